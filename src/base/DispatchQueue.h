@@ -1,0 +1,72 @@
+// Queues of work: one with a thread of its own, one that the main thread drains.
+#pragma once
+
+#include <chrono>
+#include <condition_variable>
+#include <deque>
+#include <functional>
+#include <mutex>
+#include <optional>
+#include <string>
+#include <thread>
+
+namespace qel {
+
+using Work = std::function<void()>;
+
+// Runs work items one at a time, in the order in which they came. async may be called from any
+// thread, also from a running item.
+class DispatchQueue {
+ public:
+  virtual ~DispatchQueue() = default;
+  virtual void async(Work work) = 0;
+};
+
+// Runs its work on a thread of its own, which carries the label (its first 15 characters) as name.
+// Destroyed only after the item that runs; items still waiting are dropped.
+class SerialQueue final : public DispatchQueue {
+ public:
+  explicit SerialQueue(std::string label);
+  ~SerialQueue() override;
+  SerialQueue(const SerialQueue&) = delete;
+  SerialQueue& operator=(const SerialQueue&) = delete;
+
+  const std::string& label() const { return _label; }
+  void async(Work work) override;
+
+ private:
+  void run();
+
+  const std::string _label;
+  std::mutex _mutex;
+  std::condition_variable _changed;
+  std::deque<Work> _waiting;
+  bool _stopping = false;
+  std::thread _thread;
+};
+
+// Work for the main thread. Items run only inside drain and runUntil, which the main thread calls;
+// an event loop sets a waker that makes it do so.
+class MainQueue final : public DispatchQueue {
+ public:
+  static MainQueue& shared();
+
+  void async(Work work) override;
+
+  // Called from any thread when the queue stops being empty. Set before other threads use it.
+  void setWaker(Work waker);
+
+  // Runs the items that wait now, none that they add. The number run.
+  std::size_t drain();
+
+  // Drains until the condition holds or the time is over. True when it holds.
+  bool runUntil(const std::function<bool()>& condition, std::chrono::milliseconds timeout);
+
+ private:
+  std::mutex _mutex;
+  std::condition_variable _changed;
+  std::deque<Work> _waiting;
+  Work _waker;
+};
+
+}  // namespace qel

@@ -1,0 +1,31 @@
+#include "base/FatalError.h"
+
+#include <unistd.h>
+
+#include <cstdlib>
+#include <string>
+#include <vector>
+
+namespace qel {
+namespace {
+
+std::vector<std::function<void()>>& handlers() {
+  static std::vector<std::function<void()>> registered;
+  return registered;
+}
+
+}  // namespace
+
+void atFatalError(std::function<void()> handler) { handlers().push_back(std::move(handler)); }
+
+void fatalError(std::string_view reason) {
+  for (const auto& handler : handlers()) handler();
+  std::string line = "fatal error: ";
+  line += reason;
+  line += '\n';
+  const ssize_t written = ::write(STDERR_FILENO, line.data(), line.size());
+  static_cast<void>(written);
+  std::abort();
+}
+
+}  // namespace qel

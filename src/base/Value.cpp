@@ -1,0 +1,158 @@
+#include "base/Value.h"
+
+#include <cmath>
+#include <limits>
+#include <new>
+
+#include "base/Dictionary.h"
+
+namespace qel {
+
+Value::Value(Bytes value) : _kind(Kind::bytes) { _as.bytes = new Bytes(std::move(value)); }
+Value::Value(List value) : _kind(Kind::list) { _as.list = new List(std::move(value)); }
+Value::Value(Dictionary value) : _kind(Kind::dictionary) {
+  _as.dictionary = new Dictionary(std::move(value));
+}
+
+Value::Value(const Value& other) : _kind(other._kind) {
+  switch (_kind) {
+    case Kind::null: break;
+    case Kind::boolean: _as.boolean = other._as.boolean; break;
+    case Kind::signedInteger: _as.signedInteger = other._as.signedInteger; break;
+    case Kind::unsignedInteger: _as.unsignedInteger = other._as.unsignedInteger; break;
+    case Kind::floating: _as.floating = other._as.floating; break;
+    case Kind::text: new (&_as.text) Text(other._as.text); break;
+    case Kind::bytes: _as.bytes = new Bytes(*other._as.bytes); break;
+    case Kind::list: _as.list = new List(*other._as.list); break;
+    case Kind::dictionary: _as.dictionary = new Dictionary(*other._as.dictionary); break;
+  }
+}
+
+Value::Value(Value&& other) noexcept : _kind(std::exchange(other._kind, Kind::null)) {
+  switch (_kind) {
+    case Kind::null: break;
+    case Kind::boolean: _as.boolean = other._as.boolean; break;
+    case Kind::signedInteger: _as.signedInteger = other._as.signedInteger; break;
+    case Kind::unsignedInteger: _as.unsignedInteger = other._as.unsignedInteger; break;
+    case Kind::floating: _as.floating = other._as.floating; break;
+    case Kind::text:
+      new (&_as.text) Text(std::move(other._as.text));
+      other._as.text.~Text();
+      break;
+    case Kind::bytes: _as.bytes = other._as.bytes; break;
+    case Kind::list: _as.list = other._as.list; break;
+    case Kind::dictionary: _as.dictionary = other._as.dictionary; break;
+  }
+}
+
+Value& Value::operator=(const Value& other) {
+  if (this != &other) *this = Value(other);
+  return *this;
+}
+
+Value& Value::operator=(Value&& other) noexcept {
+  if (this == &other) return *this;
+  Value taken(std::move(other));  // `other` may live below this value
+  destroy();
+  new (this) Value(std::move(taken));
+  return *this;
+}
+
+void Value::destroy() {
+  switch (_kind) {
+    case Kind::text: _as.text.~Text(); break;
+    case Kind::bytes: delete _as.bytes; break;
+    case Kind::list: delete _as.list; break;
+    case Kind::dictionary: delete _as.dictionary; break;
+    default: break;
+  }
+  _kind = Kind::null;
+}
+
+std::optional<bool> Value::asBoolean() const {
+  if (_kind != Kind::boolean) return std::nullopt;
+  return _as.boolean;
+}
+
+std::optional<std::string_view> Value::asText() const {
+  if (_kind != Kind::text) return std::nullopt;
+  return _as.text.view();
+}
+
+std::optional<std::uint64_t> Value::asUInt64() const {
+  if (_kind == Kind::unsignedInteger) return _as.unsignedInteger;
+  const auto narrow = asInt64();
+  if (!narrow || *narrow < 0) return std::nullopt;
+  return static_cast<std::uint64_t>(*narrow);
+}
+
+std::optional<std::int64_t> Value::asInt64() const {
+  if (_kind == Kind::signedInteger) return _as.signedInteger;
+  if (_kind == Kind::unsignedInteger &&
+      _as.unsignedInteger <= std::uint64_t{std::numeric_limits<std::int64_t>::max()}) {
+    return static_cast<std::int64_t>(_as.unsignedInteger);
+  }
+  if (_kind == Kind::floating && std::trunc(_as.floating) == _as.floating &&
+      _as.floating >= -0x1p63F && _as.floating < 0x1p63F) {
+    return static_cast<std::int64_t>(_as.floating);
+  }
+  return std::nullopt;
+}
+
+std::optional<std::int32_t> Value::asInt32() const {
+  const auto wide = asInt64();
+  if (!wide || *wide < std::numeric_limits<std::int32_t>::min() ||
+      *wide > std::numeric_limits<std::int32_t>::max()) {
+    return std::nullopt;
+  }
+  return static_cast<std::int32_t>(*wide);
+}
+
+std::optional<float> Value::asFloat() const {
+  if (_kind == Kind::floating) return _as.floating;
+  // Every integer up to 2^64 is below the range of single precision; only its digits may not fit.
+  if (_kind == Kind::signedInteger) {
+    const float rounded = static_cast<float>(_as.signedInteger);
+    if (rounded < 0x1p63F && static_cast<std::int64_t>(rounded) == _as.signedInteger) return rounded;
+  }
+  if (_kind == Kind::unsignedInteger) {
+    const float rounded = static_cast<float>(_as.unsignedInteger);
+    if (rounded < 0x1p64F && static_cast<std::uint64_t>(rounded) == _as.unsignedInteger) {
+      return rounded;
+    }
+  }
+  return std::nullopt;
+}
+
+std::optional<double> Value::asDouble() const {
+  switch (_kind) {
+    case Kind::signedInteger: return static_cast<double>(_as.signedInteger);
+    case Kind::unsignedInteger: return static_cast<double>(_as.unsignedInteger);
+    case Kind::floating: return _as.floating;
+    default: return std::nullopt;
+  }
+}
+
+bool operator==(const Value& a, const Value& b) {
+  using Kind = Value::Kind;
+  if (a._kind != b._kind) {
+    const auto integral = [](Kind kind) {
+      return kind == Kind::signedInteger || kind == Kind::unsignedInteger;
+    };
+    return integral(a._kind) && integral(b._kind) && a.asInt64() && a.asInt64() == b.asInt64();
+  }
+  switch (a._kind) {
+    case Kind::null: return true;
+    case Kind::boolean: return a._as.boolean == b._as.boolean;
+    case Kind::signedInteger: return a._as.signedInteger == b._as.signedInteger;
+    case Kind::unsignedInteger: return a._as.unsignedInteger == b._as.unsignedInteger;
+    case Kind::floating: return a._as.floating == b._as.floating;
+    case Kind::text: return a._as.text == b._as.text;
+    case Kind::bytes: return *a._as.bytes == *b._as.bytes;
+    case Kind::list: return *a._as.list == *b._as.list;
+    case Kind::dictionary: return *a._as.dictionary == *b._as.dictionary;
+  }
+  return false;
+}
+
+}  // namespace qel

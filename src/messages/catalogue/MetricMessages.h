@@ -1,0 +1,34 @@
+// Which message class is the payload of which metric.
+#pragma once
+
+#include <cstdint>
+#include <memory>
+#include <span>
+#include <string_view>
+
+#include "base/Bytes.h"
+#include "messages/runtime/PBCodable.h"
+
+namespace qel {
+
+// Decodes a payload: the message, or nothing when the bytes are damaged.
+using DecodeMessage = std::shared_ptr<PBCodable> (*)(ByteView payload);
+
+template <class Message>
+std::shared_ptr<PBCodable> decodeMessage(ByteView payload) {
+  return Message::initWithData(payload);
+}
+
+struct MetricMessage {
+  std::uint32_t identifier;  // as in the catalogue, 16 bits
+  std::string_view className;
+  DecodeMessage decode;
+};
+
+// The 30 metrics whose payload has a message class.
+std::span<const MetricMessage> metricMessages();
+
+// By the 16-bit identifier, or nothing.
+const MetricMessage* findMetricMessage(std::uint32_t identifier);
+
+}  // namespace qel

@@ -1,0 +1,188 @@
+#include "messages/generator/FieldCode.h"
+
+#include <google/protobuf/io/printer.h>
+#include <google/protobuf/io/zero_copy_stream_impl_lite.h>
+
+#include <algorithm>
+#include <cstdlib>
+#include <iostream>
+#include <vector>
+
+#include "messages/generator/Names.h"
+
+namespace qel::generator {
+namespace {
+
+using google::protobuf::FieldDescriptor;
+using Variables = std::map<std::string, std::string>;
+
+[[noreturn]] void refuse(const FieldDescriptor& field, std::string_view why) {
+  std::cerr << field.file()->name() << ": " << field.full_name() << ": " << why << '\n';
+  std::exit(EXIT_FAILURE);
+}
+
+bool isScalar(const FieldDescriptor& field) {
+  return !field.is_repeated() && field.type() != FieldDescriptor::TYPE_BYTES &&
+         field.type() != FieldDescriptor::TYPE_STRING &&
+         field.type() != FieldDescriptor::TYPE_MESSAGE;
+}
+
+struct Scalar {
+  const char* type;
+  const char* encoding;
+};
+
+Scalar scalarOf(const FieldDescriptor& field) {
+  switch (field.type()) {
+    case FieldDescriptor::TYPE_UINT64: return {"std::uint64_t", "uint64"};
+    case FieldDescriptor::TYPE_UINT32: return {"std::uint32_t", "uint32"};
+    case FieldDescriptor::TYPE_INT32: return {"std::int32_t", "int32"};
+    case FieldDescriptor::TYPE_SINT32: return {"std::int32_t", "sint32"};
+    case FieldDescriptor::TYPE_BOOL: return {"bool", "boolean"};
+    case FieldDescriptor::TYPE_ENUM: return {"std::int32_t", "int32"};
+    default: refuse(field, "a scalar is uint64, uint32, int32, sint32, bool or an enumeration");
+  }
+}
+
+std::string render(const Variables& variables, const char* text) {
+  std::string out;
+  {
+    google::protobuf::io::StringOutputStream stream(&out);
+    google::protobuf::io::Printer printer(&stream, '$');
+    printer.Print(variables, text);
+  }
+  return out;
+}
+
+struct Template {
+  const char* accessors;
+  const char* member;
+  const char* tableRow;
+};
+
+constexpr Template kScalar = {
+    "$type$ $name$() const { return _$name$; }\n"
+    "void set$Name$($type$ value) {\n"
+    "  _$name$ = value;\n"
+    "  setHas$Name$(true);\n"
+    "}\n"
+    "bool has$Name$() const { return Presence::get(*this, $bit$); }\n"
+    "void setHas$Name$(bool present) { Presence::set(*this, $bit$, present); }\n",
+    "$type$ _$name$ = {};\n",
+    "ScalarField<$Message$, $type$, Encoding::$encoding$>{\n"
+    "    $number$, \"$key$\", &$Message$::_$name$, $bit$},\n"};
+
+constexpr Template kEnum = {
+    "std::int32_t $name$() const { return has$Name$() ? _$name$ : 0; }\n"
+    "void set$Name$(std::int32_t value) {\n"
+    "  _$name$ = value;\n"
+    "  setHas$Name$(true);\n"
+    "}\n"
+    "bool has$Name$() const { return Presence::get(*this, $bit$); }\n"
+    "void setHas$Name$(bool present) { Presence::set(*this, $bit$, present); }\n",
+    "std::int32_t _$name$ = {};\n",
+    "EnumField<$Message$>{$number$, \"$key$\", &$Message$::_$name$, $bit$, $names$},\n"};
+
+constexpr Template kObject = {
+    "const $held$& $name$() const { return _$name$; }\n"
+    "void set$Name$($held$ value) { _$name$ = std::move(value); }\n"
+    "bool has$Name$() const { return static_cast<bool>(_$name$); }\n",
+    "$held$ _$name$;\n", "$Kind$Field<$arguments$>{$number$, \"$key$\", &$Message$::_$name$},\n"};
+
+constexpr Template kRepeatedMessage = {
+    "const std::vector<std::shared_ptr<$Nested$>>& $name$() const { return _$name$; }\n"
+    "void set$Name$(std::vector<std::shared_ptr<$Nested$>> values) {\n"
+    "  _$name$ = std::move(values);\n"
+    "}\n"
+    "void clear$Name$() { _$name$.clear(); }\n"
+    "void add$One$(std::shared_ptr<$Nested$> value) { _$name$.push_back(std::move(value)); }\n"
+    "std::size_t $name$Count() const { return _$name$.size(); }\n"
+    "const std::shared_ptr<$Nested$>& $one$AtIndex(std::size_t index) const {\n"
+    "  return _$name$.at(index);\n"
+    "}\n",
+    "std::vector<std::shared_ptr<$Nested$>> _$name$;\n",
+    "RepeatedMessageField<$Message$, $Nested$>{$number$, \"$key$\", &$Message$::_$name$},\n"};
+
+constexpr Template kPacked = {
+    "const $type$* $name$() const { return _$name$.list(); }\n"
+    "std::size_t $name$Count() const { return _$name$.count(); }\n"
+    "$type$ $one$AtIndex(std::size_t index) const { return _$name$.at(index); }\n"
+    "void add$One$($type$ value) { $Family$Add(_$name$, value); }\n"
+    "void clear$Name$() { $Family$Clear(_$name$); }\n"
+    "void set$Name$(const $type$* list, std::size_t count) {\n"
+    "  $Family$Set(_$name$, list, count);\n"
+    "}\n",
+    "$Family$ _$name$;\n",
+    "PackedField<$Message$, $type$, Encoding::$encoding$>{\n"
+    "    $number$, \"$key$\", &$Message$::_$name$},\n"};
+
+// The template for the field, with the variables that only this kind has.
+Template chooseTemplate(const FieldDescriptor& field, Variables& variables) {
+  const std::string& message = variables["Message"];
+  if (field.type() == FieldDescriptor::TYPE_MESSAGE) {
+    const std::string& nested = field.message_type()->name();
+    variables["Nested"] = nested;
+    if (field.is_repeated()) return kRepeatedMessage;
+    variables["held"] = "std::shared_ptr<" + nested + ">";
+    variables["Kind"] = "Message";
+    variables["arguments"] = message + ", " + nested;
+    return kObject;
+  }
+  if (field.is_repeated()) {
+    const Scalar scalar = scalarOf(field);
+    if (!field.is_packed()) refuse(field, "a repeated scalar must be packed");
+    variables["type"] = scalar.type;
+    variables["encoding"] = scalar.encoding;
+    variables["Family"] =
+        scalar.type == std::string_view("std::uint32_t") ? "PBRepeatedUInt32" : "PBRepeatedInt32";
+    return kPacked;
+  }
+  if (isScalar(field)) {
+    const Scalar scalar = scalarOf(field);
+    variables["type"] = scalar.type;
+    variables["encoding"] = scalar.encoding;
+    if (field.type() != FieldDescriptor::TYPE_ENUM) return kScalar;
+    variables["names"] = namesTable(*field.enum_type());
+    return kEnum;
+  }
+  const bool text = field.type() == FieldDescriptor::TYPE_STRING;
+  variables["held"] = text ? "std::optional<std::string>" : "std::optional<Bytes>";
+  variables["Kind"] = text ? "String" : "Data";
+  variables["arguments"] = message;
+  return kObject;
+}
+
+}  // namespace
+
+PresenceBits presenceBits(const google::protobuf::Descriptor& message) {
+  std::vector<const FieldDescriptor*> scalars;
+  for (int i = 0; i < message.field_count(); ++i) {
+    if (isScalar(*message.field(i))) scalars.push_back(message.field(i));
+  }
+  std::ranges::sort(scalars, {}, [](const FieldDescriptor* field) {
+    return std::pair(field->type() != FieldDescriptor::TYPE_UINT64, propertyName(*field));
+  });
+  PresenceBits bits;
+  for (std::size_t i = 0; i < scalars.size(); ++i) bits[scalars[i]] = static_cast<int>(i);
+  return bits;
+}
+
+FieldCode fieldCode(const FieldDescriptor& field, const PresenceBits& bits) {
+  Variables variables;
+  variables["Message"] = field.containing_type()->name();
+  variables["number"] = std::to_string(field.number());
+  variables["key"] = field.name();
+  variables["name"] = propertyName(field);
+  variables["Name"] = capitalised(variables["name"]);
+  variables["one"] = camelCase(field.name());
+  variables["One"] = capitalised(variables["one"]);
+  if (const auto bit = bits.find(&field); bit != bits.end()) {
+    variables["bit"] = std::to_string(bit->second);
+  }
+  const Template chosen = chooseTemplate(field, variables);
+  return {.accessors = commentOf(field, "") + render(variables, chosen.accessors),
+          .member = render(variables, chosen.member),
+          .tableRow = render(variables, chosen.tableRow)};
+}
+
+}  // namespace qel::generator

@@ -1,0 +1,102 @@
+// The rows of a message's field table. Every message class has a constant tuple of them, kFields,
+// in ascending field number; the codec rules are written once over these tables.
+#pragma once
+
+#include <algorithm>
+#include <cstdint>
+#include <memory>
+#include <optional>
+#include <span>
+#include <string>
+#include <string_view>
+#include <tuple>
+#include <type_traits>
+#include <vector>
+
+#include "base/Bytes.h"
+#include "messages/runtime/PBRepeated.h"
+
+namespace qel {
+
+// How a scalar travels. All are varints; sint32 is ZigZag-coded.
+enum class Encoding : std::uint8_t { uint64, uint32, int32, sint32, boolean };
+
+// One name of an enumeration; tables of them are sorted by value.
+struct EnumName {
+  std::int32_t value;
+  std::string_view name;
+};
+
+template <class Message, class T, Encoding encoding>
+struct ScalarField {
+  std::uint32_t number;
+  std::string_view key;
+  T Message::*member;
+  unsigned presenceBit;
+};
+
+template <class Message>
+struct EnumField {
+  std::uint32_t number;
+  std::string_view key;
+  std::int32_t Message::*member;
+  unsigned presenceBit;
+  std::span<const EnumName> names;
+};
+
+template <class Message>
+struct DataField {
+  std::uint32_t number;
+  std::string_view key;
+  std::optional<Bytes> Message::*member;
+};
+
+template <class Message>
+struct StringField {
+  std::uint32_t number;
+  std::string_view key;
+  std::optional<std::string> Message::*member;
+};
+
+template <class Message, class Nested>
+struct MessageField {
+  std::uint32_t number;
+  std::string_view key;
+  std::shared_ptr<Nested> Message::*member;
+};
+
+template <class Message, class Nested>
+struct RepeatedMessageField {
+  std::uint32_t number;
+  std::string_view key;
+  std::vector<std::shared_ptr<Nested>> Message::*member;
+};
+
+template <class Message, class T, Encoding encoding>
+struct PackedField {
+  std::uint32_t number;
+  std::string_view key;
+  PBRepeated<T> Message::*member;
+};
+
+// The smallest word with a presence bit for each of `count` scalar fields.
+template <unsigned count>
+using PresenceWord =
+    std::conditional_t<count <= 8, std::uint8_t,
+                       std::conditional_t<count <= 16, std::uint16_t,
+                                          std::conditional_t<count <= 32, std::uint32_t,
+                                                             std::uint64_t>>>;
+
+// The name of an enumeration's value, or empty.
+constexpr std::string_view nameOf(std::span<const EnumName> names, std::int32_t value) {
+  const auto found = std::ranges::lower_bound(names, value, {}, &EnumName::value);
+  return found != names.end() && found->value == value ? found->name : std::string_view();
+}
+
+// Calls visit(field) for every row of the message's table, in field order.
+template <class Message, class Visitor>
+constexpr void forEachField(Visitor&& visit) {
+  std::apply([&visit](const auto&... field) { (visit(field), ...); }, Message::kFields);
+}
+
+}  // namespace qel

@@ -1,0 +1,86 @@
+#include "messages/runtime/PBDataReader.h"
+
+#include <vector>
+
+namespace qel {
+namespace {
+
+// The next `count` bytes, or nothing with the error flag set when there are fewer.
+std::optional<ByteView> take(PBDataReader& reader, std::uint64_t count) {
+  if (reader._error || count > reader._length - reader._pos) {
+    reader._error = true;
+    return std::nullopt;
+  }
+  const ByteView taken(reader._bytes + reader._pos, count);
+  reader._pos += count;
+  return taken;
+}
+
+std::optional<ByteView> takeDelimited(PBDataReader& reader) {
+  return take(reader, PBReaderReadVarint(reader));
+}
+
+// Skips everything up to the end tag of the group `fieldNumber`. Groups within are counted on a
+// heap stack, so that no input can exhaust the call stack.
+bool skipGroup(PBDataReader& reader, std::uint32_t fieldNumber);
+
+bool skipScalar(PBDataReader& reader, std::uint8_t wireType) {
+  switch (wireType) {
+    case 0: PBReaderReadVarint(reader); return !reader._error;
+    case 1: return take(reader, 8).has_value();
+    case 2: return takeDelimited(reader).has_value();
+    case 5: return take(reader, 4).has_value();
+    default: return false;
+  }
+}
+
+bool skipGroup(PBDataReader& reader, std::uint32_t fieldNumber) {
+  std::vector<std::uint64_t> open = {fieldNumber};
+  while (!open.empty()) {
+    const std::uint64_t tag = PBReaderReadVarint(reader);
+    if (reader._error) return false;
+    const auto wireType = static_cast<std::uint8_t>(tag & 7);
+    if (wireType == 3) {
+      open.push_back(tag >> 3);
+    } else if (wireType == 4) {
+      if (tag >> 3 != open.back()) return false;
+      open.pop_back();
+    } else if (!skipScalar(reader, wireType)) {
+      return false;
+    }
+  }
+  return true;
+}
+
+}  // namespace
+
+std::optional<Bytes> PBReaderReadData(PBDataReader& reader) {
+  const auto taken = takeDelimited(reader);
+  if (!taken) return std::nullopt;
+  return Bytes(taken->begin(), taken->end());
+}
+
+std::optional<std::string> PBReaderReadString(PBDataReader& reader) {
+  const auto taken = takeDelimited(reader);
+  if (!taken) return std::nullopt;
+  return std::string(taken->begin(), taken->end());
+}
+
+bool PBReaderPlaceMark(PBDataReader& reader, PBReaderMark& mark) {
+  const std::uint64_t length = PBReaderReadVarint(reader);
+  if (length > reader._length - reader._pos) return false;
+  mark.length = reader._length;
+  reader._length = reader._pos + length;
+  return true;
+}
+
+void PBReaderRecallMark(PBDataReader& reader, const PBReaderMark& mark) {
+  reader._length = mark.length;
+}
+
+bool PBReaderSkipValueWithTag(PBDataReader& reader, std::uint32_t fieldNumber,
+                              std::uint8_t wireType) {
+  return wireType == 3 ? skipGroup(reader, fieldNumber) : skipScalar(reader, wireType);
+}
+
+}  // namespace qel

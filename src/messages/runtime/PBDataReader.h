@@ -1,0 +1,65 @@
+// Reads protocol-buffer wire format from a run of bytes.
+#pragma once
+
+#include <cstdint>
+#include <optional>
+#include <string>
+
+#include "base/Bytes.h"
+
+namespace qel {
+
+// The input stays the caller's and must outlive the reader. Once set, the error flag stays set.
+class PBDataReader {
+ public:
+  explicit PBDataReader(ByteView bytes) : _bytes(bytes.data()), _length(bytes.size()) {}
+
+  const std::uint8_t* _bytes;
+  std::uint64_t _length;  // end of what may be read now: the input, or the marked part of it
+  std::uint64_t _pos = 0;
+  bool _error = false;
+};
+
+// What PBReaderPlaceMark remembers: the end to go back to.
+struct PBReaderMark {
+  std::uint64_t length = 0;
+};
+
+// A varint of at most ten bytes. Ten bytes that all carry the top bit read as 0; running past the
+// end sets the error flag and reads as 0.
+inline std::uint64_t PBReaderReadVarint(PBDataReader& reader) {
+  constexpr unsigned kLongest = 10;
+  std::uint64_t value = 0;
+  std::uint64_t pos = reader._pos;
+  for (unsigned i = 0; i < kLongest; ++i) {
+    if (pos >= reader._length) {
+      reader._pos = pos;
+      reader._error = true;
+      return 0;
+    }
+    const std::uint8_t byte = reader._bytes[pos++];
+    value |= static_cast<std::uint64_t>(byte & 0x7F) << (7 * i);
+    if (byte < 0x80) {
+      reader._pos = pos;
+      return value;
+    }
+  }
+  reader._pos = pos;
+  return 0;
+}
+
+// A varint length and as many bytes. A length past the end sets the error flag and gives nothing.
+std::optional<Bytes> PBReaderReadData(PBDataReader& reader);
+std::optional<std::string> PBReaderReadString(PBDataReader& reader);
+
+// Reads a varint length L and narrows the reader to the next L bytes until PBReaderRecallMark
+// widens it again. False, with nothing narrowed, when that part runs past the end.
+bool PBReaderPlaceMark(PBDataReader& reader, PBReaderMark& mark);
+void PBReaderRecallMark(PBDataReader& reader, const PBReaderMark& mark);
+
+// Skips the value of a field by its wire type: 0, 1, 2, 5, or 3 for a group with everything in it.
+// False on any other wire type, on a group closed by another field's end, and past the end.
+bool PBReaderSkipValueWithTag(PBDataReader& reader, std::uint32_t fieldNumber,
+                              std::uint8_t wireType);
+
+}  // namespace qel

@@ -1,0 +1,84 @@
+// The operations of every message class, over its field table.
+#pragma once
+
+#include <string>
+
+#include "base/FatalError.h"
+#include "messages/runtime/MessageDictionary.h"
+#include "messages/runtime/MessageReader.h"
+#include "messages/runtime/MessageRelations.h"
+#include "messages/runtime/MessageWriter.h"
+#include "messages/runtime/PBMessage.h"
+
+namespace qel {
+
+// `message` as one of the class, which it must be exactly. Message classes are final, so a cast
+// that succeeds says just that.
+template <class Message, class Codable>
+auto& sameClass(Codable& message, std::string_view operation) {
+  using Wanted = std::conditional_t<std::is_const_v<Codable>, const Message, Message>;
+  auto* same = dynamic_cast<Wanted*>(&message);
+  if (!same) {
+    fatalError(std::string(operation) + ": " + std::string(message.className()) + " is no " +
+               std::string(Message::kClassName));
+  }
+  return *same;
+}
+
+template <class Message>
+std::shared_ptr<Message> PBMessage<Message>::initWithData(ByteView bytes) {
+  auto message = std::make_shared<Message>();
+  PBDataReader reader(bytes);
+  return readMessage(*message, reader) ? message : nullptr;
+}
+
+template <class Message>
+Dictionary PBMessage<Message>::dictionaryRepresentation() const {
+  return messageDictionary(self());
+}
+
+template <class Message>
+bool PBMessage<Message>::readFrom(PBDataReader& reader) {
+  return readMessage(self(), reader);
+}
+
+template <class Message>
+void PBMessage<Message>::writeTo(PBDataWriter& writer) const {
+  writeMessage(self(), writer);
+}
+
+template <class Message>
+void PBMessage<Message>::copyTo(PBCodable& destination) const {
+  copyMessage(sameClass<Message>(destination, "copyTo"), self());
+}
+
+template <class Message>
+std::shared_ptr<Message> PBMessage<Message>::deepCopy() const {
+  auto copy = std::make_shared<Message>();
+  copyMessage(*copy, self());
+  detachMessage(*copy);
+  return copy;
+}
+
+template <class Message>
+std::shared_ptr<PBCodable> PBMessage<Message>::copyWithZone() const {
+  return deepCopy();
+}
+
+template <class Message>
+bool PBMessage<Message>::isEqual(const PBCodable& other) const {
+  const auto* same = dynamic_cast<const Message*>(&other);
+  return same && equalMessages(self(), *same);
+}
+
+template <class Message>
+std::size_t PBMessage<Message>::hash() const {
+  return hashMessage(self());
+}
+
+template <class Message>
+void PBMessage<Message>::mergeFrom(const PBCodable& source) {
+  mergeMessage(self(), sameClass<Message>(source, "mergeFrom"));
+}
+
+}  // namespace qel
