@@ -1,0 +1,137 @@
+#include "connection/TeskWrapper.h"
+
+#include <array>
+#include <fstream>
+#include <iterator>
+#include <mutex>
+#include <utility>
+
+#include "base/LogSink.h"
+#include "base/Rendering.h"
+#include "tesk/Constants.h"
+
+namespace qel {
+namespace {
+
+constexpr std::string_view kClientName = "qelwatch";
+constexpr std::string_view kQueueLabel = "tesk.qelwatch.serialQ.queue";
+constexpr std::int64_t kAppID = 2;
+constexpr std::int64_t kPayloadType = 0;
+
+// An event stream of the manager and where its events go.
+struct Stream {
+  std::string_view eventName;
+  std::string_view logText;
+  void (TeskWrapperDelegate::*deliver)(const std::optional<Dictionary>&);
+};
+
+constexpr std::array kStreams = {
+    Stream{tesk::kEventTrigger, "EventTrigger dict=", &TeskWrapperDelegate::eventsDidUpdate},
+    Stream{tesk::kEventMetric, "MetricsTrigger dict=", &TeskWrapperDelegate::metricsDidUpdate},
+};
+
+void logOperation(std::string_view operation, std::string_view text) {
+  std::string line(operation);
+  line += ": ";
+  line += text;
+  systemLog().write(line);
+}
+
+void handOver(const std::shared_ptr<TeskWrapper>& wrapper, const Stream& stream,
+              const tesk::Message& event) {
+  Dictionary dictionary = tesk::createDictionaryFromMessage(event);
+  logOperation("-[TeskWrapper listen]_block_invoke",
+               std::string(stream.logText) + jsonText(dictionary));
+  if (!wrapper->delegate()) return;
+  MainQueue::shared().async(
+      [wrapper, &stream, held = std::optional(std::move(dictionary))] {
+        if (const auto delegate = wrapper->delegate()) ((*delegate).*stream.deliver)(held);
+      });
+}
+
+// Sends the request; its result is logged and judged.
+bool perform(const std::shared_ptr<tesk::client::Manager>& manager, std::string_view operation,
+             std::string_view command, const tesk::Message& request) {
+  tesk::CommandResult result{static_cast<std::int32_t>(0xE020E002), ""};
+  tesk::Message reply;
+  result = tesk::client::PerformCommand(manager, command, request, reply);
+  logOperation(operation, "error=" + std::to_string(result.code) + " msg=" + result.message);
+  return result.code == 0;
+}
+
+// The content of the file; nothing of one that cannot be read.
+Bytes contentOf(const std::string& path) {
+  std::ifstream file(path, std::ios::binary);
+  return Bytes(std::istreambuf_iterator<char>(file), std::istreambuf_iterator<char>());
+}
+
+}  // namespace
+
+const std::shared_ptr<TeskWrapper>& TeskWrapper::sharedInstance() {
+  static std::shared_ptr<TeskWrapper> instance;
+  if (!instance) instance = init();
+  return instance;
+}
+
+std::shared_ptr<TeskWrapper> TeskWrapper::init() {
+  const std::shared_ptr<TeskWrapper> wrapper(new TeskWrapper);
+  wrapper->_teskManager = tesk::client::CreateManager(kClientName, wrapper->queue());
+  return wrapper;
+}
+
+const std::shared_ptr<SerialQueue>& TeskWrapper::queue() {
+  static std::once_flag once;
+  std::call_once(once, [this] { _queue = std::make_shared<SerialQueue>(std::string(kQueueLabel)); });
+  return _queue;
+}
+
+void TeskWrapper::listen() {
+  for (const Stream& stream : kStreams) {
+    tesk::client::RegisterEventHandler(
+        _teskManager, stream.eventName,
+        [weak = weak_from_this(), &stream](const tesk::Message& event, tesk::client::DispatchGroup&) {
+          if (const auto wrapper = weak.lock()) handOver(wrapper, stream, event);
+        });
+  }
+  tesk::client::EventsOff(_teskManager);
+  tesk::client::EventsOn(_teskManager);
+  logOperation("-[TeskWrapper listen]", "listening for events");
+}
+
+bool TeskWrapper::addQuixConfigForAppId(std::string_view appId, const std::string& protofFilePath) {
+  if (appId != kClientName) return false;
+  tesk::Message request;
+  request.setInt64(tesk::kKeyAppID, kAppID);
+  request.setData(tesk::kKeyPayload, contentOf(protofFilePath));
+  request.setInt64(tesk::kKeyPayloadType, kPayloadType);
+  return perform(_teskManager, "-[TeskWrapper addQuixConfigForAppId:andProtofFilePath:]",
+                 tesk::kCommandAddConfiguration, request);
+}
+
+bool TeskWrapper::removeQuixConfigForAppid(std::string_view appId) {
+  if (appId != kClientName) return false;
+  tesk::Message request;
+  request.setInt64(tesk::kKeyAppID, kAppID);
+  return perform(_teskManager, "-[TeskWrapper removeQuixConfigForAppid:]",
+                 tesk::kCommandClearConfiguration, request);
+}
+
+bool TeskWrapper::querySpecificMetric(std::string_view appId, std::int32_t triggerRef,
+                                      std::int32_t triggerType, std::int32_t triggerID,
+                                      std::int32_t profileID, std::int32_t metricID) {
+  if (appId != kClientName) return false;
+  tesk::Message request;
+  request.setInt64(tesk::kKeyAppID, kAppID);
+  request.setInt64(tesk::kKeyPayloadType, kPayloadType);
+  request.setInt64(tesk::kKeyTriggerRef, triggerRef);
+  request.setInt64(tesk::kKeyTriggerType, triggerType);
+  request.setInt64(tesk::kKeyTriggerID, triggerID);
+  request.setInt64(tesk::kKeyProfileID, profileID);
+  request.setInt64(tesk::kKeyMetricID, metricID);
+  return perform(_teskManager,
+                 "-[TeskWrapper querySpecificMetric:triggerRef:triggerType:triggerID:profileID:"
+                 "metricID:]",
+                 tesk::kCommandQueryMetric, request);
+}
+
+}  // namespace qel

@@ -1,0 +1,40 @@
+#include "metrics/MetricStore.h"
+
+#include <initializer_list>
+#include <string_view>
+
+namespace qel {
+namespace {
+
+Dictionary emptyTexts(std::initializer_list<std::string_view> keys) {
+  Dictionary record;
+  record.reserve(keys.size());
+  for (const std::string_view key : keys) record.append(Text::borrowed(key), Text());
+  return record;
+}
+
+}  // namespace
+
+EntryList placeholderList() {
+  constexpr std::string_view kWaiting = "Waiting for Update";
+  return {Dictionary{{Text::borrowed(kWaiting), Text::borrowed(kWaiting)}}};
+}
+
+LTE::LTE()
+    : SelReselCellInfo(emptyTexts(
+          {"timestamp", "ims_emergency_support", "ac_barring_for_emergency",
+           "mo_signalling_ac_barring_factor", "mo_signalling_ac_barring_time",
+           "mo_signalling_ac_barring_for_special_ac", "mo_data_ac_barring_factor",
+           "mo_data_ac_barring_time", "mo_data_ac_barring_for_special_ac", "QRxLevMin", "QQualMin",
+           "S_non_intra_search_P", "S_non_intra_search_Q", "S_intra_search_P", "S_intra_search_Q",
+           "Thresh_serving_lowP", "Thresh_serving_lowQ", "priority_operating_freq",
+           "multi_band_info"})) {}
+
+UMTS::UMTS()
+    : SelReselCellInfo(emptyTexts({"timestamp", "ims_emergency_support", "hsdpa_capable",
+                                   "edch_capable", "duplex_mode", "cell_barred",
+                                   "fach_meas_occ_info_present", "s_rxlev", "s_qual",
+                                   "s_intrasearch", "s_intersearch", "s_search_rat", "s_cell_prio",
+                                   "multi_band_info"})) {}
+
+}  // namespace qel
