@@ -2,38 +2,54 @@
 
 #include <pthread.h>
 
+#include <algorithm>
+#include <iterator>
+
 namespace qel {
 
+struct SerialQueue::State {
+  std::mutex mutex;
+  std::condition_variable changed;
+  std::deque<Work> waiting;
+  bool stopping = false;
+};
+
 SerialQueue::SerialQueue(std::string label)
-    : _label(std::move(label)), _thread([this] { run(); }) {
+    : _label(std::move(label)),
+      _state(std::make_shared<State>()),
+      _thread([state = _state] { run(state); }) {
   constexpr std::size_t kLongestThreadName = 15;
   ::pthread_setname_np(_thread.native_handle(), _label.substr(0, kLongestThreadName).c_str());
 }
 
 SerialQueue::~SerialQueue() {
   {
-    const std::lock_guard lock(_mutex);
-    _stopping = true;
+    const std::lock_guard lock(_state->mutex);
+    _state->stopping = true;
   }
-  _changed.notify_one();
-  _thread.join();
+  _state->changed.notify_one();
+  if (_thread.get_id() == std::this_thread::get_id()) {
+    _thread.detach();
+  } else {
+    _thread.join();
+  }
 }
 
 void SerialQueue::async(Work work) {
   {
-    const std::lock_guard lock(_mutex);
-    _waiting.push_back(std::move(work));
+    const std::lock_guard lock(_state->mutex);
+    _state->waiting.push_back(std::move(work));
   }
-  _changed.notify_one();
+  _state->changed.notify_one();
 }
 
-void SerialQueue::run() {
-  std::unique_lock lock(_mutex);
+void SerialQueue::run(const std::shared_ptr<State>& state) {
+  std::unique_lock lock(state->mutex);
   while (true) {
-    _changed.wait(lock, [this] { return _stopping || !_waiting.empty(); });
-    if (_stopping) return;
-    Work work = std::move(_waiting.front());
-    _waiting.pop_front();
+    state->changed.wait(lock, [&state] { return state->stopping || !state->waiting.empty(); });
+    if (state->stopping) return;
+    Work work = std::move(state->waiting.front());
+    state->waiting.pop_front();
     lock.unlock();
     work();
     work = nullptr;
@@ -42,7 +58,7 @@ void SerialQueue::run() {
 }
 
 MainQueue& MainQueue::shared() {
-  static MainQueue queue;
+  static auto& queue = *new MainQueue;  // other threads may still post while the process ends
   return queue;
 }
 
@@ -62,14 +78,18 @@ void MainQueue::setWaker(Work waker) {
   _waker = std::move(waker);
 }
 
-std::size_t MainQueue::drain() {
+bool MainQueue::drain(std::size_t most) {
   std::deque<Work> ready;
   {
     const std::lock_guard lock(_mutex);
-    ready.swap(_waiting);
+    most = std::min(most, _waiting.size());
+    const auto end = _waiting.begin() + static_cast<std::ptrdiff_t>(most);
+    ready.assign(std::move_iterator(_waiting.begin()), std::move_iterator(end));
+    _waiting.erase(_waiting.begin(), end);
   }
   for (Work& work : ready) work();
-  return ready.size();
+  const std::lock_guard lock(_mutex);
+  return !_waiting.empty();
 }
 
 bool MainQueue::runUntil(const std::function<bool()>& condition,

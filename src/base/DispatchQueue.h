@@ -5,8 +5,9 @@
 #include <condition_variable>
 #include <deque>
 #include <functional>
+#include <limits>
+#include <memory>
 #include <mutex>
-#include <optional>
 #include <string>
 #include <thread>
 
@@ -23,7 +24,8 @@ class DispatchQueue {
 };
 
 // Runs its work on a thread of its own, which carries the label (its first 15 characters) as name.
-// Destroyed only after the item that runs; items still waiting are dropped.
+// The destructor waits for the item that runs and drops the items that wait; when the item that
+// runs is what lets go of the queue, it does not wait.
 class SerialQueue final : public DispatchQueue {
  public:
   explicit SerialQueue(std::string label);
@@ -35,13 +37,11 @@ class SerialQueue final : public DispatchQueue {
   void async(Work work) override;
 
  private:
-  void run();
+  struct State;
+  static void run(const std::shared_ptr<State>& state);
 
   const std::string _label;
-  std::mutex _mutex;
-  std::condition_variable _changed;
-  std::deque<Work> _waiting;
-  bool _stopping = false;
+  const std::shared_ptr<State> _state;  // the thread's too: it may outlive the queue
   std::thread _thread;
 };
 
@@ -56,8 +56,8 @@ class MainQueue final : public DispatchQueue {
   // Called from any thread when the queue stops being empty. Set before other threads use it.
   void setWaker(Work waker);
 
-  // Runs the items that wait now, none that they add. The number run.
-  std::size_t drain();
+  // Runs the items that wait now, none that they add, `most` at most. True when items are left.
+  bool drain(std::size_t most = std::numeric_limits<std::size_t>::max());
 
   // Drains until the condition holds or the time is over. True when it holds.
   bool runUntil(const std::function<bool()>& condition, std::chrono::milliseconds timeout);

@@ -19,14 +19,16 @@ int writeAll(int descriptor, std::string_view text) {
   return 0;
 }
 
+// Neither slot is ever destroyed: threads may log while the process ends.
 std::shared_ptr<LogSink>& standardOutputSlot() {
-  static std::shared_ptr<LogSink> sink = std::make_shared<DescriptorSink>(STDOUT_FILENO);
+  static auto& sink =
+      *new std::shared_ptr<LogSink>(std::make_shared<DescriptorSink>(STDOUT_FILENO));
   return sink;
 }
 
 std::shared_ptr<LogSink>& systemLogSlot() {
-  static std::shared_ptr<LogSink> sink =
-      std::make_shared<SystemLogSink>("qelwatch", SystemLogSink::Echo::none);
+  static auto& sink = *new std::shared_ptr<LogSink>(
+      std::make_shared<SystemLogSink>("qelwatch", SystemLogSink::Echo::none));
   return sink;
 }
 

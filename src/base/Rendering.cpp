@@ -38,13 +38,27 @@ void appendBytes(std::string& out, const Bytes& bytes) {
 
 void appendEscaped(std::string& out, char c) {
   switch (c) {
-    case '"': out += "\\\""; break;
-    case '\\': out += "\\\\"; break;
-    case '\b': out += "\\b"; break;
-    case '\f': out += "\\f"; break;
-    case '\n': out += "\\n"; break;
-    case '\r': out += "\\r"; break;
-    case '\t': out += "\\t"; break;
+    case '"':
+      out += "\\\"";
+      break;
+    case '\\':
+      out += "\\\\";
+      break;
+    case '\b':
+      out += "\\b";
+      break;
+    case '\f':
+      out += "\\f";
+      break;
+    case '\n':
+      out += "\\n";
+      break;
+    case '\r':
+      out += "\\r";
+      break;
+    case '\t':
+      out += "\\t";
+      break;
     default:
       out += "\\u00";
       appendHex(out, std::array{static_cast<std::uint8_t>(c)});
@@ -97,19 +111,35 @@ void appendJson(std::string& out, const Dictionary& dictionary) {
 
 void appendJson(std::string& out, const Value& value) {
   switch (value.kind()) {
-    case Value::Kind::null: out += "null"; break;
-    case Value::Kind::boolean: out += *value.asBoolean() ? "true" : "false"; break;
-    case Value::Kind::signedInteger: appendInteger(out, *value.asInt64()); break;
-    case Value::Kind::unsignedInteger: appendInteger(out, *value.asUInt64()); break;
-    case Value::Kind::floating: appendFloat(out, *value.asFloat()); break;
-    case Value::Kind::text: appendJsonString(out, *value.asText()); break;
+    case Value::Kind::null:
+      out += "null";
+      break;
+    case Value::Kind::boolean:
+      out += *value.asBoolean() ? "true" : "false";
+      break;
+    case Value::Kind::signedInteger:
+      appendInteger(out, *value.asInt64());
+      break;
+    case Value::Kind::unsignedInteger:
+      appendInteger(out, *value.asUInt64());
+      break;
+    case Value::Kind::floating:
+      appendFloat(out, *value.asFloat());
+      break;
+    case Value::Kind::text:
+      appendJsonString(out, *value.asText());
+      break;
     case Value::Kind::bytes:
       out += '"';
       appendBytes(out, *value.asBytes());
       out += '"';
       break;
-    case Value::Kind::list: appendList(out, *value.asList()); break;
-    case Value::Kind::dictionary: appendJson(out, *value.asDictionary()); break;
+    case Value::Kind::list:
+      appendList(out, *value.asList());
+      break;
+    case Value::Kind::dictionary:
+      appendJson(out, *value.asDictionary());
+      break;
   }
 }
 
@@ -128,10 +158,17 @@ std::string jsonText(const Dictionary& dictionary) {
 std::string cellText(const Value& value) {
   std::string out;
   switch (value.kind()) {
-    case Value::Kind::boolean: out = *value.asBoolean() ? "1" : "0"; break;
-    case Value::Kind::text: out = *value.asText(); break;
-    case Value::Kind::bytes: appendBytes(out, *value.asBytes()); break;
-    default: appendJson(out, value);
+    case Value::Kind::boolean:
+      out = *value.asBoolean() ? "1" : "0";
+      break;
+    case Value::Kind::text:
+      out = *value.asText();
+      break;
+    case Value::Kind::bytes:
+      appendBytes(out, *value.asBytes());
+      break;
+    default:
+      appendJson(out, value);
   }
   return out;
 }

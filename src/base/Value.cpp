@@ -16,32 +16,64 @@ Value::Value(Dictionary value) : _kind(Kind::dictionary) {
 
 Value::Value(const Value& other) : _kind(other._kind) {
   switch (_kind) {
-    case Kind::null: break;
-    case Kind::boolean: _as.boolean = other._as.boolean; break;
-    case Kind::signedInteger: _as.signedInteger = other._as.signedInteger; break;
-    case Kind::unsignedInteger: _as.unsignedInteger = other._as.unsignedInteger; break;
-    case Kind::floating: _as.floating = other._as.floating; break;
-    case Kind::text: new (&_as.text) Text(other._as.text); break;
-    case Kind::bytes: _as.bytes = new Bytes(*other._as.bytes); break;
-    case Kind::list: _as.list = new List(*other._as.list); break;
-    case Kind::dictionary: _as.dictionary = new Dictionary(*other._as.dictionary); break;
+    case Kind::null:
+      break;
+    case Kind::boolean:
+      _as.boolean = other._as.boolean;
+      break;
+    case Kind::signedInteger:
+      _as.signedInteger = other._as.signedInteger;
+      break;
+    case Kind::unsignedInteger:
+      _as.unsignedInteger = other._as.unsignedInteger;
+      break;
+    case Kind::floating:
+      _as.floating = other._as.floating;
+      break;
+    case Kind::text:
+      new (&_as.text) Text(other._as.text);
+      break;
+    case Kind::bytes:
+      _as.bytes = new Bytes(*other._as.bytes);
+      break;
+    case Kind::list:
+      _as.list = new List(*other._as.list);
+      break;
+    case Kind::dictionary:
+      _as.dictionary = new Dictionary(*other._as.dictionary);
+      break;
   }
 }
 
 Value::Value(Value&& other) noexcept : _kind(std::exchange(other._kind, Kind::null)) {
   switch (_kind) {
-    case Kind::null: break;
-    case Kind::boolean: _as.boolean = other._as.boolean; break;
-    case Kind::signedInteger: _as.signedInteger = other._as.signedInteger; break;
-    case Kind::unsignedInteger: _as.unsignedInteger = other._as.unsignedInteger; break;
-    case Kind::floating: _as.floating = other._as.floating; break;
+    case Kind::null:
+      break;
+    case Kind::boolean:
+      _as.boolean = other._as.boolean;
+      break;
+    case Kind::signedInteger:
+      _as.signedInteger = other._as.signedInteger;
+      break;
+    case Kind::unsignedInteger:
+      _as.unsignedInteger = other._as.unsignedInteger;
+      break;
+    case Kind::floating:
+      _as.floating = other._as.floating;
+      break;
     case Kind::text:
       new (&_as.text) Text(std::move(other._as.text));
       other._as.text.~Text();
       break;
-    case Kind::bytes: _as.bytes = other._as.bytes; break;
-    case Kind::list: _as.list = other._as.list; break;
-    case Kind::dictionary: _as.dictionary = other._as.dictionary; break;
+    case Kind::bytes:
+      _as.bytes = other._as.bytes;
+      break;
+    case Kind::list:
+      _as.list = other._as.list;
+      break;
+    case Kind::dictionary:
+      _as.dictionary = other._as.dictionary;
+      break;
   }
 }
 
@@ -60,11 +92,20 @@ Value& Value::operator=(Value&& other) noexcept {
 
 void Value::destroy() {
   switch (_kind) {
-    case Kind::text: _as.text.~Text(); break;
-    case Kind::bytes: delete _as.bytes; break;
-    case Kind::list: delete _as.list; break;
-    case Kind::dictionary: delete _as.dictionary; break;
-    default: break;
+    case Kind::text:
+      _as.text.~Text();
+      break;
+    case Kind::bytes:
+      delete _as.bytes;
+      break;
+    case Kind::list:
+      delete _as.list;
+      break;
+    case Kind::dictionary:
+      delete _as.dictionary;
+      break;
+    default:
+      break;
   }
   _kind = Kind::null;
 }
@@ -113,7 +154,8 @@ std::optional<float> Value::asFloat() const {
   // Every integer up to 2^64 is below the range of single precision; only its digits may not fit.
   if (_kind == Kind::signedInteger) {
     const float rounded = static_cast<float>(_as.signedInteger);
-    if (rounded < 0x1p63F && static_cast<std::int64_t>(rounded) == _as.signedInteger) return rounded;
+    if (rounded < 0x1p63F && static_cast<std::int64_t>(rounded) == _as.signedInteger)
+      return rounded;
   }
   if (_kind == Kind::unsignedInteger) {
     const float rounded = static_cast<float>(_as.unsignedInteger);
@@ -126,10 +168,14 @@ std::optional<float> Value::asFloat() const {
 
 std::optional<double> Value::asDouble() const {
   switch (_kind) {
-    case Kind::signedInteger: return static_cast<double>(_as.signedInteger);
-    case Kind::unsignedInteger: return static_cast<double>(_as.unsignedInteger);
-    case Kind::floating: return _as.floating;
-    default: return std::nullopt;
+    case Kind::signedInteger:
+      return static_cast<double>(_as.signedInteger);
+    case Kind::unsignedInteger:
+      return static_cast<double>(_as.unsignedInteger);
+    case Kind::floating:
+      return _as.floating;
+    default:
+      return std::nullopt;
   }
 }
 
@@ -142,15 +188,24 @@ bool operator==(const Value& a, const Value& b) {
     return integral(a._kind) && integral(b._kind) && a.asInt64() && a.asInt64() == b.asInt64();
   }
   switch (a._kind) {
-    case Kind::null: return true;
-    case Kind::boolean: return a._as.boolean == b._as.boolean;
-    case Kind::signedInteger: return a._as.signedInteger == b._as.signedInteger;
-    case Kind::unsignedInteger: return a._as.unsignedInteger == b._as.unsignedInteger;
-    case Kind::floating: return a._as.floating == b._as.floating;
-    case Kind::text: return a._as.text == b._as.text;
-    case Kind::bytes: return *a._as.bytes == *b._as.bytes;
-    case Kind::list: return *a._as.list == *b._as.list;
-    case Kind::dictionary: return *a._as.dictionary == *b._as.dictionary;
+    case Kind::null:
+      return true;
+    case Kind::boolean:
+      return a._as.boolean == b._as.boolean;
+    case Kind::signedInteger:
+      return a._as.signedInteger == b._as.signedInteger;
+    case Kind::unsignedInteger:
+      return a._as.unsignedInteger == b._as.unsignedInteger;
+    case Kind::floating:
+      return a._as.floating == b._as.floating;
+    case Kind::text:
+      return a._as.text == b._as.text;
+    case Kind::bytes:
+      return *a._as.bytes == *b._as.bytes;
+    case Kind::list:
+      return *a._as.list == *b._as.list;
+    case Kind::dictionary:
+      return *a._as.dictionary == *b._as.dictionary;
   }
   return false;
 }

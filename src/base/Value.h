@@ -75,10 +75,10 @@ class Value {
 
   // Numbers by what they can stand for. A boolean is not a number.
   std::optional<std::uint64_t> asUInt64() const;  // any integer that is not negative
-  std::optional<std::int64_t> asInt64() const;   // any integer that fits 64 bits signed
-  std::optional<std::int32_t> asInt32() const;   // any integer that fits 32 bits signed
-  std::optional<float> asFloat() const;          // any number exact in single precision
-  std::optional<double> asDouble() const;        // any number, rounded to double precision
+  std::optional<std::int64_t> asInt64() const;    // any integer that fits 64 bits signed
+  std::optional<std::int32_t> asInt32() const;    // any integer that fits 32 bits signed
+  std::optional<float> asFloat() const;           // any number exact in single precision
+  std::optional<double> asDouble() const;         // any number, rounded to double precision
 
   friend bool operator==(const Value& a, const Value& b);
 

@@ -43,10 +43,9 @@ void handOver(const std::shared_ptr<TeskWrapper>& wrapper, const Stream& stream,
   logOperation("-[TeskWrapper listen]_block_invoke",
                std::string(stream.logText) + jsonText(dictionary));
   if (!wrapper->delegate()) return;
-  MainQueue::shared().async(
-      [wrapper, &stream, held = std::optional(std::move(dictionary))] {
-        if (const auto delegate = wrapper->delegate()) ((*delegate).*stream.deliver)(held);
-      });
+  MainQueue::shared().async([wrapper, &stream, held = std::optional(std::move(dictionary))] {
+    if (const auto delegate = wrapper->delegate()) ((*delegate).*stream.deliver)(held);
+  });
 }
 
 // Sends the request; its result is logged and judged.
@@ -68,7 +67,7 @@ Bytes contentOf(const std::string& path) {
 }  // namespace
 
 const std::shared_ptr<TeskWrapper>& TeskWrapper::sharedInstance() {
-  static std::shared_ptr<TeskWrapper> instance;
+  static auto& instance = *new std::shared_ptr<TeskWrapper>;  // never released
   if (!instance) instance = init();
   return instance;
 }
@@ -81,7 +80,8 @@ std::shared_ptr<TeskWrapper> TeskWrapper::init() {
 
 const std::shared_ptr<SerialQueue>& TeskWrapper::queue() {
   static std::once_flag once;
-  std::call_once(once, [this] { _queue = std::make_shared<SerialQueue>(std::string(kQueueLabel)); });
+  std::call_once(once,
+                 [this] { _queue = std::make_shared<SerialQueue>(std::string(kQueueLabel)); });
   return _queue;
 }
 
@@ -89,7 +89,8 @@ void TeskWrapper::listen() {
   for (const Stream& stream : kStreams) {
     tesk::client::RegisterEventHandler(
         _teskManager, stream.eventName,
-        [weak = weak_from_this(), &stream](const tesk::Message& event, tesk::client::DispatchGroup&) {
+        [weak = weak_from_this(), &stream](const tesk::Message& event,
+                                           tesk::client::DispatchGroup&) {
           if (const auto wrapper = weak.lock()) handOver(wrapper, stream, event);
         });
   }

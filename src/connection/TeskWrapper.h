@@ -38,8 +38,8 @@ class TeskWrapper final : public std::enable_shared_from_this<TeskWrapper> {
   bool removeQuixConfigForAppid(std::string_view appId);
   // Asks for one metric, once. True when the service answered 0; the metric comes as an event.
   bool querySpecificMetric(std::string_view appId, std::int32_t triggerRef,
-                           std::int32_t triggerType, std::int32_t triggerID,
-                           std::int32_t profileID, std::int32_t metricID);
+                           std::int32_t triggerType, std::int32_t triggerID, std::int32_t profileID,
+                           std::int32_t metricID);
 
  private:
   TeskWrapper() = default;

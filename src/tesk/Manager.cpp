@@ -14,10 +14,11 @@ class Manager : public std::enable_shared_from_this<Manager> {
   bool connect(std::string_view clientName) {
     const auto& way = connector();
     if (!way) return false;
-    _transport = way->connect(
-        clientName, [weak = weak_from_this()](std::string_view eventName, Message event) {
-          if (const auto manager = weak.lock()) manager->take(eventName, std::move(event));
-        });
+    _transport = way->connect(clientName,
+                              [weak = weak_from_this()](std::string_view eventName, Message event) {
+                                if (const auto manager = weak.lock())
+                                  manager->take(eventName, std::move(event));
+                              });
     return _transport != nullptr;
   }
 
@@ -32,14 +33,14 @@ class Manager : public std::enable_shared_from_this<Manager> {
  private:
   // The handler is looked up on the queue, so that one registered meanwhile gets the event.
   void take(std::string_view eventName, Message event) {
-    _queue->async([weak = weak_from_this(), name = std::string(eventName),
-                   taken = std::move(event)] {
-      const auto manager = weak.lock();
-      const auto handler = manager ? manager->handlerOf(name) : nullptr;
-      if (!handler) return;
-      DispatchGroup group;
-      (*handler)(taken, group);
-    });
+    _queue->async(
+        [weak = weak_from_this(), name = std::string(eventName), taken = std::move(event)] {
+          const auto manager = weak.lock();
+          const auto handler = manager ? manager->handlerOf(name) : nullptr;
+          if (!handler) return;
+          DispatchGroup group;
+          (*handler)(taken, group);
+        });
   }
 
   std::shared_ptr<EventHandler> handlerOf(const std::string& eventName) {
