@@ -1,0 +1,73 @@
+#include "recording/RecordingWriter.h"
+
+#include <fcntl.h>
+#include <unistd.h>
+
+#include <cerrno>
+#include <cstring>
+#include <utility>
+
+#include "recording/EventLine.h"
+#include "recording/LineCompressor.h"
+
+namespace qel {
+namespace {
+
+constexpr mode_t kFileMode = 0644;
+
+ByteView bytesOf(std::string_view text) {
+  return {reinterpret_cast<const std::uint8_t*>(text.data()), text.size()};
+}
+
+}  // namespace
+
+std::unique_ptr<RecordingWriter> RecordingWriter::create(const std::string& path,
+                                                         std::string& error) {
+  const int descriptor = ::open(path.c_str(), O_WRONLY | O_CREAT | O_TRUNC | O_CLOEXEC, kFileMode);
+  if (descriptor < 0) {
+    error = path + ": " + std::strerror(errno);
+    return nullptr;
+  }
+  return std::unique_ptr<RecordingWriter>(new RecordingWriter(path, descriptor));
+}
+
+RecordingWriter::RecordingWriter(std::string path, int descriptor)
+    : _path(std::move(path)), _descriptor(descriptor) {
+  if (_path.ends_with(".gz")) _compressor = std::make_unique<LineCompressor>();
+}
+
+RecordingWriter::~RecordingWriter() { close(); }
+
+bool RecordingWriter::fail(int code) {
+  _error = _path + ": " + std::strerror(code);
+  return false;
+}
+
+bool RecordingWriter::put(ByteView bytes) {
+  while (!bytes.empty()) {
+    const ssize_t count = ::write(_descriptor, bytes.data(), bytes.size());
+    if (count < 0 && errno == EINTR) continue;
+    if (count < 0) return fail(errno);
+    bytes = bytes.subspan(static_cast<std::size_t>(count));
+  }
+  return true;
+}
+
+bool RecordingWriter::write(const RecordedEvent& event) {
+  if (!_error.empty()) return false;
+  if (_descriptor < 0) return fail(EBADF);
+  const std::string line = eventLine(event) + '\n';
+  if (!put(_compressor ? ByteView(_compressor->line(line)) : bytesOf(line))) return false;
+  ++_eventsWritten;
+  return true;
+}
+
+bool RecordingWriter::close() {
+  if (_descriptor < 0) return _error.empty();
+  if (_compressor && _error.empty()) put(_compressor->end());
+  // Network file systems report a full disk only here.
+  if (::close(std::exchange(_descriptor, -1)) != 0 && _error.empty()) fail(errno);
+  return _error.empty();
+}
+
+}  // namespace qel
