@@ -1,0 +1,52 @@
+#include "base/DescriptorSink.h"
+
+#include <unistd.h>
+
+#include <cerrno>
+
+namespace qel {
+
+int writeAll(int descriptor, std::string_view text) {
+  while (!text.empty()) {
+    const ssize_t written = ::write(descriptor, text.data(), text.size());
+    if (written < 0 && errno == EINTR) continue;
+    if (written < 0) return errno;
+    text.remove_prefix(static_cast<std::size_t>(written));
+  }
+  return 0;
+}
+
+void DescriptorSink::write(std::string_view line) {
+  const std::lock_guard lock(_mutex);
+  if (_error != 0) return;
+  _line.assign(line);
+  _line += '\n';
+  _error = writeAll(_descriptor, _line);
+}
+
+BatchingSink::~BatchingSink() { flush(); }
+
+void BatchingSink::write(std::string_view line) {
+  constexpr std::size_t kBatch = 64 * 1024;
+  const std::lock_guard lock(_mutex);
+  _waiting += line;
+  _waiting += '\n';
+  if (_waiting.size() >= kBatch) flushLocked();
+}
+
+void BatchingSink::flush() {
+  const std::lock_guard lock(_mutex);
+  flushLocked();
+}
+
+int BatchingSink::error() {
+  const std::lock_guard lock(_mutex);
+  return _error;
+}
+
+void BatchingSink::flushLocked() {
+  if (_error == 0) _error = writeAll(_descriptor, _waiting);
+  _waiting.clear();
+}
+
+}  // namespace qel

@@ -1,0 +1,24 @@
+// The subcommands of qelctl.
+#pragma once
+
+#include <functional>
+
+#include "tools/Output.h"
+
+namespace CLI {
+class App;
+}
+
+namespace qel::tools {
+
+// What a subcommand does once the command line is read. It throws a ToolError when it fails.
+using Action = std::function<void(Output&)>;
+
+// Each adds one subcommand with its options and sets `chosen` when the user asks for it.
+void addDecodeCommand(CLI::App& app, Action& chosen);
+void addReplayCommand(CLI::App& app, Action& chosen);
+void addStoreCommand(CLI::App& app, Action& chosen);
+void addScreenCommands(CLI::App& app, Action& chosen);
+void addMetricsCommand(CLI::App& app, Action& chosen);
+
+}  // namespace qel::tools

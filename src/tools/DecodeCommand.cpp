@@ -1,0 +1,119 @@
+// qelctl decode: payloads to dictionaries, one or many.
+
+#include <CLI/CLI.hpp>
+#include <iostream>
+#include <iterator>
+#include <memory>
+#include <nlohmann/json.hpp>
+#include <string>
+
+#include "base/Bytes.h"
+#include "base/Rendering.h"
+#include "messages/catalogue/MetricMessages.h"
+#include "tools/Commands.h"
+#include "tools/MetricArgument.h"
+#include "tools/ToolError.h"
+
+namespace qel::tools {
+namespace {
+
+struct Options {
+  std::string metric;
+  std::string hex;
+  bool batch = false;
+  bool reencode = false;
+};
+
+// The message as the command prints it.
+std::string rendered(const PBCodable& message, const Options& options, const char* quote) {
+  if (options.reencode) return quote + hexText(message.data()) + quote;
+  return jsonText(message.dictionaryRepresentation());
+}
+
+Bytes standardInput() {
+  return Bytes(std::istreambuf_iterator<char>(std::cin), std::istreambuf_iterator<char>());
+}
+
+void decodeOne(const Options& options, Output& output) {
+  const std::uint32_t metric = parseMetric(options.metric);
+  const MetricMessage* row = findMetricMessage(metric);
+  if (!row) throw ToolError(EX_USAGE, options.metric, "no message class decodes this metric");
+  const auto payload =
+      options.hex.empty() ? std::optional(standardInput()) : bytesFromHex(options.hex);
+  if (!payload) throw ToolError(EX_DATAERR, options.hex, "not hexadecimal bytes");
+  const auto message = row->decode(*payload);
+  if (!message) {
+    throw ToolError(EX_DATAERR, std::string(row->className), "the payload cannot be decoded");
+  }
+  output.line(rendered(*message, options, ""));
+}
+
+// One line of a batch: {"metric": N, "payload": "HEX"}.
+struct Request {
+  std::int64_t metric;
+  Bytes payload;
+};
+
+Request parseRequest(const std::string& line) {
+  const auto json = nlohmann::json::parse(line, nullptr, false);
+  if (!json.is_object()) throw std::invalid_argument("not a JSON object");
+  const auto metric = json.find("metric");
+  if (metric == json.end() || !metric->is_number_integer()) {
+    throw std::invalid_argument("\"metric\" is not an integer");
+  }
+  const auto payload = json.find("payload");
+  if (payload == json.end() || !payload->is_string()) {
+    throw std::invalid_argument("\"payload\" is not a string");
+  }
+  auto bytes = bytesFromHex(payload->get_ref<const std::string&>());
+  if (!bytes) throw std::invalid_argument("\"payload\" is not hexadecimal bytes");
+  return {metric->get<std::int64_t>(), std::move(*bytes)};
+}
+
+std::shared_ptr<PBCodable> decoded(const Request& request) {
+  const auto identifier = catalogueIdentifier(request.metric);
+  const MetricMessage* row = identifier ? findMetricMessage(*identifier) : nullptr;
+  return row ? row->decode(request.payload) : nullptr;
+}
+
+void decodeBatch(const Options& options, Output& output) {
+  std::ios::sync_with_stdio(false);
+  std::string line;
+  for (std::size_t number = 1; std::getline(std::cin, line); ++number) {
+    try {
+      const auto message = decoded(parseRequest(line));
+      output.line(message ? rendered(*message, options, "\"") : "null");
+    } catch (const std::invalid_argument& error) {
+      output.flush();
+      throw ToolError(EX_DATAERR, "standard input, line " + std::to_string(number), error.what());
+    }
+    // A program that waits for each answer gets it before the next line is waited for.
+    if (std::cin.rdbuf()->in_avail() <= 0) output.flush();
+  }
+}
+
+}  // namespace
+
+void addDecodeCommand(CLI::App& app, Action& chosen) {
+  auto* command = app.add_subcommand("decode", "Decode payloads into JSON, one line each");
+  const auto options = std::make_shared<Options>();
+  auto* metric = command->add_option("METRIC", options->metric,
+                                     "Number (decimal, 0x-hex) or name of the metric");
+  command->add_option("HEX", options->hex,
+                      "Payload in hexadecimal; without it, raw bytes from standard input");
+  command
+      ->add_flag("--batch", options->batch,
+                 "Read lines {\"metric\": N, \"payload\": \"HEX\"} from standard input")
+      ->excludes(metric);
+  command->add_flag("--reencode", options->reencode, "Print the message encoded again, in hex");
+  command->callback([options, &chosen] {
+    if (!options->batch && options->metric.empty()) {
+      throw CLI::RequiredError("METRIC or --batch");
+    }
+    chosen = [options](Output& output) {
+      options->batch ? decodeBatch(*options, output) : decodeOne(*options, output);
+    };
+  });
+}
+
+}  // namespace qel::tools

@@ -1,0 +1,28 @@
+// The standard output of qelctl.
+#pragma once
+
+#include <memory>
+#include <string_view>
+
+#include "base/DescriptorSink.h"
+
+namespace qel::tools {
+
+// Lines for standard output, batched, complete at the end and before a fatal error. When the reader
+// has closed the pipe the program ends at once, quietly; any other failed write is a ToolError.
+class Output {
+ public:
+  Output();
+
+  void line(std::string_view text);
+  void flush();
+  // The same lines as a sink, for the dispatcher.
+  const std::shared_ptr<BatchingSink>& sink() const { return _sink; }
+
+ private:
+  void check();
+
+  std::shared_ptr<BatchingSink> _sink;
+};
+
+}  // namespace qel::tools

@@ -1,0 +1,51 @@
+#include "base/Bytes.h"
+
+#include <gtest/gtest.h>
+
+namespace qel {
+namespace {
+
+ByteView viewOf(std::string_view text) {
+  return {reinterpret_cast<const std::uint8_t*>(text.data()), text.size()};
+}
+
+TEST(HexText, isLowerCaseWithTwoDigitsAByte) {
+  EXPECT_EQ(hexText(Bytes{0x00, 0x0A, 0xFF}), "000aff");
+  EXPECT_EQ(hexText({}), "");
+}
+
+TEST(BytesFromHex, readsBothCasesAndNothingElse) {
+  EXPECT_EQ(bytesFromHex("00aAfF"), (Bytes{0x00, 0xAA, 0xFF}));
+  EXPECT_EQ(bytesFromHex(""), Bytes());
+  EXPECT_EQ(bytesFromHex("0"), std::nullopt);
+  EXPECT_EQ(bytesFromHex("0g"), std::nullopt);
+  EXPECT_EQ(bytesFromHex("0x00"), std::nullopt);
+}
+
+// The test vectors of RFC 4648, section 10.
+TEST(Base64, agreesWithTheVectorsOfItsDefinition) {
+  const std::pair<std::string_view, std::string_view> vectors[] = {
+      {"", ""},
+      {"f", "Zg=="},
+      {"fo", "Zm8="},
+      {"foo", "Zm9v"},
+      {"foob", "Zm9vYg=="},
+      {"fooba", "Zm9vYmE="},
+      {"foobar", "Zm9vYmFy"},
+  };
+  for (const auto& [plain, encoded] : vectors) {
+    const ByteView bytes = viewOf(plain);
+    EXPECT_EQ(base64Text(bytes), encoded);
+    EXPECT_EQ(bytesFromBase64(encoded), Bytes(bytes.begin(), bytes.end()));
+  }
+}
+
+TEST(Base64, refusesWhatIsNotCanonical) {
+  for (const std::string_view text : {"Z", "Zg", "Zg=", "Zg===", "Z===", "====", "Zh==", "Zm9=",
+                                      "Zm9v\n", "Zm 9", "Z-_v", "=m9v"}) {
+    EXPECT_EQ(bytesFromBase64(text), std::nullopt) << text;
+  }
+}
+
+}  // namespace
+}  // namespace qel
