@@ -8,6 +8,8 @@
 #include <iostream>
 #include <vector>
 
+#include "messages/generator/Comments.h"
+#include "messages/generator/Layout.h"
 #include "messages/generator/Names.h"
 
 namespace qel::generator {
@@ -34,13 +36,20 @@ struct Scalar {
 
 Scalar scalarOf(const FieldDescriptor& field) {
   switch (field.type()) {
-    case FieldDescriptor::TYPE_UINT64: return {"std::uint64_t", "uint64"};
-    case FieldDescriptor::TYPE_UINT32: return {"std::uint32_t", "uint32"};
-    case FieldDescriptor::TYPE_INT32: return {"std::int32_t", "int32"};
-    case FieldDescriptor::TYPE_SINT32: return {"std::int32_t", "sint32"};
-    case FieldDescriptor::TYPE_BOOL: return {"bool", "boolean"};
-    case FieldDescriptor::TYPE_ENUM: return {"std::int32_t", "int32"};
-    default: refuse(field, "a scalar is uint64, uint32, int32, sint32, bool or an enumeration");
+    case FieldDescriptor::TYPE_UINT64:
+      return {"std::uint64_t", "uint64"};
+    case FieldDescriptor::TYPE_UINT32:
+      return {"std::uint32_t", "uint32"};
+    case FieldDescriptor::TYPE_INT32:
+      return {"std::int32_t", "int32"};
+    case FieldDescriptor::TYPE_SINT32:
+      return {"std::int32_t", "sint32"};
+    case FieldDescriptor::TYPE_BOOL:
+      return {"bool", "boolean"};
+    case FieldDescriptor::TYPE_ENUM:
+      return {"std::int32_t", "int32"};
+    default:
+      refuse(field, "a scalar is uint64, uint32, int32, sint32, bool or an enumeration");
   }
 }
 
@@ -54,70 +63,88 @@ std::string render(const Variables& variables, const char* text) {
   return out;
 }
 
-struct Template {
-  const char* accessors;
-  const char* member;
-  const char* tableRow;
+// Class members stand two columns in, rows of the field table six.
+constexpr std::size_t kMemberIndent = 2;
+constexpr std::size_t kRowIndent = 6;
+
+// One operation of the class: "head { body }".
+struct Accessor {
+  const char* head;
+  const char* body;
 };
 
-constexpr Template kScalar = {
-    "$type$ $name$() const { return _$name$; }\n"
-    "void set$Name$($type$ value) {\n"
-    "  _$name$ = value;\n"
-    "  setHas$Name$(true);\n"
-    "}\n"
-    "bool has$Name$() const { return Presence::get(*this, $bit$); }\n"
-    "void setHas$Name$(bool present) { Presence::set(*this, $bit$, present); }\n",
+struct Template {
+  std::vector<Accessor> accessors;
+  const char* member;
+  const char* row;                       // the row's type
+  std::vector<const char*> rowEnd = {};  // what follows number, key and member
+};
+
+const std::vector<Accessor> kPresence = {
+    {"bool has$Name$() const", "return Presence::get(*this, $bit$);"},
+    {"void setHas$Name$(bool present)", "Presence::set(*this, $bit$, present);"}};
+
+const Template kScalar = {
+    {{"$type$ $name$() const", "return _$name$;"},
+     {"void set$Name$($type$ value)", "_$name$ = value;\n  setHas$Name$(true);"}},
     "$type$ _$name$ = {};\n",
-    "ScalarField<$Message$, $type$, Encoding::$encoding$>{\n"
-    "    $number$, \"$key$\", &$Message$::_$name$, $bit$},\n"};
+    "ScalarField<$Message$, $type$, Encoding::$encoding$>",
+    {"$bit$"}};
 
-constexpr Template kEnum = {
-    "std::int32_t $name$() const { return has$Name$() ? _$name$ : 0; }\n"
-    "void set$Name$(std::int32_t value) {\n"
-    "  _$name$ = value;\n"
-    "  setHas$Name$(true);\n"
-    "}\n"
-    "bool has$Name$() const { return Presence::get(*this, $bit$); }\n"
-    "void setHas$Name$(bool present) { Presence::set(*this, $bit$, present); }\n",
+const Template kEnum = {
+    {{"std::int32_t $name$() const", "return has$Name$() ? _$name$ : 0;"},
+     {"void set$Name$(std::int32_t value)", "_$name$ = value;\n  setHas$Name$(true);"}},
     "std::int32_t _$name$ = {};\n",
-    "EnumField<$Message$>{$number$, \"$key$\", &$Message$::_$name$, $bit$, $names$},\n"};
+    "EnumField<$Message$>",
+    {"$bit$", "$names$"}};
 
-constexpr Template kObject = {
-    "const $held$& $name$() const { return _$name$; }\n"
-    "void set$Name$($held$ value) { _$name$ = std::move(value); }\n"
-    "bool has$Name$() const { return static_cast<bool>(_$name$); }\n",
-    "$held$ _$name$;\n", "$Kind$Field<$arguments$>{$number$, \"$key$\", &$Message$::_$name$},\n"};
+const Template kObject = {{{"const $held$& $name$() const", "return _$name$;"},
+                           {"void set$Name$($held$ value)", "_$name$ = std::move(value);"},
+                           {"bool has$Name$() const", "return static_cast<bool>(_$name$);"}},
+                          "$held$ _$name$;\n",
+                          "$Kind$Field<$arguments$>"};
 
-constexpr Template kRepeatedMessage = {
-    "const std::vector<std::shared_ptr<$Nested$>>& $name$() const { return _$name$; }\n"
-    "void set$Name$(std::vector<std::shared_ptr<$Nested$>> values) {\n"
-    "  _$name$ = std::move(values);\n"
-    "}\n"
-    "void clear$Name$() { _$name$.clear(); }\n"
-    "void add$One$(std::shared_ptr<$Nested$> value) { _$name$.push_back(std::move(value)); }\n"
-    "std::size_t $name$Count() const { return _$name$.size(); }\n"
-    "const std::shared_ptr<$Nested$>& $one$AtIndex(std::size_t index) const {\n"
-    "  return _$name$.at(index);\n"
-    "}\n",
+const Template kRepeatedMessage = {
+    {{"const std::vector<std::shared_ptr<$Nested$>>& $name$() const", "return _$name$;"},
+     {"void set$Name$(std::vector<std::shared_ptr<$Nested$>> values)",
+      "_$name$ = std::move(values);"},
+     {"void clear$Name$()", "_$name$.clear();"},
+     {"void add$One$(std::shared_ptr<$Nested$> value)", "_$name$.push_back(std::move(value));"},
+     {"std::size_t $name$Count() const", "return _$name$.size();"},
+     {"const std::shared_ptr<$Nested$>& $one$AtIndex(std::size_t index) const",
+      "return _$name$.at(index);"}},
     "std::vector<std::shared_ptr<$Nested$>> _$name$;\n",
-    "RepeatedMessageField<$Message$, $Nested$>{$number$, \"$key$\", &$Message$::_$name$},\n"};
+    "RepeatedMessageField<$Message$, $Nested$>"};
 
-constexpr Template kPacked = {
-    "const $type$* $name$() const { return _$name$.list(); }\n"
-    "std::size_t $name$Count() const { return _$name$.count(); }\n"
-    "$type$ $one$AtIndex(std::size_t index) const { return _$name$.at(index); }\n"
-    "void add$One$($type$ value) { $Family$Add(_$name$, value); }\n"
-    "void clear$Name$() { $Family$Clear(_$name$); }\n"
-    "void set$Name$(const $type$* list, std::size_t count) {\n"
-    "  $Family$Set(_$name$, list, count);\n"
-    "}\n",
+const Template kPacked = {
+    {{"const $type$* $name$() const", "return _$name$.list();"},
+     {"std::size_t $name$Count() const", "return _$name$.count();"},
+     {"$type$ $one$AtIndex(std::size_t index) const", "return _$name$.at(index);"},
+     {"void add$One$($type$ value)", "$Family$Add(_$name$, value);"},
+     {"void clear$Name$()", "$Family$Clear(_$name$);"},
+     {"void set$Name$(const $type$* list, std::size_t count)",
+      "$Family$Set(_$name$, list, count);"}},
     "$Family$ _$name$;\n",
-    "PackedField<$Message$, $type$, Encoding::$encoding$>{\n"
-    "    $number$, \"$key$\", &$Message$::_$name$},\n"};
+    "PackedField<$Message$, $type$, Encoding::$encoding$>"};
+
+std::string renderAccessors(const Variables& variables, const std::vector<Accessor>& accessors) {
+  std::string code;
+  for (const Accessor& accessor : accessors) {
+    code += functionLines(render(variables, accessor.head), render(variables, accessor.body),
+                          kMemberIndent);
+  }
+  return code;
+}
+
+std::string renderRow(const Variables& variables, const Template& chosen) {
+  std::vector<std::string> values = {render(variables, "$number$"), render(variables, "\"$key$\""),
+                                     render(variables, "&$Message$::_$name$")};
+  for (const char* value : chosen.rowEnd) values.push_back(render(variables, value));
+  return rowLines(render(variables, chosen.row), values, kRowIndent);
+}
 
 // The template for the field, with the variables that only this kind has.
-Template chooseTemplate(const FieldDescriptor& field, Variables& variables) {
+const Template& chooseTemplate(const FieldDescriptor& field, Variables& variables) {
   const std::string& message = variables["Message"];
   if (field.type() == FieldDescriptor::TYPE_MESSAGE) {
     const std::string& nested = field.message_type()->name();
@@ -179,10 +206,12 @@ FieldCode fieldCode(const FieldDescriptor& field, const PresenceBits& bits) {
   if (const auto bit = bits.find(&field); bit != bits.end()) {
     variables["bit"] = std::to_string(bit->second);
   }
-  const Template chosen = chooseTemplate(field, variables);
-  return {.accessors = commentOf(field, "") + render(variables, chosen.accessors),
+  const Template& chosen = chooseTemplate(field, variables);
+  std::string accessors = commentOf(field) + renderAccessors(variables, chosen.accessors);
+  if (isScalar(field)) accessors += renderAccessors(variables, kPresence);
+  return {.accessors = std::move(accessors),
           .member = render(variables, chosen.member),
-          .tableRow = render(variables, chosen.tableRow)};
+          .tableRow = renderRow(variables, chosen)};
 }
 
 }  // namespace qel::generator

@@ -14,9 +14,9 @@ PresenceBits presenceBits(const google::protobuf::Descriptor& message);
 
 // What a field is in the message class, each as C++ text.
 struct FieldCode {
-  std::string accessors;    // public operations
-  std::string member;       // the stored value
-  std::string tableRow;     // its row of kFields
+  std::string accessors;  // public operations
+  std::string member;     // the stored value
+  std::string tableRow;   // its row of kFields
 };
 
 // Ends the generator with a message when the schema uses what metric messages do not have.
