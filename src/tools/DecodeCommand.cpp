@@ -5,6 +5,7 @@
 #include <iterator>
 #include <memory>
 #include <nlohmann/json.hpp>
+#include <optional>
 #include <string>
 
 #include "base/Bytes.h"
@@ -19,7 +20,7 @@ namespace {
 
 struct Options {
   std::string metric;
-  std::string hex;
+  std::optional<std::string> hex;
   bool batch = false;
   bool reencode = false;
 };
@@ -38,9 +39,8 @@ void decodeOne(const Options& options, Output& output) {
   const std::uint32_t metric = parseMetric(options.metric);
   const MetricMessage* row = findMetricMessage(metric);
   if (!row) throw ToolError(EX_USAGE, options.metric, "no message class decodes this metric");
-  const auto payload =
-      options.hex.empty() ? std::optional(standardInput()) : bytesFromHex(options.hex);
-  if (!payload) throw ToolError(EX_DATAERR, options.hex, "not hexadecimal bytes");
+  const auto payload = options.hex ? bytesFromHex(*options.hex) : std::optional(standardInput());
+  if (!payload) throw ToolError(EX_DATAERR, *options.hex, "not hexadecimal bytes");
   const auto message = row->decode(*payload);
   if (!message) {
     throw ToolError(EX_DATAERR, std::string(row->className), "the payload cannot be decoded");

@@ -16,12 +16,12 @@ class Output {
 
   void line(std::string_view text);
   void flush();
+  // Looks at how the writing went so far, also of lines that went to the sink directly.
+  void check();
   // The same lines as a sink, for the dispatcher.
   const std::shared_ptr<BatchingSink>& sink() const { return _sink; }
 
  private:
-  void check();
-
   std::shared_ptr<BatchingSink> _sink;
 };
 

@@ -1,12 +1,15 @@
 // qelctl: the viewer's core on the command line.
 
+#include <unistd.h>
+
 #include <CLI/CLI.hpp>
+#include <csignal>
 #include <cstdio>
 #include <exception>
 #include <memory>
 
+#include "base/DescriptorSink.h"
 #include "base/LogSink.h"
-#include "base/SystemLogSink.h"
 #include "tools/Commands.h"
 #include "tools/ToolError.h"
 
@@ -48,6 +51,7 @@ int main(int argc, char* argv[]) {
     return reportUsage(error);
   }
 
+  std::signal(SIGPIPE, SIG_IGN);  // a closed pipe shows as a failed write
   setSystemLog(verbose ? std::make_shared<DescriptorSink>(STDERR_FILENO) : nullptr);
   try {
     tools::Output output;

@@ -1,0 +1,57 @@
+#include "tools/RecordingFeed.h"
+
+#include <CLI/CLI.hpp>
+#include <cstdio>
+
+#include "metrics/MetricValidator.h"
+#include "recording/RecordingReader.h"
+#include "tools/ToolError.h"
+
+namespace qel::tools {
+namespace {
+
+ToolError asError(const RecordingFault& fault) {
+  switch (fault.kind) {
+    case RecordingFault::Kind::notOpened:
+      return {EX_NOINPUT, fault.message};
+    case RecordingFault::Kind::badData:
+      return {EX_DATAERR, fault.message};
+    case RecordingFault::Kind::notRead:
+      return {EX_IOERR, fault.message};
+  }
+  return {EX_SOFTWARE, fault.message};
+}
+
+void warn(const std::string& text) { std::fprintf(stderr, "qelctl: %s\n", text.c_str()); }
+
+}  // namespace
+
+void addRecordingOptions(CLI::App& command, RecordingOptions& options) {
+  command.add_option("FILE", options.file, "Recording (.jsonl or .jsonl.gz)")->required();
+  command.add_flag("--skip-bad", options.skipBad, "Count and skip lines that are no event");
+}
+
+void feedRecording(const RecordingOptions& options, const std::function<void()>& afterEach) {
+  using BadLines = RecordingReader::BadLines;
+  RecordingFault notOpened;
+  const auto reader = RecordingReader::open(
+      options.file, options.skipBad ? BadLines::skip : BadLines::fail, notOpened);
+  if (!reader) throw asError(notOpened);
+  MetricValidator& validator = *MetricValidator::shared();
+  while (auto event = reader->next()) {
+    const std::optional dictionary = std::move(event->entries);
+    if (event->kind == RecordedKind::metric) {
+      validator.metricsDidUpdate(dictionary);
+    } else {
+      validator.eventsDidUpdate(dictionary);
+    }
+    if (afterEach) afterEach();
+  }
+  if (reader->fault()) throw asError(*reader->fault());
+  if (reader->cutOff()) warn(*reader->cutOff());
+  if (reader->skippedLines() > 0) {
+    warn(options.file + ": bad lines skipped: " + std::to_string(reader->skippedLines()));
+  }
+}
+
+}  // namespace qel::tools
