@@ -21,7 +21,11 @@ int report(int code, const char* why) {
 }
 
 // The first line of the message: errors take one line.
-int reportUsage(const CLI::ParseError& error) {
+int reportUsage(const CLI::App& app, const CLI::ParseError& error) {
+  const auto unknown = app.remaining();
+  if (!unknown.empty() && app.get_subcommands().empty()) {
+    return report(EX_USAGE, ("usage: no such subcommand: " + unknown.front()).c_str());
+  }
   const std::string text = error.what();
   return report(EX_USAGE, ("usage: " + text.substr(0, text.find('\n'))).c_str());
 }
@@ -48,19 +52,21 @@ int main(int argc, char* argv[]) {
   } catch (const CLI::Success& success) {  // --help, --version
     return app.exit(success);
   } catch (const CLI::ParseError& error) {
-    return reportUsage(error);
+    return reportUsage(app, error);
   }
 
   std::signal(SIGPIPE, SIG_IGN);  // a closed pipe shows as a failed write
   setSystemLog(verbose ? std::make_shared<DescriptorSink>(STDERR_FILENO) : nullptr);
+  tools::Output output;
   try {
-    tools::Output output;
     chosen(output);
     output.flush();
+    return EX_OK;
   } catch (const tools::ToolError& error) {
+    output.sink()->flush();  // what was good before the error stays good
     return report(error.code(), error.what());
   } catch (const std::exception& error) {
+    output.sink()->flush();
     return report(EX_SOFTWARE, error.what());
   }
-  return EX_OK;
 }
