@@ -1,0 +1,92 @@
+// The dependency rule: a folder includes only from folders below it, and a foreign library shows
+// only where it is meant to.
+
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <map>
+#include <optional>
+#include <set>
+
+#include "hygiene/SourceFiles.h"
+
+namespace qel::testing {
+namespace {
+
+// Folder → the folders that it may include from, besides itself.
+const std::map<std::string, std::set<std::string>> kAllowed = {
+    {"base", {}},
+    {"messages", {"base"}},
+    {"recording", {"base"}},
+    {"tesk", {"base"}},
+    {"connection", {"base", "tesk"}},
+    {"metrics", {"base", "connection", "messages"}},
+    {"service", {"base", "messages", "recording", "tesk"}},
+    {"ui", {"base", "connection", "metrics"}},
+    {"app", {"base", "metrics", "service", "tesk", "ui"}},
+    {"tools", {"base", "messages", "metrics", "recording", "ui"}},
+};
+
+// Foreign header prefix → the folders (path prefixes in src/) that may include it.
+const std::vector<std::pair<std::string, std::vector<std::string>>> kForeign = {
+    {"Q", {"src/ui/quick/", "src/app/"}},
+    {"sdbus-c++/", {"src/tesk/", "src/service/"}},
+    {"google/protobuf/", {"src/messages/generator/"}},
+    {"nlohmann/", {"src/recording/", "src/tools/"}},
+    {"CLI/", {"src/tools/", "src/app/"}},
+    {"zlib.h", {"src/recording/"}},
+};
+
+// What stands between the given marks of an #include line, if it is one.
+std::optional<std::string> included(const std::string& line, char open, char close) {
+  if (!line.starts_with("#include")) return std::nullopt;
+  const auto start = line.find(open);
+  const auto end = line.find(close, start + 1);
+  if (start == std::string::npos || end == std::string::npos) return std::nullopt;
+  return line.substr(start + 1, end - start - 1);
+}
+
+std::string firstFolder(const std::string& path) { return path.substr(0, path.find('/')); }
+
+std::vector<std::filesystem::path> sources() { return filesBelow("src", {".h", ".cpp", ".inl"}); }
+
+TEST(DependencyRule, holdsForEveryInclude) {
+  ASSERT_GT(sources().size(), 50U);
+  for (const auto& file : sources()) {
+    const std::string folder = firstFolder(nameOf(file).substr(4));
+    ASSERT_TRUE(kAllowed.contains(folder)) << nameOf(file) << " is in no known folder";
+    for (const std::string& line : linesOf(file)) {
+      const auto path = included(line, '"', '"');
+      if (!path) continue;
+      const std::string from = firstFolder(*path);
+      EXPECT_TRUE(from == folder || kAllowed.at(folder).contains(from))
+          << nameOf(file) << " includes " << *path;
+    }
+  }
+}
+
+TEST(DependencyRule, keepsForeignLibrariesWhereTheyBelong) {
+  for (const auto& file : sources()) {
+    const std::string name = nameOf(file);
+    for (const std::string& line : linesOf(file)) {
+      const auto path = included(line, '<', '>');
+      if (!path) continue;
+      for (const auto& [prefix, folders] : kForeign) {
+        if (!path->starts_with(prefix)) continue;
+        const bool allowed = std::any_of(folders.begin(), folders.end(), [&](const auto& folder) {
+          return name.starts_with(folder);
+        });
+        EXPECT_TRUE(allowed) << name << " includes <" << *path << ">";
+      }
+    }
+  }
+}
+
+TEST(SourceFiles, liveUnderOneNamespaceAndGuard) {
+  for (const auto& file : filesBelow("src", {".h"})) {
+    EXPECT_NE(contentOf(file).find("#pragma once"), std::string::npos) << nameOf(file);
+  }
+}
+
+}  // namespace
+}  // namespace qel::testing
