@@ -1,0 +1,56 @@
+#include "app/Options.h"
+
+#include <sysexits.h>
+
+#include <CLI/App.hpp>
+#include <CLI/Config.hpp>
+#include <CLI/Formatter.hpp>
+#include <CLI/Validators.hpp>
+#include <iostream>
+#include <map>
+
+namespace qel {
+namespace {
+
+const std::map<std::string, Appearance::Theme>& themes() {
+  static const std::map<std::string, Appearance::Theme> names = {
+      {"system", Appearance::System}, {"light", Appearance::Light}, {"dark", Appearance::Dark}};
+  return names;
+}
+
+}  // namespace
+
+std::optional<Options> parseOptions(int argc, const char* const* argv, int& exitCode) {
+  Options options;
+  Appearance::Theme theme = Appearance::System;
+  CLI::App line("Shows what the phone's baseband reports about its cells.", "qelwatch");
+  line.set_version_flag("--version", "qelwatch " QELWATCH_VERSION);
+  line.add_option("--source", options.source,
+                  "where values come from: simulated[,seed=N][,speed=N] or "
+                  "recording:FILE[,speed=N][,loop]")
+      ->type_name("SOURCE")
+      ->capture_default_str();
+  const CLI::Option* themeOption =
+      line.add_option("--theme", theme, "system, light or dark, for this run")
+          ->type_name("THEME")
+          ->transform(CLI::Transformer(themes()).description(""))
+          ->check(CLI::IsMember(themes()).description(""));
+  line.add_option("--picture", options.picture,
+                  "keep a PNG picture of the current screen in this file")
+      ->type_name("FILE");
+  line.add_flag("--self-test", options.selfTest, "open and draw every screen once, then end");
+  try {
+    line.parse(argc, argv);
+  } catch (const CLI::Success& answered) {
+    exitCode = line.exit(answered);
+    return std::nullopt;
+  } catch (const CLI::ParseError& error) {
+    std::cerr << "qelwatch: " << error.what() << '\n';
+    exitCode = EX_USAGE;
+    return std::nullopt;
+  }
+  if (themeOption->count() > 0) options.theme = theme;
+  return options;
+}
+
+}  // namespace qel

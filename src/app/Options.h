@@ -1,0 +1,22 @@
+// What the command line asks for.
+#pragma once
+
+#include <optional>
+#include <string>
+
+#include "ui/quick/Appearance.h"
+
+namespace qel {
+
+struct Options {
+  std::string source = "simulated";
+  std::string picture;  // file name; empty: keep none
+  std::optional<Appearance::Theme> theme;
+  bool selfTest = false;
+};
+
+// Nothing when the program is to end at once, with that exit code: help and version were printed,
+// or what is wrong with the line, on standard error.
+std::optional<Options> parseOptions(int argc, const char* const* argv, int& exitCode);
+
+}  // namespace qel

@@ -1,0 +1,100 @@
+#include <sysexits.h>
+
+#include <QtGui/QGuiApplication>
+#include <QtQml/QQmlApplicationEngine>
+#include <QtQuick/QQuickWindow>
+#include <QtQuickControls2/QQuickStyle>
+#include <cstdlib>
+#include <iostream>
+#include <memory>
+
+#include "app/Display.h"
+#include "app/Options.h"
+#include "app/PictureKeeper.h"
+#include "app/SelfTest.h"
+#include "app/SignalQuit.h"
+#include "app/Source.h"
+#include "ui/kit/ResourceBundle.h"
+#include "ui/quick/Appearance.h"
+#include "ui/quick/Navigation.h"
+#include "ui/quick/QuickRunLoop.h"
+#include "ui/screens/AppDelegate.h"
+
+namespace {
+
+const QString kName = QStringLiteral("qelwatch");
+
+void chooseDisplay(const qel::Options& options) {
+  if (qel::hasDisplay()) return;
+  std::cerr << "qelwatch: no display, drawing off screen";
+  if (!options.picture.empty()) std::cerr << "; the picture is kept in " << options.picture;
+  std::cerr << '\n';
+  qel::useMemoryAsDisplay();
+}
+
+void nameApplication() {
+  QGuiApplication::setApplicationName(kName);
+  QGuiApplication::setApplicationDisplayName(kName);
+  QGuiApplication::setApplicationVersion(QStringLiteral(QELWATCH_VERSION));
+  QGuiApplication::setOrganizationName(kName);
+  QGuiApplication::setDesktopFileName(kName);
+  QQuickStyle::setStyle(QStringLiteral("Basic"));
+}
+
+void findResources() {
+  const QString directory = QGuiApplication::applicationDirPath() + "/../share/qelwatch";
+  qel::ResourceBundle::setMain(std::make_shared<qel::DirectoryBundle>(directory.toStdString()));
+}
+
+// The interface description creates the first screens and with them the connection.
+QQuickWindow* loadWindow(QQmlApplicationEngine& engine, const qel::Options& options) {
+  engine.addImportPath(QStringLiteral("qrc:/qt/qml"));
+  engine.setInitialProperties({{"source", qel::sourceInWords(options.source)}});
+  engine.load(QStringLiteral("qrc:/qt/qml/Qelwatch/Ui/Main.qml"));
+  if (engine.rootObjects().isEmpty()) return nullptr;
+  return qobject_cast<QQuickWindow*>(engine.rootObjects().constFirst());
+}
+
+// After the window is loaded, which makes the type known, and before its first frame.
+void setAppearance(QQmlApplicationEngine& engine, const qel::Options& options) {
+  const int type = qmlTypeId("Qelwatch.Ui", 1, 0, "Appearance");
+  auto* appearance = engine.singletonInstance<qel::Appearance*>(type);
+  if (options.theme) appearance->overrideTheme(*options.theme);
+  if (options.selfTest) appearance->reduceMotion();
+}
+
+int runWindow(QQuickWindow& window, const qel::Options& options) {
+  auto* navigation = window.property("navigation").value<qel::Navigation*>();
+  if (options.selfTest) {
+    return qel::SelfTest(window, *navigation).run() ? EXIT_SUCCESS : EXIT_FAILURE;
+  }
+  std::unique_ptr<qel::PictureKeeper> keeper;
+  if (!options.picture.empty()) {
+    keeper = std::make_unique<qel::PictureKeeper>(window, QString::fromStdString(options.picture));
+  }
+  return QGuiApplication::exec();
+}
+
+}  // namespace
+
+int main(int argc, char** argv) {
+  int exitCode = EXIT_SUCCESS;
+  const auto options = qel::parseOptions(argc, argv, exitCode);
+  if (!options) return exitCode;
+  exitCode = qel::connectToSource(options->source);
+  if (exitCode != EXIT_SUCCESS) return exitCode;
+  chooseDisplay(*options);
+  nameApplication();
+  int programNameOnly = 1;
+  const QGuiApplication application(programNameOnly, argv);
+  const qel::SignalQuit signalQuit;
+  const qel::QuickRunLoop runLoop;
+  findResources();
+  qel::AppDelegate delegate;
+  if (!delegate.didFinishLaunchingWithOptions()) return EX_SOFTWARE;
+  QQmlApplicationEngine engine;
+  QQuickWindow* window = loadWindow(engine, *options);
+  if (!window) return EX_SOFTWARE;
+  setAppearance(engine, *options);
+  return runWindow(*window, *options);
+}

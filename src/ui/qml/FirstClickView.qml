@@ -1,0 +1,2 @@
+// A category.
+MenuRow {}

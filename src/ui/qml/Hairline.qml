@@ -1,0 +1,6 @@
+import QtQuick
+
+Rectangle {
+    implicitHeight: Theme.hairline
+    color: Theme.separator
+}

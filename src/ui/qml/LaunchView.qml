@@ -1,0 +1,2 @@
+// A technology.
+MenuRow {}

@@ -1,0 +1,78 @@
+import QtQuick
+import QtQuick.Templates as T
+import Qelwatch.Ui
+
+// A row of a menu: what it is called and that it leads on. The whole row is the target.
+T.AbstractButton {
+    id: row
+
+    required property int index
+    required text
+    required property TableModel table
+
+    readonly property bool isCurrent: ListView.isCurrentItem && (ListView.view?.activeFocus ?? false)
+
+    width: ListView.view?.width ?? 0
+    implicitHeight: Math.max(Theme.touch + 8, Math.round(label.implicitHeight) + 2 * Theme.padding)
+    focusPolicy: Qt.NoFocus
+
+    Accessible.role: Accessible.ListItem
+    Accessible.name: text
+    Accessible.focusable: true
+    Accessible.focused: isCurrent
+
+    onClicked: table.choose(index)
+
+    background: Rectangle {
+        color: Theme.row
+
+        Rectangle {
+            anchors.fill: parent
+            color: Theme.pressTint
+            opacity: row.down ? 1 : 0
+
+            Behavior on opacity {
+                NumberAnimation {
+                    duration: Theme.pressMs
+                }
+            }
+        }
+        Hairline {
+            anchors {
+                left: parent.left
+                right: parent.right
+                bottom: parent.bottom
+                leftMargin: Theme.margin
+            }
+        }
+        FocusRing {
+            visible: row.isCurrent && Appearance.keyboardInUse
+        }
+    }
+
+    contentItem: Item {
+        Text {
+            id: label
+            anchors {
+                left: parent.left
+                right: chevron.left
+                verticalCenter: parent.verticalCenter
+                leftMargin: Theme.margin
+                rightMargin: Theme.padding
+            }
+            text: row.text
+            color: Theme.value
+            font.pointSize: Theme.valueSize
+            wrapMode: Text.Wrap
+            Accessible.ignored: true
+        }
+        Chevron {
+            id: chevron
+            anchors {
+                right: parent.right
+                rightMargin: Theme.margin
+                verticalCenter: parent.verticalCenter
+            }
+        }
+    }
+}

@@ -1,0 +1,104 @@
+import QtQuick
+import Qelwatch.Ui
+
+// The screens of the navigation stack side by side, of which one is seen. `position` is the screen
+// in sight; it follows the stack, or the finger that drags from the left edge.
+FocusScope {
+    id: stack
+
+    required property Navigation navigation
+    property string source
+
+    readonly property int target: navigation.depth - 1
+    property real position: 0
+    readonly property bool moving: slide.running || edge.active
+
+    function glide(): void {
+        slide.stop();
+        slide.duration = Theme.slideMs * Math.min(1, Math.abs(target - position));
+        slide.to = target;
+        slide.start();
+    }
+
+    function release(speed: real): void {
+        const farEnough = position < target - 0.4;
+        if ((farEnough && speed > -200) || speed > 400)
+            navigation.back();
+        else
+            glide();
+    }
+
+    onTargetChanged: glide()
+
+    Keys.onPressed: event => {
+        const isBack = event.key === Qt.Key_Escape || event.key === Qt.Key_Back
+            || event.key === Qt.Key_Backspace
+            || (event.key === Qt.Key_Left && (event.modifiers & Qt.AltModifier));
+        if (isBack && target > 0) {
+            event.accepted = true;
+            navigation.back();
+        }
+    }
+
+    NumberAnimation {
+        id: slide
+        target: stack
+        property: "position"
+        easing.type: Easing.OutCubic
+        onFinished: stack.navigation.settle()
+    }
+
+    Repeater {
+        model: stack.navigation
+
+        TableScreen {
+            required property int index
+            readonly property real away: index - stack.position
+
+            width: stack.width
+            height: stack.height
+            x: Math.round(away * width * (away > 0 ? 1 : 0.3))
+            z: index
+            visible: away > -1 && away < 1
+            focus: index === stack.target
+            enabled: focus && !edge.active
+            notice: stack.navigation.notice
+            source: stack.source
+            storyboard: stack.navigation.storyboard
+            isFirst: index === 0
+            onBack: stack.navigation.back()
+        }
+    }
+
+    Item {
+        width: 20
+        height: stack.height
+        z: 1000
+
+        DragHandler {
+            id: edge
+
+            property real start: 0
+            property real speed: 0
+
+            target: null
+            enabled: stack.target > 0
+            yAxis.enabled: false
+            onActiveChanged: {
+                if (active) {
+                    slide.stop();
+                    start = stack.position;
+                } else {
+                    stack.release(speed);
+                }
+            }
+            onTranslationChanged: {
+                if (!active)
+                    return;
+                speed = centroid.velocity.x;
+                const wanted = start - translation.x / stack.width;
+                stack.position = Math.max(stack.target - 1, Math.min(stack.target, wanted));
+            }
+        }
+    }
+}

@@ -1,0 +1,87 @@
+import QtQuick
+import QtQuick.Controls.Basic
+import Qelwatch.Ui
+
+// One screen: its bar, what there is to say to the reader, and its table.
+FocusScope {
+    id: screen
+
+    required property TableModel table
+    property string notice
+    property string source
+    required property InterfaceDescription storyboard
+    property bool isFirst
+
+    signal back
+
+    Accessible.role: Accessible.Pane
+    Accessible.name: table.title
+
+    Rectangle {
+        anchors.fill: parent
+        color: Theme.page
+    }
+
+    TableList {
+        id: list
+        anchors {
+            top: noticeBar.bottom
+            bottom: footer.top
+            left: parent.left
+            right: parent.right
+        }
+        table: screen.table
+        storyboard: screen.storyboard
+        focus: true
+        visible: !emptyText.visible
+    }
+
+    EmptyText {
+        id: emptyText
+        anchors {
+            top: list.top
+            left: parent.left
+            right: parent.right
+        }
+        visible: screen.table.blank
+        title: screen.table.title
+        technology: screen.table.previousTitle
+        hasRows: screen.table.count > 0
+    }
+
+    NoticeBar {
+        id: noticeBar
+        anchors {
+            top: bar.bottom
+            left: parent.left
+            right: parent.right
+        }
+        text: screen.notice
+    }
+
+    ScreenBar {
+        id: bar
+        anchors {
+            top: parent.top
+            left: parent.left
+            right: parent.right
+        }
+        title: screen.table.title
+        previousTitle: screen.table.previousTitle
+        hasBack: !screen.isFirst
+        hairline: !list.atYBeginning
+        onBack: screen.back()
+    }
+
+    FirstScreenFooter {
+        id: footer
+        anchors {
+            bottom: parent.bottom
+            left: parent.left
+            right: parent.right
+        }
+        height: screen.isFirst ? implicitHeight : 0
+        visible: screen.isFirst
+        source: screen.source
+    }
+}

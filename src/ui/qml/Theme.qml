@@ -1,0 +1,42 @@
+pragma Singleton
+
+import QtQuick
+import Qelwatch.Ui
+
+// Colours, sizes and times of the whole window; nothing else names a colour.
+QtObject {
+    readonly property bool dark: Appearance.dark
+
+    readonly property color page: dark ? "#0D1013" : "#F3F4F6"
+    readonly property color row: dark ? "#171B20" : "#FFFFFF"
+    readonly property color value: dark ? "#F2F5F7" : "#12161A"
+    readonly property color secondary: dark ? "#AEB8C2" : "#4A5560"
+    readonly property color separator: dark ? "#2A3038" : "#DDE1E6"
+    readonly property color accent: dark ? "#5CD6CB" : "#005F5B"
+    readonly property color noticeGround: dark ? "#3A2C05" : "#FFF4D6"
+    readonly property color noticeText: dark ? "#FFD98A" : "#5C3D00"
+
+    // The accent laid thinly over a row.
+    readonly property color pressTint: Qt.alpha(accent, 0.12)
+
+    // Points, so that they follow the screen's resolution and the user's text size.
+    readonly property real titleSize: 15 * Appearance.textScale
+    readonly property real valueSize: 12.75 * Appearance.textScale
+    readonly property real nameSize: 10.5 * Appearance.textScale
+    readonly property real headerSize: 9.75 * Appearance.textScale
+    readonly property string fixedFamily: Appearance.fixedFamily
+
+    readonly property int margin: 16
+    readonly property int padding: 12
+    readonly property int touch: 48
+    readonly property int hairline: 1
+
+    readonly property int pressMs: 80
+    readonly property int slideMs: Appearance.reducedMotion ? 0 : 200
+    readonly property int changeMs: Appearance.reducedMotion ? 0 : 600
+
+    // A long name may break after each of its underscores.
+    function breakable(text: string): string {
+        return text.replace(/_/g, "_\u200B");
+    }
+}

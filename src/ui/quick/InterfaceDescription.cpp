@@ -1,0 +1,31 @@
+#include "ui/quick/InterfaceDescription.h"
+
+#include <algorithm>
+
+#include "ui/screens/StandardScreens.h"
+
+namespace qel {
+
+const CellPrototype* InterfaceDescription::find(const QString& identifier) const {
+  const auto named = [&identifier](const auto* cell) { return cell->identifier == identifier; };
+  const auto found = std::find_if(_cells.begin(), _cells.end(), named);
+  return found == _cells.end() ? nullptr : *found;
+}
+
+QQmlComponent* InterfaceDescription::lookOf(const QString& identifier) const {
+  const CellPrototype* cell = find(identifier);
+  return cell ? cell->look : nullptr;
+}
+
+std::string InterfaceDescription::destinationOfCell(std::string_view cellIdentifier) const {
+  const auto size = static_cast<qsizetype>(cellIdentifier.size());
+  const CellPrototype* cell = find(QString::fromUtf8(cellIdentifier.data(), size));
+  return cell ? cell->opens.toStdString() : std::string();
+}
+
+std::shared_ptr<TableViewController> InterfaceDescription::makeScreen(
+    std::string_view className) const {
+  return makeStandardScreen(className);
+}
+
+}  // namespace qel

@@ -1,0 +1,69 @@
+// The navigation stack as the list of screens that the window shows.
+#pragma once
+
+#include <QtQml/qqmlregistration.h>
+#include <QtCore/QAbstractListModel>
+#include <QtQml/QQmlParserStatus>
+#include <memory>
+#include <vector>
+
+#include "ui/quick/InterfaceDescription.h"
+#include "ui/quick/TableModel.h"
+#include "ui/screens/RootNavigationController.h"
+
+namespace qel {
+
+// GUI thread only. Made by the interface description; once that is read it creates the root
+// navigation controller with the first screen. A screen that is left stays in the list until the
+// window has moved it out of sight and says so with settle().
+class Navigation : public QAbstractListModel, public QQmlParserStatus {
+  Q_OBJECT
+  Q_INTERFACES(QQmlParserStatus)
+  QML_ELEMENT
+  Q_PROPERTY(qel::InterfaceDescription* storyboard MEMBER _storyboard NOTIFY storyboardChanged)
+  Q_PROPERTY(int depth READ depth NOTIFY depthChanged)
+  Q_PROPERTY(qel::TableModel* top READ top NOTIFY depthChanged)
+  Q_PROPERTY(QString notice READ notice WRITE setNotice NOTIFY noticeChanged)
+
+ public:
+  enum Role { tableRole = Qt::UserRole + 1 };
+
+  explicit Navigation(QObject* parent = nullptr);
+  ~Navigation() override;
+
+  void classBegin() override {}
+  void componentComplete() override;
+
+  int rowCount(const QModelIndex& parent = {}) const override;
+  QVariant data(const QModelIndex& index, int role) const override;
+  QHash<int, QByteArray> roleNames() const override;
+
+  // Screens on the stack; the list may still hold more that were left.
+  int depth() const { return _depth; }
+  TableModel* top() const;
+
+  // A line for the reader under the title of every screen; empty: none.
+  QString notice() const { return _notice; }
+  void setNotice(const QString& notice);
+
+  Q_INVOKABLE void back();
+  Q_INVOKABLE void settle();
+
+ signals:
+  void storyboardChanged();
+  void depthChanged();
+  void noticeChanged();
+
+ private:
+  void follow(const TableModel* table, IndexPath indexPath);
+  void stackChanged();
+  void show(const std::shared_ptr<TableViewController>& controller);
+
+  InterfaceDescription* _storyboard = nullptr;
+  std::shared_ptr<RootNavigationController> _controller;
+  std::vector<TableModel*> _screens;  // children
+  int _depth = 0;
+  QString _notice;
+};
+
+}  // namespace qel
