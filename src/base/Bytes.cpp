@@ -16,11 +16,11 @@ int hexDigit(char c) {
   return -1;
 }
 
-constexpr std::array<std::int8_t, 256> makeBase64Values() {
-  std::array<std::int8_t, 256> values{};
+constexpr std::array<int, 256> makeBase64Values() {
+  std::array<int, 256> values{};
   values.fill(-1);
   for (std::size_t i = 0; i < kBase64Digits.size(); ++i) {
-    values[static_cast<unsigned char>(kBase64Digits[i])] = static_cast<std::int8_t>(i);
+    values[static_cast<unsigned char>(kBase64Digits[i])] = static_cast<int>(i);
   }
   return values;
 }

@@ -27,7 +27,7 @@ void DescriptorSink::write(std::string_view line) {
 BatchingSink::~BatchingSink() { flush(); }
 
 void BatchingSink::write(std::string_view line) {
-  constexpr std::size_t kBatch = 64 * 1024;
+  constexpr std::size_t kBatch = 65536;
   const std::lock_guard lock(_mutex);
   _waiting += line;
   _waiting += '\n';
