@@ -20,30 +20,37 @@ std::optional<ByteView> takeDelimited(PBDataReader& reader) {
   return take(reader, PBReaderReadVarint(reader));
 }
 
-// Skips everything up to the end tag of the group `fieldNumber`. Groups within are counted on a
-// heap stack, so that no input can exhaust the call stack.
-bool skipGroup(PBDataReader& reader, std::uint32_t fieldNumber);
+// Field numbers have 16 bits, here as in the messages.
+std::uint16_t numberOf(std::uint64_t tag) { return static_cast<std::uint16_t>(tag >> 3); }
 
 bool skipScalar(PBDataReader& reader, std::uint8_t wireType) {
   switch (wireType) {
-    case 0: PBReaderReadVarint(reader); return !reader._error;
-    case 1: return take(reader, 8).has_value();
-    case 2: return takeDelimited(reader).has_value();
-    case 5: return take(reader, 4).has_value();
-    default: return false;
+    case 0:
+      PBReaderReadVarint(reader);
+      return !reader._error;
+    case 1:
+      return take(reader, 8).has_value();
+    case 2:
+      return takeDelimited(reader).has_value();
+    case 5:
+      return take(reader, 4).has_value();
+    default:
+      return false;
   }
 }
 
+// Skips everything up to the end tag of the group `fieldNumber`. Groups within are kept on a heap
+// stack, so that no input can exhaust the call stack.
 bool skipGroup(PBDataReader& reader, std::uint32_t fieldNumber) {
-  std::vector<std::uint64_t> open = {fieldNumber};
+  std::vector<std::uint16_t> open = {numberOf(std::uint64_t{fieldNumber} << 3)};
   while (!open.empty()) {
     const std::uint64_t tag = PBReaderReadVarint(reader);
     if (reader._error) return false;
     const auto wireType = static_cast<std::uint8_t>(tag & 7);
     if (wireType == 3) {
-      open.push_back(tag >> 3);
+      open.push_back(numberOf(tag));
     } else if (wireType == 4) {
-      if (tag >> 3 != open.back()) return false;
+      if (numberOf(tag) != open.back()) return false;
       open.pop_back();
     } else if (!skipScalar(reader, wireType)) {
       return false;
