@@ -22,7 +22,7 @@ const std::map<std::string, Appearance::Theme>& themes() {
 
 std::optional<Options> parseOptions(int argc, const char* const* argv, int& exitCode) {
   Options options;
-  Appearance::Theme theme = Appearance::System;
+  std::string theme;
   CLI::App line("Shows what the phone's baseband reports about its cells.", "qelwatch");
   line.set_version_flag("--version", "qelwatch " QELWATCH_VERSION);
   line.add_option("--source", options.source,
@@ -30,11 +30,9 @@ std::optional<Options> parseOptions(int argc, const char* const* argv, int& exit
                   "recording:FILE[,speed=N][,loop]")
       ->type_name("SOURCE")
       ->capture_default_str();
-  const CLI::Option* themeOption =
-      line.add_option("--theme", theme, "system, light or dark, for this run")
-          ->type_name("THEME")
-          ->transform(CLI::Transformer(themes()).description(""))
-          ->check(CLI::IsMember(themes()).description(""));
+  line.add_option("--theme", theme, "system, light or dark, for this run")
+      ->type_name("THEME")
+      ->check(CLI::IsMember(themes()).description(""));
   line.add_option("--picture", options.picture,
                   "keep a PNG picture of the current screen in this file")
       ->type_name("FILE");
@@ -49,7 +47,7 @@ std::optional<Options> parseOptions(int argc, const char* const* argv, int& exit
     exitCode = EX_USAGE;
     return std::nullopt;
   }
-  if (themeOption->count() > 0) options.theme = theme;
+  if (!theme.empty()) options.theme = themes().at(theme);
   return options;
 }
 

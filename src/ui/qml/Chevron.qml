@@ -9,24 +9,30 @@ Item {
     property color color: Theme.accent
     readonly property real arm: Math.round(9 * Appearance.textScale)
 
+    component Arm: Rectangle {
+        // 1: the lower arm, -1: the upper one.
+        required property int side
+
+        y: (parent.height - height) / 2 + side * (width - height) * 0.35
+        anchors.horizontalCenter: parent.horizontalCenter
+        height: 2
+        radius: 1
+        antialiasing: true
+    }
+
     implicitWidth: Math.ceil(arm * 0.8) + 2
     implicitHeight: Math.ceil(arm * 1.5) + 2
 
-    Repeater {
-        model: [-1, 1]
-
-        Rectangle {
-            required property int modelData
-            readonly property int side: chevron.pointsLeft ? -1 : 1
-
-            x: (chevron.width - width) / 2
-            y: chevron.height / 2 - height / 2 + modelData * (chevron.arm - height) * 0.35
-            width: chevron.arm
-            height: 2
-            radius: 1
-            color: chevron.color
-            rotation: -side * modelData * 45
-            antialiasing: true
-        }
+    Arm {
+        side: -1
+        width: chevron.arm
+        color: chevron.color
+        rotation: chevron.pointsLeft ? -45 : 45
+    }
+    Arm {
+        side: 1
+        width: chevron.arm
+        color: chevron.color
+        rotation: chevron.pointsLeft ? 45 : -45
     }
 }

@@ -7,7 +7,34 @@ Item {
 
     property string source
 
+    readonly property var choices: [
+        {
+            name: qsTr("System"),
+            theme: Appearance.System
+        },
+        {
+            name: qsTr("Light"),
+            theme: Appearance.Light
+        },
+        {
+            name: qsTr("Dark"),
+            theme: Appearance.Dark
+        }
+    ]
+    // As much room beside the names as the width leaves.
+    readonly property real sidePadding: {
+        const left = width - 2 * Theme.margin - names.advanceWidth;
+        return Math.max(4, Math.min(Theme.margin, left / (2 * choices.length)));
+    }
+
     implicitHeight: column.height + Theme.padding
+
+    TextMetrics {
+        id: names
+        text: footer.choices.map(choice => choice.name).join("")
+        font.pointSize: Theme.nameSize
+        font.weight: Font.DemiBold
+    }
 
     Column {
         id: column
@@ -16,6 +43,7 @@ Item {
         Text {
             x: Theme.margin
             width: parent.width - 2 * Theme.margin
+            topPadding: Theme.padding
             bottomPadding: 4
             visible: text !== ""
             text: footer.source
@@ -29,28 +57,18 @@ Item {
             anchors.horizontalCenter: parent.horizontalCenter
 
             Repeater {
-                model: [
-                    {
-                        name: qsTr("System"),
-                        theme: Appearance.System
-                    },
-                    {
-                        name: qsTr("Light"),
-                        theme: Appearance.Light
-                    },
-                    {
-                        name: qsTr("Dark"),
-                        theme: Appearance.Dark
-                    }
-                ]
+                model: footer.choices
 
+                // qmllint disable unqualified
                 ThemeChoice {
                     required property var modelData
 
+                    sidePadding: footer.sidePadding
                     text: modelData.name
                     checked: Appearance.theme === modelData.theme
                     onClicked: Appearance.theme = modelData.theme
                 }
+                // qmllint enable unqualified
             }
         }
     }

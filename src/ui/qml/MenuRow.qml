@@ -50,29 +50,27 @@ T.AbstractButton {
         }
     }
 
-    contentItem: Item {
-        Text {
-            id: label
-            anchors {
-                left: parent.left
-                right: chevron.left
-                verticalCenter: parent.verticalCenter
-                leftMargin: Theme.margin
-                rightMargin: Theme.padding
-            }
-            text: row.text
-            color: Theme.value
-            font.pointSize: Theme.valueSize
-            wrapMode: Text.Wrap
-            Accessible.ignored: true
+    Text {
+        id: label
+        anchors {
+            left: parent.left
+            right: chevron.left
+            verticalCenter: parent.verticalCenter
+            leftMargin: Theme.margin
+            rightMargin: Theme.padding
         }
-        Chevron {
-            id: chevron
-            anchors {
-                right: parent.right
-                rightMargin: Theme.margin
-                verticalCenter: parent.verticalCenter
-            }
+        text: row.text
+        color: Theme.value
+        font.pointSize: Theme.valueSize
+        wrapMode: Text.Wrap
+        Accessible.ignored: true
+    }
+    Chevron {
+        id: chevron
+        anchors {
+            right: parent.right
+            rightMargin: Theme.margin
+            verticalCenter: parent.verticalCenter
         }
     }
 }

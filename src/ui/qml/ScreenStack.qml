@@ -51,6 +51,7 @@ FocusScope {
     Repeater {
         model: stack.navigation
 
+        // qmllint disable unqualified
         TableScreen {
             required property int index
             readonly property real away: index - stack.position
@@ -68,6 +69,7 @@ FocusScope {
             isFirst: index === 0
             onBack: stack.navigation.back()
         }
+        // qmllint enable unqualified
     }
 
     Item {

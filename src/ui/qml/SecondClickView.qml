@@ -31,13 +31,15 @@ Rectangle {
     Accessible.focused: isCurrent
 
     Rectangle {
+        id: tint
         anchors.fill: parent
         color: Theme.pressTint
         opacity: 0
 
-        NumberAnimation on opacity {
+        NumberAnimation {
             id: fade
-            running: false
+            target: tint
+            property: "opacity"
             from: 1
             to: 0
             duration: Theme.changeMs

@@ -1,5 +1,4 @@
 import QtQuick
-import QtQuick.Controls.Basic
 import Qelwatch.Ui
 
 // One screen: its bar, what there is to say to the reader, and its table.
@@ -30,7 +29,7 @@ FocusScope {
             left: parent.left
             right: parent.right
         }
-        table: screen.table
+        model: screen.table
         storyboard: screen.storyboard
         focus: true
         visible: !emptyText.visible
@@ -69,7 +68,7 @@ FocusScope {
         title: screen.table.title
         previousTitle: screen.table.previousTitle
         hasBack: !screen.isFirst
-        hairline: !list.atYBeginning
+        hairline: !list.atTop
         onBack: screen.back()
     }
 

@@ -6,7 +6,9 @@ import Qelwatch.Ui
 T.AbstractButton {
     id: choice
 
-    implicitWidth: Math.max(Theme.touch, label.implicitWidth + 2 * Theme.margin)
+    required property real sidePadding
+
+    implicitWidth: Math.max(Theme.touch, label.implicitWidth + 2 * sidePadding)
     implicitHeight: Math.max(Theme.touch, label.implicitHeight + 2 * Theme.padding)
     focusPolicy: Qt.TabFocus
 
@@ -30,7 +32,7 @@ T.AbstractButton {
             topMargin: 4
             horizontalCenter: parent.horizontalCenter
         }
-        width: label.width
+        width: label.contentWidth
         height: 2
         visible: choice.checked
         color: Theme.accent
