@@ -1,0 +1,25 @@
+// The service within the client's own process.
+#pragma once
+
+#include <memory>
+#include <string>
+
+#include "service/ServiceCore.h"
+#include "service/sources/SourceError.h"
+#include "tesk/Transport.h"
+
+namespace qel::service {
+
+// The core on a source, named as for parseSourceSpec. Nothing when there is no such source; `error`
+// then holds an exit code and one line why.
+std::shared_ptr<ServiceCore> makeServiceCore(const std::string& sourceSpec, SourceError& error);
+
+// Connections straight to the core. Sinks run on the source's thread, or in a query on the
+// caller's; a transport may be destroyed from within its own sink.
+std::shared_ptr<tesk::Connector> makeInProcessConnector(std::shared_ptr<ServiceCore> core);
+
+// Both in one.
+std::shared_ptr<tesk::Connector> makeInProcessConnector(const std::string& sourceSpec,
+                                                        SourceError& error);
+
+}  // namespace qel::service

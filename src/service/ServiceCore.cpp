@@ -1,0 +1,110 @@
+#include "service/ServiceCore.h"
+
+#include <algorithm>
+#include <utility>
+
+namespace qel::service {
+
+std::shared_ptr<ServiceCore> ServiceCore::create(std::unique_ptr<EventSource> source,
+                                                 const Clock& clock) {
+  return std::shared_ptr<ServiceCore>(new ServiceCore(std::move(source), clock));
+}
+
+ServiceCore::ServiceCore(std::unique_ptr<EventSource> source, const Clock& clock)
+    : _undecodableLog(clock), _source(std::move(source)) {}
+
+ServiceCore::~ServiceCore() { _source->stop(); }
+
+std::shared_ptr<Session> ServiceCore::open(std::string_view clientName, tesk::EventSink sink) {
+  const std::lock_guard lock(_mutex);
+  const auto known = _applicationOfClient.find(clientName);
+  auto application =
+      known == _applicationOfClient.end() ? std::nullopt : std::optional(known->second);
+  auto session = std::make_shared<Session>(std::string(clientName), std::move(sink),
+                                           _configurations, application);
+  _sessions.push_back(session);
+  return session;
+}
+
+void ServiceCore::close(const std::shared_ptr<Session>& session) {
+  session->close();
+  const std::lock_guard lock(_mutex);
+  std::erase(_sessions, session);
+  if (_sessions.empty() && _sourceRunning) {
+    _source->stop();
+    _sourceRunning = false;
+  }
+}
+
+void ServiceCore::eventsOn(Session& session) {
+  session.eventsOn();
+  _listeners->changed();
+  const std::lock_guard lock(_mutex);
+  if (_sourceRunning || _sessions.empty()) return;
+  _source->start(weak_from_this(), _listeners);
+  _sourceRunning = true;
+}
+
+void ServiceCore::eventsOff(Session& session) { session.eventsOff(); }
+
+std::vector<std::shared_ptr<Session>> ServiceCore::sessions() const {
+  const std::lock_guard lock(_mutex);
+  return _sessions;
+}
+
+EventReceiver::Taken ServiceCore::take(const ServiceEvent& event) {
+  std::string reason;
+  const auto subject = examineEvent(event, reason);
+  if (!subject) {
+    ++_received;
+    ++_undecodable;
+    _undecodableLog.note(reason);
+    return Taken::yes;
+  }
+  // Whether anyone listens is known only from the offers themselves: a look beforehand could be
+  // overtaken by a client that switches its events off and on again.
+  const auto open = sessions();
+  std::vector<Session::Offer> offers;
+  for (const auto& session : open) offers.push_back(session->offer(event, *subject));
+  const bool heard = std::ranges::any_of(offers, [](Session::Offer offer) {
+    return offer == Session::Offer::delivered || offer == Session::Offer::notWanted;
+  });
+  if (!heard) return Taken::nobodyListens;
+  ++_received;
+  for (std::size_t i = 0; i < offers.size(); ++i) {
+    open[i]->pass(offers[i]);
+    switch (offers[i]) {
+      case Session::Offer::delivered:
+        ++_delivered;
+        break;
+      case Session::Offer::notWanted:
+      case Session::Offer::unconfigured:
+        ++_droppedByConfiguration;
+        break;
+      case Session::Offer::off:
+        ++_droppedWhileOff;
+        break;
+    }
+  }
+  return Taken::yes;
+}
+
+CoreStatus ServiceCore::status() const {
+  CoreStatus status;
+  status.source = _source->description();
+  {
+    const std::lock_guard lock(_mutex);
+    status.sourceRunning = _sourceRunning;
+    for (const auto& session : _sessions) status.sessions.push_back(session->status());
+  }
+  status.received = _received;
+  status.delivered = _delivered;
+  status.undecodable = _undecodable;
+  status.droppedByConfiguration = _droppedByConfiguration;
+  status.droppedWhileOff = _droppedWhileOff;
+  status.commands = _commands;
+  status.refusedCommands = _refusedCommands;
+  return status;
+}
+
+}  // namespace qel::service

@@ -1,0 +1,93 @@
+// The baseband manager service without its front: sessions, configurations, routing and commands.
+#pragma once
+
+#include <array>
+#include <atomic>
+#include <cstdint>
+#include <map>
+#include <memory>
+#include <mutex>
+#include <optional>
+#include <string>
+#include <string_view>
+#include <vector>
+
+#include "base/Clock.h"
+#include "service/ConfigurationStore.h"
+#include "service/Counters.h"
+#include "service/Session.h"
+#include "service/UndecodableLog.h"
+#include "service/sources/EventSource.h"
+#include "tesk/Transport.h"
+
+namespace qel::service {
+
+// Shared by its fronts and their sessions. Every call may come from any thread, also from a sink.
+// The core's lock guards the list of sessions and whether the source runs; no sink, no session and
+// no query runs under it. The source runs from the first session that switches events on until the
+// last session closes.
+class ServiceCore final : public EventReceiver, public std::enable_shared_from_this<ServiceCore> {
+ public:
+  // `clock` outlives the core; it only spaces out log lines.
+  static std::shared_ptr<ServiceCore> create(std::unique_ptr<EventSource> source,
+                                             const Clock& clock = systemClock());
+  ~ServiceCore() override;
+
+  // A session starts with events off. A client that comes back under the same name belongs to the
+  // application of its last command.
+  std::shared_ptr<Session> open(std::string_view clientName, tesk::EventSink sink);
+  // After it returned, the session's sink is not called any more.
+  void close(const std::shared_ptr<Session>& session);
+
+  void eventsOn(Session& session);
+  // After it returned, no event is in flight to the session.
+  void eventsOff(Session& session);
+
+  // Never throws; a request that cannot be met is answered with a code and one line that names the
+  // key at fault. A query's metric is delivered to the session before its result is returned.
+  tesk::CommandResult performCommand(Session& session, std::string_view command,
+                                     const tesk::Message& request);
+
+  CoreStatus status() const;
+
+  // EventReceiver, for the source.
+  Taken take(const ServiceEvent& event) override;
+
+ private:
+  using Handler = tesk::CommandResult (ServiceCore::*)(Session&, const Dictionary&);
+  struct Command {
+    std::string_view name;
+    Handler handler;
+  };
+  static const std::array<Command, 3> kCommands;
+
+  ServiceCore(std::unique_ptr<EventSource> source, const Clock& clock);
+
+  tesk::CommandResult addConfiguration(Session& session, const Dictionary& request);
+  tesk::CommandResult clearConfiguration(Session& session, const Dictionary& request);
+  tesk::CommandResult queryMetric(Session& session, const Dictionary& request);
+  void belongsTo(Session& session, std::int64_t application);
+  std::vector<std::shared_ptr<Session>> sessions() const;
+
+  ConfigurationStore _configurations;
+  const std::shared_ptr<ListenerSignal> _listeners = std::make_shared<ListenerSignal>();
+  UndecodableLog _undecodableLog;
+
+  mutable std::mutex _mutex;
+  std::vector<std::shared_ptr<Session>> _sessions;
+  std::map<std::string, std::int64_t, std::less<>> _applicationOfClient;
+  bool _sourceRunning = false;
+
+  std::atomic<std::uint64_t> _received = 0;
+  std::atomic<std::uint64_t> _delivered = 0;
+  std::atomic<std::uint64_t> _undecodable = 0;
+  std::atomic<std::uint64_t> _droppedByConfiguration = 0;
+  std::atomic<std::uint64_t> _droppedWhileOff = 0;
+  std::atomic<std::uint64_t> _commands = 0;
+  std::atomic<std::uint64_t> _refusedCommands = 0;
+
+  // Last: gone before anything that its events might need.
+  const std::unique_ptr<EventSource> _source;
+};
+
+}  // namespace qel::service

@@ -1,0 +1,24 @@
+// The events of a source one after the other, without threads or clocks.
+#pragma once
+
+#include <cstdint>
+#include <optional>
+
+#include "service/ServiceEvent.h"
+#include "service/sources/EventSource.h"
+
+namespace qel::service {
+
+// One thread at a time.
+class EventSequence {
+ public:
+  virtual ~EventSequence() = default;
+  // In time order; nothing at the end.
+  virtual std::optional<ServiceEvent> next() = 0;
+  // That event's moment has come.
+  virtual void passed(const ServiceEvent& /*event*/) {}
+  // The metric as it is at the moment, by its 16-bit identifier.
+  virtual SourceAnswer query(std::uint32_t metric) = 0;
+};
+
+}  // namespace qel::service

@@ -1,0 +1,40 @@
+// Tells a source that the set of clients that listen may have changed.
+#pragma once
+
+#include <condition_variable>
+#include <cstdint>
+#include <mutex>
+#include <stop_token>
+
+namespace qel::service {
+
+// Any thread. A waiter first reads the generation, then looks whether anyone listens, then waits
+// for the generation to go on: so it misses nothing.
+class ListenerSignal {
+ public:
+  std::uint64_t generation() const {
+    const std::lock_guard lock(_mutex);
+    return _generation;
+  }
+
+  void changed() {
+    {
+      const std::lock_guard lock(_mutex);
+      ++_generation;
+    }
+    _changed.notify_all();
+  }
+
+  // False when stopped.
+  bool waitPast(std::uint64_t generation, const std::stop_token& stop) {
+    std::unique_lock lock(_mutex);
+    return _changed.wait(lock, stop, [&] { return _generation != generation; });
+  }
+
+ private:
+  mutable std::mutex _mutex;
+  std::condition_variable_any _changed;
+  std::uint64_t _generation = 0;
+};
+
+}  // namespace qel::service

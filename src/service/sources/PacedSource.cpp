@@ -1,0 +1,106 @@
+#include "service/sources/PacedSource.h"
+
+#include <stop_token>
+#include <utility>
+
+#include "service/sources/Pacer.h"
+
+namespace qel::service {
+
+struct PacedSource::Run {
+  Run(std::unique_ptr<EventSequence> events, WaitClock& clock, double speed)
+      : sequence(std::move(events)), pacer(clock, speed) {}
+
+  std::optional<ServiceEvent> next() {
+    const std::lock_guard lock(mutex);
+    return sequence->next();
+  }
+  void passed(const ServiceEvent& event) {
+    const std::lock_guard lock(mutex);
+    sequence->passed(event);
+  }
+  SourceAnswer query(std::uint32_t metric) {
+    const std::lock_guard lock(mutex);
+    return sequence->query(metric);
+  }
+
+  std::stop_source stop;
+  std::weak_ptr<EventReceiver> receiver;
+  std::shared_ptr<ListenerSignal> listeners;
+  std::mutex mutex;  // guards the sequence
+  std::unique_ptr<EventSequence> sequence;
+  Pacer pacer;
+};
+
+PacedSource::PacedSource(std::string description, MakeSequence makeSequence, double speed,
+                         WaitClock& clock)
+    : _description(std::move(description)),
+      _makeSequence(std::move(makeSequence)),
+      _speed(speed),
+      _clock(clock) {}
+
+PacedSource::~PacedSource() {
+  stop();
+  for (std::thread& thread : _threads) {
+    if (thread.get_id() == std::this_thread::get_id()) {
+      thread.detach();
+    } else {
+      thread.join();
+    }
+  }
+}
+
+void PacedSource::start(std::weak_ptr<EventReceiver> receiver,
+                        std::shared_ptr<ListenerSignal> listeners) {
+  stop();
+  auto run = std::make_shared<Run>(_makeSequence(), _clock, _speed);
+  run->receiver = std::move(receiver);
+  run->listeners = std::move(listeners);
+  const std::lock_guard lock(_mutex);
+  _run = run;
+  _threads.emplace_back([run] { play(run); });
+}
+
+void PacedSource::stop() {
+  const std::lock_guard lock(_mutex);
+  if (_run) _run->stop.request_stop();
+  _run.reset();
+}
+
+SourceAnswer PacedSource::query(std::uint32_t metric) {
+  std::shared_ptr<Run> run;
+  {
+    const std::lock_guard lock(_mutex);
+    run = _run;
+  }
+  if (!run) return {CommandCode::metricNotAvailable, "the source is not running", 0, {}};
+  return run->query(metric);
+}
+
+void PacedSource::play(const std::shared_ptr<Run>& run) {
+  const std::stop_token stop = run->stop.get_token();
+  while (auto event = run->next()) {
+    if (!run->pacer.wait(event->timeMs, stop)) return;
+    run->passed(*event);
+    if (!hand(*run, *event)) return;
+  }
+}
+
+// Until someone took the event. False when stopped or nobody is left.
+bool PacedSource::hand(Run& run, const ServiceEvent& event) {
+  const std::stop_token stop = run.stop.get_token();
+  while (!stop.stop_requested()) {
+    const std::uint64_t generation = run.listeners->generation();
+    {
+      // Held no longer than this: letting go may be the end of the receiver and of the source.
+      const auto receiver = run.receiver.lock();
+      if (!receiver) return false;
+      if (receiver->take(event) == EventReceiver::Taken::yes) return true;
+    }
+    run.pacer.resume();
+    if (!run.listeners->waitPast(generation, stop)) return false;
+  }
+  return false;
+}
+
+}  // namespace qel::service

@@ -1,0 +1,42 @@
+// The events of a recording, as they were recorded.
+#pragma once
+
+#include <map>
+#include <memory>
+#include <string>
+
+#include "recording/RecordingReader.h"
+#include "service/sources/EventSequence.h"
+#include "service/sources/SourceError.h"
+
+namespace qel::service {
+
+// Metric events by their 16-bit identifier.
+using EventOfMetric = std::map<std::uint32_t, ServiceEvent>;
+
+// Reads the whole recording once. Nothing when it is not whole and sound, or holds no event: then
+// `error` says why. `firsts` gets the first event of every metric.
+bool checkRecording(const std::string& path, EventOfMetric& firsts, SourceError& error);
+
+// Plays the file from its beginning, again and again when it loops. A query is answered with the
+// newest event of the metric that has passed, else with the first in the file.
+class RecordingSequence final : public EventSequence {
+ public:
+  RecordingSequence(std::string path, bool loops, std::shared_ptr<const EventOfMetric> firsts);
+
+  std::optional<ServiceEvent> next() override;
+  void passed(const ServiceEvent& event) override;
+  SourceAnswer query(std::uint32_t metric) override;
+
+ private:
+  std::optional<ServiceEvent> read();
+  bool reopen();
+
+  const std::string _path;
+  const bool _loops;
+  const std::shared_ptr<const EventOfMetric> _firsts;
+  std::unique_ptr<RecordingReader> _reader;
+  EventOfMetric _newest;
+};
+
+}  // namespace qel::service

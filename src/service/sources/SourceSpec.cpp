@@ -1,0 +1,105 @@
+#include "service/sources/SourceSpec.h"
+
+#include <sysexits.h>
+
+#include <charconv>
+#include <utility>
+
+namespace qel::service {
+namespace {
+
+constexpr std::string_view kSimulated = "simulated";
+constexpr std::string_view kRecording = "recording:";
+constexpr double kSlowest = 0.01;
+constexpr double kFastest = 1e6;
+
+template <class Number>
+std::optional<Number> numberOf(std::string_view text) {
+  Number number{};
+  const auto [end, code] = std::from_chars(text.data(), text.data() + text.size(), number);
+  if (code != std::errc() || end != text.data() + text.size()) return std::nullopt;
+  return number;
+}
+
+bool readSpeed(std::string_view text, double& speed) {
+  const auto number = numberOf<double>(text);
+  // Also false for what is no number at all.
+  if (!number || !(*number >= kSlowest && *number <= kFastest)) return false;
+  speed = *number;
+  return true;
+}
+
+bool readOption(std::string_view name, std::string_view value, SimulatedSpec& spec) {
+  if (name == "speed") return readSpeed(value, spec.speed);
+  const auto number = numberOf<std::uint64_t>(value);
+  if (!number) return false;
+  if (name == "seed") {
+    spec.seed = *number;
+  } else if (name == "start") {
+    spec.startMs = *number;
+  } else {
+    return false;
+  }
+  return true;
+}
+
+std::nullopt_t refuse(SourceError& error, std::string message) {
+  error = {EX_USAGE, std::move(message)};
+  return std::nullopt;
+}
+
+std::optional<SourceSpec> parseSimulated(std::string_view options, SourceError& error) {
+  SimulatedSpec spec;
+  while (!options.empty()) {
+    options.remove_prefix(1);  // the comma
+    const std::string_view option = options.substr(0, options.find(','));
+    options.remove_prefix(option.size());
+    const std::size_t equals = option.find('=');
+    if (equals == std::string_view::npos ||
+        !readOption(option.substr(0, equals), option.substr(equals + 1), spec)) {
+      return refuse(error, "simulated source: bad option \"" + std::string(option) +
+                               "\" (seed=N, speed=0.01..1000000, start=MS)");
+    }
+  }
+  return spec;
+}
+
+// Options are taken from the end for as long as they are options: what is left is the file.
+std::optional<SourceSpec> parseRecording(std::string_view text, SourceError& error) {
+  RecordingSpec spec;
+  bool speedSet = false;
+  for (std::size_t comma = text.rfind(','); comma != std::string_view::npos;
+       comma = text.rfind(',')) {
+    const std::string_view option = text.substr(comma + 1);
+    if (option == "loop") {
+      spec.loops = true;
+    } else if (option.starts_with("speed=")) {
+      double speed = 1;
+      if (!readSpeed(option.substr(option.find('=') + 1), speed)) {
+        return refuse(error, "recording source: bad option \"" + std::string(option) +
+                                 "\" (speed=0.01..1000000)");
+      }
+      if (!std::exchange(speedSet, true)) spec.speed = speed;
+    } else {
+      break;
+    }
+    text = text.substr(0, comma);
+  }
+  if (text.empty()) return refuse(error, "recording source: no file named");
+  spec.path = text;
+  return spec;
+}
+
+}  // namespace
+
+std::optional<SourceSpec> parseSourceSpec(std::string_view text, SourceError& error) {
+  if (text == kSimulated || text.starts_with(std::string(kSimulated) + ",")) {
+    return parseSimulated(text.substr(kSimulated.size()), error);
+  }
+  if (text.starts_with(kRecording)) return parseRecording(text.substr(kRecording.size()), error);
+  return refuse(error, "unknown source \"" + std::string(text) +
+                           "\" (simulated[,seed=N][,speed=N][,start=MS] or "
+                           "recording:FILE[,speed=N][,loop])");
+}
+
+}  // namespace qel::service
