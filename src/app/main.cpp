@@ -50,7 +50,7 @@ void findResources() {
 QQuickWindow* loadWindow(QQmlApplicationEngine& engine, const qel::Options& options) {
   engine.addImportPath(QStringLiteral("qrc:/qt/qml"));
   engine.setInitialProperties({{"source", qel::sourceInWords(options.source)}});
-  engine.load(QStringLiteral("qrc:/qt/qml/Qelwatch/Ui/Main.qml"));
+  engine.load(QStringLiteral("qrc:/qt/qml/Qelwatch/Ui/qml/Main.qml"));
   if (engine.rootObjects().isEmpty()) return nullptr;
   return qobject_cast<QQuickWindow*>(engine.rootObjects().constFirst());
 }
