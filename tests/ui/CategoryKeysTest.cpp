@@ -4,6 +4,7 @@
 #include <gtest/gtest.h>
 
 #include <array>
+#include <ostream>
 
 #include "support/RecordingSink.h"
 #include "ui/Tables.h"
@@ -26,6 +27,8 @@ struct Key {
   const char* source;
   const char* title = "";
 };
+
+void PrintTo(const Key& key, std::ostream* out) { *out << '"' << key.key << '"'; }
 
 constexpr std::array kKeys = {
     Key{"LTE C-DRX", Shape::record, "myLTECDRXConfigDict"},
