@@ -142,7 +142,8 @@ std::optional<LineFault> checkMetric(const RecordedEvent& event) {
   if (event.kind != RecordedKind::metric) return std::nullopt;
   const Value* metric = event.entries.find(kRecordedMetricKey);
   if (!metric) return fault("\"kKeyMetricID\" is missing");
-  if (!metric->asInt64()) return fault("\"kKeyMetricID\" is no 64-bit integer");
+  if (metric->kind() == Value::Kind::floating || !metric->asInt64())
+    return fault("\"kKeyMetricID\" is no 64-bit integer");
   return std::nullopt;
 }
 
