@@ -29,7 +29,9 @@ void Request::refuseType(std::string_view key, std::string_view wanted) {
 std::int64_t Request::integer(std::string_view key) {
   const Value* value = find(key);
   if (!value) return 0;
-  if (const auto number = value->asInt64()) return *number;
+  // A floating number is none, even a whole one.
+  const auto number = value->kind() == Value::Kind::floating ? std::nullopt : value->asInt64();
+  if (number) return *number;
   refuseType(key, "a 64-bit integer");
   return 0;
 }

@@ -25,7 +25,7 @@ constexpr double kRidgeSlopeM = 200;  // from the crest to the full loss
 
 constexpr double kUnderpassM = 1950;
 constexpr double kUnderpassHalfM = 25;
-constexpr double kUnderpassLossDb = 52;
+constexpr double kUnderpassLossDb = 65;
 constexpr double kNearUnderpassM = 90;
 
 constexpr double kTurnSeconds = 12;
