@@ -44,13 +44,31 @@ tesk::CommandResult ServiceCore::performCommand(Session& session, std::string_vi
   return result;
 }
 
-void ServiceCore::belongsTo(Session& session, std::int64_t application) {
+void ServiceCore::remember(Session& session, std::int64_t application) {
+  constexpr std::size_t kMostClients = 256;
   session.setApplication(application);
   {
-    const std::lock_guard lock(_mutex);
-    _applicationOfClient.insert_or_assign(session.clientName(), application);
+    const std::lock_guard lock(_keptMutex);
+    auto& applications = _kept.applicationOfClient;
+    const auto known = applications.find(session.clientName());
+    const bool isNew = known == applications.end() || known->second != application;
+    if (isNew && applications.size() < kMostClients) {
+      applications.insert_or_assign(session.clientName(), application);
+      _keeper->save(_kept);
+    }
   }
   _listeners->changed();
+}
+
+void ServiceCore::rememberConfiguration(std::int64_t application, const Bytes* payload) {
+  const std::lock_guard lock(_keptMutex);
+  const KeptState before = _kept;
+  if (payload) {
+    _kept.configurations.insert_or_assign(application, *payload);
+  } else {
+    _kept.configurations.erase(application);
+  }
+  if (_kept != before) _keeper->save(_kept);
 }
 
 tesk::CommandResult ServiceCore::addConfiguration(Session& session, const Dictionary& entries) {
@@ -63,7 +81,8 @@ tesk::CommandResult ServiceCore::addConfiguration(Session& session, const Dictio
   auto configuration = DeviceConfiguration::fromPayload(*payload, reason);
   if (!configuration) return refusal(CommandCode::notAConfiguration, "kKeyPayload " + reason);
   _configurations.install(application, std::move(*configuration));
-  belongsTo(session, application);
+  rememberConfiguration(application, payload);
+  remember(session, application);
   return {};
 }
 
@@ -72,7 +91,8 @@ tesk::CommandResult ServiceCore::clearConfiguration(Session& session, const Dict
   const std::int64_t application = request.integer(tesk::kKeyAppID);
   if (request.refused()) return *request.refused();
   _configurations.clear(application);
-  belongsTo(session, application);
+  rememberConfiguration(application, nullptr);
+  remember(session, application);
   return {};
 }
 
@@ -96,7 +116,7 @@ tesk::CommandResult ServiceCore::queryMetric(Session& session, const Dictionary&
                                                    " is not the metric of kKeyTriggerID " +
                                                    std::to_string(trigger));
   }
-  belongsTo(session, application);
+  remember(session, application);
   SourceAnswer answer = _source->query(*metric);
   if (answer.code != CommandCode::done) return refusal(answer.code, std::move(answer.message));
   ServiceEvent event{answer.timeMs, tesk::kEventMetric, std::move(answer.entries)};

@@ -22,4 +22,13 @@ std::shared_ptr<const DeviceConfiguration> ConfigurationStore::find(
   return found == _byApplication.end() ? nullptr : found->second;
 }
 
+std::map<std::int64_t, std::uint32_t> ConfigurationStore::sizes() const {
+  const std::lock_guard lock(_mutex);
+  std::map<std::int64_t, std::uint32_t> sizes;
+  for (const auto& [application, configuration] : _byApplication) {
+    sizes.emplace(application, static_cast<std::uint32_t>(configuration->metricCount()));
+  }
+  return sizes;
+}
+
 }  // namespace qel::service

@@ -19,6 +19,9 @@ class ConfigurationStore {
   // Nothing when none is installed.
   std::shared_ptr<const DeviceConfiguration> find(std::int64_t application) const;
 
+  // Application identifiers and the number of metrics that each asks for.
+  std::map<std::int64_t, std::uint32_t> sizes() const;
+
  private:
   mutable std::mutex _mutex;
   std::map<std::int64_t, std::shared_ptr<const DeviceConfiguration>> _byApplication;

@@ -41,11 +41,13 @@ class InProcessConnector final : public tesk::Connector {
 
 }  // namespace
 
-std::shared_ptr<ServiceCore> makeServiceCore(const std::string& sourceSpec, SourceError& error) {
+std::shared_ptr<ServiceCore> makeServiceCore(const std::string& sourceSpec, SourceError& error,
+                                             std::unique_ptr<StateKeeper> keeper) {
   const auto spec = parseSourceSpec(sourceSpec, error);
   if (!spec) return nullptr;
   auto source = makeSource(*spec, error);
-  return source ? ServiceCore::create(std::move(source)) : nullptr;
+  if (!source) return nullptr;
+  return ServiceCore::create(std::move(source), systemClock(), std::move(keeper));
 }
 
 std::shared_ptr<tesk::Connector> makeInProcessConnector(std::shared_ptr<ServiceCore> core) {

@@ -11,8 +11,9 @@
 namespace qel::service {
 
 // The core on a source, named as for parseSourceSpec. Nothing when there is no such source; `error`
-// then holds an exit code and one line why.
-std::shared_ptr<ServiceCore> makeServiceCore(const std::string& sourceSpec, SourceError& error);
+// then holds an exit code and one line why. With a keeper, configurations outlive the core.
+std::shared_ptr<ServiceCore> makeServiceCore(const std::string& sourceSpec, SourceError& error,
+                                             std::unique_ptr<StateKeeper> keeper = nullptr);
 
 // Connections straight to the core. Sinks run on the source's thread, or in a query on the
 // caller's; a transport may be destroyed from within its own sink.

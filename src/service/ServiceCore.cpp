@@ -6,22 +6,41 @@
 namespace qel::service {
 
 std::shared_ptr<ServiceCore> ServiceCore::create(std::unique_ptr<EventSource> source,
-                                                 const Clock& clock) {
-  return std::shared_ptr<ServiceCore>(new ServiceCore(std::move(source), clock));
+                                                 const Clock& clock,
+                                                 std::unique_ptr<StateKeeper> keeper) {
+  if (!keeper) keeper = std::make_unique<ForgetfulKeeper>();
+  return std::shared_ptr<ServiceCore>(new ServiceCore(std::move(source), clock, std::move(keeper)));
 }
 
-ServiceCore::ServiceCore(std::unique_ptr<EventSource> source, const Clock& clock)
-    : _undecodableLog(clock), _source(std::move(source)) {}
+ServiceCore::ServiceCore(std::unique_ptr<EventSource> source, const Clock& clock,
+                         std::unique_ptr<StateKeeper> keeper)
+    : _undecodableLog(clock), _keeper(std::move(keeper)), _source(std::move(source)) {
+  restore();
+}
+
+void ServiceCore::restore() {
+  _kept = _keeper->load();
+  std::erase_if(_kept.configurations, [this](const auto& kept) {
+    std::string reason;
+    auto configuration = DeviceConfiguration::fromPayload(kept.second, reason);
+    if (configuration) _configurations.install(kept.first, std::move(*configuration));
+    return !configuration;
+  });
+}
 
 ServiceCore::~ServiceCore() { _source->stop(); }
 
+std::optional<std::int64_t> ServiceCore::applicationOf(std::string_view clientName) const {
+  const std::lock_guard lock(_keptMutex);
+  const auto known = _kept.applicationOfClient.find(clientName);
+  if (known == _kept.applicationOfClient.end()) return std::nullopt;
+  return known->second;
+}
+
 std::shared_ptr<Session> ServiceCore::open(std::string_view clientName, tesk::EventSink sink) {
-  const std::lock_guard lock(_mutex);
-  const auto known = _applicationOfClient.find(clientName);
-  auto application =
-      known == _applicationOfClient.end() ? std::nullopt : std::optional(known->second);
   auto session = std::make_shared<Session>(std::string(clientName), std::move(sink),
-                                           _configurations, application);
+                                           _configurations, applicationOf(clientName));
+  const std::lock_guard lock(_mutex);
   _sessions.push_back(session);
   return session;
 }

@@ -16,6 +16,7 @@
 #include "service/ConfigurationStore.h"
 #include "service/Counters.h"
 #include "service/Session.h"
+#include "service/StateKeeper.h"
 #include "service/UndecodableLog.h"
 #include "service/sources/EventSource.h"
 #include "tesk/Transport.h"
@@ -28,9 +29,11 @@ namespace qel::service {
 // last session closes.
 class ServiceCore final : public EventReceiver, public std::enable_shared_from_this<ServiceCore> {
  public:
-  // `clock` outlives the core; it only spaces out log lines.
+  // `clock` outlives the core; it only spaces out log lines. With a keeper, configurations and
+  // whose they are outlive the core.
   static std::shared_ptr<ServiceCore> create(std::unique_ptr<EventSource> source,
-                                             const Clock& clock = systemClock());
+                                             const Clock& clock = systemClock(),
+                                             std::unique_ptr<StateKeeper> keeper = nullptr);
   ~ServiceCore() override;
 
   // A session starts with events off. A client that comes back under the same name belongs to the
@@ -49,6 +52,10 @@ class ServiceCore final : public EventReceiver, public std::enable_shared_from_t
                                      const tesk::Message& request);
 
   CoreStatus status() const;
+  // Application identifiers with a configuration and the number of metrics that each asks for.
+  std::map<std::int64_t, std::uint32_t> configurationSizes() const {
+    return _configurations.sizes();
+  }
 
   // EventReceiver, for the source.
   Taken take(const ServiceEvent& event) override;
@@ -61,12 +68,17 @@ class ServiceCore final : public EventReceiver, public std::enable_shared_from_t
   };
   static const std::array<Command, 3> kCommands;
 
-  ServiceCore(std::unique_ptr<EventSource> source, const Clock& clock);
+  ServiceCore(std::unique_ptr<EventSource> source, const Clock& clock,
+              std::unique_ptr<StateKeeper> keeper);
+  void restore();
+  std::optional<std::int64_t> applicationOf(std::string_view clientName) const;
 
   tesk::CommandResult addConfiguration(Session& session, const Dictionary& request);
   tesk::CommandResult clearConfiguration(Session& session, const Dictionary& request);
   tesk::CommandResult queryMetric(Session& session, const Dictionary& request);
-  void belongsTo(Session& session, std::int64_t application);
+  // Notes whose command it was, and the payload that it installed (none: cleared), if any.
+  void remember(Session& session, std::int64_t application);
+  void rememberConfiguration(std::int64_t application, const Bytes* payload);
   std::vector<std::shared_ptr<Session>> sessions() const;
 
   ConfigurationStore _configurations;
@@ -75,8 +87,11 @@ class ServiceCore final : public EventReceiver, public std::enable_shared_from_t
 
   mutable std::mutex _mutex;
   std::vector<std::shared_ptr<Session>> _sessions;
-  std::map<std::string, std::int64_t, std::less<>> _applicationOfClient;
   bool _sourceRunning = false;
+
+  mutable std::mutex _keptMutex;  // also held while the keeper writes
+  KeptState _kept;
+  const std::unique_ptr<StateKeeper> _keeper;
 
   std::atomic<std::uint64_t> _received = 0;
   std::atomic<std::uint64_t> _delivered = 0;

@@ -18,7 +18,7 @@ const std::map<std::string, std::set<std::string>> kAllowed = {
     {"base", {}},
     {"messages", {"base"}},
     {"recording", {"base"}},
-    {"tesk", {"base"}},
+    {"tesk", {"base", "messages"}},
     {"connection", {"base", "tesk"}},
     {"metrics", {"base", "connection", "messages"}},
     {"service", {"base", "messages", "recording", "tesk"}},

@@ -1,0 +1,55 @@
+// The service's end of one client's event stream.
+#pragma once
+
+#include <cstdint>
+#include <deque>
+#include <functional>
+#include <mutex>
+#include <string_view>
+
+#include "base/Bytes.h"
+#include "tesk/Message.h"
+
+namespace qel::service {
+
+// Events go straight into the socket while it takes them. When the client does not read, they wait
+// here, at most kLargestBacklog bytes; beyond that the oldest are dropped and counted, never the
+// newest. send may be called from any thread; the rest belongs to the thread that polls.
+class EventStream {
+ public:
+  static constexpr std::size_t kLargestBacklog = 1024 * 1024;
+
+  // Takes the descriptor, which must not block. `backlogBegins` is called, from any thread, when
+  // events begin to wait.
+  EventStream(int descriptor, std::function<void()> backlogBegins);
+  ~EventStream();
+  EventStream(const EventStream&) = delete;
+  EventStream& operator=(const EventStream&) = delete;
+
+  int descriptor() const { return _descriptor; }
+
+  void send(std::string_view eventName, const tesk::Message& event);
+
+  // What poll shall wait for: room when events wait, and always the client's end.
+  short pollEvents() const;
+  // Writes what waits, as far as there is room.
+  void flush();
+
+  bool isBroken() const;
+  std::uint64_t dropped() const;
+
+ private:
+  enum class Written { yes, full, broken };
+  Written write(ByteView packet) const;
+  void keep(Bytes packet);
+
+  const int _descriptor;
+  const std::function<void()> _backlogBegins;
+  mutable std::mutex _mutex;
+  std::deque<Bytes> _backlog;
+  std::size_t _backlogBytes = 0;
+  std::uint64_t _dropped = 0;
+  bool _broken = false;
+};
+
+}  // namespace qel::service

@@ -1,0 +1,29 @@
+#include "tesk/bus/BusConnector.h"
+
+#include "tesk/bus/BusTransport.h"
+
+namespace tesk::bus {
+namespace {
+
+class BusConnector final : public Connector {
+ public:
+  BusConnector(BusAddress address, ReachabilityObserver observer)
+      : _address(std::move(address)), _observer(std::move(observer)) {}
+
+  std::unique_ptr<Transport> connect(std::string_view clientName, EventSink sink) override {
+    return std::make_unique<BusTransport>(_address, std::string(clientName), std::move(sink),
+                                          _observer);
+  }
+
+ private:
+  const BusAddress _address;
+  const ReachabilityObserver _observer;
+};
+
+}  // namespace
+
+std::shared_ptr<Connector> makeBusConnector(BusAddress address, ReachabilityObserver observer) {
+  return std::make_shared<BusConnector>(std::move(address), std::move(observer));
+}
+
+}  // namespace tesk::bus

@@ -1,0 +1,31 @@
+// A client's connection over the bus that mends itself.
+#pragma once
+
+#include <memory>
+#include <thread>
+
+#include "tesk/Transport.h"
+#include "tesk/bus/BusConnector.h"
+
+namespace tesk::bus {
+
+// A thread of its own does all that touches the bus; calls hand it work and wait for it.
+class BusTransport final : public Transport {
+ public:
+  BusTransport(BusAddress address, std::string clientName, EventSink sink,
+               ReachabilityObserver observer);
+  ~BusTransport() override;
+
+  CommandResult performCommand(std::string_view command, const Message& request,
+                               Message& reply) override;
+  void eventsOn() override;
+  void eventsOff() override;
+
+ private:
+  class Worker;
+
+  const std::shared_ptr<Worker> _worker;  // the thread's too
+  std::thread _thread;
+};
+
+}  // namespace tesk::bus
