@@ -56,8 +56,7 @@ constexpr std::array<MetricMessage, 30> kMetricMessages = {
 std::span<const MetricMessage> metricMessages() { return kMetricMessages; }
 
 const MetricMessage* findMetricMessage(std::uint32_t identifier) {
-  const auto found =
-      std::ranges::find(kMetricMessages, identifier, &MetricMessage::identifier);
+  const auto found = std::ranges::find(kMetricMessages, identifier, &MetricMessage::identifier);
   return found == kMetricMessages.end() ? nullptr : &*found;
 }
 

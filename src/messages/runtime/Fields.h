@@ -81,11 +81,10 @@ struct PackedField {
 
 // The smallest word with a presence bit for each of `count` scalar fields.
 template <unsigned count>
-using PresenceWord =
-    std::conditional_t<count <= 8, std::uint8_t,
-                       std::conditional_t<count <= 16, std::uint16_t,
-                                          std::conditional_t<count <= 32, std::uint32_t,
-                                                             std::uint64_t>>>;
+using PresenceWord = std::conditional_t<
+    count <= 8, std::uint8_t,
+    std::conditional_t<count <= 16, std::uint16_t,
+                       std::conditional_t<count <= 32, std::uint32_t, std::uint64_t>>>;
 
 // The name of an enumeration's value, or empty.
 constexpr std::string_view nameOf(std::span<const EnumName> names, std::int32_t value) {

@@ -90,8 +90,7 @@ bool readField(Message& message, PBDataReader& reader,
   PBReaderMark mark;
   if (!PBReaderPlaceMark(reader, mark)) return false;
   while (reader._pos < reader._length && !reader._error) {
-    (message.*field.member)
-        .values.push_back(decodedScalar<encoding>(PBReaderReadVarint(reader)));
+    (message.*field.member).values.push_back(decodedScalar<encoding>(PBReaderReadVarint(reader)));
   }
   PBReaderRecallMark(reader, mark);
   return true;
@@ -105,8 +104,8 @@ bool readFieldNumbered(Message& message, PBDataReader& reader, std::uint32_t num
   bool whole = true;
   std::apply(
       [&](const auto&... field) {
-        known = ((number == field.number && (whole = readField(message, reader, field), true)) ||
-                 ...);
+        known =
+            ((number == field.number && (whole = readField(message, reader, field), true)) || ...);
       },
       Message::kFields);
   return known ? whole : PBReaderSkipValueWithTag(reader, number, wireType);

@@ -19,11 +19,17 @@ std::size_t hashMessage(const Message& message);
 
 // Fields with a presence bit, and fields whose presence is a reference that is not null.
 template <class Field>
-concept HasPresenceBit = requires(Field field) { field.presenceBit; };
+concept HasPresenceBit = requires(Field field) {
+  field.presenceBit;
+};
 template <class Held>
-concept IsNullable = requires(const Held& held) { static_cast<bool>(held); *held; };
+concept IsNullable = requires(const Held& held) {
+  static_cast<bool>(held);
+  *held;
+};
 template <class Field, class Message>
-using HeldBy = std::remove_cvref_t<decltype(std::declval<Message&>().*std::declval<Field>().member)>;
+using HeldBy =
+    std::remove_cvref_t<decltype(std::declval<Message&>().*std::declval<Field>().member)>;
 
 // copyTo: the present fields of `source` replace those of `destination`.
 template <class Message, class Field>
