@@ -1,0 +1,120 @@
+#include <gtest/gtest.h>
+
+#include <QtTest/QTest>
+
+#include "ui/Window.h"
+
+namespace qel {
+namespace {
+
+using testing::Window;
+
+constexpr auto kLongName = "mo_signalling_ac_barring_for_special_ac";
+constexpr auto kLongValue = "KLTE_RRC_CAUSE_REEST_OTHER_FAIL_T310_EXP_AND_A_GOOD_DEAL_MORE";
+
+// Width and height of a phone's window in both orientations, and of a large one.
+class Layout : public ::testing::TestWithParam<QSize> {
+ protected:
+  Layout() {
+    window.window().resize(GetParam());
+    window.store().myLTERRCStateDict = {
+        {"short", 1}, {kLongName, "2017-07-14 02:40:00 UTC"}, {"cause", kLongValue}};
+    window.settle();
+  }
+
+  QRectF area(const std::string& text) const {
+    const QQuickItem* item = window.find(text);
+    return item ? item->mapRectToScene(item->boundingRect()) : QRectF();
+  }
+
+  Window window;
+};
+
+TEST_P(Layout, everyMenuRowIsATargetForAThumb) {
+  for (int row = 0; row < 4; ++row) {
+    EXPECT_GE(window.row(row)->height(), 48);
+    EXPECT_EQ(window.row(row)->width(), GetParam().width());
+  }
+}
+
+TEST_P(Layout, aShortFieldStandsOnOneLine) {
+  ASSERT_TRUE(window.open("LTE", "RRC State"));
+  EXPECT_GE(window.row(0)->height(), 48);
+  EXPECT_LT(area("short").left(), area("1").left());
+  EXPECT_TRUE(area("short").top() < area("1").bottom() && area("1").top() < area("short").bottom());
+}
+
+TEST_P(Layout, noTextLeavesTheWindowOrItsRow) {
+  ASSERT_TRUE(window.open("LTE", "RRC State"));
+  for (const char* text : {"RRC State", "short", "1", kLongName, kLongValue}) {
+    const QQuickItem* item = window.find(text);
+    if (!item) continue;  // below the fold of a low window
+    EXPECT_GE(area(text).left(), 0) << text;
+    EXPECT_LE(area(text).right(), GetParam().width()) << text;
+    EXPECT_FALSE(item->property("truncated").toBool()) << text;
+    EXPECT_LE(item->property("contentWidth").toReal(), item->width() + 0.5) << text;
+  }
+}
+
+TEST_P(Layout, nameAndValueNeverOverlap) {
+  ASSERT_TRUE(window.open("LTE", "RRC State"));
+  const QQuickItem* name = window.find(kLongName);
+  const QQuickItem* value = window.find("2017-07-14 02:40:00 UTC");
+  ASSERT_TRUE(name && value);
+  const bool above = area(kLongName).bottom() <= area("2017-07-14 02:40:00 UTC").top();
+  const qreal widths =
+      name->property("contentWidth").toReal() + value->property("contentWidth").toReal();
+  EXPECT_TRUE(above || widths + 16 <= GetParam().width() - 32);
+}
+
+INSTANTIATE_TEST_SUITE_P(Sizes, Layout,
+                         ::testing::Values(QSize(320, 568), QSize(360, 720), QSize(412, 915),
+                                           QSize(720, 1280), QSize(720, 360)),
+                         [](const auto& instance) {
+                           return std::to_string(instance.param.width()) + "x" +
+                                  std::to_string(instance.param.height());
+                         });
+
+TEST(LongValues, breakAfterUnderscores) {
+  const Window window;
+  window.store().myLTERRCStateDict = {{"cause", kLongValue}};
+  ASSERT_TRUE(window.open("LTE", "RRC State"));
+  const QQuickItem* value = window.find(kLongValue);
+  ASSERT_TRUE(value);
+  EXPECT_GT(value->property("lineCount").toInt(), 1);
+  EXPECT_TRUE(value->property("text").toString().contains(QStringLiteral("KLTE_\u200B")));
+}
+
+TEST(Motion, pushesAndPopsThroughTheSpaceBetween) {
+  const Window window(true);
+  window.tap("LTE");
+  const QQuickItem* stack = window.window().activeFocusItem();
+  while (stack && !stack->inherits("QQuickFocusScope")) stack = stack->parentItem();
+  EXPECT_TRUE(QTest::qWaitFor([&window] { return window.find("qelwatch") != nullptr; }));
+  window.navigation().back();
+  EXPECT_TRUE(QTest::qWaitFor([&window] { return window.navigation().rowCount() == 1; }))
+      << "the screen that was left goes when it is out of sight";
+}
+
+TEST(Motion, aDragFromTheLeftEdgeGoesBack) {
+  const Window window;
+  ASSERT_TRUE(window.tap("LTE"));
+  QTest::mousePress(&window.window(), Qt::LeftButton, Qt::NoModifier, QPoint(4, 300));
+  for (int x = 10; x <= 320; x += 10) QTest::mouseMove(&window.window(), QPoint(x, 300), 1);
+  EXPECT_EQ(window.navigation().depth(), 2) << "the finger is still down";
+  QTest::mouseRelease(&window.window(), Qt::LeftButton, Qt::NoModifier, QPoint(320, 300));
+  EXPECT_EQ(window.navigation().depth(), 1);
+}
+
+TEST(Motion, aDragThatTurnsBackStays) {
+  const Window window;
+  ASSERT_TRUE(window.tap("LTE"));
+  QTest::mousePress(&window.window(), Qt::LeftButton, Qt::NoModifier, QPoint(4, 300));
+  for (int x = 10; x <= 200; x += 10) QTest::mouseMove(&window.window(), QPoint(x, 300), 1);
+  for (int x = 200; x >= 10; x -= 10) QTest::mouseMove(&window.window(), QPoint(x, 300), 1);
+  QTest::mouseRelease(&window.window(), Qt::LeftButton, Qt::NoModifier, QPoint(10, 300));
+  EXPECT_EQ(window.navigation().depth(), 2);
+}
+
+}  // namespace
+}  // namespace qel

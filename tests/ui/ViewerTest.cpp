@@ -1,0 +1,80 @@
+// The program as its users start it.
+
+#include <gtest/gtest.h>
+
+#include <csignal>
+#include <cstdlib>
+#include <filesystem>
+
+#include "support/Subprocess.h"
+
+namespace qel {
+namespace {
+
+using testing::Outcome;
+
+class Viewer : public ::testing::Test {
+ protected:
+  Viewer() {
+    std::filesystem::create_directories(home);
+    for (const char* name : {"DISPLAY", "WAYLAND_DISPLAY"}) ::unsetenv(name);
+    ::setenv("QT_QPA_PLATFORM", "offscreen", 1);
+    ::setenv("XDG_CONFIG_HOME", home.c_str(), 1);
+    ::setenv("XDG_RUNTIME_DIR", home.c_str(), 1);
+    ::setenv("DBUS_SESSION_BUS_ADDRESS", "unix:path=/nonexistent", 1);
+  }
+  ~Viewer() override { std::filesystem::remove_all(home); }
+
+  static Outcome start(const std::vector<std::string>& arguments) {
+    return testing::run(QELWATCH_PROGRAM, arguments);
+  }
+
+  std::filesystem::path home = std::filesystem::path(::testing::TempDir()) / "qelwatch_viewer_test";
+};
+
+TEST_F(Viewer, tellsItsVersionAndItsOptions) {
+  const Outcome version = start({"--version"});
+  EXPECT_EQ(version.exitCode, 0);
+  EXPECT_EQ(version.out.rfind("qelwatch ", 0), 0U) << version.out;
+  const Outcome help = start({"--help"});
+  EXPECT_EQ(help.exitCode, 0);
+  for (const char* option : {"--source", "--theme", "--picture", "--self-test", "--version"}) {
+    EXPECT_NE(help.out.find(option), std::string::npos) << option;
+  }
+}
+
+TEST_F(Viewer, saysInOneLineWhatIsWrongWithItsCall) {
+  const std::vector<std::vector<std::string>> wrongCalls = {
+      {"--nonsense"},        {"extra"},
+      {"--theme", "pink"},   {"--source"},
+      {"--source", "radio"}, {"--source", "simulated,seed=x"}};
+  for (const auto& wrong : wrongCalls) {
+    const Outcome outcome = start(wrong);
+    EXPECT_EQ(outcome.exitCode, 64) << wrong.back();
+    EXPECT_EQ(outcome.err.rfind("qelwatch: ", 0), 0U) << outcome.err;
+    EXPECT_EQ(std::count(outcome.err.begin(), outcome.err.end(), '\n'), 1) << outcome.err;
+  }
+}
+
+TEST_F(Viewer, saysThatARecordingIsNotThere) {
+  const Outcome outcome = start({"--source", "recording:/no/such/file.jsonl"});
+  EXPECT_EQ(outcome.exitCode, 66);
+  EXPECT_NE(outcome.err.find("/no/such/file.jsonl"), std::string::npos);
+}
+
+TEST_F(Viewer, drawsEveryScreenInItsSelfTest) {
+  const Outcome outcome = start({"--self-test"});
+  EXPECT_EQ(outcome.exitCode, 0) << outcome.err;
+  EXPECT_NE(outcome.err.find("47 screens, 0 failures"), std::string::npos) << outcome.err;
+  EXPECT_EQ(outcome.out.rfind("pushing metric file\n", 0), 0U) << outcome.out;
+}
+
+TEST_F(Viewer, withoutDisplayDrawsOffScreenAndSaysSo) {
+  ::unsetenv("QT_QPA_PLATFORM");
+  const Outcome outcome = start({"--self-test", "--picture", (home / "picture.png").string()});
+  EXPECT_EQ(outcome.exitCode, 0) << outcome.err;
+  EXPECT_NE(outcome.err.find("no display, drawing off screen"), std::string::npos) << outcome.err;
+}
+
+}  // namespace
+}  // namespace qel
