@@ -1,10 +1,17 @@
 // The program as its users start it.
 
 #include <gtest/gtest.h>
+#include <spawn.h>
+#include <sys/wait.h>
+#include <unistd.h>
 
+#include <algorithm>
+#include <chrono>
 #include <csignal>
 #include <cstdlib>
 #include <filesystem>
+#include <fstream>
+#include <thread>
 
 #include "support/Subprocess.h"
 
@@ -27,6 +34,16 @@ class Viewer : public ::testing::Test {
 
   static Outcome start(const std::vector<std::string>& arguments) {
     return testing::run(QELWATCH_PROGRAM, arguments);
+  }
+
+  // Waits for a file to be there; a minute is for a machine in trouble.
+  static bool appears(const std::string& file) {
+    const auto deadline = std::chrono::steady_clock::now() + std::chrono::minutes(1);
+    while (!std::filesystem::exists(file)) {
+      if (std::chrono::steady_clock::now() > deadline) return false;
+      std::this_thread::sleep_for(std::chrono::milliseconds(5));
+    }
+    return true;
   }
 
   std::filesystem::path home = std::filesystem::path(::testing::TempDir()) / "qelwatch_viewer_test";
@@ -67,6 +84,28 @@ TEST_F(Viewer, drawsEveryScreenInItsSelfTest) {
   EXPECT_EQ(outcome.exitCode, 0) << outcome.err;
   EXPECT_NE(outcome.err.find("47 screens, 0 failures"), std::string::npos) << outcome.err;
   EXPECT_EQ(outcome.out.rfind("pushing metric file\n", 0), 0U) << outcome.out;
+}
+
+TEST_F(Viewer, keepsAPictureAndEndsOnATermination) {
+  const std::string picture = home / "picture.png";
+  std::vector<std::string> words = {QELWATCH_PROGRAM, "--picture", picture};
+  std::vector<char*> argv;
+  for (std::string& word : words) argv.push_back(word.data());
+  argv.push_back(nullptr);
+  for (const int signal : {SIGTERM, SIGINT}) {
+    std::filesystem::remove(picture);
+    pid_t viewer = 0;
+    ASSERT_EQ(::posix_spawn(&viewer, QELWATCH_PROGRAM, nullptr, nullptr, argv.data(), environ), 0);
+    EXPECT_TRUE(appears(picture));
+    ::kill(viewer, signal);
+    int status = 0;
+    ASSERT_EQ(::waitpid(viewer, &status, 0), viewer);
+    EXPECT_TRUE(WIFEXITED(status));
+    EXPECT_EQ(WEXITSTATUS(status), 0);
+    std::string start(4, ' ');
+    std::ifstream(picture, std::ios::binary).read(start.data(), 4);
+    EXPECT_EQ(start, "\x89PNG");
+  }
 }
 
 TEST_F(Viewer, withoutDisplayDrawsOffScreenAndSaysSo) {

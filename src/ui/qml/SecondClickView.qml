@@ -19,6 +19,8 @@ Rectangle {
     height: Math.max(Theme.touch, texts.height + 2 * Theme.padding)
     color: notice ? Theme.noticeGround : Theme.row
 
+    // A row that comes into sight is not one that changed.
+    Component.onCompleted: fade.complete()
     ListView.onReused: fade.complete()
     onChangesChanged: {
         if (changes > 0 && Theme.changeMs > 0)
