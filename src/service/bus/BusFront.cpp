@@ -18,13 +18,12 @@ constexpr std::size_t kMostClients = 64;
 
 }  // namespace
 
-BusFront::BusFront(std::unique_ptr<sdbus::IConnection> connection,
-                   std::shared_ptr<ServiceCore> core)
-    : AdaptorInterfaces(*connection, tesk::bus::kObjectPath),
-      _connection(std::move(connection)),
+BusFront::BusFront(sdbus::IConnection& connection, std::shared_ptr<ServiceCore> core)
+    : AdaptorInterfaces(connection, tesk::bus::kObjectPath),
+      _connection(connection),
       _core(std::move(core)) {
   registerAdaptor();
-  _connection->requestName(tesk::bus::kServiceName);
+  _connection.requestName(tesk::bus::kServiceName);
 }
 
 BusFront::~BusFront() {
@@ -49,7 +48,7 @@ sdbus::UnixFd BusFront::Register(const std::string& clientName) {
   if (_clients.size() >= kMostClients) throw tooManyClients();
   auto client =
       std::make_unique<BusClient>(_core, clientName, [wakeUp = _wakeUp] { wakeUp->signal(); });
-  client->vanishWatch = _connection->addMatch(
+  client->vanishWatch = _connection.addMatch(
       "type='signal',sender='org.freedesktop.DBus',interface='org.freedesktop.DBus',"
       "member='NameOwnerChanged',arg0='" +
           busName + "'",
@@ -97,7 +96,7 @@ int BusFront::pollTimeout(const sdbus::IConnection::PollData& bus) const {
 }
 
 void BusFront::waitAndProcess(int stopDescriptor) {
-  const auto bus = _connection->getEventLoopPollData();
+  const auto bus = _connection.getEventLoopPollData();
   std::vector<pollfd> waited = {
       {bus.fd, bus.events, 0}, {stopDescriptor, POLLIN, 0}, {_wakeUp->descriptor(), POLLIN, 0}};
   const std::size_t fixed = waited.size();
@@ -109,7 +108,7 @@ void BusFront::waitAndProcess(int stopDescriptor) {
   std::vector<short> happened;
   for (std::size_t i = fixed; i < waited.size(); ++i) happened.push_back(waited[i].revents);
   serveStreams(happened);
-  while (_connection->processPendingRequest()) {
+  while (_connection.processPendingRequest()) {
   }
   for (const std::string& busName : std::exchange(_vanished, {})) forget(busName);
   if (SteadyClock::now() - _signalledAt >= kCountersEvery) signalCounters();

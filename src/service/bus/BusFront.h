@@ -21,8 +21,9 @@ namespace qel::service {
 // when that is lost, and with the front go all its clients.
 class BusFront final : public sdbus::AdaptorInterfaces<tesk::BasebandManager1_adaptor> {
  public:
-  // Takes the service's name. Throws sdbus::Error when somebody else has it or may have it.
-  BusFront(std::unique_ptr<sdbus::IConnection> connection, std::shared_ptr<ServiceCore> core);
+  // Takes the service's name on the connection, which outlives the front. Throws sdbus::Error when
+  // somebody else has it or may have it.
+  BusFront(sdbus::IConnection& connection, std::shared_ptr<ServiceCore> core);
   ~BusFront();
 
   // Waits for the bus, the clients or `stopDescriptor`, and does what is due.
@@ -62,7 +63,7 @@ class BusFront final : public sdbus::AdaptorInterfaces<tesk::BasebandManager1_ad
   int pollTimeout(const sdbus::IConnection::PollData& bus) const;
   void serveStreams(const std::vector<short>& happened);
 
-  const std::unique_ptr<sdbus::IConnection> _connection;
+  sdbus::IConnection& _connection;
   const std::shared_ptr<ServiceCore> _core;
   const std::shared_ptr<tesk::bus::WakeUp> _wakeUp = std::make_shared<tesk::bus::WakeUp>();
   std::map<std::string, std::unique_ptr<BusClient>> _clients;  // by the caller's bus name

@@ -57,7 +57,8 @@ int run(const std::shared_ptr<ServiceCore>& core, const tesk::bus::BusAddress& a
   auto pause = 0ms;
   do {
     try {
-      BusFront front(tesk::bus::connectTo(address), core);
+      const auto connection = tesk::bus::connectTo(address);
+      BusFront front(*connection, core);
       qel::systemLog().write("basebandd: on the bus as tesk.BasebandManager1");
       pause = kFirstPause;
       serve(front, stop);
