@@ -8,6 +8,7 @@
 #include <QtDBus/QDBusMetaType>
 #include <QtDBus/QDBusPendingCallWatcher>
 #include <QtDBus/QDBusPendingReply>
+#include <QtDBus/QDBusVariant>
 #include <algorithm>
 #include <array>
 
@@ -46,7 +47,7 @@ void DesktopSettings::follow() {
   if (!bus.isConnected()) return;
   qDBusRegisterMetaType<Groups>();
   bus.connect(kService, kPath, kInterface, QLatin1StringView("SettingChanged"), this,
-              SLOT(portalChanged(QString, QString, QDBusVariant)));
+              SLOT(portalChanged(QDBusMessage)));
   QDBusMessage question =
       QDBusMessage::createMethodCall(kService, kPath, kInterface, QLatin1StringView("ReadAll"));
   QStringList groups;
@@ -69,9 +70,11 @@ void DesktopSettings::portalAnswered(QDBusPendingCallWatcher* answer) {
   }
 }
 
-void DesktopSettings::portalChanged(const QString& group, const QString& name,
-                                    const QDBusVariant& value) {
-  take(group, name, value.variant());
+void DesktopSettings::portalChanged(const QDBusMessage& signal) {
+  const QList<QVariant> arguments = signal.arguments();
+  if (signal.signature() != QLatin1StringView("ssv")) return;
+  take(arguments[0].toString(), arguments[1].toString(),
+       arguments[2].value<QDBusVariant>().variant());
 }
 
 void DesktopSettings::take(const QString& group, const QString& name, const QVariant& value) {

@@ -3,7 +3,7 @@
 
 #include <QtCore/QLatin1StringView>
 #include <QtCore/QObject>
-#include <QtDBus/QDBusVariant>
+#include <QtDBus/QDBusMessage>
 
 class QDBusPendingCallWatcher;
 
@@ -27,7 +27,7 @@ class DesktopSettings final : public QObject {
   void settingChanged(const QString& name, const QVariant& value);
 
  private slots:
-  void portalChanged(const QString& group, const QString& name, const QDBusVariant& value);
+  void portalChanged(const QDBusMessage& signal);
   void portalAnswered(QDBusPendingCallWatcher* answer);
 
  private:
