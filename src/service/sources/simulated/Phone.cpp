@@ -11,6 +11,7 @@ constexpr double kLeastSinrDb = -8;
 
 // What a new serving cell makes the phone report, by technology.
 constexpr std::array kLteCellMetrics = {metric::kLteScellInfo, metric::kLteSelRes,
+                                        metric::kLteCarrierAggregation,
                                         metric::kLteComponentCarriers};
 constexpr std::array kUmtsCellMetrics = {metric::kUmtsCellInfo, metric::kUmtsSelRes,
                                          metric::kUmtsRrcConfig};

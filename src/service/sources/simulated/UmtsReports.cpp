@@ -8,8 +8,8 @@ namespace qel::service {
 namespace {
 
 constexpr std::size_t kMostNeighbours = 6;
-constexpr int kLeastQualityDb = -18;  // Qqualmin (25.304, clause 5.2.3.1.2)
-constexpr int kUmtsSearchIntraDb = 16;    // 25.304, clause 5.2.6.1.1
+constexpr int kLeastQualityDb = -18;    // Qqualmin (25.304, clause 5.2.3.1.2)
+constexpr int kUmtsSearchIntraDb = 16;  // 25.304, clause 5.2.6.1.1
 constexpr int kUmtsSearchInterDb = 14;
 constexpr int kUmtsSearchTechnologyDb = 8;
 constexpr std::uint32_t kPagingCycleMs = 640;
