@@ -140,6 +140,21 @@ TEST(WindowTest, arrowsMoveTheFocusAndEnterOpens) {
   EXPECT_EQ(window.list()->property("currentIndex").toInt(), 2) << "as it was left";
 }
 
+TEST(WindowTest, tabReachesEverythingAndEnterWorksThere) {
+  const Window window;
+  window.press(Qt::Key_Tab);
+  window.press(Qt::Key_Tab);
+  window.press(Qt::Key_Tab);
+  window.press(Qt::Key_Return);
+  EXPECT_TRUE(window.appearance().isDark()) << "system, light, dark";
+  window.press(Qt::Key_Tab);
+  window.press(Qt::Key_Return);
+  EXPECT_EQ(window.navigation().depth(), 2) << "from the last choice round to the list";
+  window.press(Qt::Key_Tab);
+  window.press(Qt::Key_Return);
+  EXPECT_EQ(window.navigation().depth(), 1) << "the way back";
+}
+
 TEST(WindowTest, aFieldLeadsNowhere) {
   const Window window;
   window.store().myLTERRCStateDict = {{"a", 1}};

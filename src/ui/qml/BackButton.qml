@@ -14,6 +14,9 @@ T.AbstractButton {
     width: Math.max(Theme.touch, showsName ? fullWidth : shortWidth)
     focusPolicy: Qt.TabFocus
 
+    Keys.onReturnPressed: clicked()
+    Keys.onEnterPressed: clicked()
+
     Accessible.role: Accessible.Button
     Accessible.name: qsTr("Back to %1").arg(text)
 

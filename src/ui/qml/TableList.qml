@@ -28,6 +28,7 @@ FocusScope {
 
         anchors.fill: parent
         focus: true
+        activeFocusOnTab: true
         model: table.model
         delegate: table.storyboard.lookOf(table.model.cellIdentifier)
         clip: true

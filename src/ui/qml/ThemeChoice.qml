@@ -12,6 +12,9 @@ T.AbstractButton {
     implicitHeight: Math.max(Theme.touch, label.implicitHeight + 2 * Theme.padding)
     focusPolicy: Qt.TabFocus
 
+    Keys.onReturnPressed: clicked()
+    Keys.onEnterPressed: clicked()
+
     Accessible.role: Accessible.RadioButton
     Accessible.name: text
     Accessible.checked: checked
