@@ -13,14 +13,20 @@ const QString kRecording = QStringLiteral("recording:");
 
 }  // namespace
 
-int connectToSource(const std::string& source) {
+Source::~Source() {
+  tesk::setConnector(nullptr);
+  if (_connector) _connector->close();
+}
+
+int Source::open(const std::string& source) {
   service::SourceError error;
   auto connector = service::makeInProcessConnector(source, error);
   if (!connector) {
     std::cerr << "qelwatch: " << error.message << '\n';
     return error.exitCode;
   }
-  tesk::setConnector(std::move(connector));
+  _connector = std::make_shared<ClosingConnector>(std::move(connector));
+  tesk::setConnector(_connector);
   return 0;
 }
 

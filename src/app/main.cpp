@@ -81,7 +81,8 @@ int main(int argc, char** argv) {
   int exitCode = EXIT_SUCCESS;
   const auto options = qel::parseOptions(argc, argv, exitCode);
   if (!options) return exitCode;
-  exitCode = qel::connectToSource(options->source);
+  qel::Source source;
+  exitCode = source.open(options->source);
   if (exitCode != EXIT_SUCCESS) return exitCode;
   chooseDisplay(*options);
   nameApplication();

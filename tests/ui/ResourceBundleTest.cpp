@@ -1,6 +1,7 @@
 #include "ui/kit/ResourceBundle.h"
 
 #include <gtest/gtest.h>
+#include <unistd.h>
 
 #include <filesystem>
 #include <fstream>
@@ -18,7 +19,8 @@ class DirectoryBundleTest : public ::testing::Test {
   }
   ~DirectoryBundleTest() override { fs::remove_all(folder); }
 
-  fs::path folder = fs::path(::testing::TempDir()) / "qelwatch_bundle_test";
+  fs::path folder =
+      fs::path(::testing::TempDir()) / ("qelwatch_bundle_test" + std::to_string(::getpid()));
   DirectoryBundle bundle{folder.string()};
 };
 

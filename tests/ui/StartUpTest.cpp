@@ -1,4 +1,5 @@
 #include <gtest/gtest.h>
+#include <unistd.h>
 
 #include <filesystem>
 #include <fstream>
@@ -50,8 +51,8 @@ class StartUp : public ::testing::Test {
     };
   }
 
-  std::filesystem::path folder =
-      std::filesystem::path(::testing::TempDir()) / "qelwatch_start_up_test";
+  std::filesystem::path folder = std::filesystem::path(::testing::TempDir()) /
+                                 ("qelwatch_start_up_test" + std::to_string(::getpid()));
   testing::CapturedSystemLog log;
   std::shared_ptr<testing::FakeService> service = testing::installFakeService();
 };

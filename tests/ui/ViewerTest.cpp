@@ -24,6 +24,7 @@ class Viewer : public ::testing::Test {
  protected:
   Viewer() {
     std::filesystem::create_directories(home);
+    std::filesystem::permissions(home, std::filesystem::perms::owner_all);
     for (const char* name : {"DISPLAY", "WAYLAND_DISPLAY"}) ::unsetenv(name);
     ::setenv("QT_QPA_PLATFORM", "offscreen", 1);
     ::setenv("XDG_CONFIG_HOME", home.c_str(), 1);
@@ -46,7 +47,8 @@ class Viewer : public ::testing::Test {
     return true;
   }
 
-  std::filesystem::path home = std::filesystem::path(::testing::TempDir()) / "qelwatch_viewer_test";
+  std::filesystem::path home = std::filesystem::path(::testing::TempDir()) /
+                               ("qelwatch_viewer_test" + std::to_string(::getpid()));
 };
 
 TEST_F(Viewer, tellsItsVersionAndItsOptions) {
