@@ -1,6 +1,9 @@
 #include "app/Display.h"
 
+#include <unistd.h>
+
 #include <QtCore/QByteArray>
+#include <QtCore/QDir>
 #include <algorithm>
 #include <array>
 
@@ -8,6 +11,7 @@ namespace qel {
 namespace {
 
 constexpr auto kPlatformVariable = "QT_QPA_PLATFORM";
+constexpr auto kSessionVariable = "XDG_RUNTIME_DIR";
 constexpr std::array kDisplayVariables = {"WAYLAND_DISPLAY", "DISPLAY", kPlatformVariable};
 
 }  // namespace
@@ -18,5 +22,11 @@ bool hasDisplay() {
 }
 
 void useMemoryAsDisplay() { qputenv(kPlatformVariable, QByteArrayLiteral("offscreen")); }
+
+void provideSessionFolder() {
+  if (!qEnvironmentVariableIsEmpty(kSessionVariable)) return;
+  const QString user = QString::number(::getuid());
+  qputenv(kSessionVariable, (QDir::tempPath() + "/runtime-" + user).toLocal8Bit());
+}
 
 }  // namespace qel

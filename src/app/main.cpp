@@ -85,6 +85,7 @@ int main(int argc, char** argv) {
   exitCode = source.open(options->source);
   if (exitCode != EXIT_SUCCESS) return exitCode;
   chooseDisplay(*options);
+  qel::provideSessionFolder();
   nameApplication();
   int programNameOnly = 1;
   const QGuiApplication application(programNameOnly, argv);

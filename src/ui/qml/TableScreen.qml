@@ -20,6 +20,15 @@ FocusScope {
         anchors.fill: parent
         color: Theme.page
     }
+    // The edge of a screen that slides over another.
+    Hairline {
+        anchors {
+            right: parent.left
+            top: parent.top
+            bottom: parent.bottom
+        }
+        width: Theme.hairline
+    }
 
     TableList {
         id: list
