@@ -257,10 +257,12 @@ TEST(InProcessConnector, ClientsComeAndGoFromManyThreads) {
 TEST(InProcessConnector, ServesTheClientLibrary) {
   tesk::setConnector(connectorTo("simulated,speed=1000000,start=1000"));
   EventLog log;
+  const auto queue = std::make_shared<SerialQueue>("connector test");
+  std::weak_ptr<tesk::client::Manager> open;
   {
-    const auto manager =
-        tesk::client::CreateManager("qelwatch", std::make_shared<SerialQueue>("connector test"));
+    const auto manager = tesk::client::CreateManager("qelwatch", queue);
     ASSERT_TRUE(manager);
+    open = manager;
     tesk::client::RegisterEventHandler(
         manager, tesk::kEventMetric,
         [sink = log.sink()](const tesk::Message& event, tesk::client::DispatchGroup&) {
@@ -274,6 +276,12 @@ TEST(InProcessConnector, ServesTheClientLibrary) {
     tesk::client::EventsOff(manager);
     tesk::client::EventsOn(manager);
     EXPECT_TRUE(log.waitFor(50));
+  }
+  // An event on the queue holds the manager for as long as it is handled.
+  while (!open.expired()) {
+    std::promise<void> handled;
+    queue->async([&] { handled.set_value(); });
+    handled.get_future().wait();
   }
   tesk::setConnector(nullptr);
 }

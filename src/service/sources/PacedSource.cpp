@@ -79,8 +79,11 @@ SourceAnswer PacedSource::query(std::uint32_t metric) {
 
 void PacedSource::play(const std::shared_ptr<Run>& run) {
   const std::stop_token stop = run->stop.get_token();
-  while (auto event = run->next()) {
-    if (!run->pacer.wait(event->timeMs, stop)) return;
+  // Once stopped, nothing is touched any more but the run: the source, its clock and the whole
+  // process may be on their way out.
+  while (!stop.stop_requested()) {
+    const auto event = run->next();
+    if (!event || !run->pacer.wait(event->timeMs, stop)) return;
     run->passed(*event);
     if (!hand(*run, *event)) return;
   }
