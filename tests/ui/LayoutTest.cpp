@@ -85,15 +85,29 @@ TEST(LongValues, breakAfterUnderscores) {
   EXPECT_TRUE(value->property("text").toString().contains(QStringLiteral("KLTE_\u200B")));
 }
 
-TEST(Motion, pushesAndPopsThroughTheSpaceBetween) {
+TEST(Motion, bothScreensAreInSightWhileTheySlide) {
   const Window window(true);
   window.tap("LTE");
-  const QQuickItem* stack = window.window().activeFocusItem();
-  while (stack && !stack->inherits("QQuickFocusScope")) stack = stack->parentItem();
-  EXPECT_TRUE(QTest::qWaitFor([&window] { return window.find("qelwatch") != nullptr; }));
+  EXPECT_TRUE(
+      QTest::qWaitFor([&window] { return window.shows("C-DRX") && !window.shows("UMTS"); }));
   window.navigation().back();
+  EXPECT_EQ(window.navigation().depth(), 1);
+  EXPECT_EQ(window.navigation().rowCount(), 2) << "the screen that was left is still seen";
+  EXPECT_TRUE(window.shows("C-DRX"));
   EXPECT_TRUE(QTest::qWaitFor([&window] { return window.navigation().rowCount() == 1; }))
-      << "the screen that was left goes when it is out of sight";
+      << "it goes when it is out of sight";
+  EXPECT_TRUE(window.shows("UMTS"));
+}
+
+TEST(Motion, aTapDuringTheWayBackOpensTheNextScreen) {
+  const Window window(true);
+  window.tap("LTE");
+  EXPECT_TRUE(QTest::qWaitFor([&window] { return !window.shows("UMTS"); }));
+  window.navigation().back();
+  window.top().choose(3);
+  EXPECT_EQ(window.top().title(), "GSM");
+  EXPECT_EQ(window.navigation().rowCount(), 2);
+  EXPECT_TRUE(QTest::qWaitFor([&window] { return window.shows("Idle Config"); }));
 }
 
 TEST(Motion, aDragFromTheLeftEdgeGoesBack) {

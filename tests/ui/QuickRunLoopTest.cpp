@@ -3,6 +3,7 @@
 #include <gtest/gtest.h>
 
 #include <QtTest/QTest>
+#include <algorithm>
 #include <thread>
 
 #include "base/DispatchQueue.h"

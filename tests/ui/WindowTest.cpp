@@ -1,6 +1,6 @@
 #include <gtest/gtest.h>
 
-#include <QtTest/QTest>
+#include <algorithm>
 
 #include "ui/Window.h"
 
