@@ -2,7 +2,7 @@
 
 #include <utility>
 
-#include "service/sources/SourceSpec.h"
+#include "service/sources/SourceChoice.h"
 
 namespace qel::service {
 namespace {
@@ -41,11 +41,11 @@ class InProcessConnector final : public tesk::Connector {
 
 }  // namespace
 
-std::shared_ptr<ServiceCore> makeServiceCore(const std::string& sourceSpec, SourceError& error,
+std::shared_ptr<ServiceCore> makeServiceCore(const std::string& sourceText, SourceError& error,
                                              std::unique_ptr<StateKeeper> keeper) {
-  const auto spec = parseSourceSpec(sourceSpec, error);
-  if (!spec) return nullptr;
-  auto source = makeSource(*spec, error);
+  const auto choice = parseSourceChoice(sourceText, error);
+  if (!choice) return nullptr;
+  auto source = makeSource(*choice, error);
   if (!source) return nullptr;
   return ServiceCore::create(std::move(source), systemClock(), std::move(keeper));
 }
@@ -54,9 +54,9 @@ std::shared_ptr<tesk::Connector> makeInProcessConnector(std::shared_ptr<ServiceC
   return std::make_shared<InProcessConnector>(std::move(core));
 }
 
-std::shared_ptr<tesk::Connector> makeInProcessConnector(const std::string& sourceSpec,
+std::shared_ptr<tesk::Connector> makeInProcessConnector(const std::string& sourceText,
                                                         SourceError& error) {
-  auto core = makeServiceCore(sourceSpec, error);
+  auto core = makeServiceCore(sourceText, error);
   return core ? makeInProcessConnector(std::move(core)) : nullptr;
 }
 

@@ -10,9 +10,9 @@
 
 namespace qel::service {
 
-// The core on a source, named as for parseSourceSpec. Nothing when there is no such source; `error`
-// then holds an exit code and one line why. With a keeper, configurations outlive the core.
-std::shared_ptr<ServiceCore> makeServiceCore(const std::string& sourceSpec, SourceError& error,
+// The core on a source, named as for parseSourceChoice. Nothing when there is no such source;
+// `error` then holds an exit code and one line why. With a keeper, configurations outlive the core.
+std::shared_ptr<ServiceCore> makeServiceCore(const std::string& sourceText, SourceError& error,
                                              std::unique_ptr<StateKeeper> keeper = nullptr);
 
 // Connections straight to the core. Sinks run on the source's thread, or in a query on the
@@ -20,7 +20,7 @@ std::shared_ptr<ServiceCore> makeServiceCore(const std::string& sourceSpec, Sour
 std::shared_ptr<tesk::Connector> makeInProcessConnector(std::shared_ptr<ServiceCore> core);
 
 // Both in one.
-std::shared_ptr<tesk::Connector> makeInProcessConnector(const std::string& sourceSpec,
+std::shared_ptr<tesk::Connector> makeInProcessConnector(const std::string& sourceText,
                                                         SourceError& error);
 
 }  // namespace qel::service

@@ -34,9 +34,9 @@ Bytes everything() {
                        {{kAnyTriggerFirst, 0xFFFFFFFF}});
 }
 
-std::shared_ptr<tesk::Connector> connectorTo(const std::string& spec) {
+std::shared_ptr<tesk::Connector> connectorTo(const std::string& choice) {
   SourceError error;
-  auto connector = makeInProcessConnector(spec, error);
+  auto connector = makeInProcessConnector(choice, error);
   EXPECT_TRUE(connector) << error.message;
   return connector;
 }

@@ -4,36 +4,37 @@
 #include "base/Clock.h"
 #include "service/sources/PacedSource.h"
 #include "service/sources/RecordingSequence.h"
-#include "service/sources/SourceSpec.h"
+#include "service/sources/SourceChoice.h"
 #include "service/sources/simulated/SimulatedDrive.h"
 
 namespace qel::service {
 namespace {
 
-std::unique_ptr<EventSource> make(const SimulatedSpec& spec, SourceError&, WaitClock& clock) {
-  auto makeDrive = [spec]() -> std::unique_ptr<EventSequence> {
-    return std::make_unique<SimulatedDrive>(spec.seed,
-                                            spec.startMs.value_or(systemClock().nowMs()));
+std::unique_ptr<EventSource> make(const SimulatedChoice& choice, SourceError&, WaitClock& clock) {
+  auto makeDrive = [choice]() -> std::unique_ptr<EventSequence> {
+    return std::make_unique<SimulatedDrive>(choice.seed,
+                                            choice.startMs.value_or(systemClock().nowMs()));
   };
-  return std::make_unique<PacedSource>("simulated drive, seed " + std::to_string(spec.seed),
-                                       std::move(makeDrive), spec.speed, clock);
+  return std::make_unique<PacedSource>("simulated drive, seed " + std::to_string(choice.seed),
+                                       std::move(makeDrive), choice.speed, clock);
 }
 
-std::unique_ptr<EventSource> make(const RecordingSpec& spec, SourceError& error, WaitClock& clock) {
+std::unique_ptr<EventSource> make(const RecordingChoice& choice, SourceError& error,
+                                  WaitClock& clock) {
   auto firsts = std::make_shared<EventOfMetric>();
-  if (!checkRecording(spec.path, *firsts, error)) return nullptr;
-  auto makeSequence = [spec, firsts]() -> std::unique_ptr<EventSequence> {
-    return std::make_unique<RecordingSequence>(spec.path, spec.loops, firsts);
+  if (!checkRecording(choice.path, *firsts, error)) return nullptr;
+  auto makeSequence = [choice, firsts]() -> std::unique_ptr<EventSequence> {
+    return std::make_unique<RecordingSequence>(choice.path, choice.loops, firsts);
   };
-  return std::make_unique<PacedSource>("recording " + spec.path, std::move(makeSequence),
-                                       spec.speed, clock);
+  return std::make_unique<PacedSource>("recording " + choice.path, std::move(makeSequence),
+                                       choice.speed, clock);
 }
 
 }  // namespace
 
-std::unique_ptr<EventSource> makeSource(const SourceSpec& spec, SourceError& error,
+std::unique_ptr<EventSource> makeSource(const SourceChoice& choice, SourceError& error,
                                         WaitClock& clock) {
-  return std::visit([&](const auto& kind) { return make(kind, error, clock); }, spec);
+  return std::visit([&](const auto& kind) { return make(kind, error, clock); }, choice);
 }
 
 }  // namespace qel::service

@@ -14,26 +14,26 @@
 
 namespace qel::service {
 
-struct SimulatedSpec {
+struct SimulatedChoice {
   std::uint64_t seed = 1;
   double speed = 1;                      // simulated seconds in one
   std::optional<std::uint64_t> startMs;  // absent: the time of the start
 };
 
-struct RecordingSpec {
+struct RecordingChoice {
   std::string path;
   double speed = 1;
   bool loops = false;
 };
 
-using SourceSpec = std::variant<SimulatedSpec, RecordingSpec>;
+using SourceChoice = std::variant<SimulatedChoice, RecordingChoice>;
 
 // "simulated[,seed=N][,speed=N][,start=MS]" or "recording:FILE[,speed=N][,loop]". A file name may
 // contain commas. Nothing when the text is neither; `error` then says what is wrong.
-std::optional<SourceSpec> parseSourceSpec(std::string_view text, SourceError& error);
+std::optional<SourceChoice> parseSourceChoice(std::string_view text, SourceError& error);
 
 // Nothing when there is no such source; a recording is read once to see that it is sound.
-std::unique_ptr<EventSource> makeSource(const SourceSpec& spec, SourceError& error,
+std::unique_ptr<EventSource> makeSource(const SourceChoice& choice, SourceError& error,
                                         WaitClock& clock = steadyWaitClock());
 
 }  // namespace qel::service

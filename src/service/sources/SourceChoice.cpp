@@ -1,4 +1,4 @@
-#include "service/sources/SourceSpec.h"
+#include "service/sources/SourceChoice.h"
 
 #include <sysexits.h>
 
@@ -29,14 +29,14 @@ bool readSpeed(std::string_view text, double& speed) {
   return true;
 }
 
-bool readOption(std::string_view name, std::string_view value, SimulatedSpec& spec) {
-  if (name == "speed") return readSpeed(value, spec.speed);
+bool readOption(std::string_view name, std::string_view value, SimulatedChoice& choice) {
+  if (name == "speed") return readSpeed(value, choice.speed);
   const auto number = numberOf<std::uint64_t>(value);
   if (!number) return false;
   if (name == "seed") {
-    spec.seed = *number;
+    choice.seed = *number;
   } else if (name == "start") {
-    spec.startMs = *number;
+    choice.startMs = *number;
   } else {
     return false;
   }
@@ -48,51 +48,51 @@ std::nullopt_t refuse(SourceError& error, std::string message) {
   return std::nullopt;
 }
 
-std::optional<SourceSpec> parseSimulated(std::string_view options, SourceError& error) {
-  SimulatedSpec spec;
+std::optional<SourceChoice> parseSimulated(std::string_view options, SourceError& error) {
+  SimulatedChoice choice;
   while (!options.empty()) {
     options.remove_prefix(1);  // the comma
     const std::string_view option = options.substr(0, options.find(','));
     options.remove_prefix(option.size());
     const std::size_t equals = option.find('=');
     if (equals == std::string_view::npos ||
-        !readOption(option.substr(0, equals), option.substr(equals + 1), spec)) {
+        !readOption(option.substr(0, equals), option.substr(equals + 1), choice)) {
       return refuse(error, "simulated source: bad option \"" + std::string(option) +
                                "\" (seed=N, speed=0.01..1000000, start=MS)");
     }
   }
-  return spec;
+  return choice;
 }
 
 // Options are taken from the end for as long as they are options: what is left is the file.
-std::optional<SourceSpec> parseRecording(std::string_view text, SourceError& error) {
-  RecordingSpec spec;
+std::optional<SourceChoice> parseRecording(std::string_view text, SourceError& error) {
+  RecordingChoice choice;
   bool speedSet = false;
   for (std::size_t comma = text.rfind(','); comma != std::string_view::npos;
        comma = text.rfind(',')) {
     const std::string_view option = text.substr(comma + 1);
     if (option == "loop") {
-      spec.loops = true;
+      choice.loops = true;
     } else if (option.starts_with("speed=")) {
       double speed = 1;
       if (!readSpeed(option.substr(option.find('=') + 1), speed)) {
         return refuse(error, "recording source: bad option \"" + std::string(option) +
                                  "\" (speed=0.01..1000000)");
       }
-      if (!std::exchange(speedSet, true)) spec.speed = speed;
+      if (!std::exchange(speedSet, true)) choice.speed = speed;
     } else {
       break;
     }
     text = text.substr(0, comma);
   }
   if (text.empty()) return refuse(error, "recording source: no file named");
-  spec.path = text;
-  return spec;
+  choice.path = text;
+  return choice;
 }
 
 }  // namespace
 
-std::optional<SourceSpec> parseSourceSpec(std::string_view text, SourceError& error) {
+std::optional<SourceChoice> parseSourceChoice(std::string_view text, SourceError& error) {
   if (text == kSimulated || text.starts_with(std::string(kSimulated) + ",")) {
     return parseSimulated(text.substr(kSimulated.size()), error);
   }

@@ -1,4 +1,4 @@
-#include "service/sources/SourceSpec.h"
+#include "service/sources/SourceChoice.h"
 
 #include <gmock/gmock.h>
 
@@ -11,52 +11,52 @@ namespace {
 using namespace service;
 using ::testing::HasSubstr;
 
-template <class Spec>
-Spec specOf(std::string_view text) {
+template <class Choice>
+Choice choiceOf(std::string_view text) {
   SourceError error;
-  const auto spec = parseSourceSpec(text, error);
-  if (spec && std::holds_alternative<Spec>(*spec)) return std::get<Spec>(*spec);
+  const auto choice = parseSourceChoice(text, error);
+  if (choice && std::holds_alternative<Choice>(*choice)) return std::get<Choice>(*choice);
   ADD_FAILURE() << text << ": " << error.message;
   return {};
 }
 
-TEST(SourceSpec, ASimulatedDriveNeedsNothingMore) {
-  const auto spec = specOf<SimulatedSpec>("simulated");
-  EXPECT_EQ(spec.seed, 1U);
-  EXPECT_EQ(spec.speed, 1);
-  EXPECT_FALSE(spec.startMs);
+TEST(SourceChoice, ASimulatedDriveNeedsNothingMore) {
+  const auto choice = choiceOf<SimulatedChoice>("simulated");
+  EXPECT_EQ(choice.seed, 1U);
+  EXPECT_EQ(choice.speed, 1);
+  EXPECT_FALSE(choice.startMs);
 }
 
-TEST(SourceSpec, ASimulatedDriveTakesItsOptionsInAnyOrder) {
-  const auto spec = specOf<SimulatedSpec>("simulated,start=1500000000000,speed=60,seed=42");
-  EXPECT_EQ(spec.seed, 42U);
-  EXPECT_EQ(spec.speed, 60);
-  EXPECT_EQ(spec.startMs, 1500000000000U);
-  EXPECT_EQ(specOf<SimulatedSpec>("simulated,speed=0.5").speed, 0.5);
+TEST(SourceChoice, ASimulatedDriveTakesItsOptionsInAnyOrder) {
+  const auto choice = choiceOf<SimulatedChoice>("simulated,start=1500000000000,speed=60,seed=42");
+  EXPECT_EQ(choice.seed, 42U);
+  EXPECT_EQ(choice.speed, 60);
+  EXPECT_EQ(choice.startMs, 1500000000000U);
+  EXPECT_EQ(choiceOf<SimulatedChoice>("simulated,speed=0.5").speed, 0.5);
 }
 
-TEST(SourceSpec, ARecordingNamesItsFile) {
-  const auto spec = specOf<RecordingSpec>("recording:/tmp/a.jsonl");
-  EXPECT_EQ(spec.path, "/tmp/a.jsonl");
-  EXPECT_EQ(spec.speed, 1);
-  EXPECT_FALSE(spec.loops);
+TEST(SourceChoice, ARecordingNamesItsFile) {
+  const auto choice = choiceOf<RecordingChoice>("recording:/tmp/a.jsonl");
+  EXPECT_EQ(choice.path, "/tmp/a.jsonl");
+  EXPECT_EQ(choice.speed, 1);
+  EXPECT_FALSE(choice.loops);
 }
 
-TEST(SourceSpec, ARecordingTakesOptionsAfterItsFile) {
+TEST(SourceChoice, ARecordingTakesOptionsAfterItsFile) {
   for (const char* text : {"recording:a,speed=10,loop", "recording:a,loop,speed=10"}) {
-    const auto spec = specOf<RecordingSpec>(text);
-    EXPECT_EQ(spec.path, "a");
-    EXPECT_EQ(spec.speed, 10);
-    EXPECT_TRUE(spec.loops);
+    const auto choice = choiceOf<RecordingChoice>(text);
+    EXPECT_EQ(choice.path, "a");
+    EXPECT_EQ(choice.speed, 10);
+    EXPECT_TRUE(choice.loops);
   }
 }
 
-TEST(SourceSpec, AFileNameMayHaveCommasAndColons) {
-  EXPECT_EQ(specOf<RecordingSpec>("recording:C:a,b=1,c.gz,loop").path, "C:a,b=1,c.gz");
-  EXPECT_EQ(specOf<RecordingSpec>("recording:a,loop,b").path, "a,loop,b");
+TEST(SourceChoice, AFileNameMayHaveCommasAndColons) {
+  EXPECT_EQ(choiceOf<RecordingChoice>("recording:C:a,b=1,c.gz,loop").path, "C:a,b=1,c.gz");
+  EXPECT_EQ(choiceOf<RecordingChoice>("recording:a,loop,b").path, "a,loop,b");
 }
 
-TEST(SourceSpec, WhatIsNoSourceIsWrongUsageAndNamed) {
+TEST(SourceChoice, WhatIsNoSourceIsWrongUsageAndNamed) {
   const std::pair<const char*, const char*> bad[] = {
       {"", "unknown source \"\""},
       {"modem", "unknown source \"modem\""},
@@ -80,16 +80,16 @@ TEST(SourceSpec, WhatIsNoSourceIsWrongUsageAndNamed) {
   };
   for (const auto& [text, reason] : bad) {
     SourceError error;
-    EXPECT_FALSE(parseSourceSpec(text, error)) << text;
+    EXPECT_FALSE(parseSourceChoice(text, error)) << text;
     EXPECT_EQ(error.exitCode, 64) << text;
     EXPECT_THAT(error.message, HasSubstr(reason));
     EXPECT_EQ(error.message.find('\n'), std::string::npos);
   }
 }
 
-SourceError errorFor(const std::string& spec) {
+SourceError errorFor(const std::string& choice) {
   SourceError error;
-  EXPECT_FALSE(makeInProcessConnector(spec, error)) << spec;
+  EXPECT_FALSE(makeInProcessConnector(choice, error)) << choice;
   return error;
 }
 
