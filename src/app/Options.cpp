@@ -25,11 +25,15 @@ std::optional<Options> parseOptions(int argc, const char* const* argv, int& exit
   std::string theme;
   CLI::App line("Shows what the phone's baseband reports about its cells.", "qelwatch");
   line.set_version_flag("--version", "qelwatch " QELWATCH_VERSION);
-  line.add_option("--source", options.source,
-                  "where values come from: simulated[,seed=N][,speed=N] or "
-                  "recording:FILE[,speed=N][,loop]")
-      ->type_name("SOURCE")
-      ->capture_default_str();
+  auto* source = line.add_option("--source", options.source,
+                                 "values from within, without the baseband manager service: "
+                                 "simulated[,seed=N][,speed=N] or recording:FILE[,speed=N][,loop]")
+                     ->type_name("SOURCE");
+  line.add_option("--bus", options.bus,
+                  "where the baseband manager service is: system, session or a bus address")
+      ->type_name("BUS")
+      ->capture_default_str()
+      ->excludes(source);
   line.add_option("--theme", theme, "system, light or dark, for this run")
       ->type_name("THEME")
       ->check(CLI::IsMember(themes()).description(""));

@@ -9,7 +9,8 @@
 namespace qel {
 
 struct Options {
-  std::string source = "simulated";
+  std::string source;  // of a service within this process; empty: the service on the bus
+  std::string bus = "system";
   std::string picture;  // file name; empty: keep none
   std::optional<Appearance::Theme> theme;
   bool selfTest = false;

@@ -18,7 +18,20 @@ Source::~Source() {
   if (_connector) _connector->close();
 }
 
-int Source::open(const std::string& source) {
+int Source::open(const Options& options) {
+  if (!options.source.empty()) return openWithin(options.source);
+  _watch = std::make_shared<ServiceWatch>();
+  _connector = std::make_shared<ClosingConnector>(
+      tesk::bus::makeBusConnector({options.bus}, _watch->observer()));
+  tesk::setConnector(_connector);
+  return 0;
+}
+
+void Source::showIn(Navigation& navigation) {
+  if (_watch) _watch->showIn(navigation);
+}
+
+int Source::openWithin(const std::string& source) {
   service::SourceError error;
   auto connector = service::makeInProcessConnector(source, error);
   if (!connector) {
@@ -31,6 +44,7 @@ int Source::open(const std::string& source) {
 }
 
 QString sourceInWords(const std::string& source) {
+  if (source.empty()) return QStringLiteral("Baseband manager service");
   const QString text = QString::fromStdString(source);
   if (!text.startsWith(kRecording)) return QStringLiteral("Simulated modem");
   const QString file = text.mid(kRecording.size()).section(u',', 0, 0);

@@ -6,10 +6,13 @@
 #include <string>
 
 #include "app/ClosingConnector.h"
+#include "app/Options.h"
+#include "app/ServiceWatch.h"
 
 namespace qel {
 
-// The service on that source within this process, until this is gone. Main thread only.
+// The connection of the viewer, until this is gone: to the service on the bus, or to one on a
+// source within this process. Main thread only.
 class Source {
  public:
   Source() = default;
@@ -17,12 +20,18 @@ class Source {
   Source(const Source&) = delete;
   Source& operator=(const Source&) = delete;
 
-  // Makes the client library connect to it. On failure nothing is changed, one line is written on
+  // Makes the client library connect there. On failure nothing is changed, one line is written on
   // standard error and the answer is the exit code; else 0.
-  int open(const std::string& source);
+  int open(const Options& options);
+
+  // Shows in the window whether the service can be reached.
+  void showIn(Navigation& navigation);
 
  private:
+  int openWithin(const std::string& source);
+
   std::shared_ptr<ClosingConnector> _connector;
+  std::shared_ptr<ServiceWatch> _watch;  // of the service on the bus
 };
 
 // The source in words for the reader.

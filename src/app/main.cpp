@@ -63,8 +63,9 @@ void setAppearance(QQmlApplicationEngine& engine, const qel::Options& options) {
   if (options.selfTest) appearance->reduceMotion();
 }
 
-int runWindow(QQuickWindow& window, const qel::Options& options) {
+int runWindow(QQuickWindow& window, const qel::Options& options, qel::Source& source) {
   auto* navigation = window.property("navigation").value<qel::Navigation*>();
+  source.showIn(*navigation);
   if (options.selfTest) {
     return qel::SelfTest(window, *navigation).run() ? EXIT_SUCCESS : EXIT_FAILURE;
   }
@@ -82,7 +83,7 @@ int main(int argc, char** argv) {
   const auto options = qel::parseOptions(argc, argv, exitCode);
   if (!options) return exitCode;
   qel::Source source;
-  exitCode = source.open(options->source);
+  exitCode = source.open(*options);
   if (exitCode != EXIT_SUCCESS) return exitCode;
   chooseDisplay(*options);
   qel::provideSessionFolder();
@@ -98,5 +99,5 @@ int main(int argc, char** argv) {
   QQuickWindow* window = loadWindow(engine, *options);
   if (!window) return EX_SOFTWARE;
   setAppearance(engine, *options);
-  return runWindow(*window, *options);
+  return runWindow(*window, *options, source);
 }

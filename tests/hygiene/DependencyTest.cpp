@@ -33,7 +33,7 @@ const std::vector<std::pair<std::string, std::vector<std::string>>> kForeign = {
     {"sdbus-c++/", {"src/tesk/", "src/service/"}},
     {"google/protobuf/", {"src/messages/generator/"}},
     {"nlohmann/", {"src/recording/", "src/tools/"}},
-    {"CLI/", {"src/tools/", "src/app/"}},
+    {"CLI/", {"src/tools/", "src/app/", "src/service/daemon/"}},
     {"zlib.h", {"src/recording/"}},
 };
 

@@ -82,7 +82,7 @@ TEST_F(Viewer, saysThatARecordingIsNotThere) {
 }
 
 TEST_F(Viewer, drawsEveryScreenInItsSelfTest) {
-  const Outcome outcome = start({"--self-test"});
+  const Outcome outcome = start({"--self-test", "--source", "simulated"});
   EXPECT_EQ(outcome.exitCode, 0) << outcome.err;
   EXPECT_NE(outcome.err.find("47 screens, 0 failures"), std::string::npos) << outcome.err;
   EXPECT_EQ(outcome.out.rfind("pushing metric file\n", 0), 0U) << outcome.out;
@@ -114,7 +114,7 @@ TEST_F(Viewer, withoutDisplayDrawsOffScreenAndSaysSo) {
   ::unsetenv("QT_QPA_PLATFORM");
   ::unsetenv("XDG_RUNTIME_DIR");
   const std::string picture = home / "picture.png";
-  const Outcome outcome = start({"--self-test", "--picture", picture});
+  const Outcome outcome = start({"--self-test", "--source", "simulated", "--picture", picture});
   EXPECT_EQ(outcome.exitCode, 0) << outcome.err;
   EXPECT_EQ(outcome.err, "qelwatch: no display, drawing off screen; the picture is kept in " +
                              picture + "\nqelwatch: self-test: 47 screens, 0 failures\n");

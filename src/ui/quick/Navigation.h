@@ -38,6 +38,9 @@ class Navigation : public QAbstractListModel, public QQmlParserStatus {
   QVariant data(const QModelIndex& index, int role) const override;
   QHash<int, QByteArray> roleNames() const override;
 
+  // The stack itself, once the interface description is read.
+  RootNavigationController& controller() const { return *_controller; }
+
   // Screens on the stack; the list may still hold more that were left.
   int depth() const { return _depth; }
   TableModel* top() const;

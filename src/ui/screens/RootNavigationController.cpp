@@ -21,6 +21,14 @@ constexpr std::int32_t kQueryMetricID = 0;
 
 void RootNavigationController::viewDidLoad() {
   NavigationController::viewDidLoad();
+  bringIntoService();
+}
+
+void RootNavigationController::comeIntoService() {
+  if (!_inService) bringIntoService();
+}
+
+void RootNavigationController::bringIntoService() {
   if (myTeskWrapper) myTeskWrapper->removeQuixConfigForAppid(myAppID);
   const auto path = ResourceBundle::main().pathForResource(metricFileName, metricFileType);
   if (!path) {
@@ -30,6 +38,7 @@ void RootNavigationController::viewDidLoad() {
   standardOutput().write("pushing metric file");
   if (!myTeskWrapper) fatalError("no connection to install the metric configuration with");
   if (!myTeskWrapper->addQuixConfigForAppId(myAppID, *path)) return;
+  _inService = true;
   if (myMetricValidator->mySharedTeskInstance) myMetricValidator->mySharedTeskInstance->listen();
   standardOutput().write("Querying SIM files");
   if (!myTeskWrapper) return;

@@ -24,6 +24,15 @@ class RootNavigationController final : public NavigationController {
   std::shared_ptr<MetricValidator> myMetricValidator = MetricValidator::shared();
 
   void viewDidLoad() override;
+
+  // The same again, unless a configuration was installed already: for a service that was not there
+  // when the view was loaded.
+  void comeIntoService();
+
+ private:
+  void bringIntoService();
+
+  bool _inService = false;
 };
 
 }  // namespace qel
