@@ -51,8 +51,8 @@ void ServiceCore::remember(Session& session, std::int64_t application) {
     const std::lock_guard lock(_keptMutex);
     auto& applications = _kept.applicationOfClient;
     const auto known = applications.find(session.clientName());
-    const bool isNew = known == applications.end() || known->second != application;
-    if (isNew && applications.size() < kMostClients) {
+    const bool isNew = known == applications.end();
+    if (isNew ? applications.size() < kMostClients : known->second != application) {
       applications.insert_or_assign(session.clientName(), application);
       _keeper->save(_kept);
     }

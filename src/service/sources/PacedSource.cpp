@@ -1,5 +1,6 @@
 #include "service/sources/PacedSource.h"
 
+#include <atomic>
 #include <stop_token>
 #include <utility>
 
@@ -30,6 +31,7 @@ struct PacedSource::Run {
   std::mutex mutex;  // guards the sequence
   std::unique_ptr<EventSequence> sequence;
   Pacer pacer;
+  std::atomic<bool> finished = false;  // the thread is about to end
 };
 
 PacedSource::PacedSource(std::string description, MakeSequence makeSequence, double speed,
@@ -41,13 +43,21 @@ PacedSource::PacedSource(std::string description, MakeSequence makeSequence, dou
 
 PacedSource::~PacedSource() {
   stop();
-  for (std::thread& thread : _threads) {
-    if (thread.get_id() == std::this_thread::get_id()) {
-      thread.detach();
+  for (Worker& worker : _workers) {
+    if (worker.thread.get_id() == std::this_thread::get_id()) {
+      worker.thread.detach();
     } else {
-      thread.join();
+      worker.thread.join();
     }
   }
+}
+
+void PacedSource::joinFinished() {
+  std::erase_if(_workers, [](Worker& worker) {
+    if (!worker.run->finished) return false;
+    worker.thread.join();
+    return true;
+  });
 }
 
 void PacedSource::start(std::weak_ptr<EventReceiver> receiver,
@@ -57,8 +67,12 @@ void PacedSource::start(std::weak_ptr<EventReceiver> receiver,
   run->receiver = std::move(receiver);
   run->listeners = std::move(listeners);
   const std::lock_guard lock(_mutex);
+  joinFinished();
   _run = run;
-  _threads.emplace_back([run] { play(run); });
+  _workers.push_back({run, std::thread([run] {
+                        play(*run);
+                        run->finished = true;
+                      })});
 }
 
 void PacedSource::stop() {
@@ -77,15 +91,15 @@ SourceAnswer PacedSource::query(std::uint32_t metric) {
   return run->query(metric);
 }
 
-void PacedSource::play(const std::shared_ptr<Run>& run) {
-  const std::stop_token stop = run->stop.get_token();
+void PacedSource::play(Run& run) {
+  const std::stop_token stop = run.stop.get_token();
   // Once stopped, nothing is touched any more but the run: the source, its clock and the whole
   // process may be on their way out.
   while (!stop.stop_requested()) {
-    const auto event = run->next();
-    if (!event || !run->pacer.wait(event->timeMs, stop)) return;
-    run->passed(*event);
-    if (!hand(*run, *event)) return;
+    const auto event = run.next();
+    if (!event || !run.pacer.wait(event->timeMs, stop)) return;
+    run.passed(*event);
+    if (!hand(run, *event)) return;
   }
 }
 

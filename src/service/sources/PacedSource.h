@@ -36,17 +36,22 @@ class PacedSource final : public EventSource {
 
  private:
   struct Run;
-  static void play(const std::shared_ptr<Run>& run);
+  struct Worker {
+    std::shared_ptr<Run> run;
+    std::thread thread;
+  };
+  static void play(Run& run);
   static bool hand(Run& run, const ServiceEvent& event);
+  void joinFinished();
 
   const std::string _description;
   const MakeSequence _makeSequence;
   const double _speed;
   WaitClock& _clock;
 
-  std::mutex _mutex;  // guards the two below; nothing is called under it
+  std::mutex _mutex;  // guards the two below; no event and no query runs under it
   std::shared_ptr<Run> _run;
-  std::vector<std::thread> _threads;  // of this run and of earlier ones
+  std::vector<Worker> _workers;  // of this run, and of earlier ones that have not been joined
 };
 
 }  // namespace qel::service

@@ -8,8 +8,6 @@ namespace qel::service {
 namespace {
 
 constexpr std::uint64_t kUpdateTakesMs = 1400;
-// The network gives a phone on LTE the areas of the town together with a neighbouring one.
-constexpr std::uint32_t kLocationAreaOverTracking = 256;
 
 }  // namespace
 
@@ -30,12 +28,12 @@ void Registration::renew() {
   _tmsi = static_cast<std::uint32_t>(_random.next()) & 0x3FFFFFFF;
   if (_technology == Technology::lte) {
     _trackingAreas = {_campedArea};
-    _locationArea = _campedArea + kLocationAreaOverTracking;
   } else {
     _pTmsi = static_cast<std::uint32_t>(_random.next()) | 0xC0000000;
-    _locationArea = _campedArea;
     _routingArea = _campedRoutingArea;
   }
+  // A place has the same number as tracking and as location area.
+  _locationArea = _campedArea;
   if (_pTmsi == 0) _pTmsi = static_cast<std::uint32_t>(_random.next()) | 0xC0000000;
   _registeredBy = _technology;
 }
