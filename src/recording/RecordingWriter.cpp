@@ -13,7 +13,8 @@
 namespace qel {
 namespace {
 
-constexpr mode_t kFileMode = 0644;
+// It tells where a phone has been.
+constexpr mode_t kFileMode = 0600;
 
 ByteView bytesOf(std::string_view text) {
   return {reinterpret_cast<const std::uint8_t*>(text.data()), text.size()};
@@ -22,23 +23,32 @@ ByteView bytesOf(std::string_view text) {
 }  // namespace
 
 std::unique_ptr<RecordingWriter> RecordingWriter::create(const std::string& path,
-                                                         std::string& error) {
-  const int descriptor = ::open(path.c_str(), O_WRONLY | O_CREAT | O_TRUNC | O_CLOEXEC, kFileMode);
+                                                         std::string& error, Existing existing) {
+  const int whenThere = existing == Existing::refused ? O_EXCL : O_TRUNC;
+  const int descriptor =
+      ::open(path.c_str(), O_WRONLY | O_CREAT | O_CLOEXEC | whenThere, kFileMode);
   if (descriptor < 0) {
     error = path + ": " + std::strerror(errno);
     return nullptr;
   }
-  return std::unique_ptr<RecordingWriter>(new RecordingWriter(path, descriptor));
+  return std::unique_ptr<RecordingWriter>(
+      new RecordingWriter(path, descriptor, path.ends_with(".gz")));
 }
 
-RecordingWriter::RecordingWriter(std::string path, int descriptor)
+std::unique_ptr<RecordingWriter> RecordingWriter::onDescriptor(int descriptor, std::string name) {
+  const int own = ::fcntl(descriptor, F_DUPFD_CLOEXEC, 0);
+  return std::unique_ptr<RecordingWriter>(new RecordingWriter(std::move(name), own, false));
+}
+
+RecordingWriter::RecordingWriter(std::string path, int descriptor, bool compressed)
     : _path(std::move(path)), _descriptor(descriptor) {
-  if (_path.ends_with(".gz")) _compressor = std::make_unique<LineCompressor>();
+  if (compressed) _compressor = std::make_unique<LineCompressor>();
 }
 
 RecordingWriter::~RecordingWriter() { close(); }
 
 bool RecordingWriter::fail(int code) {
+  _errorNumber = code;
   _error = _path + ": " + std::strerror(code);
   return false;
 }
@@ -48,6 +58,7 @@ bool RecordingWriter::put(ByteView bytes) {
     const ssize_t count = ::write(_descriptor, bytes.data(), bytes.size());
     if (count < 0 && errno == EINTR) continue;
     if (count < 0) return fail(errno);
+    _bytesWritten += static_cast<std::uint64_t>(count);
     bytes = bytes.subspan(static_cast<std::size_t>(count));
   }
   return true;
@@ -60,6 +71,11 @@ bool RecordingWriter::write(const RecordedEvent& event) {
   if (!put(_compressor ? ByteView(_compressor->line(line)) : bytesOf(line))) return false;
   ++_eventsWritten;
   return true;
+}
+
+void RecordingWriter::sync() const {
+  // Pipes have no disk: that this fails there is as it should be.
+  if (_descriptor >= 0) ::fdatasync(_descriptor);
 }
 
 bool RecordingWriter::close() {

@@ -16,24 +16,35 @@ class LineCompressor;
 // killed process reads up to its last whole event. One thread. Closed by the destructor at last.
 class RecordingWriter {
  public:
-  // Replaces the file; gzip when the name ends in ".gz". Nothing when it cannot be opened; `error`
-  // is then one line, "FILE: WHY".
-  static std::unique_ptr<RecordingWriter> create(const std::string& path, std::string& error);
+  // What becomes of a file that is there already.
+  enum class Existing : std::uint8_t { replaced, refused };
+
+  // Gzip when the name ends in ".gz". Others than the owner may not read it. Nothing when it cannot
+  // be opened; `error` is then one line, "FILE: WHY".
+  static std::unique_ptr<RecordingWriter> create(const std::string& path, std::string& error,
+                                                 Existing existing = Existing::replaced);
+  // Plain text to a descriptor, which stays the caller's. `name` stands for the file in errors.
+  static std::unique_ptr<RecordingWriter> onDescriptor(int descriptor, std::string name);
   ~RecordingWriter();
   RecordingWriter(const RecordingWriter&) = delete;
   RecordingWriter& operator=(const RecordingWriter&) = delete;
 
   // False when the file could not be written; from then on nothing is written any more.
   bool write(const RecordedEvent& event);
+  // Waits until what was written is on the disk, where there is one.
+  void sync() const;
   // Ends the file. False when it is not whole.
   bool close();
 
   std::uint64_t eventsWritten() const { return _eventsWritten; }
-  // After a false: one line, "FILE: WHY".
+  // As they are in the file.
+  std::uint64_t bytesWritten() const { return _bytesWritten; }
+  // After a false: one line, "FILE: WHY", and the error number.
   const std::string& error() const { return _error; }
+  int errorNumber() const { return _errorNumber; }
 
  private:
-  RecordingWriter(std::string path, int descriptor);
+  RecordingWriter(std::string path, int descriptor, bool compressed);
   bool put(ByteView bytes);
   bool fail(int code);
 
@@ -41,7 +52,9 @@ class RecordingWriter {
   int _descriptor;
   std::unique_ptr<LineCompressor> _compressor;  // none: plain text
   std::uint64_t _eventsWritten = 0;
+  std::uint64_t _bytesWritten = 0;
   std::string _error;
+  int _errorNumber = 0;
 };
 
 }  // namespace qel

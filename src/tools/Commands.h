@@ -20,5 +20,8 @@ void addReplayCommand(CLI::App& app, Action& chosen);
 void addStoreCommand(CLI::App& app, Action& chosen);
 void addScreenCommands(CLI::App& app, Action& chosen);
 void addMetricsCommand(CLI::App& app, Action& chosen);
+void addStatusCommand(CLI::App& app, Action& chosen);
+void addLiveCommand(CLI::App& app, Action& chosen);
+void addRecordCommand(CLI::App& app, Action& chosen);
 
 }  // namespace qel::tools

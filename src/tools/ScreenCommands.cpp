@@ -1,20 +1,17 @@
 // qelctl screen and screens: category tables after a recording, drawn by the viewer's controller.
 
 #include <CLI/CLI.hpp>
-#include <algorithm>
 #include <memory>
 #include <optional>
 #include <string>
 
 #include "base/LogSink.h"
 #include "base/Rendering.h"
-#include "base/Utf8.h"
 #include "tools/Commands.h"
 #include "tools/RecordingFeed.h"
+#include "tools/ScreenDrawing.h"
 #include "ui/kit/TableSnapshot.h"
 #include "ui/screens/QelViewItems.h"
-#include "ui/screens/SecondLevelViewController.h"
-#include "ui/screens/StandardScreens.h"
 
 namespace qel::tools {
 namespace {
@@ -27,11 +24,7 @@ struct Options {
 };
 
 TableSnapshot draw(const std::string& technology, const std::string& category) {
-  const auto screen = std::dynamic_pointer_cast<SecondLevelViewController>(
-      makeStandardScreen("SecondLevelViewController"));
-  screen->firstSelection = technology;
-  screen->seguedThroughRow = category;
-  return snapshotOf(*screen);
+  return snapshotOf(*makeScreen(technology, category));
 }
 
 Value orNull(const std::optional<std::string>& text) { return text ? Value(*text) : Value(); }
@@ -49,29 +42,10 @@ std::string asJson(const std::string& technology, const std::string& category) {
       Dictionary{{"key", technology + " " + category}, {"sections", std::move(sections)}});
 }
 
-// Characters, as far as a column's width goes.
-std::size_t widthOf(const std::string& text) {
-  return static_cast<std::size_t>(std::ranges::count_if(
-      text, [](char c) { return (static_cast<unsigned char>(c) & 0xC0) != 0x80; }));
-}
-
 void printTable(const Options& options, Output& output) {
   const TableSnapshot table = draw(options.technology, options.category);
-  std::size_t width = 0;
-  for (const SectionSnapshot& section : table.sections) {
-    for (const RowSnapshot& row : section.rows) {
-      width = std::max(width, widthOf(row.text.value_or("")));
-    }
-  }
-  output.line(options.technology + " " + options.category);
-  for (const SectionSnapshot& section : table.sections) {
-    output.line("");
-    if (section.title) output.line(*section.title);
-    for (const RowSnapshot& row : section.rows) {
-      const std::string name = row.text.value_or("");
-      output.line("  " + withReplacements(name) + std::string(width - widthOf(name) + 2, ' ') +
-                  withReplacements(row.detail.value_or("")));
-    }
+  for (const std::string& line : tableLines(options.technology + " " + options.category, table)) {
+    output.line(line);
   }
 }
 

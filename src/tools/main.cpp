@@ -46,6 +46,9 @@ int main(int argc, char* argv[]) {
   tools::addStoreCommand(app, chosen);
   tools::addScreenCommands(app, chosen);
   tools::addMetricsCommand(app, chosen);
+  tools::addStatusCommand(app, chosen);
+  tools::addLiveCommand(app, chosen);
+  tools::addRecordCommand(app, chosen);
 
   try {
     app.parse(argc, argv);

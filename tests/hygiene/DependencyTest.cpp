@@ -17,14 +17,14 @@ namespace {
 const std::map<std::string, std::set<std::string>> kAllowed = {
     {"base", {}},
     {"messages", {"base"}},
-    {"recording", {"base"}},
+    {"recording", {"base", "messages"}},
     {"tesk", {"base", "messages"}},
     {"connection", {"base", "tesk"}},
     {"metrics", {"base", "connection", "messages"}},
     {"service", {"base", "messages", "recording", "tesk"}},
     {"ui", {"base", "connection", "metrics"}},
     {"app", {"base", "metrics", "service", "tesk", "ui"}},
-    {"tools", {"base", "messages", "metrics", "recording", "ui"}},
+    {"tools", {"base", "messages", "metrics", "recording", "tesk", "ui"}},
 };
 
 // Foreign header prefix → the folders (path prefixes in src/) that may include it.

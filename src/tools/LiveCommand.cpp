@@ -1,0 +1,137 @@
+// qelctl live: the viewer without its window.
+
+#include <sys/ioctl.h>
+#include <unistd.h>
+
+#include <CLI/CLI.hpp>
+#include <cstdio>
+#include <cstdlib>
+#include <memory>
+#include <string>
+#include <utility>
+#include <vector>
+
+#include "base/LogSink.h"
+#include "tools/Commands.h"
+#include "tools/MainLoop.h"
+#include "tools/ScreenDrawing.h"
+#include "tools/Service.h"
+#include "tools/ToolError.h"
+#include "ui/screens/RootNavigationController.h"
+
+namespace qel::tools {
+namespace {
+
+using namespace std::chrono_literals;
+
+struct Options {
+  std::string bus = "system";
+  std::vector<std::string> screen;  // technology and category, or empty
+};
+
+// What the viewer's start does, again each time: configuration, delivery, SIM files.
+void startAsTheViewerDoes() { std::make_shared<RootNavigationController>()->loadViewIfNeeded(); }
+
+// A table that is drawn anew when it has changed, at most once a second.
+class LiveTable {
+ public:
+  explicit LiveTable(const std::vector<std::string>& screen)
+      : _key(screen.at(0) + " " + screen.at(1)), _screen(makeScreen(screen.at(0), screen.at(1))) {}
+
+  // When draw() may next have something to do.
+  std::optional<MainLoop::Clock::time_point> due() const {
+    return _touched ? std::optional(_next) : std::nullopt;
+  }
+
+  void touch() { _touched = true; }
+
+  void draw(Output& output) {
+    const auto now = MainLoop::Clock::now();
+    if (!_touched || now < _next) return;
+    _touched = false;
+    TableSnapshot table = snapshotOf(*_screen);
+    if (_drawn && table == *_drawn) return;
+    print(tableLines(_key, table), output);
+    _drawn = std::move(table);
+    _next = now + 1s;
+  }
+
+ private:
+  void print(const std::vector<std::string>& lines, Output& output) const {
+    const bool inPlace = ::isatty(STDOUT_FILENO) == 1;
+    std::size_t most = lines.size();
+    struct winsize size {};
+    if (inPlace && ::ioctl(STDOUT_FILENO, TIOCGWINSZ, &size) == 0 && size.ws_row > 1) {
+      most = std::min<std::size_t>(most, size.ws_row - 1U);  // more would scroll
+    }
+    if (!inPlace && _drawn) output.line("");
+    for (std::size_t i = 0; i < most; ++i) {
+      output.line(inPlace && i == 0 ? kClear + lines[i] : lines[i]);
+    }
+    output.flush();
+  }
+
+  inline static const std::string kClear = "\x1B[H\x1B[2J";
+
+  const std::string _key;
+  const std::shared_ptr<TableViewController> _screen;
+  std::optional<TableSnapshot> _drawn;
+  MainLoop::Clock::time_point _next;
+  bool _touched = true;
+};
+
+void showLines(MainLoop& loop, Output& output) {
+  output.flush();
+  while (loop.runOnce(std::nullopt)) output.flush();
+}
+
+void showTable(MainLoop& loop, Output& output, const std::vector<std::string>& screen) {
+  LiveTable table(screen);
+  table.draw(output);
+  while (loop.runOnce(table.due())) {
+    table.touch();
+    table.draw(output);
+  }
+}
+
+void run(const Options& options, Output& output) {
+  MainLoop loop;
+  loop.watchStandardOutput();
+  findResources();
+  configurationFile();
+  requireService(options.bus);
+  setStandardOutput(options.screen.empty() ? std::shared_ptr<LogSink>(output.sink()) : nullptr);
+  const auto say = [](const std::string& text) {
+    std::fprintf(stderr, "qelctl: %s\n", text.c_str());
+  };
+  tesk::setConnector(
+      tesk::bus::makeBusConnector({options.bus}, serviceObserver(say, startAsTheViewerDoes)));
+  startAsTheViewerDoes();
+  if (options.screen.empty()) {
+    showLines(loop, output);
+  } else {
+    showTable(loop, output, options.screen);
+  }
+  output.flush();
+  // The viewer's connection is never released; its threads must not see the process taken apart.
+  std::_Exit(EX_OK);
+}
+
+}  // namespace
+
+void addLiveCommand(CLI::App& app, Action& chosen) {
+  auto* command = app.add_subcommand(
+      "live", "Connect as the viewer does and print the dispatcher's lines, or one category");
+  command->footer("It runs until SIGINT or SIGTERM, and goes on when the service comes back.");
+  const auto options = std::make_shared<Options>();
+  addBusOption(*command, options->bus);
+  command
+      ->add_option("--screen", options->screen,
+                   "Draw this category whenever it changes, instead of printing lines")
+      ->type_name("TECHNOLOGY CATEGORY")
+      ->expected(2);
+  command->callback(
+      [options, &chosen] { chosen = [options](Output& output) { run(*options, output); }; });
+}
+
+}  // namespace qel::tools

@@ -1,0 +1,198 @@
+// qelctl record: live events into a recording.
+
+#include <unistd.h>
+
+#include <CLI/CLI.hpp>
+#include <algorithm>
+#include <cerrno>
+#include <chrono>
+#include <cstring>
+#include <fstream>
+#include <iterator>
+#include <memory>
+#include <optional>
+#include <string>
+
+#include "tools/Commands.h"
+#include "tools/MainLoop.h"
+#include "tools/RecordConnection.h"
+#include "tools/RecordProgress.h"
+#include "tools/Recorder.h"
+#include "tools/Service.h"
+#include "tools/ToolError.h"
+
+namespace qel::tools {
+namespace {
+
+using Clock = MainLoop::Clock;
+using Seconds = std::chrono::duration<double>;
+using namespace std::chrono_literals;
+
+struct Options {
+  std::string file;
+  std::string bus = "system";
+  std::optional<double> durationS;
+  std::optional<double> maxAgeS;
+  std::optional<std::uint64_t> maxBytes;
+  RecordingLimits limits;
+  bool keepIdentities = false;
+  bool force = false;
+};
+
+bool goesToStandardOutput(const Options& options) { return options.file == "-"; }
+
+std::string nameOf(const Options& options) {
+  return goesToStandardOutput(options) ? "standard output" : options.file;
+}
+
+RecordingLimits limitsOf(const Options& options) {
+  RecordingLimits limits = options.limits;
+  limits.fileBytes = options.maxBytes;
+  if (options.maxAgeS) {
+    limits.fileAge =
+        std::chrono::duration_cast<std::chrono::milliseconds>(Seconds(*options.maxAgeS));
+  }
+  return limits;
+}
+
+std::unique_ptr<RotatingRecording> begin(const Options& options) {
+  if (goesToStandardOutput(options)) {
+    return RotatingRecording::onDescriptor(STDOUT_FILENO, nameOf(options));
+  }
+  using Existing = RotatingRecording::Existing;
+  std::string error;
+  auto recording = RotatingRecording::create(options.file, limitsOf(options),
+                                             options.force ? Existing::replaced : Existing::refused,
+                                             Clock::now(), error);
+  if (recording) return recording;
+  const bool isThere = error.ends_with(std::strerror(EEXIST));
+  throw ToolError(EX_IOERR, error + (isThere ? " (--force replaces it)" : ""));
+}
+
+std::unique_ptr<IdentityHider> hiderOf(const Options& options) {
+  if (options.keepIdentities) return nullptr;
+  return std::make_unique<IdentityHider>(Pseudonyms::random());
+}
+
+Bytes contentOf(const std::string& path) {
+  std::ifstream file(path, std::ios::binary);
+  return Bytes(std::istreambuf_iterator<char>(file), std::istreambuf_iterator<char>());
+}
+
+std::string summary(const Options& options, const Recorder& recorder, Clock::duration duration) {
+  const Recorder::Progress progress = recorder.progress();
+  std::string text = nameOf(options) + ": " +
+                     progressText(progress, std::chrono::floor<std::chrono::seconds>(duration));
+  if (progress.filesFinished > 0) {
+    text += ", " + std::to_string(progress.filesFinished) + " files finished before it";
+  }
+  if (progress.unrecordable > 0) {
+    text += ", " + std::to_string(progress.unrecordable) + " undecodable events left out";
+  }
+  if (progress.stripped > 0) {
+    text += ", " + std::to_string(progress.stripped) + " events without their unknown content";
+  }
+  return text + (options.keepIdentities ? ", identities kept" : ", identities hidden");
+}
+
+// Until the end that was asked for, or of what can be recorded.
+void recordOn(const Options& options, MainLoop& loop, Recorder& recorder, RecordProgress& progress,
+              Clock::time_point start) {
+  std::optional<Clock::time_point> end;
+  if (options.durationS) {
+    end = start + std::chrono::duration_cast<Clock::duration>(Seconds(*options.durationS));
+  }
+  Clock::time_point nextLook = start;
+  while (loop.runOnce(end ? std::min(*end, nextLook) : nextLook)) {
+    const auto now = Clock::now();
+    if (end && now >= *end) return;
+    if (now < nextLook) continue;
+    nextLook = now + 1s;
+    if (!recorder.tend()) return;
+    progress.show(
+        progressText(recorder.progress(), std::chrono::floor<std::chrono::seconds>(now - start)));
+  }
+}
+
+void run(const Options& options) {
+  MainLoop loop;
+  if (goesToStandardOutput(options)) loop.watchStandardOutput();
+  findResources();
+  Bytes configuration = contentOf(configurationFile());
+  requireService(options.bus);
+  Recorder recorder(begin(options), hiderOf(options));
+  RecordProgress progress;
+  const auto start = Clock::now();
+  {
+    RecordConnection* connected = nullptr;
+    RecordConnection connection(
+        options.bus, std::move(configuration),
+        [&recorder](std::string_view eventName, const tesk::Message& event) {
+          recorder.take(eventName, event);
+        },
+        serviceObserver([&progress](const std::string& text) { progress.say(text); },
+                        [&connected] { connected->begin(); }));
+    connected = &connection;
+    const auto begun = connection.begin();
+    if (begun.code != 0) failWithoutService(begun.message);
+    recordOn(options, loop, recorder, progress, start);
+  }
+  const bool isWhole = recorder.close() && recorder.error().empty();
+  if (recorder.errorNumber() == EPIPE) return;
+  progress.say(summary(options, recorder, Clock::now() - start));
+  if (!isWhole) throw ToolError(EX_IOERR, recorder.error());
+}
+
+void addLimitOptions(CLI::App& command, Options& options) {
+  // Beyond any file, and still a number of milliseconds.
+  const CLI::Range seconds(0.001, 1e9, "");
+  const CLI::AsSizeValue bytes(false);
+  command.add_option("--duration", options.durationS, "End after this many seconds")
+      ->type_name("S")
+      ->check(seconds);
+  command.add_option("--max-size", options.maxBytes, "Finish a file that has reached this size")
+      ->type_name("BYTES|K|M|G")
+      ->transform(bytes)
+      ->check(CLI::PositiveNumber.description(""));
+  command.add_option("--max-age", options.maxAgeS, "Finish a file that is this old")
+      ->type_name("SECONDS")
+      ->check(seconds);
+  command
+      .add_option("--keep", options.limits.filesKept,
+                  "Finished files that stay: FILE.1, the newest, to FILE.N")
+      ->type_name("N")
+      ->check(CLI::Range(1, 9999, "").description(""))
+      ->capture_default_str();
+  command
+      .add_option("--min-free", options.limits.freeBytes,
+                  "Stop when less is free on the disk; 64M unless given, 0 for no such limit")
+      ->type_name("BYTES|K|M|G")
+      ->transform(bytes);
+}
+
+}  // namespace
+
+void addRecordCommand(CLI::App& app, Action& chosen) {
+  auto* command = app.add_subcommand("record", "Record live events, with identities hidden");
+  command->footer(
+      "Subscriber and temporary identities, SIM file contents and addresses are replaced by\n"
+      "pseudonyms. Cells and areas stay: a recording tells where the phone was.\n"
+      "It runs until SIGINT or SIGTERM, and goes on when the service comes back.");
+  const auto options = std::make_shared<Options>();
+  command
+      ->add_option("FILE", options->file,
+                   "Recording to write, compressed when it ends in .gz; - is standard output")
+      ->required();
+  addBusOption(*command, options->bus);
+  command->add_flag("--keep-identities", options->keepIdentities, "Record them as they are");
+  command->add_flag("--force", options->force, "Replace FILE and its finished files");
+  addLimitOptions(*command, *options);
+  command->callback([options, &chosen] {
+    if (goesToStandardOutput(*options) && (options->maxBytes || options->maxAgeS)) {
+      throw CLI::ValidationError("standard output has no size or age");
+    }
+    chosen = [options](Output&) { run(*options); };
+  });
+}
+
+}  // namespace qel::tools

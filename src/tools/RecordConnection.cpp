@@ -1,0 +1,75 @@
+#include "tools/RecordConnection.h"
+
+#include <algorithm>
+#include <utility>
+
+#include "tesk/Constants.h"
+#include "tesk/bus/ServiceStatus.h"
+
+namespace qel::tools {
+namespace {
+
+constexpr const char* kClientName = "qelctl-record";
+// The viewer's is 2.
+constexpr std::int64_t kApplication = 3;
+constexpr std::int64_t kPayloadType = 0;
+constexpr std::int64_t kTriggerRef = 9999;
+constexpr std::int64_t kSimFilesMetric = 19;
+
+}  // namespace
+
+RecordConnection::RecordConnection(std::string bus, Bytes configuration, tesk::EventSink sink,
+                                   tesk::bus::ReachabilityObserver observer)
+    : _bus(std::move(bus)),
+      _configuration(std::move(configuration)),
+      _transport(tesk::bus::makeBusConnector({_bus}, std::move(observer))
+                     ->connect(kClientName, std::move(sink))) {}
+
+RecordConnection::~RecordConnection() {
+  _transport->eventsOff();
+  if (!isOnlyRecorder()) return;
+  tesk::Message request;
+  request.setInt64(tesk::kKeyAppID, kApplication);
+  tesk::Message reply;
+  _transport->performCommand(tesk::kCommandClearConfiguration, request, reply);
+}
+
+bool RecordConnection::isOnlyRecorder() const {
+  std::string why;
+  const auto status = tesk::bus::readServiceStatus({_bus}, why);
+  return status &&
+         std::ranges::count(status->clients, kClientName, &tesk::bus::ClientStatus::name) <= 1;
+}
+
+tesk::CommandResult RecordConnection::install() {
+  tesk::Message request;
+  request.setInt64(tesk::kKeyAppID, kApplication);
+  request.setData(tesk::kKeyPayload, _configuration);
+  request.setInt64(tesk::kKeyPayloadType, kPayloadType);
+  tesk::Message reply;
+  return _transport->performCommand(tesk::kCommandAddConfiguration, request, reply);
+}
+
+// They are not sent unless somebody asks. A modem without a SIM refuses, and that is no error.
+void RecordConnection::querySimFiles() {
+  tesk::Message request;
+  request.setInt64(tesk::kKeyAppID, kApplication);
+  request.setInt64(tesk::kKeyPayloadType, kPayloadType);
+  request.setInt64(tesk::kKeyTriggerRef, kTriggerRef);
+  request.setInt64(tesk::kKeyTriggerType, 0);
+  request.setInt64(tesk::kKeyTriggerID, tesk::kQueryTriggerBase + kSimFilesMetric);
+  request.setInt64(tesk::kKeyProfileID, 0);
+  request.setInt64(tesk::kKeyMetricID, 0);
+  tesk::Message reply;
+  _transport->performCommand(tesk::kCommandQueryMetric, request, reply);
+}
+
+tesk::CommandResult RecordConnection::begin() {
+  auto result = install();
+  if (result.code != 0) return result;
+  _transport->eventsOn();
+  querySimFiles();
+  return result;
+}
+
+}  // namespace qel::tools

@@ -1,0 +1,54 @@
+// Live events into a recording.
+#pragma once
+
+#include <cstdint>
+#include <memory>
+#include <mutex>
+#include <string>
+#include <string_view>
+
+#include "base/Clock.h"
+#include "recording/RotatingRecording.h"
+#include "recording/privacy/IdentityHider.h"
+#include "tesk/Message.h"
+
+namespace qel::tools {
+
+// Any thread. Each event is written before take() returns: a disk that is slow holds the event
+// stream up, and the service counts what is lost by it.
+class Recorder {
+ public:
+  struct Progress {
+    std::uint64_t events = 0;
+    std::uint64_t bytes = 0;
+    std::uint64_t filesFinished = 0;
+    std::uint64_t unrecordable = 0;  // events without a form in a recording, or undecodable
+    std::uint64_t stripped = 0;      // events recorded without a value of unknown meaning
+  };
+
+  // Without a hider identities are kept.
+  Recorder(std::unique_ptr<RotatingRecording> recording, std::unique_ptr<IdentityHider> hider,
+           const Clock& clock = systemClock());
+
+  // An event of the stream of that name, received now. Other streams are no part of a recording.
+  void take(std::string_view eventName, const tesk::Message& event);
+  // To be called every second or so. False when nothing more can be recorded: see error().
+  bool tend();
+  // Ends the recording. False when it is not whole.
+  bool close();
+
+  Progress progress() const;
+  std::string error() const;
+  int errorNumber() const;
+
+ private:
+  bool isRecordable(RecordedEvent& event);
+
+  mutable std::mutex _mutex;
+  const std::unique_ptr<RotatingRecording> _recording;
+  const std::unique_ptr<IdentityHider> _hider;
+  const Clock& _clock;
+  std::uint64_t _shapeless = 0;
+};
+
+}  // namespace qel::tools

@@ -1,0 +1,34 @@
+// The baseband manager service, for the subcommands that need it.
+#pragma once
+
+#include <functional>
+#include <string>
+
+#include "tesk/bus/BusConnector.h"
+
+namespace CLI {
+class App;
+}
+
+namespace qel::tools {
+
+// --bus.
+void addBusOption(CLI::App& command, std::string& bus);
+
+// Waits up to two seconds for the service. A ToolError when it is not there then.
+void requireService(const std::string& bus);
+[[noreturn]] void failWithoutService(const std::string& why);
+
+// Says on the main queue that the service was lost, through `say`, and that it came back; then
+// calls `back`.
+tesk::bus::ReachabilityObserver serviceObserver(std::function<void(const std::string&)> say,
+                                                std::function<void()> back);
+
+// Makes the files that the program is shipped with the resources of the process.
+void findResources();
+
+// The configuration that asks for every metric: the name of its file. A ToolError when it is not
+// there.
+std::string configurationFile();
+
+}  // namespace qel::tools

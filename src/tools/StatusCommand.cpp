@@ -1,0 +1,86 @@
+// qelctl status: what the service says about itself.
+
+#include <CLI/CLI.hpp>
+#include <memory>
+#include <string>
+
+#include "base/Rendering.h"
+#include "tesk/bus/ServiceStatus.h"
+#include "tools/Commands.h"
+#include "tools/Service.h"
+
+namespace qel::tools {
+namespace {
+
+using tesk::bus::ServiceStatus;
+
+struct Options {
+  std::string bus = "system";
+  bool json = false;
+};
+
+void printJson(const ServiceStatus& status, Output& output) {
+  List configurations;
+  for (const auto& [application, metrics] : status.configurations) {
+    configurations.emplace_back(Dictionary{{"application", application}, {"metrics", metrics}});
+  }
+  List clients;
+  for (const auto& client : status.clients) {
+    clients.emplace_back(Dictionary{{"name", client.name},
+                                    {"events_on", client.eventsOn},
+                                    {"delivered", client.delivered},
+                                    {"dropped", client.dropped}});
+  }
+  output.line(
+      jsonText(Dictionary{{"version", status.version},
+                          {"source", status.source},
+                          {"source_running", status.sourceRunning},
+                          {"configurations", std::move(configurations)},
+                          {"clients", std::move(clients)},
+                          {"events", Dictionary{{"received", status.eventsReceived},
+                                                {"delivered", status.eventsDelivered},
+                                                {"dropped", status.eventsDropped},
+                                                {"undecodable", status.eventsUndecodable}}}}));
+}
+
+// Names come from other programs: as JSON strings they cannot play tricks on a terminal.
+std::string quoted(const std::string& text) { return jsonText(Value(text)); }
+
+void printText(const ServiceStatus& status, Output& output) {
+  const auto number = [](std::uint64_t value) { return std::to_string(value); };
+  output.line("service         version " + quoted(status.version));
+  output.line("source          " + quoted(status.source) +
+              (status.sourceRunning ? ", runs" : ", does not run: no client wants events"));
+  for (const auto& [application, metrics] : status.configurations) {
+    output.line("configuration   application " + std::to_string(application) + ", " +
+                number(metrics) + " metrics");
+  }
+  for (const auto& client : status.clients) {
+    output.line("client          " + quoted(client.name) + ", events " +
+                (client.eventsOn ? "on" : "off") + ", " + number(client.delivered) +
+                " delivered, " + number(client.dropped) + " dropped");
+  }
+  output.line("events          " + number(status.eventsReceived) + " received, " +
+              number(status.eventsDelivered) + " delivered, " + number(status.eventsDropped) +
+              " dropped, " + number(status.eventsUndecodable) + " undecodable");
+}
+
+}  // namespace
+
+void addStatusCommand(CLI::App& app, Action& chosen) {
+  auto* command = app.add_subcommand(
+      "status", "Tell what the service does: source, configurations, clients, events");
+  const auto options = std::make_shared<Options>();
+  addBusOption(*command, options->bus);
+  command->add_flag("--json", options->json, "As one JSON object");
+  command->callback([options, &chosen] {
+    chosen = [options](Output& output) {
+      std::string why;
+      const auto status = tesk::bus::readServiceStatus({options->bus}, why);
+      if (!status) failWithoutService(why);
+      options->json ? printJson(*status, output) : printText(*status, output);
+    };
+  });
+}
+
+}  // namespace qel::tools
