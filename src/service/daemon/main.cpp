@@ -49,8 +49,8 @@ int fail(int code, const std::string& why) {
   return code;
 }
 
-// The first connection must succeed; later ones are tried until they do. A failed attempt costs some
-// memory inside the bus library, so the pauses grow.
+// The first connection must succeed; later ones are tried until they do. A failed attempt costs
+// some memory inside the bus library, so the pauses grow.
 int run(const std::shared_ptr<ServiceCore>& core, const tesk::bus::BusAddress& address, int stop) {
   constexpr auto kFirstPause = 250ms;
   constexpr auto kLongestPause = 5000ms;
