@@ -50,12 +50,14 @@ constexpr auto sortedIdentifiers() {
 }
 
 constexpr auto kSortedIdentifiers = sortedIdentifiers();
+static_assert(kSortedIdentifiers[0] == kSmallestMetric);
+static_assert(kSortedIdentifiers[1] == kSecondSmallestMetric);
 
 }  // namespace
 
 std::span<const MetricName> KBBMetricUtility::catalogue() { return kCatalogue; }
 
-bool KBBMetricUtility::isValidMetricIdTag(std::uint32_t tag, std::string_view /*messageClass*/) {
+bool KBBMetricUtility::look(std::uint32_t tag, std::string_view /*messageClass*/) {
   if (!std::ranges::binary_search(kSortedIdentifiers, tag)) return false;
   systemLog().write("valid metricId tag");
   return true;

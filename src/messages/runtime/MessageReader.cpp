@@ -1,6 +1,10 @@
 #include "messages/runtime/MessageReader.h"
 
+#include <array>
 #include <cstdio>
+
+#include "base/LogSink.h"
+#include "messages/runtime/PBDataReader.h"
 
 namespace qel {
 
@@ -9,6 +13,12 @@ void logUnknownTag(std::uint32_t fieldNumber, std::uint32_t value) {
   const int length =
       std::snprintf(line.data(), line.size(), "Unknown tag: %x:%u", fieldNumber, value);
   systemLog().write({line.data(), static_cast<std::size_t>(length)});
+}
+
+Cursor skipUnknown(Cursor cursor, std::uint32_t fieldNumber, std::uint8_t wireType) {
+  PBDataReader reader({cursor.at, cursor.left()});
+  if (!PBReaderSkipValueWithTag(reader, fieldNumber, wireType)) return Cursor::damaged();
+  return {cursor.at + reader._pos, cursor.end};
 }
 
 }  // namespace qel

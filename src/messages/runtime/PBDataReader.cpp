@@ -2,7 +2,30 @@
 
 #include <vector>
 
+#include "messages/runtime/Cursor.h"
+
 namespace qel {
+
+Varint readLongVarint(const std::uint8_t* at, const std::uint8_t* end) {
+  constexpr unsigned kLongest = 10;
+  std::uint64_t value = 0;
+  for (unsigned i = 0; i < kLongest; ++i) {
+    if (at >= end) return {0, nullptr};
+    const std::uint8_t byte = *at++;
+    value |= static_cast<std::uint64_t>(byte & 0x7F) << (7 * i);
+    if (byte < 0x80) return {value, at};
+  }
+  return {0, at};
+}
+
+std::uint64_t PBReaderReadVarint(PBDataReader& reader) {
+  const std::uint8_t* end = reader._bytes + reader._length;
+  const auto [value, next] = readLongVarint(reader._bytes + reader._pos, end);
+  reader._error = reader._error || !next;
+  reader._pos = next ? static_cast<std::uint64_t>(next - reader._bytes) : reader._length;
+  return value;
+}
+
 namespace {
 
 // The next `count` bytes, or nothing with the error flag set when there are fewer.

@@ -27,26 +27,7 @@ struct PBReaderMark {
 
 // A varint of at most ten bytes. Ten bytes that all carry the top bit read as 0; running past the
 // end sets the error flag and reads as 0.
-inline std::uint64_t PBReaderReadVarint(PBDataReader& reader) {
-  constexpr unsigned kLongest = 10;
-  std::uint64_t value = 0;
-  std::uint64_t pos = reader._pos;
-  for (unsigned i = 0; i < kLongest; ++i) {
-    if (pos >= reader._length) {
-      reader._pos = pos;
-      reader._error = true;
-      return 0;
-    }
-    const std::uint8_t byte = reader._bytes[pos++];
-    value |= static_cast<std::uint64_t>(byte & 0x7F) << (7 * i);
-    if (byte < 0x80) {
-      reader._pos = pos;
-      return value;
-    }
-  }
-  reader._pos = pos;
-  return 0;
-}
+std::uint64_t PBReaderReadVarint(PBDataReader& reader);
 
 // A varint length and as many bytes. A length past the end sets the error flag and gives nothing.
 std::optional<Bytes> PBReaderReadData(PBDataReader& reader);

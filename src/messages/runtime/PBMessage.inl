@@ -28,8 +28,10 @@ auto& sameClass(Codable& message, std::string_view operation) {
 template <class Message>
 std::shared_ptr<Message> PBMessage<Message>::initWithData(ByteView bytes) {
   auto message = std::make_shared<Message>();
-  PBDataReader reader(bytes);
-  return readMessage(*message, reader) ? message : nullptr;
+  if (bytes.empty()) return message;
+  const Cursor whole{bytes.data(), bytes.data() + bytes.size()};
+  if (readMessage(*message, whole).isDamaged()) return nullptr;
+  return message;
 }
 
 template <class Message>
@@ -39,7 +41,12 @@ Dictionary PBMessage<Message>::dictionaryRepresentation() const {
 
 template <class Message>
 bool PBMessage<Message>::readFrom(PBDataReader& reader) {
-  return readMessage(self(), reader);
+  if (reader._pos >= reader._length || reader._error) return !reader._error;
+  const Cursor part{reader._bytes + reader._pos, reader._bytes + reader._length};
+  const Cursor stopped = readMessage(self(), part);
+  reader._error = stopped.isDamaged();
+  reader._pos = reader._error ? reader._length : reader._pos + (part.left() - stopped.left());
+  return !reader._error;
 }
 
 template <class Message>
