@@ -88,7 +88,7 @@ Step dictionaryOurs() {
 
 Step encodeOurs() {
   return [kept = messages(), writer = PBDataWriter()](std::size_t i) mutable {
-    writer._output.clear();
+    writer.clear();
     kept[i]->writeTo(writer);
     benchmark::DoNotOptimize(writer.data().data());
   };

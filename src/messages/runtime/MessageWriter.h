@@ -7,6 +7,9 @@
 
 namespace qel {
 
+template <class Message>
+void writeMessage(const Message& message, PBDataWriter& writer);
+
 template <Encoding encoding, class T>
 void writeScalar(PBDataWriter& writer, T value, std::uint32_t number) {
   if constexpr (encoding == Encoding::uint64) PBDataWriterWriteUint64Field(writer, value, number);
@@ -42,18 +45,27 @@ void writeField(const Message& message, PBDataWriter& writer, const StringField<
   if (text) PBDataWriterWriteStringField(writer, *text, field.number);
 }
 
+// As PBDataWriterWriteSubmessage, with the class known.
+template <class Nested>
+void writeNested(const Nested& nested, PBDataWriter& writer, std::uint32_t number) {
+  PBDataWriterMark mark;
+  PBDataWriterPlaceMark(writer, mark, number);
+  writeMessage(nested, writer);
+  PBDataWriterRecallMark(writer, mark);
+}
+
 template <class Message, class Nested>
 void writeField(const Message& message, PBDataWriter& writer,
                 const MessageField<Message, Nested>& field) {
   const auto& nested = message.*field.member;
-  if (nested) PBDataWriterWriteSubmessage(writer, *nested, field.number);
+  if (nested) writeNested(*nested, writer, field.number);
 }
 
 template <class Message, class Nested>
 void writeField(const Message& message, PBDataWriter& writer,
                 const RepeatedMessageField<Message, Nested>& field) {
   for (const auto& element : message.*field.member) {
-    PBDataWriterWriteSubmessage(writer, *element, field.number);
+    writeNested(*element, writer, field.number);
   }
 }
 

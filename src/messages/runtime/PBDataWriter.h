@@ -3,6 +3,7 @@
 
 #include <cstdint>
 #include <string_view>
+#include <utility>
 
 #include "base/Bytes.h"
 
@@ -10,13 +11,34 @@ namespace qel {
 
 class PBCodable;
 
-// Collects what is written; the buffer grows as needed.
+// Collects what is written. The buffer keeps its size over clear, so that a writer that is used
+// again allocates nothing.
 class PBDataWriter {
  public:
-  const Bytes& data() const { return _output; }
-  Bytes takeData() { return std::move(_output); }
+  const Bytes& data() const {
+    _output.resize(_size);
+    return _output;
+  }
+  Bytes takeData() {
+    _output.resize(std::exchange(_size, 0));
+    return std::move(_output);
+  }
+  void clear() { _size = 0; }
 
-  Bytes _output;
+  std::size_t size() const { return _size; }
+  // The next `count` bytes of the buffer, for writing; written says how many of them are filled.
+  std::uint8_t* room(std::size_t count) {
+    if (_output.size() - _size < count) [[unlikely]]
+      grow(count);
+    return _output.data() + _size;
+  }
+  void written(std::size_t count) { _size += count; }
+
+ private:
+  void grow(std::size_t count);
+
+  mutable Bytes _output;  // at least _size long; what is behind is room
+  std::size_t _size = 0;
 };
 
 // What PBDataWriterPlaceMark remembers: where the marked content starts.
@@ -27,12 +49,50 @@ struct PBDataWriterMark {
 // As a field number: write the value only, without a tag.
 inline constexpr std::uint32_t kPBNoTag = 0xFFFFFFFF;
 
+// The longest varint has ten bytes.
+inline constexpr std::size_t kLongestVarint = 10;
+
+// Fills in the varint at this place; its length.
+inline std::size_t PBPutVarint(std::uint8_t* at, std::uint64_t value) {
+  std::size_t length = 0;
+  while (value >= 0x80) {
+    at[length++] = static_cast<std::uint8_t>(value | 0x80);
+    value >>= 7;
+  }
+  at[length++] = static_cast<std::uint8_t>(value);
+  return length;
+}
+
+// A field that is a varint, or the tag and length of one that is delimited.
+inline void PBDataWriterWriteVarint(PBDataWriter& writer, std::uint64_t value, std::uint32_t field,
+                                    std::uint32_t wireType) {
+  std::uint8_t* at = writer.room(2 * kLongestVarint);
+  std::size_t length = 0;
+  if (field != kPBNoTag) length = PBPutVarint(at, std::uint64_t{field} << 3 | wireType);
+  writer.written(length + PBPutVarint(at + length, value));
+}
+
 // Each appends one field. Integers are varints; a negative int32 takes ten bytes.
-void PBDataWriterWriteUint64Field(PBDataWriter& writer, std::uint64_t value, std::uint32_t field);
-void PBDataWriterWriteUint32Field(PBDataWriter& writer, std::uint32_t value, std::uint32_t field);
-void PBDataWriterWriteInt32Field(PBDataWriter& writer, std::int32_t value, std::uint32_t field);
-void PBDataWriterWriteSint32Field(PBDataWriter& writer, std::int32_t value, std::uint32_t field);
-void PBDataWriterWriteBOOLField(PBDataWriter& writer, bool value, std::uint32_t field);
+inline void PBDataWriterWriteUint64Field(PBDataWriter& writer, std::uint64_t value,
+                                         std::uint32_t field) {
+  PBDataWriterWriteVarint(writer, value, field, 0);
+}
+inline void PBDataWriterWriteUint32Field(PBDataWriter& writer, std::uint32_t value,
+                                         std::uint32_t field) {
+  PBDataWriterWriteVarint(writer, value, field, 0);
+}
+inline void PBDataWriterWriteInt32Field(PBDataWriter& writer, std::int32_t value,
+                                        std::uint32_t field) {
+  PBDataWriterWriteVarint(writer, static_cast<std::uint64_t>(std::int64_t{value}), field, 0);
+}
+inline void PBDataWriterWriteSint32Field(PBDataWriter& writer, std::int32_t value,
+                                         std::uint32_t field) {
+  const std::uint32_t sign = value < 0 ? 0xFFFFFFFFU : 0U;
+  PBDataWriterWriteVarint(writer, static_cast<std::uint32_t>(value) << 1 ^ sign, field, 0);
+}
+inline void PBDataWriterWriteBOOLField(PBDataWriter& writer, bool value, std::uint32_t field) {
+  PBDataWriterWriteVarint(writer, value ? 1 : 0, field, 0);
+}
 void PBDataWriterWriteDataField(PBDataWriter& writer, ByteView value, std::uint32_t field);
 void PBDataWriterWriteStringField(PBDataWriter& writer, std::string_view value,
                                   std::uint32_t field);
