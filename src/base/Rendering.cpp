@@ -1,5 +1,6 @@
 #include "base/Rendering.h"
 
+#include <algorithm>
 #include <array>
 #include <charconv>
 #include <cmath>
@@ -65,7 +66,24 @@ void appendEscaped(std::string& out, char c) {
   }
 }
 
-bool needsEscape(char c) { return static_cast<unsigned char>(c) < 0x20 || c == '"' || c == '\\'; }
+// Characters that stand for themselves: printable ASCII without quote and backslash.
+constexpr std::array<bool, 256> makePlainCharacters() {
+  std::array<bool, 256> plain{};
+  for (std::size_t c = 0x20; c < 0x80; ++c) plain[c] = c != '"' && c != '\\';
+  return plain;
+}
+
+constexpr auto kPlain = makePlainCharacters();
+
+bool isPlain(char c) { return kPlain[static_cast<unsigned char>(c)]; }
+
+void appendSpecial(std::string& out, char c) {
+  if (static_cast<unsigned char>(c) >= 0x80) {
+    out += c;  // part of a longer UTF-8 sequence
+  } else {
+    appendEscaped(out, c);
+  }
+}
 
 void appendList(std::string& out, const List& list) {
   out += '[';
@@ -81,18 +99,20 @@ void appendList(std::string& out, const List& list) {
 }  // namespace
 
 void appendJsonString(std::string& out, std::string_view text) {
-  if (!isValidUtf8(text)) {
+  auto special = std::ranges::find_if_not(text, isPlain);
+  if (special != text.end() && !isValidUtf8(text)) {
     appendJsonString(out, withReplacements(text));
     return;
   }
   out += '"';
-  for (const char c : text) {
-    if (needsEscape(c)) {
-      appendEscaped(out, c);
-    } else {
-      out += c;
-    }
+  auto plain = text.begin();
+  while (special != text.end()) {
+    out.append(plain, special);
+    appendSpecial(out, *special);
+    plain = special + 1;
+    special = std::find_if_not(plain, text.end(), isPlain);
   }
+  out.append(plain, special);
   out += '"';
 }
 
