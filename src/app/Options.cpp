@@ -41,6 +41,8 @@ std::optional<Options> parseOptions(int argc, const char* const* argv, int& exit
                   "keep a PNG picture of the current screen in this file")
       ->type_name("FILE");
   line.add_flag("--self-test", options.selfTest, "open and draw every screen once, then end");
+  line.add_flag("-v,--verbose", options.verbose,
+                "what goes to the system log goes to standard error too");
   try {
     line.parse(argc, argv);
   } catch (const CLI::Success& answered) {

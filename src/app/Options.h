@@ -14,6 +14,7 @@ struct Options {
   std::string picture;  // file name; empty: keep none
   std::optional<Appearance::Theme> theme;
   bool selfTest = false;
+  bool verbose = false;  // what goes to the system log goes to standard error too
 };
 
 // Nothing when the program is to end at once, with that exit code: help and version were printed,

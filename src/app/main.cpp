@@ -14,6 +14,8 @@
 #include "app/SelfTest.h"
 #include "app/SignalQuit.h"
 #include "app/Source.h"
+#include "base/LogSink.h"
+#include "base/SystemLogSink.h"
 #include "ui/kit/ResourceBundle.h"
 #include "ui/quick/Appearance.h"
 #include "ui/quick/Navigation.h"
@@ -23,6 +25,11 @@
 namespace {
 
 const QString kName = QStringLiteral("qelwatch");
+
+void logOnStandardErrorToo() {
+  using Sink = qel::SystemLogSink;
+  qel::setSystemLog(std::make_shared<Sink>("qelwatch", Sink::Echo::standardError));
+}
 
 void chooseDisplay(const qel::Options& options) {
   if (qel::hasDisplay()) return;
@@ -82,6 +89,7 @@ int main(int argc, char** argv) {
   int exitCode = EXIT_SUCCESS;
   const auto options = qel::parseOptions(argc, argv, exitCode);
   if (!options) return exitCode;
+  if (options->verbose) logOnStandardErrorToo();
   qel::Source source;
   exitCode = source.open(*options);
   if (exitCode != EXIT_SUCCESS) return exitCode;

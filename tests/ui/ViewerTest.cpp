@@ -57,7 +57,8 @@ TEST_F(Viewer, tellsItsVersionAndItsOptions) {
   EXPECT_EQ(version.out.rfind("qelwatch ", 0), 0U) << version.out;
   const Outcome help = start({"--help"});
   EXPECT_EQ(help.exitCode, 0);
-  for (const char* option : {"--source", "--theme", "--picture", "--self-test", "--version"}) {
+  for (const char* option :
+       {"--source", "--bus", "--theme", "--picture", "--self-test", "--verbose", "--version"}) {
     EXPECT_NE(help.out.find(option), std::string::npos) << option;
   }
 }
