@@ -12,8 +12,9 @@ std::optional<Options> parseOptions(int argc, const char* const* argv, int& exit
   Options options;
   app.set_version_flag("--version", "basebandd " QEL_VERSION);
   app.add_option("--source", options.source,
-                 "Where events come from: simulated[,seed=N][,speed=N] or "
-                 "recording:FILE[,speed=N][,loop]")
+                 "Where events come from: simulated[,seed=N][,speed=N], "
+                 "recording:FILE[,speed=N][,loop] or "
+                 "modem-manager[:IMEI|:PATH][,bus=ADDRESS]")
       ->capture_default_str();
   app.add_option("--bus", options.bus, "system, session or a bus address")->capture_default_str();
   app.add_option("--state", options.stateDirectory,

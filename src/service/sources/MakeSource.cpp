@@ -5,6 +5,7 @@
 #include "service/sources/PacedSource.h"
 #include "service/sources/RecordingSequence.h"
 #include "service/sources/SourceChoice.h"
+#include "service/sources/modem_manager/ModemManagerSource.h"
 #include "service/sources/simulated/SimulatedDrive.h"
 
 namespace qel::service {
@@ -28,6 +29,12 @@ std::unique_ptr<EventSource> make(const RecordingChoice& choice, SourceError& er
   };
   return std::make_unique<PacedSource>("recording " + choice.path, std::move(makeSequence),
                                        choice.speed, clock);
+}
+
+// There may be no bus yet, and no modem: the source waits for them.
+std::unique_ptr<EventSource> make(const ModemManagerChoice& choice, SourceError&, WaitClock&) {
+  return std::make_unique<ModemManagerSource>(ModemWish{choice.imei, choice.path},
+                                              tesk::bus::BusAddress{choice.bus});
 }
 
 }  // namespace

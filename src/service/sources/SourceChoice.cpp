@@ -2,6 +2,7 @@
 
 #include <sysexits.h>
 
+#include <algorithm>
 #include <charconv>
 #include <utility>
 
@@ -10,6 +11,7 @@ namespace {
 
 constexpr std::string_view kSimulated = "simulated";
 constexpr std::string_view kRecording = "recording:";
+constexpr std::string_view kModemManager = "modem-manager";
 constexpr double kSlowest = 0.01;
 constexpr double kFastest = 1e6;
 
@@ -90,6 +92,43 @@ std::optional<SourceChoice> parseRecording(std::string_view text, SourceError& e
   return choice;
 }
 
+bool isImei(std::string_view text) {
+  constexpr std::size_t kImeiDigits = 15;    // 23.003, clause 6.2
+  constexpr std::size_t kImeiSvDigits = 16;  // with the software version
+  return (text.size() == kImeiDigits || text.size() == kImeiSvDigits) &&
+         std::ranges::all_of(text, [](char c) { return c >= '0' && c <= '9'; });
+}
+
+bool isObjectPath(std::string_view text) {
+  return text.size() > 1 && text.front() == '/' && text.back() != '/' &&
+         text.find("//") == std::string_view::npos && std::ranges::all_of(text, [](char c) {
+           return (c >= '0' && c <= '9') || (c >= 'A' && c <= 'Z') || (c >= 'a' && c <= 'z') ||
+                  c == '_' || c == '/';
+         });
+}
+
+// The bus is the last option: its address goes to the end.
+std::optional<SourceChoice> parseModemManager(std::string_view text, SourceError& error) {
+  constexpr std::string_view kBus = ",bus=";
+  ModemManagerChoice choice;
+  if (const std::size_t bus = text.find(kBus); bus != std::string_view::npos) {
+    choice.bus = text.substr(bus + kBus.size());
+    if (choice.bus.empty()) return refuse(error, "modem-manager source: no bus named");
+    text = text.substr(0, bus);
+  }
+  if (text.empty()) return choice;
+  const std::string_view modem = text.substr(1);
+  if (text.front() == ':' && isImei(modem)) {
+    choice.imei = modem;
+  } else if (text.front() == ':' && isObjectPath(modem)) {
+    choice.path = modem;
+  } else {
+    return refuse(error, "modem-manager source: bad modem \"" + std::string(text) +
+                             "\" (:IMEI of 15 digits or :/org/freedesktop/ModemManager1/Modem/N)");
+  }
+  return choice;
+}
+
 }  // namespace
 
 std::optional<SourceChoice> parseSourceChoice(std::string_view text, SourceError& error) {
@@ -97,9 +136,14 @@ std::optional<SourceChoice> parseSourceChoice(std::string_view text, SourceError
     return parseSimulated(text.substr(kSimulated.size()), error);
   }
   if (text.starts_with(kRecording)) return parseRecording(text.substr(kRecording.size()), error);
+  if (text == kModemManager || text.starts_with(std::string(kModemManager) + ":") ||
+      text.starts_with(std::string(kModemManager) + ",")) {
+    return parseModemManager(text.substr(kModemManager.size()), error);
+  }
   return refuse(error, "unknown source \"" + std::string(text) +
-                           "\" (simulated[,seed=N][,speed=N][,start=MS] or "
-                           "recording:FILE[,speed=N][,loop])");
+                           "\" (simulated[,seed=N][,speed=N][,start=MS], "
+                           "recording:FILE[,speed=N][,loop] or "
+                           "modem-manager[:IMEI|:PATH][,bus=ADDRESS])");
 }
 
 }  // namespace qel::service

@@ -26,10 +26,18 @@ struct RecordingChoice {
   bool loops = false;
 };
 
-using SourceChoice = std::variant<SimulatedChoice, RecordingChoice>;
+// A modem by its IMEI or its object path; with neither the first.
+struct ModemManagerChoice {
+  std::string imei;
+  std::string path;
+  std::string bus = "system";  // or "session", or an address
+};
 
-// "simulated[,seed=N][,speed=N][,start=MS]" or "recording:FILE[,speed=N][,loop]". A file name may
-// contain commas. Nothing when the text is neither; `error` then says what is wrong.
+using SourceChoice = std::variant<SimulatedChoice, RecordingChoice, ModemManagerChoice>;
+
+// "simulated[,seed=N][,speed=N][,start=MS]", "recording:FILE[,speed=N][,loop]" or
+// "modem-manager[:IMEI|:PATH][,bus=ADDRESS]". A file name and an address may contain commas.
+// Nothing when the text is none of them; `error` then says what is wrong.
 std::optional<SourceChoice> parseSourceChoice(std::string_view text, SourceError& error);
 
 // Nothing when there is no such source; a recording is read once to see that it is sound.

@@ -1,0 +1,36 @@
+// Values from the bus, read without trust: a value of another type than expected is none.
+#pragma once
+
+#include <sdbus-c++/Types.h>
+
+#include <map>
+#include <optional>
+#include <string>
+#include <string_view>
+
+namespace qel::service {
+
+using BusProperties = std::map<std::string, sdbus::Variant>;
+using BusInterfaces = std::map<std::string, BusProperties>;
+
+template <class Type>
+std::optional<Type> busValue(const sdbus::Variant& variant) {
+  if (variant.isEmpty() || !variant.containsValueOfType<Type>()) return std::nullopt;
+  return variant.get<Type>();
+}
+
+template <class Type>
+std::optional<Type> busValue(const BusProperties& properties, const std::string& key) {
+  const auto found = properties.find(key);
+  if (found == properties.end()) return std::nullopt;
+  return busValue<Type>(found->second);
+}
+
+// Empty when there is no such interface.
+inline const BusProperties& propertiesOf(const BusInterfaces& interfaces, const std::string& name) {
+  static const BusProperties kNone;
+  const auto found = interfaces.find(name);
+  return found == interfaces.end() ? kNone : found->second;
+}
+
+}  // namespace qel::service

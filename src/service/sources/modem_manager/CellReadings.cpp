@@ -1,0 +1,139 @@
+#include "service/sources/modem_manager/CellReadings.h"
+
+#include <algorithm>
+#include <array>
+#include <charconv>
+#include <cstdint>
+
+namespace qel::service {
+namespace {
+
+constexpr std::uint32_t kLargestRxlev = 63;     // 45.008, clause 8.1.4
+constexpr std::uint32_t kLargestArea = 0xFFFD;  // 0, FFFE and FFFF stand for none
+constexpr std::size_t kPlaceFields = 5;
+
+// How the dictionary of a technology's cell is read.
+struct CellKeys {
+  std::uint32_t cellType;
+  Technology technology;
+  const char* area;
+  const char* channel;
+  std::uint32_t largestChannel;
+  const char* code;
+  bool codeIsText;  // hexadecimal
+  std::uint32_t largestCode;
+  std::uint32_t largestCellId;  // all ones stand for none
+  const char* level;
+  std::optional<double> (*validLevel)(std::optional<double>);
+  const char* quality;
+  std::optional<double> (*validQuality)(std::optional<double>);
+};
+
+constexpr std::uint32_t kLargest28Bits = 0x0FFFFFFE;
+
+// GSM's level is an index and read apart.
+constexpr std::array kCellKeys = {
+    CellKeys{2, Technology::gsm, "lac", "arfcn", 1023, "base-station-id", true, 63, 0xFFFE, nullptr,
+             nullptr, nullptr, nullptr},
+    CellKeys{3, Technology::umts, "lac", "uarfcn", 16383, "psc", false, 511, kLargest28Bits, "rscp",
+             validRscp, "ecio", validEcno},
+    CellKeys{5, Technology::lte, "tac", "earfcn", 262143, "physical-ci", true, 503, kLargest28Bits,
+             "rsrp", validRsrp, "rsrq", validRsrq},
+};
+
+const CellKeys* keysOf(std::optional<std::uint32_t> cellType) {
+  const auto row = std::ranges::find_if(
+      kCellKeys, [&](const CellKeys& keys) { return cellType == keys.cellType; });
+  return row == kCellKeys.end() ? nullptr : &*row;
+}
+
+const CellKeys& keysOf(Technology technology) {
+  return *std::ranges::find(kCellKeys, technology, &CellKeys::technology);
+}
+
+std::optional<std::uint32_t> number(std::string_view text, int base) {
+  std::uint32_t value = 0;
+  const auto [end, code] = std::from_chars(text.data(), text.data() + text.size(), value, base);
+  if (code != std::errc() || end != text.data() + text.size()) return std::nullopt;
+  return value;
+}
+
+std::optional<std::uint32_t> hexNumber(std::optional<std::string> text) {
+  return text ? number(*text, 16) : std::nullopt;
+}
+
+std::optional<std::uint32_t> atMost(std::uint32_t most, std::optional<std::uint32_t> value) {
+  return value && *value <= most ? value : std::nullopt;
+}
+
+std::optional<std::uint32_t> validArea(std::optional<std::uint32_t> area) {
+  return area && *area != 0 ? atMost(kLargestArea, area) : std::nullopt;
+}
+
+}  // namespace
+
+std::optional<double> within(std::optional<double> value, double least, double most) {
+  return value && *value >= least && *value <= most ? value : std::nullopt;
+}
+
+std::optional<double> validRsrp(std::optional<double> dbm) { return within(dbm, -156, -31); }
+std::optional<double> validRsrq(std::optional<double> db) { return within(db, -34, 2.5); }
+std::optional<double> validRscp(std::optional<double> dbm) { return within(dbm, -121, -24); }
+std::optional<double> validEcno(std::optional<double> db) { return within(db, -32, 0); }
+std::optional<double> validRssi(std::optional<double> dbm) { return within(dbm, -125, -20); }
+std::optional<double> validSnr(std::optional<double> db) { return within(db, -30, 50); }
+
+std::optional<CellReading> cellReading(const BusProperties& cell) {
+  const CellKeys* keys = keysOf(busValue<std::uint32_t>(cell, "cell-type"));
+  if (!keys) return std::nullopt;
+  CellReading reading;
+  reading.technology = keys->technology;
+  reading.serving = busValue<bool>(cell, "serving").value_or(false);
+  reading.network = networkCode(busValue<std::string>(cell, "operator-id").value_or(""));
+  reading.area = validArea(hexNumber(busValue<std::string>(cell, keys->area)));
+  reading.cellId = atMost(keys->largestCellId, hexNumber(busValue<std::string>(cell, "ci")));
+  reading.channel = atMost(keys->largestChannel, busValue<std::uint32_t>(cell, keys->channel));
+  reading.code = atMost(keys->largestCode, keys->codeIsText
+                                               ? hexNumber(busValue<std::string>(cell, keys->code))
+                                               : busValue<std::uint32_t>(cell, keys->code));
+  if (keys->level) {
+    reading.levelDbm = keys->validLevel(busValue<double>(cell, keys->level));
+    reading.qualityDb = keys->validQuality(busValue<double>(cell, keys->quality));
+  } else if (const auto rxlev = atMost(kLargestRxlev, busValue<std::uint32_t>(cell, "rx-level"))) {
+    reading.levelDbm = static_cast<double>(*rxlev) - 110;
+  }
+  return reading;
+}
+
+std::optional<NetworkCode> networkCode(std::string_view digits) {
+  constexpr std::size_t kMccDigits = 3;
+  if (digits.size() != 5 && digits.size() != 6) return std::nullopt;
+  if (!std::ranges::all_of(digits, [](char c) { return c >= '0' && c <= '9'; })) {
+    return std::nullopt;
+  }
+  const auto mcc = number(digits.substr(0, kMccDigits), 10);
+  const auto mnc = number(digits.substr(kMccDigits), 10);
+  if (!mcc || !mnc || *mcc == 0) return std::nullopt;
+  return NetworkCode{*mcc, *mnc, static_cast<std::uint32_t>(digits.size() - kMccDigits)};
+}
+
+std::optional<CellReading> placeReading(std::string_view text, Technology technology) {
+  std::array<std::string_view, kPlaceFields> fields;
+  for (std::string_view& field : fields) {
+    field = text.substr(0, text.find(','));
+    text.remove_prefix(std::min(text.size(), field.size() + 1));
+  }
+  if (!text.empty()) return std::nullopt;
+  const auto& [mcc, mnc, lac, ci, tac] = fields;
+  CellReading reading;
+  reading.technology = technology;
+  reading.serving = true;
+  reading.network = networkCode(std::string(mcc) + std::string(mnc));
+  reading.area = validArea(number(technology == Technology::lte ? tac : lac, 16));
+  const auto cellId = number(ci, 16);
+  // Nought is what stands there when there is no cell.
+  if (cellId != 0U) reading.cellId = atMost(keysOf(technology).largestCellId, cellId);
+  return reading;
+}
+
+}  // namespace qel::service

@@ -1,0 +1,79 @@
+// One bus connection to ModemManager and the one modem of it that is watched.
+#pragma once
+
+#include <chrono>
+#include <memory>
+#include <optional>
+#include <string>
+
+#include "service/sources/modem_manager/BusCalls.h"
+#include "service/sources/modem_manager/ModemPicture.h"
+#include "service/sources/modem_manager/ObjectTree.h"
+#include "service/sources/modem_manager/PolledMethod.h"
+#include "service/sources/modem_manager/SaidOnce.h"
+#include "service/sources/modem_manager/SignalRate.h"
+#include "tesk/bus/BusAddress.h"
+
+namespace qel::service {
+
+// Which modem, by one of the two; with neither the first that there is.
+struct ModemWish {
+  std::string imei;
+  std::string path;
+};
+
+struct ModemTiming {
+  std::chrono::milliseconds period{5000};        // from report to report, and of polled methods
+  std::chrono::milliseconds callTimeout{10000};  // of one call
+};
+
+// Belongs to one thread and lives as long as the connection: when that is lost, calls throw
+// sdbus::Error and the link is of no more use. No call waits for an answer but finish().
+class ModemLink {
+ public:
+  using Clock = std::chrono::steady_clock;
+
+  ModemLink(const tesk::bus::BusAddress& address, ModemWish wish, const ModemTiming& timing,
+            SaidOnce& said);
+
+  // Waits for the bus, for `wakeDescriptor` or until then, and takes what came.
+  void waitAndProcess(int wakeDescriptor, Clock::time_point until);
+
+  // The modem as it is known now; nothing while there is none.
+  std::optional<ModemPicture> picture() const;
+
+  // Leaves the modem as it was found. Waits some two seconds for that at most.
+  void finish();
+
+ private:
+  // What is done with the one modem; made anew for another.
+  struct Watched {
+    Watched(const std::string& path, std::uint32_t rateS);
+
+    const std::string path;
+    ModemAnswers answers;
+    PolledMethod cells;
+    PolledMethod place;
+    SignalRate rate;
+    std::uint32_t accessTechnologies = 0;
+  };
+
+  void process();
+  void choose();
+  bool isWished(const std::string& path, const BusInterfaces& interfaces) const;
+  void attend(Clock::time_point now);
+  const BusInterfaces& watchedInterfaces() const;
+  Clock::time_point due() const;
+
+  const ModemWish _wish;
+  const ModemTiming _timing;
+  SaidOnce& _said;
+  const std::unique_ptr<sdbus::IConnection> _connection;
+  // Before the calls, whose answers go there: nothing is answered while it goes.
+  std::unique_ptr<Watched> _watched;
+  BusCalls _calls;
+  ObjectTree _tree;
+  Clock::time_point _askAgainAt;
+};
+
+}  // namespace qel::service

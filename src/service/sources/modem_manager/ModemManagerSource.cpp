@@ -1,0 +1,162 @@
+#include "service/sources/modem_manager/ModemManagerSource.h"
+
+#include <poll.h>
+
+#include <algorithm>
+#include <atomic>
+#include <utility>
+
+#include "base/Clock.h"
+#include "service/sources/modem_manager/MetricKeeper.h"
+#include "tesk/bus/WakeUp.h"
+
+namespace qel::service {
+namespace {
+
+using namespace std::chrono_literals;
+using Steady = std::chrono::steady_clock;
+
+constexpr std::chrono::milliseconds kFirstPause = 250ms;
+constexpr std::chrono::milliseconds kLongestPause = 5s;
+
+}  // namespace
+
+struct ModemManagerSource::Run {
+  Run(ModemWish modemWish, tesk::bus::BusAddress busAddress, const ModemTiming& modemTiming)
+      : wish(std::move(modemWish)),
+        address(std::move(busAddress)),
+        timing(modemTiming),
+        keeper(modemTiming.period) {}
+
+  void stop() {
+    stopping = true;
+    wakeUp.signal();
+  }
+
+  // Connects, lives with that connection until it is lost, pauses, and so on.
+  void play() {
+    auto pause = kFirstPause;
+    while (!stopping) {
+      try {
+        ModemLink link(address, wish, timing, said);
+        pause = kFirstPause;
+        live(link);
+      } catch (const sdbus::Error& error) {
+        // A failed attempt costs some memory inside the bus library, so the pauses grow.
+        said.say(address.name, "no message bus (" + error.getMessage() + "), trying again");
+      }
+      keeper.update(std::nullopt, 0, Steady::now(), {});
+      rest(pause);
+      pause = std::min(pause * 2, kLongestPause);
+    }
+  }
+
+  void live(ModemLink& link) {
+    while (!stopping) {
+      noticeListeners();
+      keeper.update(link.picture(), systemClock().nowMs(), Steady::now(),
+                    [this](const ServiceEvent& event) { hand(event); });
+      if (stopping) break;
+      link.waitAndProcess(wakeUp.descriptor(), keeper.due());
+    }
+    link.finish();
+  }
+
+  // A new listener is told everything.
+  void noticeListeners() {
+    const std::uint64_t now = listeners->generation();
+    if (std::exchange(generation, now) != now) keeper.sendAll();
+  }
+
+  void hand(const ServiceEvent& event) {
+    if (stopping) return;
+    // Held no longer than this: letting go may be the end of the receiver and of the source.
+    if (const auto taker = receiver.lock()) {
+      taker->take(event);
+    } else {
+      stopping = true;
+    }
+  }
+
+  void rest(std::chrono::milliseconds pause) {
+    if (stopping) return;
+    pollfd waited{wakeUp.descriptor(), POLLIN, 0};
+    ::poll(&waited, 1, static_cast<int>(pause.count()));
+  }
+
+  const ModemWish wish;
+  const tesk::bus::BusAddress address;
+  const ModemTiming timing;
+  std::weak_ptr<EventReceiver> receiver;
+  std::shared_ptr<ListenerSignal> listeners;
+  const tesk::bus::WakeUp wakeUp;  // for the end alone, so it is never cleared
+  std::atomic<bool> stopping = false;
+  std::atomic<bool> finished = false;  // the thread is about to end
+  MetricKeeper keeper;
+  // The thread only.
+  SaidOnce said;
+  std::uint64_t generation = 0;
+};
+
+ModemManagerSource::ModemManagerSource(ModemWish wish, tesk::bus::BusAddress address,
+                                       ModemTiming timing)
+    : _wish(std::move(wish)), _address(std::move(address)), _timing(timing) {}
+
+ModemManagerSource::~ModemManagerSource() {
+  stop();
+  for (Worker& worker : _workers) {
+    if (worker.thread.get_id() == std::this_thread::get_id()) {
+      worker.thread.detach();
+    } else {
+      worker.thread.join();
+    }
+  }
+}
+
+void ModemManagerSource::joinFinished() {
+  std::erase_if(_workers, [](Worker& worker) {
+    if (!worker.run->finished) return false;
+    worker.thread.join();
+    return true;
+  });
+}
+
+void ModemManagerSource::start(std::weak_ptr<EventReceiver> receiver,
+                               std::shared_ptr<ListenerSignal> listeners) {
+  stop();
+  auto run = std::make_shared<Run>(_wish, _address, _timing);
+  run->receiver = std::move(receiver);
+  run->listeners = std::move(listeners);
+  run->generation = run->listeners->generation();
+  const std::lock_guard lock(_mutex);
+  joinFinished();
+  _run = run;
+  _workers.push_back({run, std::thread([run] {
+                        run->play();
+                        run->finished = true;
+                      })});
+}
+
+void ModemManagerSource::stop() {
+  const std::lock_guard lock(_mutex);
+  if (_run) _run->stop();
+  _run.reset();
+}
+
+SourceAnswer ModemManagerSource::query(std::uint32_t metric) {
+  std::shared_ptr<Run> run;
+  {
+    const std::lock_guard lock(_mutex);
+    run = _run;
+  }
+  if (!run) return {CommandCode::metricNotAvailable, "the source is not running", 0, {}};
+  return run->keeper.query(metric);
+}
+
+std::string ModemManagerSource::description() const {
+  if (!_wish.imei.empty()) return "modem " + _wish.imei + " of ModemManager";
+  if (!_wish.path.empty()) return "modem " + _wish.path + " of ModemManager";
+  return "first modem of ModemManager";
+}
+
+}  // namespace qel::service

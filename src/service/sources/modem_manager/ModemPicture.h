@@ -1,0 +1,71 @@
+// What is known of a modem at a moment, in plain values: made from the bus by ModemReading, turned
+// into metrics by the reports.
+#pragma once
+
+#include <cstdint>
+#include <optional>
+#include <string>
+#include <vector>
+
+#include "base/Bytes.h"
+#include "service/sources/simulated/Network.h"
+
+namespace qel::service {
+
+// A member without value is one that the modem does not give, or whose value makes no sense.
+// Levels are in dBm, qualities in dB.
+
+// Country and network code (23.003, clause 2.2).
+struct NetworkCode {
+  std::uint32_t mcc = 0;
+  std::uint32_t mnc = 0;
+  std::uint32_t mncDigits = 2;
+  friend bool operator==(const NetworkCode&, const NetworkCode&) = default;
+};
+
+struct CellReading {
+  Technology technology = Technology::lte;
+  bool serving = false;
+  std::optional<NetworkCode> network;
+  std::optional<std::uint32_t> area;     // tracking or location area code
+  std::optional<std::uint32_t> cellId;   // 28 bits, for GSM 16
+  std::optional<std::uint32_t> channel;  // EARFCN, UARFCN or ARFCN, downlink
+  std::optional<std::uint32_t> code;     // physical cell identity, scrambling code or BSIC
+  std::optional<double> levelDbm;        // RSRP, RSCP or RXLEV
+  std::optional<double> qualityDb;       // RSRQ or Ec/No
+};
+
+// Of the serving cell.
+struct LevelReading {
+  std::optional<double> rssiDbm;
+  std::optional<double> levelDbm;   // RSRP or RSCP
+  std::optional<double> qualityDb;  // RSRQ or Ec/No
+  std::optional<double> snrDb;
+};
+
+// A packet connection that is up.
+struct BearerReading {
+  std::uint32_t profile = 0;  // 0: not known
+  std::string apn;
+  Bytes address4;  // in network byte order, as the following; empty: none
+  Bytes address6;
+  std::vector<Bytes> nameServers;  // IPv4 first
+  friend bool operator==(const BearerReading&, const BearerReading&) = default;
+};
+
+struct ModemPicture {
+  std::optional<Technology> technology;        // of the serving cell
+  std::uint32_t accessTechnologies = 0;        // as the modem gives them, a bit each
+  std::optional<std::uint32_t> registration;   // as the modem numbers it
+  std::optional<std::uint32_t> packetService;  // likewise
+  std::optional<NetworkCode> network;          // the registered one
+  std::optional<CellReading> serving;          // from every place that tells of it
+  LevelReading levels;
+  bool cellsKnown = false;                            // the modem lists cells
+  std::vector<CellReading> neighbours;                // of all technologies
+  std::optional<std::vector<BearerReading>> bearers;  // those that are connected
+  std::string imsi;                                   // digits, or nothing
+  std::string iccid;
+};
+
+}  // namespace qel::service

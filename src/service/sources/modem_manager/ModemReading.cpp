@@ -1,0 +1,223 @@
+#include "service/sources/modem_manager/ModemReading.h"
+
+#include <arpa/inet.h>
+
+#include <algorithm>
+#include <array>
+
+#include "service/sources/modem_manager/CellReadings.h"
+#include "service/sources/modem_manager/Names.h"
+
+namespace qel::service {
+namespace {
+
+struct TechnologyBits {
+  std::uint32_t bits;
+  Technology technology;
+  const char* signal;  // the property of Signal
+  const char* level;
+  std::optional<double> (*validLevel)(std::optional<double>);
+  const char* quality;
+  std::optional<double> (*validQuality)(std::optional<double>);
+};
+
+// The newest first: a phone on LTE may name older ones beside it.
+constexpr std::array kTechnologies = {
+    TechnologyBits{mm::kAnyLte, Technology::lte, "Lte", "rsrp", validRsrp, "rsrq", validRsrq},
+    TechnologyBits{mm::kAnyUmts, Technology::umts, "Umts", "rscp", validRscp, "ecio", validEcno},
+    TechnologyBits{mm::kAnyGsm, Technology::gsm, "Gsm", nullptr, nullptr, nullptr, nullptr},
+};
+
+const BusInterfaces& objectAt(const BusObjects& objects, const std::string& path) {
+  static const BusInterfaces kNone;
+  const auto found = objects.find(path);
+  return found == objects.end() ? kNone : found->second;
+}
+
+std::string digitsOnly(std::string text) {
+  // A filler at the end is how some cards' digits come.
+  while (!text.empty() && (text.back() == 'F' || text.back() == 'f')) text.pop_back();
+  const bool digits = std::ranges::all_of(text, [](char c) { return c >= '0' && c <= '9'; });
+  return digits ? text : std::string();
+}
+
+std::string digitsOf(const BusProperties& properties, const char* key, std::size_t fewest,
+                     std::size_t most) {
+  std::string digits = digitsOnly(busValue<std::string>(properties, key).value_or(""));
+  return digits.size() >= fewest && digits.size() <= most ? digits : std::string();
+}
+
+Bytes addressOf(const BusProperties& configuration, const char* key, int family) {
+  std::array<std::uint8_t, 16> address{};
+  const std::string text = busValue<std::string>(configuration, key).value_or("");
+  if (::inet_pton(family, text.c_str(), address.data()) != 1) return {};
+  const std::ptrdiff_t size = family == AF_INET ? 4 : 16;
+  return {address.begin(), address.begin() + size};
+}
+
+struct AddressKind {
+  const char* property;
+  int family;
+  Bytes BearerReading::*address;
+};
+constexpr std::array kAddressKinds = {
+    AddressKind{"Ip4Config", AF_INET, &BearerReading::address4},
+    AddressKind{"Ip6Config", AF_INET6, &BearerReading::address6},
+};
+
+// Nothing unless it is connected.
+std::optional<BearerReading> bearerReading(const BusProperties& bearer) {
+  if (!busValue<bool>(bearer, "Connected").value_or(false)) return std::nullopt;
+  BearerReading reading;
+  const auto asked = busValue<BusProperties>(bearer, "Properties").value_or(BusProperties());
+  reading.apn = busValue<std::string>(asked, "apn").value_or("");
+  reading.profile = static_cast<std::uint32_t>(
+      std::max(0, busValue<std::int32_t>(bearer, "ProfileId").value_or(0)));
+  for (const AddressKind& kind : kAddressKinds) {
+    const auto configuration = busValue<BusProperties>(bearer, kind.property);
+    if (!configuration) continue;
+    reading.*kind.address = addressOf(*configuration, "address", kind.family);
+    for (const char* key : {"dns1", "dns2", "dns3"}) {
+      if (Bytes server = addressOf(*configuration, key, kind.family); !server.empty()) {
+        reading.nameServers.push_back(std::move(server));
+      }
+    }
+  }
+  return reading;
+}
+
+std::optional<std::vector<BearerReading>> bearersOf(const BusObjects& objects,
+                                                    const BusInterfaces& modem) {
+  const auto paths =
+      busValue<std::vector<sdbus::ObjectPath>>(propertiesOf(modem, mm::kModem), "Bearers");
+  if (!paths) return std::nullopt;
+  std::vector<BearerReading> bearers;
+  for (const std::string& path : *paths) {
+    if (auto bearer = bearerReading(propertiesOf(objectAt(objects, path), mm::kBearer))) {
+      bearers.push_back(std::move(*bearer));
+    }
+  }
+  return bearers;
+}
+
+const CellReading* servingAmong(const std::vector<CellReading>& cells,
+                                std::optional<Technology> technology) {
+  const auto found = std::ranges::find_if(cells, [&](const CellReading& cell) {
+    return cell.serving && (!technology || cell.technology == *technology);
+  });
+  return found == cells.end() ? nullptr : &*found;
+}
+
+std::optional<Technology> technologyOf(std::uint32_t bits, const ModemAnswers& answers) {
+  for (const TechnologyBits& row : kTechnologies) {
+    if ((bits & row.bits) != 0) return row.technology;
+  }
+  const CellReading* serving = answers.cells ? servingAmong(*answers.cells, {}) : nullptr;
+  return serving ? std::optional(serving->technology) : std::nullopt;
+}
+
+template <class Type>
+void fill(std::optional<Type>& value, const std::optional<Type>& other) {
+  if (!value) value = other;
+}
+
+// Adds what another place knows of the cell, unless it speaks of another cell.
+void complete(CellReading& cell, const CellReading& place) {
+  const auto differs = [](const auto& a, const auto& b) { return a && b && *a != *b; };
+  if (differs(cell.cellId, place.cellId) || differs(cell.area, place.area)) return;
+  fill(cell.cellId, place.cellId);
+  fill(cell.area, place.area);
+  fill(cell.network, place.network);
+}
+
+void readCells(ModemPicture& picture, const BusInterfaces& modem, const ModemAnswers& answers) {
+  const CellReading* serving = nullptr;
+  if (answers.cells) {
+    serving = servingAmong(*answers.cells, picture.technology);
+    // With a serving cell of another technology the list is of before the phone moved.
+    picture.cellsKnown = serving || !servingAmong(*answers.cells, {});
+  }
+  if (picture.cellsKnown) {
+    std::ranges::copy_if(*answers.cells, std::back_inserter(picture.neighbours),
+                         [](const CellReading& cell) { return !cell.serving; });
+  }
+  if (!picture.technology) return;
+  CellReading cell = serving ? *serving : CellReading();
+  cell.technology = *picture.technology;
+  std::string place = answers.place;
+  if (const auto locations = busValue<std::map<std::uint32_t, sdbus::Variant>>(
+          propertiesOf(modem, mm::kLocation), "Location");
+      locations && !placeIn(*locations).empty()) {
+    place = placeIn(*locations);
+  }
+  if (const auto reading = placeReading(place, *picture.technology)) complete(cell, *reading);
+  fill(cell.network, picture.network);
+  if (cell.network || cell.area || cell.cellId || cell.channel || cell.code) picture.serving = cell;
+}
+
+void readLevels(ModemPicture& picture, const BusInterfaces& modem) {
+  if (!picture.technology) return;
+  const TechnologyBits& row =
+      *std::ranges::find(kTechnologies, *picture.technology, &TechnologyBits::technology);
+  const auto signal = busValue<BusProperties>(propertiesOf(modem, mm::kSignal), row.signal)
+                          .value_or(BusProperties());
+  picture.levels.rssiDbm = validRssi(busValue<double>(signal, "rssi"));
+  picture.levels.snrDb = validSnr(busValue<double>(signal, "snr"));
+  if (row.level) {
+    picture.levels.levelDbm = row.validLevel(busValue<double>(signal, row.level));
+    picture.levels.qualityDb = row.validQuality(busValue<double>(signal, row.quality));
+  }
+  if (!picture.serving) return;
+  fill(picture.levels.levelDbm, picture.serving->levelDbm);
+  fill(picture.levels.qualityDb, picture.serving->qualityDb);
+}
+
+}  // namespace
+
+ModemPicture pictureOf(const BusObjects& objects, const std::string& modem,
+                       const ModemAnswers& answers) {
+  const BusInterfaces& interfaces = objectAt(objects, modem);
+  const BusProperties& own = propertiesOf(interfaces, mm::kModem);
+  const BusProperties& registered = propertiesOf(interfaces, mm::kModem3gpp);
+  ModemPicture picture;
+  picture.registration = busValue<std::uint32_t>(registered, "RegistrationState");
+  picture.packetService = busValue<std::uint32_t>(registered, "PacketServiceState");
+  picture.network = networkCode(busValue<std::string>(registered, "OperatorCode").value_or(""));
+  picture.bearers = bearersOf(objects, interfaces);
+  const auto simPath = busValue<sdbus::ObjectPath>(own, "Sim").value_or(mm::kNoObject);
+  const BusProperties& sim = propertiesOf(objectAt(objects, simPath), mm::kSim);
+  picture.imsi = digitsOf(sim, "Imsi", 6, 15);             // 23.003, clause 2.2
+  picture.iccid = digitsOf(sim, "SimIdentifier", 18, 20);  // ITU-T E.118
+  if (isEnabled(interfaces)) {
+    picture.accessTechnologies = busValue<std::uint32_t>(own, "AccessTechnologies").value_or(0);
+    picture.technology = technologyOf(picture.accessTechnologies, answers);
+    readCells(picture, interfaces, answers);
+    readLevels(picture, interfaces);
+  }
+  return picture;
+}
+
+bool isEnabled(const BusInterfaces& modem) {
+  return busValue<std::int32_t>(propertiesOf(modem, mm::kModem), "State").value_or(0) >=
+         mm::kStateEnabled;
+}
+
+std::vector<ModemPart> partsOf(const BusInterfaces& modem) {
+  const BusProperties& own = propertiesOf(modem, mm::kModem);
+  std::vector<ModemPart> parts;
+  const auto sim = busValue<sdbus::ObjectPath>(own, "Sim");
+  if (sim && *sim != mm::kNoObject) parts.push_back({*sim, mm::kSim});
+  for (const std::string& bearer : busValue<std::vector<sdbus::ObjectPath>>(own, "Bearers")
+                                       .value_or(std::vector<sdbus::ObjectPath>())) {
+    if (bearer != mm::kNoObject) parts.push_back({bearer, mm::kBearer});
+  }
+  return parts;
+}
+
+std::string placeIn(const std::map<std::uint32_t, sdbus::Variant>& locations) {
+  const auto found = locations.find(mm::kPlaceOfCell);
+  if (found == locations.end()) return "";
+  return busValue<std::string>(found->second).value_or("");
+}
+
+}  // namespace qel::service

@@ -1,0 +1,40 @@
+// A modem's objects on the bus into one picture of it.
+#pragma once
+
+#include <map>
+#include <optional>
+#include <string>
+#include <vector>
+
+#include "service/sources/modem_manager/BusValues.h"
+#include "service/sources/modem_manager/ModemPicture.h"
+
+namespace qel::service {
+
+// By object path.
+using BusObjects = std::map<std::string, BusInterfaces>;
+
+// What methods have answered, beside the properties.
+struct ModemAnswers {
+  std::optional<std::vector<CellReading>> cells;  // none: GetCellInfo is not to be had
+  std::string place;                              // of GetLocation; may be empty
+};
+
+// `modem` is a path in `objects`, where its SIM and bearers are too once they have been read.
+ModemPicture pictureOf(const BusObjects& objects, const std::string& modem,
+                       const ModemAnswers& answers);
+
+// Enabled, so that its radio works.
+bool isEnabled(const BusInterfaces& modem);
+
+// The SIM and the bearers that the modem names.
+struct ModemPart {
+  std::string path;
+  const char* interface;
+};
+std::vector<ModemPart> partsOf(const BusInterfaces& modem);
+
+// The place of the serving cell in a dictionary of locations; empty when it is not in there.
+std::string placeIn(const std::map<std::uint32_t, sdbus::Variant>& locations);
+
+}  // namespace qel::service

@@ -1,0 +1,50 @@
+// A method of a modem that is called again and again, and given up when it is refused.
+#pragma once
+
+#include <chrono>
+#include <functional>
+#include <memory>
+#include <string>
+
+#include "service/sources/modem_manager/BusCalls.h"
+#include "service/sources/modem_manager/SaidOnce.h"
+
+namespace qel::service {
+
+struct MethodRow {
+  const char* interface;
+  const char* member;
+  const char* deniedAdvice;       // one line: what is missing, and what would allow it
+  const char* unsupportedAdvice;  // one line
+};
+
+// One modem's. One thread; never waits: at most one call is under way.
+class PolledMethod {
+ public:
+  using Clock = std::chrono::steady_clock;
+  using Take = std::function<void(sdbus::MethodReply& reply)>;  // may throw sdbus::Error
+
+  // `forget` when the last answer no longer holds: the call has failed.
+  PolledMethod(const MethodRow& row, std::string modem, Take take, std::function<void()> forget)
+      : _row(row), _modem(std::move(modem)), _take(std::move(take)), _forget(std::move(forget)) {}
+
+  // Calls when that is due. `identity` names the modem to whoever reads the log once.
+  void step(BusCalls& calls, SaidOnce& said, const std::string& identity, Clock::time_point now,
+            std::chrono::milliseconds period);
+  // The next step calls, if it may.
+  void callSoon() { _due = {}; }
+  Clock::time_point due() const;
+
+ private:
+  void failed(const sdbus::Error& error, SaidOnce& said, const std::string& identity);
+
+  const MethodRow& _row;
+  const std::string _modem;
+  const Take _take;
+  const std::function<void()> _forget;
+  bool _underWay = false;
+  bool _off = false;
+  Clock::time_point _due;
+};
+
+}  // namespace qel::service
