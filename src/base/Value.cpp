@@ -16,20 +16,6 @@ Value::Value(Dictionary value) : _kind(Kind::dictionary) {
 
 Value::Value(const Value& other) : _kind(other._kind) {
   switch (_kind) {
-    case Kind::null:
-      break;
-    case Kind::boolean:
-      _as.boolean = other._as.boolean;
-      break;
-    case Kind::signedInteger:
-      _as.signedInteger = other._as.signedInteger;
-      break;
-    case Kind::unsignedInteger:
-      _as.unsignedInteger = other._as.unsignedInteger;
-      break;
-    case Kind::floating:
-      _as.floating = other._as.floating;
-      break;
     case Kind::text:
       new (&_as.text) Text(other._as.text);
       break;
@@ -42,38 +28,8 @@ Value::Value(const Value& other) : _kind(other._kind) {
     case Kind::dictionary:
       _as.dictionary = new Dictionary(*other._as.dictionary);
       break;
-  }
-}
-
-Value::Value(Value&& other) noexcept : _kind(std::exchange(other._kind, Kind::null)) {
-  switch (_kind) {
-    case Kind::null:
-      break;
-    case Kind::boolean:
-      _as.boolean = other._as.boolean;
-      break;
-    case Kind::signedInteger:
-      _as.signedInteger = other._as.signedInteger;
-      break;
-    case Kind::unsignedInteger:
-      _as.unsignedInteger = other._as.unsignedInteger;
-      break;
-    case Kind::floating:
-      _as.floating = other._as.floating;
-      break;
-    case Kind::text:
-      new (&_as.text) Text(std::move(other._as.text));
-      other._as.text.~Text();
-      break;
-    case Kind::bytes:
-      _as.bytes = other._as.bytes;
-      break;
-    case Kind::list:
-      _as.list = other._as.list;
-      break;
-    case Kind::dictionary:
-      _as.dictionary = other._as.dictionary;
-      break;
+    default:
+      _as.takeOver(other._as);
   }
 }
 

@@ -3,6 +3,7 @@
 
 #include <concepts>
 #include <cstdint>
+#include <cstring>
 #include <optional>
 #include <string>
 #include <string_view>
@@ -22,6 +23,7 @@ using List = std::vector<Value>;
 // same kind and hold the same; a signed and an unsigned integer of the same number are equal.
 class Value {
  public:
+  // Those from text on own something.
   enum class Kind : std::uint8_t {
     null,
     boolean,
@@ -56,10 +58,14 @@ class Value {
   Value(const void*) = delete;
 
   Value(const Value& other);
-  Value(Value&& other) noexcept;
+  Value(Value&& other) noexcept : _kind(std::exchange(other._kind, Kind::null)) {
+    _as.takeOver(other._as);
+  }
   Value& operator=(const Value& other);
   Value& operator=(Value&& other) noexcept;
-  ~Value() { destroy(); }
+  ~Value() {
+    if (_kind >= Kind::text) destroy();
+  }
 
   Kind kind() const { return _kind; }
   bool isNull() const { return _kind == Kind::null; }
@@ -88,6 +94,10 @@ class Value {
   union Storage {
     Storage() : unsignedInteger(0) {}
     ~Storage() {}
+    // Byte for byte; whatever the other one owns is then this one's.
+    void takeOver(const Storage& other) {
+      std::memcpy(static_cast<void*>(this), static_cast<const void*>(&other), sizeof *this);
+    }
     bool boolean;
     std::int64_t signedInteger;
     std::uint64_t unsignedInteger;
