@@ -1,8 +1,8 @@
 // Immutable text that either owns its characters or points at text that never goes away.
 #pragma once
 
-#include <compare>
 #include <cstdint>
+#include <limits>
 #include <string>
 #include <string_view>
 #include <utility>
@@ -19,7 +19,12 @@ class Text {
   Text(const char* copied) : Text(std::string_view(copied)) {}
 
   // `text` must outlive every copy of the result: string literals and constant tables only.
-  static Text borrowed(std::string_view text);
+  static Text borrowed(std::string_view text) {
+    Text result;
+    result._size = checkedSize(text);
+    if (result._size != 0) result._data = text.data();
+    return result;
+  }
 
   Text(const Text& other);
   Text(Text&& other) noexcept { swap(other); }
@@ -27,7 +32,9 @@ class Text {
     swap(other);
     return *this;
   }
-  ~Text() { release(); }
+  ~Text() {
+    if (_owned) delete[] _data;
+  }
 
   std::string_view view() const { return {_data, _size}; }
   operator std::string_view() const { return view(); }
@@ -42,7 +49,11 @@ class Text {
   friend bool operator==(const Text& a, const Text& b) { return a.view() == b.view(); }
 
  private:
-  void release();
+  static std::uint32_t checkedSize(std::string_view text) {
+    if (text.size() > std::numeric_limits<std::uint32_t>::max()) refuseSize();
+    return static_cast<std::uint32_t>(text.size());
+  }
+  [[noreturn]] static void refuseSize();
 
   const char* _data = "";
   std::uint32_t _size = 0;
