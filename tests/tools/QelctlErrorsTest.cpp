@@ -26,6 +26,17 @@ TEST(Qelctl, refusesWrongUsage) {
   expectError({"replay"}, 64, "FILE");
   expectError({"replay", "--nonsense", "x"}, 64, "usage");
   expectError({"screen", "x", "LTE"}, 64, "CATEGORY");
+  expectError({"live", "--screen", "LTE"}, 64, "--screen");
+  expectError({"live", "--source", "simulated"}, 64, "usage");
+  expectError({"record"}, 64, "FILE");
+  expectError({"record", "x", "--duration", "0"}, 64, "--duration");
+  expectError({"record", "x", "--max-age", "-1"}, 64, "--max-age");
+  expectError({"record", "x", "--max-size", "10X"}, 64, "--max-size");
+  expectError({"record", "x", "--max-size", "0"}, 64, "--max-size");
+  expectError({"record", "x", "--min-free", "much"}, 64, "--min-free");
+  expectError({"record", "x", "--keep", "0"}, 64, "--keep");
+  expectError({"record", "-", "--max-size", "1M"}, 64, "standard output");
+  expectError({"record", "-", "--max-age", "60"}, 64, "standard output");
 }
 
 TEST(Qelctl, refusesBadData) {
@@ -59,7 +70,8 @@ TEST(Qelctl, explainsItselfAndEverySubcommand) {
   EXPECT_TRUE(qelctl({"--version"}).out.starts_with("qelctl "));
   const Outcome help = qelctl({"--help"});
   EXPECT_EQ(help.exitCode, 0);
-  for (const char* command : {"decode", "replay", "store", "screen", "screens", "metrics"}) {
+  for (const char* command :
+       {"decode", "replay", "store", "screen", "screens", "metrics", "status", "live", "record"}) {
     EXPECT_NE(help.out.find(command), std::string::npos);
     const Outcome detail = qelctl({command, "--help"});
     EXPECT_EQ(detail.exitCode, 0);

@@ -1,0 +1,97 @@
+#include <nlohmann/json.hpp>
+
+#include "tools/WithService.h"
+
+namespace qel::testing {
+namespace {
+
+class QelctlStatus : public WithService {
+ protected:
+  nlohmann::json status() const { return nlohmann::json::parse(ask({"status", "--json"}).out); }
+};
+
+TEST_F(QelctlStatus, tellsWhatTheServiceDoes) {
+  Client client(bus, "tester");
+  ASSERT_TRUE(client.waitForReachable(true));
+  ASSERT_EQ(client.install(7, {20330, 19972}).code, 0);
+  auto told = status();
+  EXPECT_EQ(told["version"].get<std::string>().find_first_not_of("0123456789."), std::string::npos);
+  EXPECT_NE(told["source"].get<std::string>().find("simulated"), std::string::npos);
+  EXPECT_EQ(told["source_running"], false);
+  EXPECT_EQ(told["configurations"], nlohmann::json::parse(R"([{"application": 7, "metrics": 2}])"));
+  EXPECT_EQ(told["clients"],
+            nlohmann::json::parse(
+                R"([{"name": "tester", "events_on": false, "delivered": 0, "dropped": 0}])"));
+  client.transport().eventsOn();
+  ASSERT_TRUE(client.waitForMetrics(5));
+  told = status();
+  EXPECT_EQ(told["source_running"], true);
+  EXPECT_EQ(told["clients"][0]["events_on"], true);
+  EXPECT_GE(told["events"]["received"], 5);
+  EXPECT_GE(told["events"]["delivered"], 5);
+  EXPECT_EQ(told["events"]["dropped"], 0);
+  EXPECT_EQ(told["events"]["undecodable"], 0);
+}
+
+TEST_F(QelctlStatus, tellsItToPeople) {
+  Client client(bus, "a \x1B[31mred\x1B[0m name");
+  ASSERT_TRUE(client.waitForReachable(true));
+  ASSERT_EQ(client.install(7, {20330}).code, 0);
+  const Outcome outcome = ask({"status"});
+  EXPECT_EQ(outcome.exitCode, 0);
+  EXPECT_EQ(outcome.err, "");
+  for (const char* part : {"version \"", "simulated", "application 7, 1 metrics", "events off",
+                           "0 received", "0 undecodable"}) {
+    EXPECT_NE(outcome.out.find(part), std::string::npos) << part << " in " << outcome.out;
+  }
+  // A name cannot reach the terminal as a command.
+  EXPECT_EQ(outcome.out.find('\x1B'), std::string::npos);
+}
+
+void expectAbsent(const std::vector<std::string>& words, const std::string& why) {
+  const Outcome outcome = qelctl(words);
+  EXPECT_EQ(outcome.exitCode, 69) << words.front();
+  EXPECT_EQ(outcome.out, "");
+  EXPECT_EQ(outcome.err, "qelctl: baseband manager service: " + why + "\n");
+}
+
+TEST(QelctlWithoutService, saysThatItIsNotThere) {
+  const PrivateBus bus;
+  const std::string file = ::testing::TempDir() + std::to_string(::getpid()) + "_absent.jsonl";
+  expectAbsent({"status", "--bus", bus.address()}, "not reachable");
+  expectAbsent({"status", "--bus", bus.address(), "--json"}, "not reachable");
+  expectAbsent({"live", "--bus", bus.address()}, "not reachable");
+  expectAbsent({"live", "--bus", bus.address(), "--screen", "LTE", "NAS"}, "not reachable");
+  expectAbsent({"record", file, "--bus", bus.address()}, "not reachable");
+  EXPECT_FALSE(std::filesystem::exists(file));
+}
+
+TEST(QelctlWithoutService, saysThatThereIsNoBus) {
+  for (const char* command : {"status", "live"}) {
+    expectAbsent({command, "--bus", "unix:path=/nonexistent"}, "no message bus");
+  }
+  expectAbsent({"status", "--bus", "nonsense"}, "no message bus");
+}
+
+TEST(QelctlWithoutService, saysThatThePermissionIsMissing) {
+  const PrivateBus bus(
+      "<policy context=\"default\"><allow user=\"*\"/><allow own=\"*\"/>"
+      "<allow send_destination=\"*\"/><allow receive_sender=\"*\"/>"
+      "<deny send_destination=\"tesk.BasebandManager1\"/></policy>");
+  const ServiceProcess service(bus, "simulated");
+  EXPECT_TRUE(eventually([&] {
+    return qelctl({"status", "--bus", bus.address()}).err ==
+           "qelctl: baseband manager service: no permission to use it (is the user in group "
+           "baseband?)\n";
+  }));
+}
+
+TEST(QelctlWithoutService, findsOneThatStartsMeanwhile) {
+  const PrivateBus bus;
+  RunningQelctl live({"live", "--bus", bus.address()});
+  const ServiceProcess service(bus, "simulated,speed=20");
+  EXPECT_TRUE(eventually([&] { return linesOf(live.out()).size() > 20; })) << live.err();
+}
+
+}  // namespace
+}  // namespace qel::testing
