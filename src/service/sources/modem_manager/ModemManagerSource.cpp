@@ -43,6 +43,7 @@ struct ModemManagerSource::Run {
         live(link);
       } catch (const sdbus::Error& error) {
         // A failed attempt costs some memory inside the bus library, so the pauses grow.
+        if (stopping) break;
         said.say(address.name, "no message bus (" + error.getMessage() + "), trying again");
       }
       keeper.update(std::nullopt, 0, Steady::now(), {});
