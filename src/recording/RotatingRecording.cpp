@@ -40,10 +40,16 @@ void syncDirectory(const std::string& directory) {
   ::close(descriptor);
 }
 
+// A file that is there and takes up no disk, such as a device.
+bool isNoFile(const std::string& path) {
+  struct stat status {};
+  return ::stat(path.c_str(), &status) == 0 && !S_ISREG(status.st_mode);
+}
+
 // Empty when enough is free, or nobody knows.
 std::string spaceError(const std::string& path, std::uint64_t wanted) {
   struct statvfs disk {};
-  if (wanted == 0 || ::statvfs(directoryOf(path).c_str(), &disk) != 0) return {};
+  if (wanted == 0 || isNoFile(path) || ::statvfs(directoryOf(path).c_str(), &disk) != 0) return {};
   const std::uint64_t free = std::uint64_t{disk.f_bavail} * disk.f_frsize;
   if (free >= wanted) return {};
   return path + ": " + std::to_string(free >> 20U) + " MB are free on the disk, " +

@@ -121,7 +121,7 @@ void run(const Options& options, Output& output) {
 
 void addLiveCommand(CLI::App& app, Action& chosen) {
   auto* command = app.add_subcommand(
-      "live", "Connect as the viewer does and print the dispatcher's lines, or one category");
+      "live", "Connect as the viewer does; print the lines, or draw one category");
   command->footer("It runs until SIGINT or SIGTERM, and goes on when the service comes back.");
   const auto options = std::make_shared<Options>();
   addBusOption(*command, options->bus);
@@ -129,7 +129,8 @@ void addLiveCommand(CLI::App& app, Action& chosen) {
       ->add_option("--screen", options->screen,
                    "Draw this category whenever it changes, instead of printing lines")
       ->type_name("TECHNOLOGY CATEGORY")
-      ->expected(2);
+      ->type_size(2)
+      ->expected(1);
   command->callback(
       [options, &chosen] { chosen = [options](Output& output) { run(*options, output); }; });
 }

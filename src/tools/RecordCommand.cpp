@@ -123,37 +123,41 @@ void run(const Options& options) {
   Recorder recorder(begin(options), hiderOf(options));
   RecordProgress progress;
   const auto start = Clock::now();
-  {
-    RecordConnection* connected = nullptr;
-    RecordConnection connection(
-        options.bus, std::move(configuration),
-        [&recorder](std::string_view eventName, const tesk::Message& event) {
-          recorder.take(eventName, event);
-        },
-        serviceObserver([&progress](const std::string& text) { progress.say(text); },
-                        [&connected] { connected->begin(); }));
-    connected = &connection;
-    const auto begun = connection.begin();
-    if (begun.code != 0) failWithoutService(begun.message);
-    recordOn(options, loop, recorder, progress, start);
-  }
+  std::unique_ptr<RecordConnection> connection;
+  connection = std::make_unique<RecordConnection>(
+      options.bus, std::move(configuration),
+      [&recorder](std::string_view eventName, const tesk::Message& event) {
+        recorder.take(eventName, event);
+      },
+      serviceObserver([&progress](const std::string& text) { progress.say(text); },
+                      [&connection] { connection->begin(); }));
+  const auto begun = connection->begin();
+  if (begun.code != 0) failWithoutService(begun.message);
+  recordOn(options, loop, recorder, progress, start);
+  connection.reset();
   const bool isWhole = recorder.close() && recorder.error().empty();
   if (recorder.errorNumber() == EPIPE) return;
   progress.say(summary(options, recorder, Clock::now() - start));
   if (!isWhole) throw ToolError(EX_IOERR, recorder.error());
 }
 
+// A validator that leaves the help text to the option.
+template <class Checked>
+CLI::Validator silent(Checked validator) {
+  return validator.description("");
+}
+
 void addLimitOptions(CLI::App& command, Options& options) {
-  // Beyond any file, and still a number of milliseconds.
-  const CLI::Range seconds(0.001, 1e9, "");
-  const CLI::AsSizeValue bytes(false);
+  // Beyond any recording, and still a number of milliseconds.
+  const auto seconds = silent(CLI::Range(0.001, 1e9));
+  const auto bytes = silent(CLI::AsSizeValue(false));
   command.add_option("--duration", options.durationS, "End after this many seconds")
-      ->type_name("S")
+      ->type_name("SECONDS")
       ->check(seconds);
   command.add_option("--max-size", options.maxBytes, "Finish a file that has reached this size")
       ->type_name("BYTES|K|M|G")
       ->transform(bytes)
-      ->check(CLI::PositiveNumber.description(""));
+      ->check(silent(CLI::PositiveNumber));
   command.add_option("--max-age", options.maxAgeS, "Finish a file that is this old")
       ->type_name("SECONDS")
       ->check(seconds);
@@ -161,7 +165,7 @@ void addLimitOptions(CLI::App& command, Options& options) {
       .add_option("--keep", options.limits.filesKept,
                   "Finished files that stay: FILE.1, the newest, to FILE.N")
       ->type_name("N")
-      ->check(CLI::Range(1, 9999, "").description(""))
+      ->check(silent(CLI::Range(1, 9999)))
       ->capture_default_str();
   command
       .add_option("--min-free", options.limits.freeBytes,

@@ -15,6 +15,23 @@ std::size_t widthOf(const std::string& text) {
       text, [](char c) { return (static_cast<unsigned char>(c) & 0xC0) != 0x80; }));
 }
 
+bool isControl(unsigned char c, unsigned char next) {
+  constexpr unsigned char kDelete = 0x7F;
+  // U+0080 to U+009F are controls too.
+  return c < ' ' || c == kDelete || (c == 0xC2 && next >= 0x80 && next < 0xA0);
+}
+
+// Text that a terminal shows and does not obey: controls become spaces.
+std::string visible(const std::string& text) {
+  std::string shown = withReplacements(text);
+  for (std::size_t i = 0; i < shown.size(); ++i) {
+    const auto next = static_cast<unsigned char>(i + 1 < shown.size() ? shown[i + 1] : 0);
+    const auto c = static_cast<unsigned char>(shown[i]);
+    if (isControl(c, next)) shown.replace(i, c == 0xC2 ? 2 : 1, " ");
+  }
+  return shown;
+}
+
 }  // namespace
 
 std::shared_ptr<TableViewController> makeScreen(const std::string& technology,
@@ -30,7 +47,7 @@ std::vector<std::string> tableLines(const std::string& key, const TableSnapshot&
   std::size_t width = 0;
   for (const SectionSnapshot& section : table.sections) {
     for (const RowSnapshot& row : section.rows) {
-      width = std::max(width, widthOf(row.text.value_or("")));
+      width = std::max(width, widthOf(visible(row.text.value_or(""))));
     }
   }
   std::vector<std::string> lines = {key};
@@ -38,9 +55,9 @@ std::vector<std::string> tableLines(const std::string& key, const TableSnapshot&
     lines.emplace_back();
     if (section.title) lines.push_back(*section.title);
     for (const RowSnapshot& row : section.rows) {
-      const std::string name = row.text.value_or("");
-      lines.push_back("  " + withReplacements(name) + std::string(width - widthOf(name) + 2, ' ') +
-                      withReplacements(row.detail.value_or("")));
+      const std::string name = visible(row.text.value_or(""));
+      lines.push_back("  " + name + std::string(width - widthOf(name) + 2, ' ') +
+                      visible(row.detail.value_or("")));
     }
   }
   return lines;

@@ -68,8 +68,8 @@ void printText(const ServiceStatus& status, Output& output) {
 }  // namespace
 
 void addStatusCommand(CLI::App& app, Action& chosen) {
-  auto* command = app.add_subcommand(
-      "status", "Tell what the service does: source, configurations, clients, events");
+  auto* command =
+      app.add_subcommand("status", "Tell what the service does: its source, clients and events");
   const auto options = std::make_shared<Options>();
   addBusOption(*command, options->bus);
   command->add_flag("--json", options->json, "As one JSON object");

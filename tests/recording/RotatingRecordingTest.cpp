@@ -139,6 +139,14 @@ TEST_F(RotatingRecordingTest, doesNotBeginOnAFullDisk) {
   EXPECT_FALSE(exists(""));
 }
 
+TEST_F(RotatingRecordingTest, asksForNoSpaceWhereNoneIsTaken) {
+  limits.freeBytes = std::uint64_t{1} << 60U;
+  path = "/dev/null";
+  const auto recording = create(Existing::replaced);
+  ASSERT_TRUE(recording) << error;
+  EXPECT_TRUE(recording->tend(kStart));
+}
+
 TEST_F(RotatingRecordingTest, rotatesRegularFilesOnly) {
   path = "/dev/null";
   EXPECT_TRUE(create(Existing::replaced)) << error;

@@ -2,6 +2,7 @@
 #include <nlohmann/json.hpp>
 
 #include "messages/lte_serving.h"
+#include "messages/nas.h"
 #include "metrics/MetricValidator.h"
 #include "tools/Qelctl.h"
 #include "ui/screens/QelViewItems.h"
@@ -124,6 +125,16 @@ TEST(QelctlScreen, drawsATableForPeople) {
   const TemporaryRecording recording(txPower(1));
   EXPECT_EQ(qelctl({"screen", recording.path(), "LTE", "Tx Power"}).out,
             "LTE Tx Power\n\nTxPowerInfo 0\n  pucch_tx_power  12\n");
+}
+
+TEST(QelctlScreen, letsNoTextCommandTheTerminal) {
+  BearerContext bearer;
+  bearer.setApn("a\x1B[2J\xC2\x9Bz");
+  KCellularActivatedBearerContexts contexts;
+  contexts.addBearerContexts(std::make_shared<BearerContext>(bearer));
+  const TemporaryRecording recording(metricLine(V::K_CELLULAR_ACTIVE_BEARER, contexts));
+  EXPECT_EQ(qelctl({"screen", recording.path(), "LTE", "Active Bearers"}).out,
+            "LTE Active Bearers\n\nPDP 0\n  apn  a [2J z\n");
 }
 
 TEST(QelctlScreen, asksToComeBackLaterForAKeyThatNoRoutineKnows) {
