@@ -1,6 +1,5 @@
 #include "service/sources/PacedSource.h"
 
-#include <atomic>
 #include <stop_token>
 #include <utility>
 
@@ -31,7 +30,6 @@ struct PacedSource::Run {
   std::mutex mutex;  // guards the sequence
   std::unique_ptr<EventSequence> sequence;
   Pacer pacer;
-  std::atomic<bool> finished = false;  // the thread is about to end
 };
 
 PacedSource::PacedSource(std::string description, MakeSequence makeSequence, double speed,
@@ -41,24 +39,7 @@ PacedSource::PacedSource(std::string description, MakeSequence makeSequence, dou
       _speed(speed),
       _clock(clock) {}
 
-PacedSource::~PacedSource() {
-  stop();
-  for (Worker& worker : _workers) {
-    if (worker.thread.get_id() == std::this_thread::get_id()) {
-      worker.thread.detach();
-    } else {
-      worker.thread.join();
-    }
-  }
-}
-
-void PacedSource::joinFinished() {
-  std::erase_if(_workers, [](Worker& worker) {
-    if (!worker.run->finished) return false;
-    worker.thread.join();
-    return true;
-  });
-}
+PacedSource::~PacedSource() { stop(); }
 
 void PacedSource::start(std::weak_ptr<EventReceiver> receiver,
                         std::shared_ptr<ListenerSignal> listeners) {
@@ -67,12 +48,8 @@ void PacedSource::start(std::weak_ptr<EventReceiver> receiver,
   run->receiver = std::move(receiver);
   run->listeners = std::move(listeners);
   const std::lock_guard lock(_mutex);
-  joinFinished();
   _run = run;
-  _workers.push_back({run, std::thread([run] {
-                        play(*run);
-                        run->finished = true;
-                      })});
+  _threads.start([run] { play(*run); });
 }
 
 void PacedSource::stop() {

@@ -5,11 +5,10 @@
 #include <memory>
 #include <mutex>
 #include <string>
-#include <thread>
-#include <vector>
 
 #include "service/sources/EventSequence.h"
 #include "service/sources/EventSource.h"
+#include "service/sources/RunThreads.h"
 #include "service/sources/WaitClock.h"
 
 namespace qel::service {
@@ -36,13 +35,8 @@ class PacedSource final : public EventSource {
 
  private:
   struct Run;
-  struct Worker {
-    std::shared_ptr<Run> run;
-    std::thread thread;
-  };
   static void play(Run& run);
   static bool hand(Run& run, const ServiceEvent& event);
-  void joinFinished();
 
   const std::string _description;
   const MakeSequence _makeSequence;
@@ -51,7 +45,7 @@ class PacedSource final : public EventSource {
 
   std::mutex _mutex;  // guards the two below; no event and no query runs under it
   std::shared_ptr<Run> _run;
-  std::vector<Worker> _workers;  // of this run, and of earlier ones that have not been joined
+  RunThreads _threads;  // last: they end first
 };
 
 }  // namespace qel::service

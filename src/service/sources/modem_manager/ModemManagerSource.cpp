@@ -92,7 +92,6 @@ struct ModemManagerSource::Run {
   std::shared_ptr<ListenerSignal> listeners;
   const tesk::bus::WakeUp wakeUp;  // for the end alone, so it is never cleared
   std::atomic<bool> stopping = false;
-  std::atomic<bool> finished = false;  // the thread is about to end
   MetricKeeper keeper;
   // The thread only.
   SaidOnce said;
@@ -103,24 +102,7 @@ ModemManagerSource::ModemManagerSource(ModemWish wish, tesk::bus::BusAddress add
                                        ModemTiming timing)
     : _wish(std::move(wish)), _address(std::move(address)), _timing(timing) {}
 
-ModemManagerSource::~ModemManagerSource() {
-  stop();
-  for (Worker& worker : _workers) {
-    if (worker.thread.get_id() == std::this_thread::get_id()) {
-      worker.thread.detach();
-    } else {
-      worker.thread.join();
-    }
-  }
-}
-
-void ModemManagerSource::joinFinished() {
-  std::erase_if(_workers, [](Worker& worker) {
-    if (!worker.run->finished) return false;
-    worker.thread.join();
-    return true;
-  });
-}
+ModemManagerSource::~ModemManagerSource() { stop(); }
 
 void ModemManagerSource::start(std::weak_ptr<EventReceiver> receiver,
                                std::shared_ptr<ListenerSignal> listeners) {
@@ -130,12 +112,8 @@ void ModemManagerSource::start(std::weak_ptr<EventReceiver> receiver,
   run->listeners = std::move(listeners);
   run->generation = run->listeners->generation();
   const std::lock_guard lock(_mutex);
-  joinFinished();
   _run = run;
-  _workers.push_back({run, std::thread([run] {
-                        run->play();
-                        run->finished = true;
-                      })});
+  _threads.start([run] { run->play(); });
 }
 
 void ModemManagerSource::stop() {

@@ -4,10 +4,9 @@
 #include <memory>
 #include <mutex>
 #include <string>
-#include <thread>
-#include <vector>
 
 #include "service/sources/EventSource.h"
+#include "service/sources/RunThreads.h"
 #include "service/sources/modem_manager/ModemLink.h"
 
 namespace qel::service {
@@ -31,11 +30,6 @@ class ModemManagerSource final : public EventSource {
 
  private:
   struct Run;
-  struct Worker {
-    std::shared_ptr<Run> run;
-    std::thread thread;
-  };
-  void joinFinished();
 
   const ModemWish _wish;
   const tesk::bus::BusAddress _address;
@@ -43,7 +37,7 @@ class ModemManagerSource final : public EventSource {
 
   std::mutex _mutex;  // guards the two below; no event runs under it
   std::shared_ptr<Run> _run;
-  std::vector<Worker> _workers;  // of this run, and of earlier ones that have not been joined
+  RunThreads _threads;  // last: they end first
 };
 
 }  // namespace qel::service
