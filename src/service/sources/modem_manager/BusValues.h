@@ -3,6 +3,7 @@
 
 #include <sdbus-c++/Types.h>
 
+#include <cstdint>
 #include <map>
 #include <optional>
 #include <string>
@@ -25,6 +26,12 @@ std::optional<Type> busValue(const BusProperties& properties, const std::string&
   if (found == properties.end()) return std::nullopt;
   return busValue<Type>(found->second);
 }
+
+// An integer of any width that fits, so that none of them has to be the documented one.
+std::optional<std::int64_t> busInteger(const BusProperties& properties, const std::string& key);
+std::optional<std::uint32_t> busUnsigned(const BusProperties& properties, const std::string& key);
+// A floating point number or an integer.
+std::optional<double> busDouble(const BusProperties& properties, const std::string& key);
 
 // Empty when there is no such interface.
 inline const BusProperties& propertiesOf(const BusInterfaces& interfaces, const std::string& name) {

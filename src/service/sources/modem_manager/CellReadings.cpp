@@ -58,8 +58,15 @@ std::optional<std::uint32_t> number(std::string_view text, int base) {
   return value;
 }
 
-std::optional<std::uint32_t> hexNumber(std::optional<std::string> text) {
-  return text ? number(*text, 16) : std::nullopt;
+std::optional<std::uint32_t> hexNumber(std::string_view text) {
+  if (text.starts_with("0x") || text.starts_with("0X")) text.remove_prefix(2);
+  return number(text, 16);
+}
+
+// A text in hexadecimal, or else a number.
+std::optional<std::uint32_t> identifier(const BusProperties& cell, const char* key) {
+  const auto text = busValue<std::string>(cell, key);
+  return text ? hexNumber(*text) : busUnsigned(cell, key);
 }
 
 std::optional<std::uint32_t> atMost(std::uint32_t most, std::optional<std::uint32_t> value) {
@@ -84,22 +91,21 @@ std::optional<double> validRssi(std::optional<double> dbm) { return within(dbm, 
 std::optional<double> validSnr(std::optional<double> db) { return within(db, -30, 50); }
 
 std::optional<CellReading> cellReading(const BusProperties& cell) {
-  const CellKeys* keys = keysOf(busValue<std::uint32_t>(cell, "cell-type"));
+  const CellKeys* keys = keysOf(busUnsigned(cell, "cell-type"));
   if (!keys) return std::nullopt;
   CellReading reading;
   reading.technology = keys->technology;
   reading.serving = busValue<bool>(cell, "serving").value_or(false);
   reading.network = networkCode(busValue<std::string>(cell, "operator-id").value_or(""));
-  reading.area = validArea(hexNumber(busValue<std::string>(cell, keys->area)));
-  reading.cellId = atMost(keys->largestCellId, hexNumber(busValue<std::string>(cell, "ci")));
-  reading.channel = atMost(keys->largestChannel, busValue<std::uint32_t>(cell, keys->channel));
-  reading.code = atMost(keys->largestCode, keys->codeIsText
-                                               ? hexNumber(busValue<std::string>(cell, keys->code))
-                                               : busValue<std::uint32_t>(cell, keys->code));
+  reading.area = validArea(identifier(cell, keys->area));
+  reading.cellId = atMost(keys->largestCellId, identifier(cell, "ci"));
+  reading.channel = atMost(keys->largestChannel, busUnsigned(cell, keys->channel));
+  reading.code = atMost(keys->largestCode, keys->codeIsText ? identifier(cell, keys->code)
+                                                            : busUnsigned(cell, keys->code));
   if (keys->level) {
-    reading.levelDbm = keys->validLevel(busValue<double>(cell, keys->level));
-    reading.qualityDb = keys->validQuality(busValue<double>(cell, keys->quality));
-  } else if (const auto rxlev = atMost(kLargestRxlev, busValue<std::uint32_t>(cell, "rx-level"))) {
+    reading.levelDbm = keys->validLevel(busDouble(cell, keys->level));
+    reading.qualityDb = keys->validQuality(busDouble(cell, keys->quality));
+  } else if (const auto rxlev = atMost(kLargestRxlev, busUnsigned(cell, "rx-level"))) {
     reading.levelDbm = static_cast<double>(*rxlev) - 110;
   }
   return reading;
@@ -129,8 +135,8 @@ std::optional<CellReading> placeReading(std::string_view text, Technology techno
   reading.technology = technology;
   reading.serving = true;
   reading.network = networkCode(std::string(mcc) + std::string(mnc));
-  reading.area = validArea(number(technology == Technology::lte ? tac : lac, 16));
-  const auto cellId = number(ci, 16);
+  reading.area = validArea(hexNumber(technology == Technology::lte ? tac : lac));
+  const auto cellId = hexNumber(ci);
   // Nought is what stands there when there is no cell.
   if (cellId != 0U) reading.cellId = atMost(keysOf(technology).largestCellId, cellId);
   return reading;

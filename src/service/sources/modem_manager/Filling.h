@@ -2,6 +2,7 @@
 #pragma once
 
 #include <optional>
+#include <type_traits>
 
 #include "service/sources/modem_manager/ModemPicture.h"
 
@@ -24,7 +25,25 @@ inline const CellReading* servingOn(Technology technology, const ModemPicture& m
   return modem.technology == technology && modem.serving ? &*modem.serving : nullptr;
 }
 
-// Whether there is anything by which to tell the cell.
-inline bool isNamed(const CellReading& cell) { return cell.channel || cell.code || cell.cellId; }
+// How a message takes a neighbour of each technology; null: not at all.
+template <class Message>
+struct NeighbourAdders {
+  void (*lte)(const CellReading& cell, Message& message);
+  void (*umts)(const CellReading& cell, Message& message);
+  void (*gsm)(const CellReading& cell, Message& message);
+};
+
+template <class Message>
+void addNeighbours(const ModemPicture& modem, Message& message,
+                   const std::type_identity_t<NeighbourAdders<Message>>& adders) {
+  for (const CellReading& cell : modem.neighbours) {
+    // Without any of them there is nothing by which to tell the cell.
+    if (!cell.channel && !cell.code && !cell.cellId) continue;
+    const auto add = cell.technology == Technology::lte    ? adders.lte
+                     : cell.technology == Technology::umts ? adders.umts
+                                                           : adders.gsm;
+    if (add) add(cell, message);
+  }
+}
 
 }  // namespace qel::service

@@ -1,9 +1,9 @@
 // The metrics of a modem on GSM.
 #include "messages/gsm.h"
+#include "service/sources/Levels.h"
 #include "service/sources/modem_manager/Bands.h"
 #include "service/sources/modem_manager/Filling.h"
 #include "service/sources/modem_manager/ModemReports.h"
-#include "service/sources/simulated/Reports.h"
 
 namespace qel::service {
 namespace {
@@ -78,20 +78,7 @@ std::optional<Bytes> modemGsmNeighbours(const ModemPicture& modem, std::uint64_t
   if (modem.technology != Technology::gsm || !modem.cellsKnown) return std::nullopt;
   KCellularGsmGrrEventMeasCr message;
   message.setTimestamp(timeMs);
-  for (const CellReading& cell : modem.neighbours) {
-    if (!isNamed(cell)) continue;
-    switch (cell.technology) {
-      case Technology::umts:
-        addUmts(cell, message);
-        break;
-      case Technology::gsm:
-        addGsm(cell, message);
-        break;
-      case Technology::lte:
-        addLte(cell, message);
-        break;
-    }
-  }
+  addNeighbours(modem, message, {addLte, addUmts, addGsm});
   return message.data();
 }
 

@@ -1,10 +1,10 @@
 // The metrics of a modem on LTE.
 #include "messages/lte_neighbours.h"
 #include "messages/lte_serving.h"
+#include "service/sources/Levels.h"
 #include "service/sources/modem_manager/Bands.h"
 #include "service/sources/modem_manager/Filling.h"
 #include "service/sources/modem_manager/ModemReports.h"
-#include "service/sources/simulated/Reports.h"
 
 namespace qel::service {
 namespace {
@@ -17,6 +17,33 @@ std::shared_ptr<RsrpRsrqSinr> sampleOf(const ModemPicture& modem) {
   if (levels.qualityDb) sample->setRsrq0(rounded(*levels.qualityDb));
   if (levels.snrDb) sample->setSinr0(rounded(*levels.snrDb * 2));  // half dB
   return sample;
+}
+
+void addLte(const CellReading& cell, KCellularLteNbrEutraCellMeas& message) {
+  auto entry = std::make_shared<EgwErrcNbrEutraMeas>();
+  set(*entry, &EgwErrcNbrEutraMeas::setNbrEarfcn, cell.channel);
+  set(*entry, &EgwErrcNbrEutraMeas::setNbrPhysCellId, cell.code);
+  if (cell.channel) set(*entry, &EgwErrcNbrEutraMeas::setFreqBandInd, lteBandOf(*cell.channel));
+  set(*entry, &EgwErrcNbrEutraMeas::setNbrRsrp, cell.levelDbm, rsrpIndex);
+  set(*entry, &EgwErrcNbrEutraMeas::setNbrRsrq, cell.qualityDb, rsrqIndex);
+  message.addMeasNbrEutra(entry);
+}
+
+void addUmts(const CellReading& cell, KCellularLteNbrInterRatCellMeas& message) {
+  auto entry = std::make_shared<EgwErrcNbrUtraMeas>();
+  set(*entry, &EgwErrcNbrUtraMeas::setUarfcn, cell.channel);
+  set(*entry, &EgwErrcNbrUtraMeas::setPsc, cell.code);
+  set(*entry, &EgwErrcNbrUtraMeas::setRscp, cell.levelDbm, rscpIndex);
+  set(*entry, &EgwErrcNbrUtraMeas::setEcno, cell.qualityDb, ecnoIndex);
+  message.addMeasNbrUtra(entry);
+}
+
+void addGsm(const CellReading& cell, KCellularLteNbrInterRatCellMeas& message) {
+  auto entry = std::make_shared<EgwErrcNbrGeranMeas>();
+  set(*entry, &EgwErrcNbrGeranMeas::setArfcn, cell.channel);
+  set(*entry, &EgwErrcNbrGeranMeas::setBsic, cell.code);
+  set(*entry, &EgwErrcNbrGeranMeas::setRxlev, cell.levelDbm, rxlevIndex);
+  message.addMeasNbrGeran(entry);
 }
 
 }  // namespace
@@ -72,19 +99,9 @@ std::optional<Bytes> modemLteQuality(const ModemPicture& modem, std::uint64_t ti
 
 std::optional<Bytes> modemLteNeighbours(const ModemPicture& modem, std::uint64_t timeMs) {
   if (modem.technology != Technology::lte || !modem.cellsKnown) return std::nullopt;
-  using Entry = EgwErrcNbrEutraMeas;
   KCellularLteNbrEutraCellMeas message;
   message.setTimestamp(timeMs);
-  for (const CellReading& cell : modem.neighbours) {
-    if (cell.technology != Technology::lte || !isNamed(cell)) continue;
-    auto entry = std::make_shared<Entry>();
-    set(*entry, &Entry::setNbrEarfcn, cell.channel);
-    set(*entry, &Entry::setNbrPhysCellId, cell.code);
-    if (cell.channel) set(*entry, &Entry::setFreqBandInd, lteBandOf(*cell.channel));
-    set(*entry, &Entry::setNbrRsrp, cell.levelDbm, rsrpIndex);
-    set(*entry, &Entry::setNbrRsrq, cell.qualityDb, rsrqIndex);
-    message.addMeasNbrEutra(entry);
-  }
+  addNeighbours(modem, message, {addLte, nullptr, nullptr});
   return message.data();
 }
 
@@ -92,23 +109,7 @@ std::optional<Bytes> modemLteOthers(const ModemPicture& modem, std::uint64_t tim
   if (modem.technology != Technology::lte || !modem.cellsKnown) return std::nullopt;
   KCellularLteNbrInterRatCellMeas message;
   message.setTimestamp(timeMs);
-  for (const CellReading& cell : modem.neighbours) {
-    if (!isNamed(cell)) continue;
-    if (cell.technology == Technology::umts) {
-      auto entry = std::make_shared<EgwErrcNbrUtraMeas>();
-      set(*entry, &EgwErrcNbrUtraMeas::setUarfcn, cell.channel);
-      set(*entry, &EgwErrcNbrUtraMeas::setPsc, cell.code);
-      set(*entry, &EgwErrcNbrUtraMeas::setRscp, cell.levelDbm, rscpIndex);
-      set(*entry, &EgwErrcNbrUtraMeas::setEcno, cell.qualityDb, ecnoIndex);
-      message.addMeasNbrUtra(entry);
-    } else if (cell.technology == Technology::gsm) {
-      auto entry = std::make_shared<EgwErrcNbrGeranMeas>();
-      set(*entry, &EgwErrcNbrGeranMeas::setArfcn, cell.channel);
-      set(*entry, &EgwErrcNbrGeranMeas::setBsic, cell.code);
-      set(*entry, &EgwErrcNbrGeranMeas::setRxlev, cell.levelDbm, rxlevIndex);
-      message.addMeasNbrGeran(entry);
-    }
-  }
+  addNeighbours(modem, message, {nullptr, addUmts, addGsm});
   return message.data();
 }
 

@@ -28,6 +28,18 @@ constexpr MethodRow kGetLocation = {
     "org.freedesktop.ModemManager1.Location)",
     "no location area: the modem does not support GetLocation"};
 
+constexpr SettingRow kSignalRate = {
+    mm::kSignal, "Setup",
+    "signal levels come at the pace that other programs ask for: not allowed to set it (polkit "
+    "action org.freedesktop.ModemManager1.Device.Control)",
+    "the modem has no signal levels to report", true};
+// Whoever has switched it off meanwhile knows why.
+constexpr SettingRow kPlaceSources = {
+    mm::kLocation, "Setup",
+    "no location area: not allowed to switch 3gpp-lac-ci on (polkit action "
+    "org.freedesktop.ModemManager1.Device.Control)",
+    "no location area: the modem does not support 3gpp-lac-ci", false};
+
 constexpr std::size_t kMostCells = 256;
 
 std::vector<CellReading> cellsIn(sdbus::MethodReply& reply) {
@@ -51,12 +63,26 @@ bool isEarlier(const std::string& a, const std::string& b) {
   return a.size() != b.size() ? a.size() < b.size() : a < b;
 }
 
-// The cell's place is switched on and not pushed with the properties.
+std::optional<std::tuple<std::uint32_t>> rateIn(const BusInterfaces& modem) {
+  const auto rateS = busUnsigned(propertiesOf(modem, mm::kSignal), "Rate");
+  return rateS ? std::optional(std::tuple(*rateS)) : std::nullopt;
+}
+
+// What tells of a place, and whether that is pushed with the properties. Only where the modem can
+// tell the place of the cell.
+std::optional<std::tuple<std::uint32_t, bool>> placeSourcesIn(const BusInterfaces& modem) {
+  const BusProperties& location = propertiesOf(modem, mm::kLocation);
+  const auto sources = busUnsigned(location, "Enabled");
+  const bool able = (busUnsigned(location, "Capabilities").value_or(0) & mm::kPlaceOfCell) != 0;
+  if (!sources || !able) return std::nullopt;
+  return std::tuple(*sources, busValue<bool>(location, "SignalsLocation").value_or(false));
+}
+
+// The cell's place is switched on and not pushed.
 bool placeMustBeAsked(const BusInterfaces& modem) {
   const BusProperties& location = propertiesOf(modem, mm::kLocation);
-  const bool enabled =
-      (busValue<std::uint32_t>(location, "Enabled").value_or(0) & mm::kPlaceOfCell) != 0;
-  return enabled && !busValue<bool>(location, "SignalsLocation").value_or(false);
+  return (busUnsigned(location, "Enabled").value_or(0) & mm::kPlaceOfCell) != 0 &&
+         !busValue<bool>(location, "SignalsLocation").value_or(false);
 }
 
 std::uint32_t wholeSeconds(std::chrono::milliseconds period) {
@@ -87,7 +113,17 @@ ModemLink::Watched::Watched(const std::string& modem, std::uint32_t rateS)
             answers.place = placeIn(locations);
           },
           [this] { answers.place.clear(); }),
-      rate(modem, rateS) {}
+      signalRate(kSignalRate, modem, rateIn,
+                 [rateS](const std::tuple<std::uint32_t>& found) {
+                   const auto [now] = found;
+                   return now == 0 || now > rateS ? std::tuple(rateS) : found;
+                 }),
+      placeSources(kPlaceSources, modem, placeSourcesIn,
+                   [this](std::tuple<std::uint32_t, bool> found) {
+                     const bool needed = cells.isSettled() && !tellsServingCell(answers);
+                     if (needed) std::get<0>(found) |= mm::kPlaceOfCell;
+                     return found;
+                   }) {}
 
 ModemLink::ModemLink(const tesk::bus::BusAddress& address, ModemWish wish,
                      const ModemTiming& timing, SaidOnce& said)
@@ -112,7 +148,8 @@ void ModemLink::process() {
   while (_connection->processPendingRequest()) {
   }
   const auto now = Clock::now();
-  _tree.step(now);
+  const auto gone = _tree.step(now);
+  if (_watched && gone.contains(_watched->path)) leave();
   choose();
   if (_watched) attend(now);
 }
@@ -122,7 +159,15 @@ bool ModemLink::isWished(const std::string& path, const BusInterfaces& interface
   if (modem == interfaces.end()) return false;
   if (!_wish.path.empty()) return path == _wish.path;
   return _wish.imei.empty() ||
-         busValue<std::string>(modem->second, "EquipmentIdentifier") == _wish.imei;
+         busValue<std::string>(modem->second, "EquipmentIdentifier") == _wish.imei ||
+         busValue<std::string>(propertiesOf(interfaces, mm::kModem3gpp), "Imei") == _wish.imei;
+}
+
+// With the modem goes what was asked of it: an answer would find nobody.
+void ModemLink::leave() {
+  _calls.forget(_watched->path);
+  _watched.reset();
+  _tree.want({});
 }
 
 // The modem that is watched stays the one for as long as it is there.
@@ -131,10 +176,7 @@ void ModemLink::choose() {
   if (_watched) {
     const auto found = objects.find(_watched->path);
     if (found != objects.end() && isWished(found->first, found->second)) return;
-    // With it goes what was asked of it: an answer would find nobody.
-    _calls.forget(_watched->path);
-    _watched.reset();
-    _tree.want({});
+    leave();
   }
   const std::string* first = nullptr;
   for (const auto& [path, interfaces] : objects) {
@@ -160,8 +202,7 @@ void ModemLink::attend(Clock::time_point now) {
     return;
   }
   const std::uint32_t technologies =
-      busValue<std::uint32_t>(propertiesOf(interfaces, mm::kModem), "AccessTechnologies")
-          .value_or(0);
+      busUnsigned(propertiesOf(interfaces, mm::kModem), "AccessTechnologies").value_or(0);
   // The list of cells is of before the phone moved.
   if (std::exchange(_watched->accessTechnologies, technologies) != technologies) {
     _watched->cells.callSoon();
@@ -172,7 +213,8 @@ void ModemLink::attend(Clock::time_point now) {
   } else {
     _watched->answers.place.clear();
   }
-  _watched->rate.step(_calls, _said, identity, interfaces, now);
+  _watched->signalRate.step(_calls, _said, identity, interfaces, now);
+  _watched->placeSources.step(_calls, _said, identity, interfaces, now);
 }
 
 ModemLink::Clock::time_point ModemLink::due() const {
@@ -192,7 +234,7 @@ std::optional<ModemPicture> ModemLink::picture() const {
 void ModemLink::finish() {
   const auto end = Clock::now() + kFarewell;
   const auto settle = [&] {
-    while (_watched && _watched->rate.isUnderWay() && Clock::now() < end) {
+    while (_watched && _watched->changesSettings() && Clock::now() < end) {
       const auto bus = _connection->getEventLoopPollData();
       pollfd waited{bus.fd, bus.events, 0};
       ::poll(&waited, 1, pollTimeout(end, bus.getPollTimeout()));
@@ -202,7 +244,8 @@ void ModemLink::finish() {
   };
   settle();
   if (!_watched || !_tree.objects().contains(_watched->path)) return;
-  _watched->rate.restore(_calls, watchedInterfaces());
+  _watched->signalRate.restore(_calls, watchedInterfaces());
+  _watched->placeSources.restore(_calls, watchedInterfaces());
   settle();
 }
 

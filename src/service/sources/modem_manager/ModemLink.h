@@ -11,7 +11,7 @@
 #include "service/sources/modem_manager/ObjectTree.h"
 #include "service/sources/modem_manager/PolledMethod.h"
 #include "service/sources/modem_manager/SaidOnce.h"
-#include "service/sources/modem_manager/SignalRate.h"
+#include "service/sources/modem_manager/SharedSetting.h"
 #include "tesk/bus/BusAddress.h"
 
 namespace qel::service {
@@ -49,17 +49,20 @@ class ModemLink {
   // What is done with the one modem; made anew for another.
   struct Watched {
     Watched(const std::string& path, std::uint32_t rateS);
+    bool changesSettings() const { return signalRate.isUnderWay() || placeSources.isUnderWay(); }
 
     const std::string path;
     ModemAnswers answers;
     PolledMethod cells;
     PolledMethod place;
-    SignalRate rate;
+    SharedSetting<std::uint32_t> signalRate;
+    SharedSetting<std::uint32_t, bool> placeSources;
     std::uint32_t accessTechnologies = 0;
   };
 
   void process();
   void choose();
+  void leave();
   bool isWished(const std::string& path, const BusInterfaces& interfaces) const;
   void attend(Clock::time_point now);
   const BusInterfaces& watchedInterfaces() const;

@@ -47,6 +47,8 @@ struct LevelReading {
 struct BearerReading {
   std::uint32_t profile = 0;  // 0: not known
   std::string apn;
+  bool uses4 = false;  // carries IPv4; its address may be told over the connection alone
+  bool uses6 = false;
   Bytes address4;  // in network byte order, as the following; empty: none
   Bytes address6;
   std::vector<Bytes> nameServers;  // IPv4 first

@@ -59,10 +59,11 @@ struct AddressKind {
   const char* property;
   int family;
   Bytes BearerReading::*address;
+  bool BearerReading::*inUse;
 };
 constexpr std::array kAddressKinds = {
-    AddressKind{"Ip4Config", AF_INET, &BearerReading::address4},
-    AddressKind{"Ip6Config", AF_INET6, &BearerReading::address6},
+    AddressKind{"Ip4Config", AF_INET, &BearerReading::address4, &BearerReading::uses4},
+    AddressKind{"Ip6Config", AF_INET6, &BearerReading::address6, &BearerReading::uses6},
 };
 
 // Nothing unless it is connected.
@@ -71,12 +72,14 @@ std::optional<BearerReading> bearerReading(const BusProperties& bearer) {
   BearerReading reading;
   const auto asked = busValue<BusProperties>(bearer, "Properties").value_or(BusProperties());
   reading.apn = busValue<std::string>(asked, "apn").value_or("");
-  reading.profile = static_cast<std::uint32_t>(
-      std::max(0, busValue<std::int32_t>(bearer, "ProfileId").value_or(0)));
+  reading.profile = busUnsigned(bearer, "ProfileId").value_or(0);
+  if (reading.profile == 0) reading.profile = busUnsigned(asked, "profile-id").value_or(0);
   for (const AddressKind& kind : kAddressKinds) {
     const auto configuration = busValue<BusProperties>(bearer, kind.property);
     if (!configuration) continue;
     reading.*kind.address = addressOf(*configuration, "address", kind.family);
+    reading.*kind.inUse =
+        !(reading.*kind.address).empty() || busUnsigned(*configuration, "method").value_or(0) != 0;
     for (const char* key : {"dns1", "dns2", "dns3"}) {
       if (Bytes server = addressOf(*configuration, key, kind.family); !server.empty()) {
         reading.nameServers.push_back(std::move(server));
@@ -109,6 +112,7 @@ const CellReading* servingAmong(const std::vector<CellReading>& cells,
 }
 
 std::optional<Technology> technologyOf(std::uint32_t bits, const ModemAnswers& answers) {
+  if (bits == mm::kAnyTechnology) bits = 0;  // says nothing
   for (const TechnologyBits& row : kTechnologies) {
     if ((bits & row.bits) != 0) return row.technology;
   }
@@ -161,11 +165,11 @@ void readLevels(ModemPicture& picture, const BusInterfaces& modem) {
       *std::ranges::find(kTechnologies, *picture.technology, &TechnologyBits::technology);
   const auto signal = busValue<BusProperties>(propertiesOf(modem, mm::kSignal), row.signal)
                           .value_or(BusProperties());
-  picture.levels.rssiDbm = validRssi(busValue<double>(signal, "rssi"));
-  picture.levels.snrDb = validSnr(busValue<double>(signal, "snr"));
+  picture.levels.rssiDbm = validRssi(busDouble(signal, "rssi"));
+  picture.levels.snrDb = validSnr(busDouble(signal, "snr"));
   if (row.level) {
-    picture.levels.levelDbm = row.validLevel(busValue<double>(signal, row.level));
-    picture.levels.qualityDb = row.validQuality(busValue<double>(signal, row.quality));
+    picture.levels.levelDbm = row.validLevel(busDouble(signal, row.level));
+    picture.levels.qualityDb = row.validQuality(busDouble(signal, row.quality));
   }
   if (!picture.serving) return;
   fill(picture.levels.levelDbm, picture.serving->levelDbm);
@@ -180,8 +184,8 @@ ModemPicture pictureOf(const BusObjects& objects, const std::string& modem,
   const BusProperties& own = propertiesOf(interfaces, mm::kModem);
   const BusProperties& registered = propertiesOf(interfaces, mm::kModem3gpp);
   ModemPicture picture;
-  picture.registration = busValue<std::uint32_t>(registered, "RegistrationState");
-  picture.packetService = busValue<std::uint32_t>(registered, "PacketServiceState");
+  picture.registration = busUnsigned(registered, "RegistrationState");
+  picture.packetService = busUnsigned(registered, "PacketServiceState");
   picture.network = networkCode(busValue<std::string>(registered, "OperatorCode").value_or(""));
   picture.bearers = bearersOf(objects, interfaces);
   const auto simPath = busValue<sdbus::ObjectPath>(own, "Sim").value_or(mm::kNoObject);
@@ -189,7 +193,7 @@ ModemPicture pictureOf(const BusObjects& objects, const std::string& modem,
   picture.imsi = digitsOf(sim, "Imsi", 6, 15);             // 23.003, clause 2.2
   picture.iccid = digitsOf(sim, "SimIdentifier", 18, 20);  // ITU-T E.118
   if (isEnabled(interfaces)) {
-    picture.accessTechnologies = busValue<std::uint32_t>(own, "AccessTechnologies").value_or(0);
+    picture.accessTechnologies = busUnsigned(own, "AccessTechnologies").value_or(0);
     picture.technology = technologyOf(picture.accessTechnologies, answers);
     readCells(picture, interfaces, answers);
     readLevels(picture, interfaces);
@@ -197,9 +201,13 @@ ModemPicture pictureOf(const BusObjects& objects, const std::string& modem,
   return picture;
 }
 
+bool tellsServingCell(const ModemAnswers& answers) {
+  const CellReading* cell = answers.cells ? servingAmong(*answers.cells, {}) : nullptr;
+  return cell && cell->area && cell->cellId;
+}
+
 bool isEnabled(const BusInterfaces& modem) {
-  return busValue<std::int32_t>(propertiesOf(modem, mm::kModem), "State").value_or(0) >=
-         mm::kStateEnabled;
+  return busInteger(propertiesOf(modem, mm::kModem), "State").value_or(0) >= mm::kStateEnabled;
 }
 
 std::vector<ModemPart> partsOf(const BusInterfaces& modem) {

@@ -20,6 +20,9 @@ struct ModemAnswers {
   std::string place;                              // of GetLocation; may be empty
 };
 
+// Whether the list of cells says where the serving one is.
+bool tellsServingCell(const ModemAnswers& answers);
+
 // `modem` is a path in `objects`, where its SIM and bearers are too once they have been read.
 ModemPicture pictureOf(const BusObjects& objects, const std::string& modem,
                        const ModemAnswers& answers);

@@ -23,6 +23,7 @@ inline constexpr std::int32_t kStateEnabled = 6;        // of Modem.State; enabl
 inline constexpr std::uint32_t kPlaceOfCell = 1U << 0;  // of Location.Enabled and its keys
 
 // Of Modem.AccessTechnologies.
+inline constexpr std::uint32_t kAnyTechnology = 0xFFFFFFFFU;
 inline constexpr std::uint32_t kAnyGsm = 0x1EU;
 inline constexpr std::uint32_t kHsdpa = 1U << 6;
 inline constexpr std::uint32_t kHsupa = 1U << 7;

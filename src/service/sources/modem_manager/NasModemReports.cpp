@@ -67,18 +67,17 @@ std::shared_ptr<Area> areaOf(const ModemPicture& modem, const RegistrationRow& r
 
 // As the connection of LTE its numbers begin three higher (PDP_TYPE_IPv4_PDN).
 std::optional<std::int32_t> pdpTypeOf(const BearerReading& bearer, bool onLte) {
-  const bool four = !bearer.address4.empty();
-  const bool six = !bearer.address6.empty();
-  if (!four && !six) return std::nullopt;
-  const std::int32_t type = four && six ? kPdpIPv4v6 : six ? kPdpIPv6 : kPdpIPv4;
+  const bool both = bearer.uses4 && bearer.uses6;
+  if (!bearer.uses4 && !bearer.uses6) return std::nullopt;
+  const std::int32_t type = both ? kPdpIPv4v6 : bearer.uses6 ? kPdpIPv6 : kPdpIPv4;
   return onLte ? type + (kPdpIPv6Lte - kPdpIPv6) : type;
 }
 
 // With both, the interface identifier comes before the IPv4 address (24.301, clause 9.9.4.9).
+// Nothing while one of them is not known.
 Bytes pdpAddressOf(const BearerReading& bearer) {
-  if (bearer.address4.empty() || bearer.address6.empty()) {
-    return bearer.address4.empty() ? bearer.address6 : bearer.address4;
-  }
+  if (bearer.uses4 != bearer.uses6) return bearer.uses4 ? bearer.address4 : bearer.address6;
+  if (bearer.address4.empty() || bearer.address6.empty()) return {};
   Bytes both(bearer.address6.begin() + 8, bearer.address6.end());
   both.insert(both.end(), bearer.address4.begin(), bearer.address4.end());
   return both;
@@ -90,9 +89,9 @@ std::shared_ptr<BearerContext> contextOf(const BearerReading& bearer, bool onLte
   auto context = std::make_shared<BearerContext>();
   if (bearer.profile != 0) context->setCid(bearer.profile);
   if (!bearer.apn.empty()) context->setApn(bearer.apn);
-  if (const auto type = pdpTypeOf(bearer, onLte)) {
-    context->setPdpType(*type);
-    context->setPdpAddr(pdpAddressOf(bearer));
+  if (const auto type = pdpTypeOf(bearer, onLte)) context->setPdpType(*type);
+  if (Bytes address = pdpAddressOf(bearer); !address.empty()) {
+    context->setPdpAddr(std::move(address));
   }
   const auto& servers = bearer.nameServers;
   if (!servers.empty()) {

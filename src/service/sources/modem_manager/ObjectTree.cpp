@@ -11,10 +11,12 @@ namespace {
 using namespace std::chrono_literals;
 
 constexpr auto kFirstPause = 1s;
-constexpr auto kLongestPause = 60s;
+// A manager that does not answer yet, and none at all: then there will be a signal.
+constexpr auto kLongestPause = 5s;
+constexpr auto kLongestPauseWithout = 60s;
 
 std::string signalRule(const char* interface, const char* member) {
-  return std::string("type='signal',path_namespace='") + mm::kRoot + "',interface='" + interface +
+  return std::string("type='signal',sender='") + mm::kService + "',interface='" + interface +
          "',member='" + member + "'";
 }
 
@@ -49,10 +51,7 @@ void ObjectTree::ownerChanged(sdbus::Message& signal) {
   std::string before;
   std::string now;
   signal >> name >> before >> now;
-  for (const auto& [path, interfaces] : _objects) _gone.insert(path);
-  _objects.clear();
-  _parts.clear();
-  _asked.clear();
+  forgetAll();
   _owner.clear();
   ++_epoch;
   _pause = kFirstPause;
@@ -60,16 +59,23 @@ void ObjectTree::ownerChanged(sdbus::Message& signal) {
 }
 
 void ObjectTree::added(sdbus::Message& signal) {
-  if (signal.getSender() != _owner) return;
+  if (signal.getSender() != _owner) {
+    // Whoever did not answer so far is there now; and who is about to may not tell of this one.
+    if (_owner.empty() && _askAt != Clock::time_point::max()) _askAt = Clock::now();
+    _newsMeanwhile = true;
+    return;
+  }
   sdbus::ObjectPath path;
   BusInterfaces interfaces;
   signal >> path >> interfaces;
   for (auto& [name, properties] : interfaces) _objects[path][name] = std::move(properties);
-  _gone.erase(path);
 }
 
 void ObjectTree::removed(sdbus::Message& signal) {
-  if (signal.getSender() != _owner) return;
+  if (signal.getSender() != _owner) {
+    _newsMeanwhile = true;
+    return;
+  }
   sdbus::ObjectPath path;
   std::vector<std::string> interfaces;
   signal >> path >> interfaces;
@@ -90,26 +96,40 @@ void ObjectTree::changed(sdbus::Message& signal) {
   signal >> interface >> properties >> invalidated;
   BusProperties& known = found->second[interface];
   for (auto& [name, value] : properties) known[name] = std::move(value);
-  for (const std::string& name : invalidated) known.erase(name);
+  // Their old values hold until the new ones are read.
+  if (!invalidated.empty()) _toRead.emplace(found->first, interface);
 }
 
 void ObjectTree::drop(const std::string& path) {
   _objects.erase(path);
   _parts.erase(path);
-  _asked.erase(path);
+  for (std::set<Place>* places : {&_toRead, &_reading, &_unread}) {
+    std::erase_if(*places, [&](const Place& place) { return place.first == path; });
+  }
   _gone.insert(path);
 }
 
-void ObjectTree::step(Clock::time_point now) {
-  for (const std::string& path : std::exchange(_gone, {})) _calls.forget(path);
+void ObjectTree::forgetAll() {
+  while (!_objects.empty()) drop(std::string(_objects.begin()->first));
+  for (std::set<Place>* places : {&_toRead, &_reading, &_unread}) {
+    for (const Place& place : *places) _gone.insert(place.first);
+    places->clear();
+  }
+}
+
+std::set<std::string> ObjectTree::step(Clock::time_point now) {
+  auto gone = std::exchange(_gone, {});
+  for (const std::string& path : gone) _calls.forget(path);
   if (now >= _askAt) askForAll();
+  for (const Place& place : std::exchange(_toRead, {})) read(place);
+  return gone;
 }
 
 // Asked again with growing pauses until there is an answer.
 void ObjectTree::askForAll() {
   _askAt = Clock::time_point::max();
-  const auto pause =
-      std::exchange(_pause, std::min<std::chrono::seconds>(_pause * 2, kLongestPause));
+  _newsMeanwhile = false;
+  const auto pause = _pause;
   const std::uint64_t epoch = ++_epoch;
   _calls.call(
       mm::kRoot, mm::kObjectManager, "GetManagedObjects",
@@ -117,33 +137,71 @@ void ObjectTree::askForAll() {
         if (epoch != _epoch) return;
         std::map<sdbus::ObjectPath, BusInterfaces> objects;
         reply >> objects;
+        for (const auto& [path, interfaces] : BusObjects(_objects)) {
+          if (!_parts.contains(path) && objects.count(sdbus::ObjectPath(path)) == 0) drop(path);
+        }
+        for (auto& [path, interfaces] : objects) _objects[path] = std::move(interfaces);
         _owner = reply.getSender();
-        _objects = {objects.begin(), objects.end()};
+        _pause = kFirstPause;
+        if (_newsMeanwhile) _askAt = Clock::now();
       },
-      [this, epoch, pause](const sdbus::Error&) {
-        if (epoch == _epoch) _askAt = Clock::now() + pause;
+      [this, epoch, pause](const sdbus::Error& error) {
+        if (epoch != _epoch) return;
+        const bool absent = error.getName() == "org.freedesktop.DBus.Error.ServiceUnknown";
+        _pause = std::min<std::chrono::seconds>(pause * 2,
+                                                absent ? kLongestPauseWithout : kLongestPause);
+        _askAt = Clock::now() + pause;
       });
 }
 
+void ObjectTree::read(const Place& place) {
+  if (!_reading.insert(place).second) {
+    // What is on its way may be older than what is wanted.
+    _unread.insert(place);
+    return;
+  }
+  const std::uint64_t epoch = _epoch;
+  _calls.call(
+      place.first, mm::kPropertiesInterface, "GetAll",
+      [this, place, epoch](sdbus::MethodReply& reply) {
+        if (epoch != _epoch || _reading.erase(place) == 0) return;
+        BusProperties properties;
+        reply >> properties;
+        const auto& [path, interface] = place;
+        if (_unread.erase(place) != 0) _toRead.insert(place);
+        if (!_objects.contains(path)) {
+          if (!_wanted.contains(path)) return;
+          _parts.insert(path);
+        }
+        _objects[path][interface] = std::move(properties);
+      },
+      [this, place, epoch](const sdbus::Error&) {
+        if (epoch != _epoch) return;
+        _reading.erase(place);
+        _unread.insert(place);
+        if (const auto found = _objects.find(place.first); found != _objects.end()) {
+          found->second[place.second].clear();
+        }
+      },
+      place.second);
+}
+
 void ObjectTree::want(const std::vector<ModemPart>& parts) {
+  _wanted.clear();
+  for (const ModemPart& part : parts) _wanted.insert(part.path);
   for (const std::string& path : std::set<std::string>(_parts)) {
-    if (std::ranges::find(parts, path, &ModemPart::path) == parts.end()) drop(path);
+    if (!_wanted.contains(path)) drop(path);
   }
   for (const ModemPart& part : parts) {
-    if (_objects.contains(part.path) || !_asked.insert(part.path).second) continue;
-    const std::string path = part.path;
-    const std::string interface = part.interface;
-    _calls.call(
-        path, mm::kPropertiesInterface, "GetAll",
-        [this, path, interface, epoch = _epoch](sdbus::MethodReply& reply) {
-          if (epoch != _epoch || !_asked.contains(path)) return;
-          BusProperties properties;
-          reply >> properties;
-          _objects[path][interface] = std::move(properties);
-          _parts.insert(path);
-        },
-        [](const sdbus::Error&) {}, interface);
+    const Place place(part.path, part.interface);
+    const auto object = _objects.find(part.path);
+    const bool known = object != _objects.end() && object->second.contains(part.interface);
+    if (!known && !_reading.contains(place) && !_unread.contains(place)) _toRead.insert(place);
   }
+}
+
+void ObjectTree::askAgain() {
+  for (const Place& place : std::exchange(_unread, {})) _toRead.insert(place);
 }
 
 }  // namespace qel::service

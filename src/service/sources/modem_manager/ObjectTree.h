@@ -7,6 +7,7 @@
 #include <cstdint>
 #include <set>
 #include <string>
+#include <utility>
 #include <vector>
 
 #include "service/sources/modem_manager/BusCalls.h"
@@ -23,23 +24,28 @@ class ObjectTree {
 
   const BusObjects& objects() const { return _objects; }
 
-  // Makes the calls that are due. Not from within a signal or an answer.
-  void step(Clock::time_point now);
+  // Makes the calls that are due. Not from within a signal or an answer. Returns the objects that
+  // went since the last step: what is now at such a path is another one.
+  std::set<std::string> step(Clock::time_point now);
   // The objects that ModemManager does not list by itself, all that are wanted.
   void want(const std::vector<ModemPart>& parts);
-  // Those that are not there are asked for again.
-  void askAgain() { _asked.clear(); }
+  // What could not be read is asked for again.
+  void askAgain();
   // When step() has something to do, at the latest.
-  Clock::time_point due() const { return _askAt; }
+  Clock::time_point due() const { return _toRead.empty() ? _askAt : Clock::time_point(); }
 
  private:
   using Take = void (ObjectTree::*)(sdbus::Message& signal);
+  using Place = std::pair<std::string, std::string>;  // path and interface
+
   sdbus::Slot watch(sdbus::IConnection& connection, const std::string& rule, Take take);
   void ownerChanged(sdbus::Message& signal);
   void added(sdbus::Message& signal);
   void removed(sdbus::Message& signal);
   void changed(sdbus::Message& signal);
+  void forgetAll();
   void askForAll();
+  void read(const Place& place);
   void drop(const std::string& path);
 
   BusCalls& _calls;
@@ -47,10 +53,14 @@ class ObjectTree {
   std::uint64_t _epoch = 0;  // of the owner: answers of an earlier one are late
   Clock::time_point _askAt;
   std::chrono::seconds _pause;
+  bool _newsMeanwhile = false;  // objects came or went while all were asked for
   BusObjects _objects;
-  std::set<std::string> _parts;  // of the objects, those that were asked for
-  std::set<std::string> _asked;
-  std::set<std::string> _gone;  // to be forgotten by the calls
+  std::set<std::string> _wanted;  // paths
+  std::set<std::string> _parts;   // of the objects, those that are there because they were wanted
+  std::set<Place> _toRead;
+  std::set<Place> _reading;
+  std::set<Place> _unread;  // asked for in vain
+  std::set<std::string> _gone;
   std::vector<sdbus::Slot> _watches;
 };
 

@@ -11,6 +11,7 @@ void PolledMethod::step(BusCalls& calls, SaidOnce& said, const std::string& iden
       _modem, _row.interface, _row.member,
       [this](sdbus::MethodReply& reply) {
         _underWay = false;
+        _settled = true;
         _take(reply);
       },
       [this, &said, identity](const sdbus::Error& error) { failed(error, said, identity); });
@@ -18,6 +19,7 @@ void PolledMethod::step(BusCalls& calls, SaidOnce& said, const std::string& iden
 
 void PolledMethod::failed(const sdbus::Error& error, SaidOnce& said, const std::string& identity) {
   _underWay = false;
+  _settled = true;
   _forget();
   const Refusal refusal = refusalOf(error);
   if (refusal == Refusal::none) return;

@@ -34,6 +34,8 @@ class PolledMethod {
   // The next step calls, if it may.
   void callSoon() { _due = {}; }
   Clock::time_point due() const;
+  // There has been an answer, or an error instead.
+  bool isSettled() const { return _settled; }
 
  private:
   void failed(const sdbus::Error& error, SaidOnce& said, const std::string& identity);
@@ -44,6 +46,7 @@ class PolledMethod {
   const std::function<void()> _forget;
   bool _underWay = false;
   bool _off = false;
+  bool _settled = false;
   Clock::time_point _due;
 };
 

@@ -1,11 +1,11 @@
 // The metrics of a modem on UMTS.
 #include "messages/lte_serving.h"
 #include "messages/wcdma.h"
+#include "service/sources/Levels.h"
 #include "service/sources/modem_manager/Bands.h"
 #include "service/sources/modem_manager/Filling.h"
 #include "service/sources/modem_manager/ModemReports.h"
 #include "service/sources/modem_manager/Names.h"
-#include "service/sources/simulated/Reports.h"
 
 namespace qel::service {
 namespace {
@@ -88,20 +88,7 @@ std::optional<Bytes> modemUmtsNeighbours(const ModemPicture& modem, std::uint64_
   if (modem.technology != Technology::umts || !modem.cellsKnown) return std::nullopt;
   KCellularWcdmaNbrCellMeas message;
   message.setTimestamp(timeMs);
-  for (const CellReading& cell : modem.neighbours) {
-    if (!isNamed(cell)) continue;
-    switch (cell.technology) {
-      case Technology::umts:
-        addUmts(cell, message);
-        break;
-      case Technology::gsm:
-        addGsm(cell, message);
-        break;
-      case Technology::lte:
-        addLte(cell, message);
-        break;
-    }
-  }
+  addNeighbours(modem, message, {addLte, addUmts, addGsm});
   return message.data();
 }
 

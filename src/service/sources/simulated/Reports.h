@@ -1,14 +1,13 @@
 // The payloads of the metrics, from the state of the simulated phone.
 #pragma once
 
-#include <algorithm>
-#include <cmath>
 #include <cstdint>
 #include <memory>
 #include <optional>
 #include <vector>
 
 #include "base/Bytes.h"
+#include "service/sources/Levels.h"
 #include "service/sources/simulated/Phone.h"
 #include "service/sources/simulated/RadioScene.h"
 
@@ -68,17 +67,6 @@ std::optional<Bytes> gmmContext(const PhoneView& view, std::uint64_t timeMs);
 std::optional<Bytes> emmContext(const PhoneView& view, std::uint64_t timeMs);
 std::optional<Bytes> bearers(const PhoneView& view, std::uint64_t timeMs);
 std::optional<Bytes> simFiles(const PhoneView& view, std::uint64_t timeMs);
-
-// Values as reports carry them.
-inline std::int32_t rounded(double value) { return static_cast<std::int32_t>(std::lround(value)); }
-inline std::uint32_t index(double value, int highest) {
-  return static_cast<std::uint32_t>(std::clamp(rounded(value), 0, highest));
-}
-inline std::uint32_t rsrpIndex(double dbm) { return index(dbm + 140, 97); }       // 36.133, 9.1.4
-inline std::uint32_t rsrqIndex(double db) { return index((db + 19.5) * 2, 34); }  // 36.133, 9.1.7
-inline std::uint32_t rscpIndex(double dbm) { return index(dbm + 116, 91); }       // 25.133, 9.1.1.3
-inline std::uint32_t ecnoIndex(double db) { return index((db + 24.5) * 2, 49); }  // 25.133, 9.1.2.3
-inline std::uint32_t rxlevIndex(double dbm) { return index(dbm + 110, 63); }      // 45.008, 8.1.4
 
 inline constexpr double kMostPowerDbm = 23;
 inline constexpr double kLeastPowerDbm = -40;
