@@ -3,7 +3,6 @@
 #include <QtGui/QGuiApplication>
 #include <QtQml/QQmlApplicationEngine>
 #include <QtQuick/QQuickWindow>
-#include <QtQuickControls2/QQuickStyle>
 #include <cstdlib>
 #include <iostream>
 #include <memory>
@@ -45,7 +44,6 @@ void nameApplication() {
   QGuiApplication::setApplicationVersion(QStringLiteral(QELWATCH_VERSION));
   QGuiApplication::setOrganizationName(kName);
   QGuiApplication::setDesktopFileName(kName);
-  QQuickStyle::setStyle(QStringLiteral("Basic"));
 }
 
 void findResources() {

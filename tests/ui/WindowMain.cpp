@@ -4,7 +4,6 @@
 
 #include <QtCore/QTemporaryDir>
 #include <QtGui/QGuiApplication>
-#include <QtQuickControls2/QQuickStyle>
 
 int main(int argc, char** argv) {
   ::testing::InitGoogleTest(&argc, argv);
@@ -13,7 +12,6 @@ int main(int argc, char** argv) {
   qputenv("XDG_CONFIG_HOME", home.path().toLocal8Bit());
   qputenv("XDG_RUNTIME_DIR", home.path().toLocal8Bit());
   qputenv("DBUS_SESSION_BUS_ADDRESS", "unix:path=/nonexistent");
-  QQuickStyle::setStyle(QStringLiteral("Basic"));
   QGuiApplication::setApplicationName(QStringLiteral("qelwatch"));
   QGuiApplication::setApplicationDisplayName(QStringLiteral("qelwatch"));
   QGuiApplication::setOrganizationName(QStringLiteral("qelwatch"));

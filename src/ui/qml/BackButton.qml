@@ -1,9 +1,8 @@
 import QtQuick
-import QtQuick.Templates as T
 import Qelwatch.Ui
 
 // Leads to the screen before, by name when there is room for it.
-T.AbstractButton {
+Tappable {
     id: button
 
     // Width with the name and without it.
@@ -12,10 +11,7 @@ T.AbstractButton {
     property bool showsName: true
 
     width: Math.max(Theme.touch, showsName ? fullWidth : shortWidth)
-    focusPolicy: Qt.TabFocus
-
-    Keys.onReturnPressed: clicked()
-    Keys.onEnterPressed: clicked()
+    activeFocusOnTab: true
 
     Accessible.role: Accessible.Button
     Accessible.name: qsTr("Back to %1").arg(text)

@@ -66,7 +66,7 @@ Item {
                     sidePadding: footer.sidePadding
                     text: modelData.name
                     checked: Appearance.theme === modelData.theme
-                    onClicked: Appearance.theme = modelData.theme
+                    onTapped: Appearance.theme = modelData.theme
                 }
                 // qmllint enable unqualified
             }

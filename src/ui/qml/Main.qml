@@ -1,8 +1,7 @@
 import QtQuick
-import QtQuick.Controls.Basic
 import Qelwatch.Ui
 
-ApplicationWindow {
+Window {
     id: window
 
     // Where the values come from, in words for the first screen.

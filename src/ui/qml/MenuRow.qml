@@ -1,9 +1,8 @@
 import QtQuick
-import QtQuick.Templates as T
 import Qelwatch.Ui
 
 // A row of a menu: what it is called and that it leads on. The whole row is the target.
-T.AbstractButton {
+Tappable {
     id: row
 
     required property int index
@@ -14,16 +13,14 @@ T.AbstractButton {
 
     width: ListView.view?.width ?? 0
     implicitHeight: Math.max(Theme.touch + 8, Math.round(label.implicitHeight) + 2 * Theme.padding)
-    focusPolicy: Qt.NoFocus
 
     Accessible.role: Accessible.ListItem
-    Accessible.name: text
-    Accessible.focusable: true
     Accessible.focused: isCurrent
 
-    onClicked: table.choose(index)
+    onTapped: table.choose(index)
 
-    background: Rectangle {
+    Rectangle {
+        anchors.fill: parent
         color: Theme.row
 
         Rectangle {

@@ -39,7 +39,7 @@ Rectangle {
         visible: bar.hasBack
         showsName: bar.nameFits
         text: bar.previousTitle
-        onClicked: bar.back()
+        onTapped: bar.back()
     }
     Text {
         id: label

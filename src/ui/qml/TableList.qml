@@ -1,5 +1,4 @@
 import QtQuick
-import QtQuick.Controls.Basic
 import Qelwatch.Ui
 
 // The rows of a table in the look of their prototype, under section headers that stick. A key moves
@@ -41,15 +40,6 @@ FocusScope {
         section.labelPositioning: ViewSection.InlineLabels | ViewSection.CurrentLabelAtStart
         section.delegate: SectionHeader {}
 
-        ScrollIndicator.vertical: ScrollIndicator {
-            contentItem: Rectangle {
-                implicitWidth: 3
-                radius: 1.5
-                color: Theme.secondary
-                opacity: list.moving ? 0.6 : 0
-            }
-        }
-
         Accessible.role: Accessible.List
 
         Keys.onUpPressed: goTo(currentIndex - 1)
@@ -70,5 +60,20 @@ FocusScope {
             event.accepted = true;
             goTo(currentIndex + step);
         }
+    }
+
+    // Where in the table the view is, while it moves.
+    Rectangle {
+        readonly property real share: list.visibleArea.heightRatio
+        readonly property real track: table.height - 4
+
+        x: table.width - width - 2
+        y: 2 + list.visibleArea.yPosition * track
+        width: 3
+        height: Math.max(width, share * track)
+        radius: width / 2
+        visible: list.moving && share < 1
+        color: Theme.secondary
+        opacity: 0.6
     }
 }

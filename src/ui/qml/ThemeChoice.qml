@@ -1,22 +1,18 @@
 import QtQuick
-import QtQuick.Templates as T
 import Qelwatch.Ui
 
 // One of the ways the window can look; the chosen one is underlined.
-T.AbstractButton {
+Tappable {
     id: choice
 
     required property real sidePadding
+    property bool checked: false
 
     implicitWidth: Math.max(Theme.touch, label.implicitWidth + 2 * sidePadding)
     implicitHeight: Math.max(Theme.touch, label.implicitHeight + 2 * Theme.padding)
-    focusPolicy: Qt.TabFocus
-
-    Keys.onReturnPressed: clicked()
-    Keys.onEnterPressed: clicked()
+    activeFocusOnTab: true
 
     Accessible.role: Accessible.RadioButton
-    Accessible.name: text
     Accessible.checked: checked
 
     Text {
