@@ -203,9 +203,11 @@ void ModemLink::attend(Clock::time_point now) {
   }
   const std::uint32_t technologies =
       busUnsigned(propertiesOf(interfaces, mm::kModem), "AccessTechnologies").value_or(0);
-  // The list of cells is of before the phone moved.
+  // The cells and the place are of before the phone moved.
   if (std::exchange(_watched->accessTechnologies, technologies) != technologies) {
+    _watched->answers.place.clear();
     _watched->cells.callSoon();
+    _watched->place.callSoon();
   }
   _watched->cells.step(_calls, _said, identity, now, _timing.period);
   if (placeMustBeAsked(interfaces)) {

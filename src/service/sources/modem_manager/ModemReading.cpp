@@ -89,6 +89,7 @@ std::optional<BearerReading> bearerReading(const BusProperties& bearer) {
   return reading;
 }
 
+// Nothing until all of them have been read.
 std::optional<std::vector<BearerReading>> bearersOf(const BusObjects& objects,
                                                     const BusInterfaces& modem) {
   const auto paths =
@@ -96,7 +97,9 @@ std::optional<std::vector<BearerReading>> bearersOf(const BusObjects& objects,
   if (!paths) return std::nullopt;
   std::vector<BearerReading> bearers;
   for (const std::string& path : *paths) {
-    if (auto bearer = bearerReading(propertiesOf(objectAt(objects, path), mm::kBearer))) {
+    const BusInterfaces& object = objectAt(objects, path);
+    if (!object.contains(mm::kBearer)) return std::nullopt;
+    if (auto bearer = bearerReading(propertiesOf(object, mm::kBearer))) {
       bearers.push_back(std::move(*bearer));
     }
   }

@@ -167,23 +167,26 @@ void ObjectTree::read(const Place& place) {
         if (epoch != _epoch || _reading.erase(place) == 0) return;
         BusProperties properties;
         reply >> properties;
-        const auto& [path, interface] = place;
         if (_unread.erase(place) != 0) _toRead.insert(place);
-        if (!_objects.contains(path)) {
-          if (!_wanted.contains(path)) return;
-          _parts.insert(path);
-        }
-        _objects[path][interface] = std::move(properties);
+        put(place, std::move(properties));
       },
       [this, place, epoch](const sdbus::Error&) {
         if (epoch != _epoch) return;
         _reading.erase(place);
         _unread.insert(place);
-        if (const auto found = _objects.find(place.first); found != _objects.end()) {
-          found->second[place.second].clear();
-        }
+        put(place, {});
       },
       place.second);
+}
+
+// Unless the object has gone meanwhile, or is wanted no more.
+void ObjectTree::put(const Place& place, BusProperties properties) {
+  const auto& [path, interface] = place;
+  if (!_objects.contains(path)) {
+    if (!_wanted.contains(path)) return;
+    _parts.insert(path);
+  }
+  _objects[path][interface] = std::move(properties);
 }
 
 void ObjectTree::want(const std::vector<ModemPart>& parts) {

@@ -46,6 +46,7 @@ class ObjectTree {
   void forgetAll();
   void askForAll();
   void read(const Place& place);
+  void put(const Place& place, BusProperties properties);
   void drop(const std::string& path);
 
   BusCalls& _calls;

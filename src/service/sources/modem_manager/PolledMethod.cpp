@@ -1,6 +1,12 @@
 #include "service/sources/modem_manager/PolledMethod.h"
 
 namespace qel::service {
+namespace {
+
+// A modem that is busy for a while is where it was.
+constexpr int kMostFailures = 3;
+
+}  // namespace
 
 void PolledMethod::step(BusCalls& calls, SaidOnce& said, const std::string& identity,
                         Clock::time_point now, std::chrono::milliseconds period) {
@@ -13,6 +19,7 @@ void PolledMethod::step(BusCalls& calls, SaidOnce& said, const std::string& iden
         _underWay = false;
         _settled = true;
         _take(reply);
+        _failures = 0;
       },
       [this, &said, identity](const sdbus::Error& error) { failed(error, said, identity); });
 }
@@ -20,8 +27,8 @@ void PolledMethod::step(BusCalls& calls, SaidOnce& said, const std::string& iden
 void PolledMethod::failed(const sdbus::Error& error, SaidOnce& said, const std::string& identity) {
   _underWay = false;
   _settled = true;
-  _forget();
   const Refusal refusal = refusalOf(error);
+  if (refusal != Refusal::none || ++_failures >= kMostFailures) _forget();
   if (refusal == Refusal::none) return;
   _off = true;
   said.say(identity, refusal == Refusal::denied ? _row.deniedAdvice : _row.unsupportedAdvice);

@@ -24,7 +24,7 @@ class PolledMethod {
   using Clock = std::chrono::steady_clock;
   using Take = std::function<void(sdbus::MethodReply& reply)>;  // may throw sdbus::Error
 
-  // `forget` when the last answer no longer holds: the call has failed.
+  // `forget` when the last answer no longer holds: the call is refused, or has failed three times.
   PolledMethod(const MethodRow& row, std::string modem, Take take, std::function<void()> forget)
       : _row(row), _modem(std::move(modem)), _take(std::move(take)), _forget(std::move(forget)) {}
 
@@ -47,6 +47,7 @@ class PolledMethod {
   bool _underWay = false;
   bool _off = false;
   bool _settled = false;
+  int _failures = 0;  // in a row
   Clock::time_point _due;
 };
 
