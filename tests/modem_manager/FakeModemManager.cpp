@@ -74,23 +74,36 @@ void FakeModemManager::perform(const std::function<void()>& task) {
   done.get_future().wait();
 }
 
+FakeModemManager::Object& FakeModemManager::make(const std::string& path,
+                                                 FakeInterfaces interfaces) {
+  auto made = std::make_unique<Object>();
+  made->interfaces = std::move(interfaces);
+  made->object = sdbus::createObject(*_connection, path);
+  for (auto& [interface, properties] : made->interfaces) {
+    for (auto& [name, property] : properties) {
+      made->object->registerProperty(
+          interface, name, property.signature,
+          [held = &property](sdbus::PropertyGetReply& reply) { held->write(reply); });
+    }
+  }
+  if (made->interfaces.contains(kModem)) addMethods(*made->object, path);
+  made->object->finishRegistration();
+  return *(_objects[path] = std::move(made));
+}
+
 void FakeModemManager::add(const std::string& path, FakeInterfaces interfaces) {
   perform([&] {
-    auto made = std::make_unique<Object>();
-    Object* object = made.get();
-    object->interfaces = std::move(interfaces);
-    object->object = sdbus::createObject(*_connection, path);
-    for (auto& [interface, properties] : object->interfaces) {
-      for (auto& [name, property] : properties) {
-        object->object->registerProperty(
-            interface, name, property.signature,
-            [held = &property](sdbus::PropertyGetReply& reply) { held->write(reply); });
-      }
+    const Object& made = make(path, std::move(interfaces));
+    if (path.starts_with(kRoot)) made.object->emitInterfacesAddedSignal();
+  });
+}
+
+void FakeModemManager::addInPieces(const std::string& path, FakeInterfaces interfaces) {
+  perform([&] {
+    const Object& made = make(path, std::move(interfaces));
+    for (const auto& [interface, properties] : made.interfaces) {
+      made.object->emitInterfacesAddedSignal({interface});
     }
-    if (object->interfaces.contains(kModem)) addMethods(*object->object, path);
-    object->object->finishRegistration();
-    if (path.starts_with(kRoot)) object->object->emitInterfacesAddedSignal();
-    _objects[path] = std::move(made);
   });
 }
 
@@ -107,6 +120,18 @@ void FakeModemManager::set(const std::string& path, const std::string& interface
     Object& object = *_objects.at(path);
     object.interfaces.at(interface).at(name).write = value.write;
     object.object->emitPropertiesChangedSignal(interface, {name});
+  });
+}
+
+void FakeModemManager::setQuietly(const std::string& path, const std::string& interface,
+                                  const std::string& name, FakeProperty value) {
+  perform([&] {
+    Object& object = *_objects.at(path);
+    object.interfaces.at(interface).at(name).write = value.write;
+    auto signal =
+        object.object->createSignal("org.freedesktop.DBus.Properties", "PropertiesChanged");
+    signal << interface << FakeDictionary() << std::vector<std::string>{name};
+    object.object->emitSignal(signal);
   });
 }
 
@@ -134,11 +159,18 @@ std::vector<std::uint32_t> FakeModemManager::ratesAskedFor() {
   return rates;
 }
 
+std::vector<std::pair<std::uint32_t, bool>> FakeModemManager::placesAskedFor() {
+  std::vector<std::pair<std::uint32_t, bool>> places;
+  perform([&] { places = _places; });
+  return places;
+}
+
 void FakeModemManager::method(sdbus::IObject& object, const std::string& interface,
                               const std::string& name, const std::string& in,
                               const std::string& out,
                               std::function<void(sdbus::MethodCall&, sdbus::MethodReply&)> write) {
-  object.registerMethod(interface, name, in, out, [this, name, write](sdbus::MethodCall call) {
+  const std::string member = name.substr(name.rfind('.') + 1);
+  object.registerMethod(interface, member, in, out, [this, name, write](sdbus::MethodCall call) {
     ++_calls[name];
     const FakeAnswer& how = _answers[name];
     switch (how.kind) {
@@ -170,6 +202,18 @@ void FakeModemManager::addMethods(sdbus::IObject& object, const std::string& pat
   method(object, kLocation, "GetLocation", "", "a{uv}",
          [this](sdbus::MethodCall&, sdbus::MethodReply& reply) {
            reply << std::map<std::uint32_t, sdbus::Variant>{{1U, sdbus::Variant(_place)}};
+         });
+  method(object, kLocation, "Location.Setup", "ub", "",
+         [this, path](sdbus::MethodCall& call, sdbus::MethodReply&) {
+           std::uint32_t sources = 0;
+           bool signals = false;
+           call >> sources >> signals;
+           _places.emplace_back(sources, signals);
+           Object& modem = *_objects.at(path);
+           auto& location = modem.interfaces.at(kLocation);
+           location.at("Enabled").write = FakeProperty(sources).write;
+           location.at("SignalsLocation").write = FakeProperty(signals).write;
+           modem.object->emitPropertiesChangedSignal(kLocation, {"Enabled", "SignalsLocation"});
          });
   method(object, kSignal, "Setup", "u", "",
          [this, path](sdbus::MethodCall& call, sdbus::MethodReply&) {

@@ -11,6 +11,7 @@
 #include <mutex>
 #include <string>
 #include <thread>
+#include <utility>
 #include <vector>
 
 #include "tesk/bus/WakeUp.h"
@@ -47,24 +48,32 @@ class FakeModemManager {
 
   // An object under the manager is listed by it; others have to be asked for.
   void add(const std::string& path, FakeInterfaces interfaces);
+  // Tells of its interfaces one after the other.
+  void addInPieces(const std::string& path, FakeInterfaces interfaces);
   void remove(const std::string& path);
   // The property exists and keeps its type.
   void set(const std::string& path, const std::string& interface, const std::string& name,
            FakeProperty value);
+  // The same, but says only that the property has changed.
+  void setQuietly(const std::string& path, const std::string& interface, const std::string& name,
+                  FakeProperty value);
 
   // What GetCellInfo and GetLocation of every modem answer.
   void setCells(std::vector<FakeDictionary> cells);
   void setPlace(std::string place);
-  // By the method's name: GetCellInfo, GetLocation or Setup.
+  // By the method's name: GetCellInfo, GetLocation, Setup (of Signal) or Location.Setup.
   void answer(const std::string& method, FakeAnswer how);
   int calls(const std::string& method);
   std::vector<std::uint32_t> ratesAskedFor();
+  std::vector<std::pair<std::uint32_t, bool>> placesAskedFor();
 
  private:
   struct Object;
   void perform(const std::function<void()>& task);
   void live();
+  Object& make(const std::string& path, FakeInterfaces interfaces);
   void addMethods(sdbus::IObject& object, const std::string& path);
+  // Known as `name`; on the bus it is what stands behind the last dot.
   void method(sdbus::IObject& object, const std::string& interface, const std::string& name,
               const std::string& in, const std::string& out,
               std::function<void(sdbus::MethodCall&, sdbus::MethodReply&)> write);
@@ -78,6 +87,7 @@ class FakeModemManager {
   std::map<std::string, FakeAnswer> _answers;
   std::map<std::string, int> _calls;
   std::vector<std::uint32_t> _rates;
+  std::vector<std::pair<std::uint32_t, bool>> _places;
   std::vector<sdbus::MethodCall> _unanswered;
 
   const tesk::bus::WakeUp _wakeUp;

@@ -17,25 +17,7 @@ namespace qel::testing {
 namespace {
 
 using namespace service;
-using ::testing::ElementsAre;
 using ::testing::HasSubstr;
-using ::testing::IsEmpty;
-
-std::string pathOf(int number) {
-  return "/org/freedesktop/ModemManager1/Modem/" + std::to_string(number);
-}
-
-// A modem whose signal tells which one it is.
-FakeInterfaces modemWithRsrp(double dbm, const std::string& imei = "350000000000011") {
-  auto modem = modemOn(kOnLte, imei);
-  modem.at(kSignal).at("Lte") = FakeDictionary{{"rsrp", level(dbm)}};
-  return modem;
-}
-
-bool waitForRsrp(const ModemWorld& world, std::int32_t dbm) {
-  return world.log->waitFor<KCellularLteRsrpRsrqSinr>(
-      metric::kLteRsrpRsrqSinr, [dbm](const auto& m) { return m.instValues()[0]->rsrp0() == dbm; });
-}
 
 TEST(ModemManagerSource, FollowsAModemThatIsUnpluggedAndComesBackFiftyTimes) {
   ModemWorld world;
@@ -43,7 +25,7 @@ TEST(ModemManagerSource, FollowsAModemThatIsUnpluggedAndComesBackFiftyTimes) {
   for (int i = 0; i < 50; ++i) {
     const std::int32_t dbm = -60 - i;
     world.manager->add(pathOf(i), modemWithRsrp(dbm));
-    ASSERT_TRUE(waitForRsrp(world, dbm)) << i;
+    ASSERT_TRUE(world.waitForRsrp(dbm)) << i;
     world.manager->remove(pathOf(i));
     ASSERT_TRUE(becomesTrue([&] { return !world.has(metric::kLteRsrpRsrqSinr); })) << i;
   }
@@ -53,12 +35,12 @@ TEST(ModemManagerSource, GoesOnAfterAnotherStartOfModemManager) {
   ModemWorld world;
   world.manager->add(kModemPath, modemWithRsrp(-80));
   world.start();
-  ASSERT_TRUE(waitForRsrp(world, -80));
+  ASSERT_TRUE(world.waitForRsrp(-80));
   world.manager.reset();
   ASSERT_TRUE(becomesTrue([&] { return !world.has(metric::kLteRsrpRsrqSinr); }));
   world.manager = std::make_unique<FakeModemManager>(world.bus.address());
   world.manager->add(pathOf(7), modemWithRsrp(-70));
-  EXPECT_TRUE(waitForRsrp(world, -70));
+  EXPECT_TRUE(world.waitForRsrp(-70));
 }
 
 TEST(ModemManagerSource, GoesOnAfterTheLossOfTheBus) {
@@ -66,14 +48,14 @@ TEST(ModemManagerSource, GoesOnAfterTheLossOfTheBus) {
   ModemWorld world;
   world.manager->add(kModemPath, modemWithRsrp(-80));
   world.start();
-  ASSERT_TRUE(waitForRsrp(world, -80));
+  ASSERT_TRUE(world.waitForRsrp(-80));
   world.bus.stop();
   ASSERT_TRUE(becomesTrue([&] { return !world.has(metric::kLteRsrpRsrqSinr); }));
   world.manager.reset();
   world.bus.start();
   world.manager = std::make_unique<FakeModemManager>(world.bus.address());
   world.manager->add(kModemPath, modemWithRsrp(-71));
-  EXPECT_TRUE(waitForRsrp(world, -71));
+  EXPECT_TRUE(world.waitForRsrp(-71));
   world.source.reset();
   ASSERT_THAT(log.lines(), ::testing::SizeIs(1));
   EXPECT_THAT(log.lines()[0], HasSubstr("no message bus"));
@@ -84,13 +66,13 @@ TEST(ModemManagerSource, TakesTheFirstModemAndStaysWithIt) {
   world.manager->add(pathOf(10), modemWithRsrp(-90));
   world.manager->add(pathOf(9), modemWithRsrp(-80, "350000000000029"));
   world.start();
-  ASSERT_TRUE(waitForRsrp(world, -80));
+  ASSERT_TRUE(world.waitForRsrp(-80));
   world.manager->add(pathOf(2), modemWithRsrp(-60, "350000000000037"));
   const int before = world.log->count(metric::kLteRsrpRsrqSinr);
   ASSERT_TRUE(world.log->waitForCount(metric::kLteRsrpRsrqSinr, before + 3));
-  EXPECT_TRUE(waitForRsrp(world, -80));
+  EXPECT_TRUE(world.waitForRsrp(-80));
   world.manager->remove(pathOf(9));
-  EXPECT_TRUE(waitForRsrp(world, -60));
+  EXPECT_TRUE(world.waitForRsrp(-60));
 }
 
 TEST(ModemManagerSource, FindsTheWantedModemByItsImeiWhereverItIs) {
@@ -98,11 +80,11 @@ TEST(ModemManagerSource, FindsTheWantedModemByItsImeiWhereverItIs) {
   world.manager->add(pathOf(0), modemWithRsrp(-90));
   world.manager->add(pathOf(1), modemWithRsrp(-80, "350000000000029"));
   world.start();
-  ASSERT_TRUE(waitForRsrp(world, -80));
+  ASSERT_TRUE(world.waitForRsrp(-80));
   world.manager->remove(pathOf(1));
   ASSERT_TRUE(becomesTrue([&] { return !world.has(metric::kLteRsrpRsrqSinr); }));
   world.manager->add(pathOf(5), modemWithRsrp(-75, "350000000000029"));
-  EXPECT_TRUE(waitForRsrp(world, -75));
+  EXPECT_TRUE(world.waitForRsrp(-75));
 }
 
 TEST(ModemManagerSource, FindsTheWantedModemByItsPath) {
@@ -110,7 +92,7 @@ TEST(ModemManagerSource, FindsTheWantedModemByItsPath) {
   world.manager->add(pathOf(0), modemWithRsrp(-90));
   world.manager->add(pathOf(1), modemWithRsrp(-80));
   world.start();
-  EXPECT_TRUE(waitForRsrp(world, -80));
+  EXPECT_TRUE(world.waitForRsrp(-80));
 }
 
 TEST(ModemManagerSource, RepeatsWhatHoldsAndAnswersQueriesWithIt) {
@@ -140,7 +122,7 @@ TEST(CellInformation, ThatIsNotAllowedIsNamedInOneLineAndNotAskedForAgain) {
     // The same modem under another path has nothing new to say.
     world.manager->remove(kModemPath);
     world.manager->add(pathOf(1), modemWithRsrp(-81));
-    ASSERT_TRUE(waitForRsrp(world, -81));
+    ASSERT_TRUE(world.waitForRsrp(-81));
     ASSERT_TRUE(becomesTrue([&] { return world.manager->calls("GetCellInfo") == 2; }));
     world.source.reset();
     ASSERT_THAT(log.lines(), ::testing::SizeIs(1)) << error;
@@ -155,9 +137,9 @@ TEST(CellInformation, ThatNeverComesHoldsNothingUp) {
   world.manager->answer("Setup", {FakeAnswer::Kind::never, ""});
   world.manager->add(kModemPath, modemWithRsrp(-80));
   world.start();
-  ASSERT_TRUE(waitForRsrp(world, -80));
+  ASSERT_TRUE(world.waitForRsrp(-80));
   world.manager->set(kModemPath, kSignal, "Lte", FakeDictionary{{"rsrp", level(-83)}});
-  EXPECT_TRUE(waitForRsrp(world, -83));
+  EXPECT_TRUE(world.waitForRsrp(-83));
   // After the call's time is over it is tried again, and then there is an answer.
   world.manager->setCells({{{"cell-type", number(5)},
                             {"serving", flag(true)},
@@ -166,50 +148,6 @@ TEST(CellInformation, ThatNeverComesHoldsNothingUp) {
   world.manager->answer("GetCellInfo", {});
   EXPECT_TRUE(world.log->waitFor<KCellularLteScellInfo>(
       metric::kLteScellInfo, [](const auto& cell) { return cell.phyCellId() == 7; }));
-}
-
-TEST(SignalRate, IsSetAndPutBackToWhatItWas) {
-  for (const std::uint32_t found : {0U, 30U}) {
-    ModemWorld world;
-    world.manager->add(kModemPath, modemOn(kOnLte, "350000000000011", found));
-    world.start();
-    ASSERT_TRUE(becomesTrue([&] { return world.manager->ratesAskedFor().size() == 1; }));
-    world.source.reset();
-    EXPECT_THAT(world.manager->ratesAskedFor(), ElementsAre(1U, found));
-  }
-}
-
-TEST(SignalRate, OfAnotherClientIsNeverLowered) {
-  ModemWorld world;
-  world.manager->add(kModemPath, modemOn(kOnLte, "350000000000011", 1));
-  world.start();
-  ASSERT_TRUE(world.log->waitForCount(metric::kEmmContext, 4));
-  world.source.reset();
-  EXPECT_THAT(world.manager->ratesAskedFor(), IsEmpty());
-}
-
-TEST(SignalRate, ThatAnotherClientHasSetSinceIsLeftAlone) {
-  ModemWorld world;
-  world.manager->add(kModemPath, modemOn(kOnLte, "350000000000011", 30));
-  world.start();
-  ASSERT_TRUE(becomesTrue([&] { return world.manager->ratesAskedFor().size() == 1; }));
-  ASSERT_TRUE(world.log->waitForCount(metric::kEmmContext, 3));
-  world.manager->set(kModemPath, kSignal, "Rate", std::uint32_t{2});
-  const int before = world.log->count(metric::kEmmContext);
-  ASSERT_TRUE(world.log->waitForCount(metric::kEmmContext, before + 3));
-  world.source.reset();
-  EXPECT_THAT(world.manager->ratesAskedFor(), ElementsAre(1U));
-}
-
-TEST(SignalRate, ThatMayNotBeSetIsNamedInOneLine) {
-  CapturedSystemLog log;
-  ModemWorld world;
-  world.manager->answer(
-      "Setup", {FakeAnswer::Kind::error, "org.freedesktop.ModemManager1.Error.Core.Unauthorized"});
-  world.manager->add(kModemPath, modemOn(kOnLte));
-  world.start();
-  ASSERT_TRUE(becomesTrue([&] { return log.lines().size() == 1; }));
-  EXPECT_THAT(log.lines()[0], HasSubstr("Device.Control"));
 }
 
 TEST(Nonsense, OfEveryTypeIsNoValue) {
@@ -225,7 +163,7 @@ TEST(Nonsense, OfEveryTypeIsNoValue) {
   modem.at(kLocation).at("Enabled") = true;
   world.manager->add(kModemPath, modem);
   world.start();
-  ASSERT_TRUE(waitForRsrp(world, -80));
+  ASSERT_TRUE(world.waitForRsrp(-80));
   ASSERT_TRUE(becomesTrue([&] { return world.manager->calls("GetCellInfo") > 3; }));
   for (const std::uint32_t metric :
        {metric::kLteScellInfo, metric::kLteNeighbours, metric::kEmmContext, metric::kBearers,

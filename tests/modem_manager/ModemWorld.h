@@ -10,8 +10,10 @@
 #include <string>
 
 #include "messages/catalogue/KBBMetricUtility.h"
+#include "messages/lte_serving.h"
 #include "modem_manager/FakeModemManager.h"
 #include "service/sources/modem_manager/ModemManagerSource.h"
+#include "service/sources/simulated/Metrics.h"
 #include "support/PrivateBus.h"
 #include "tesk/Constants.h"
 
@@ -52,7 +54,11 @@ inline FakeInterfaces modemOn(std::uint32_t technologies,
             {"Lte", FakeDictionary()},
             {"Umts", FakeDictionary()},
             {"Gsm", FakeDictionary()}}},
-          {kLocation, {{"Enabled", std::uint32_t{0}}, {"SignalsLocation", false}}}};
+          {kLocation,
+           {{"Capabilities", std::uint32_t{0}},
+            {"Enabled", std::uint32_t{0}},
+            {"SignalsLocation", false},
+            {"Location", std::map<std::uint32_t, sdbus::Variant>()}}}};
 }
 
 inline sdbus::Variant text(const char* value) { return sdbus::Variant(std::string(value)); }
@@ -113,6 +119,17 @@ class MetricLog final : public service::EventReceiver {
   std::map<std::uint32_t, int> _counts;
 };
 
+// A modem whose signal tells which one it is.
+inline FakeInterfaces modemWithRsrp(double dbm, const std::string& imei = "350000000000011") {
+  auto modem = modemOn(kOnLte, imei);
+  modem.at(kSignal).at("Lte") = FakeDictionary{{"rsrp", level(dbm)}};
+  return modem;
+}
+
+inline std::string pathOf(int number) {
+  return "/org/freedesktop/ModemManager1/Modem/" + std::to_string(number);
+}
+
 // A condition that becomes true in half a minute at most.
 inline bool becomesTrue(const std::function<bool()>& condition) {
   const auto end = std::chrono::steady_clock::now() + std::chrono::seconds(30);
@@ -138,6 +155,12 @@ class ModemWorld {
   // Whether the metric can be had.
   bool has(std::uint32_t metric) const {
     return source->query(metric).code == service::CommandCode::done;
+  }
+
+  bool waitForRsrp(std::int32_t dbm) const {
+    return log->waitFor<KCellularLteRsrpRsrqSinr>(
+        service::metric::kLteRsrpRsrqSinr,
+        [dbm](const auto& m) { return m.instValues()[0]->rsrp0() == dbm; });
   }
 
   PrivateBus bus;

@@ -41,7 +41,7 @@ void RealModemManager::start() {
       "--test-no-udev", "--test-no-suspend-resume", "--test-no-qrtr"};
   std::array<std::string, 2> settings = {
       "DBUS_SESSION_BUS_ADDRESS=" + _address,
-      // Who may do what is asked there; with nobody to ask everything is allowed.
+      // Keeps it from the machine's own bus. On a session bus everyone may do everything.
       "DBUS_SYSTEM_BUS_ADDRESS=unix:path=/nonexistent"};
   std::array<char*, words.size() + 1> argv{};
   std::array<char*, settings.size() + 1> environment{};

@@ -118,6 +118,7 @@ TEST_F(RealModem, TellsItsConnections) {
   ASSERT_EQ(bearers->bearerContexts().size(), 1U);
   EXPECT_EQ(bearers->bearerContexts()[0]->apn(), "internet.test");
   EXPECT_EQ(bearers->bearerContexts()[0]->cid(), 1U);
+  EXPECT_EQ(bearers->bearerContexts()[0]->pdpType(), 3);  // IPv4, of LTE
   // The addresses are agreed on over the connection itself.
   EXPECT_FALSE(bearers->bearerContexts()[0]->hasPdpAddr());
   manager->disconnect(path);
