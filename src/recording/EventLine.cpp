@@ -1,6 +1,5 @@
 #include "recording/EventLine.h"
 
-#include <array>
 #include <cfloat>
 #include <cmath>
 #include <nlohmann/json.hpp>
@@ -9,27 +8,15 @@
 
 #include "base/Bytes.h"
 #include "base/Rendering.h"
+#include "recording/PlainLine.h"
 
 namespace qel {
 namespace {
 
 using Json = nlohmann::ordered_json;
 
-constexpr std::string_view kTimeKey = "time_ms";
-constexpr std::string_view kEventKey = "event";
-
 // Deeper than any event dictionary; a bound for the recursion below.
 constexpr int kDeepestNesting = 32;
-
-struct KindName {
-  RecordedKind kind;
-  std::string_view name;
-};
-
-constexpr std::array kKindNames = {
-    KindName{RecordedKind::metric, "metric"},
-    KindName{RecordedKind::trigger, "trigger"},
-};
 
 LineFault fault(std::string reason) { return {true, std::move(reason)}; }
 
@@ -95,19 +82,18 @@ std::variant<Json, LineFault> parseJson(std::string_view line) {
 }
 
 std::optional<LineFault> readKind(const Json& json, RecordedEvent& event) {
-  const auto name = json.find(kEventKey);
+  const auto name = json.find(kRecordedEventKey);
   if (name == json.end()) return fault("\"event\" is missing");
   if (!name->is_string()) return fault("\"event\" is no text");
-  for (const KindName& row : kKindNames) {
-    if (name->get_ref<const std::string&>() != row.name) continue;
-    event.kind = row.kind;
+  if (const auto kind = recordedKind(name->get_ref<const std::string&>())) {
+    event.kind = *kind;
     return std::nullopt;
   }
   return fault("unknown \"event\" " + jsonText(Value(name->get_ref<const std::string&>())));
 }
 
 std::optional<LineFault> readTime(const Json& json, RecordedEvent& event) {
-  const auto time = json.find(kTimeKey);
+  const auto time = json.find(kRecordedTimeKey);
   if (time == json.end()) return fault("\"time_ms\" is missing");
   if (!time->is_number_unsigned()) return fault("\"time_ms\" is no unsigned integer");
   event.timeMs = time->get<std::uint64_t>();
@@ -125,7 +111,7 @@ std::optional<LineFault> readPayload(Value& value) {
 std::optional<LineFault> readEntries(const Json& json, RecordedEvent& event) {
   event.entries.reserve(json.size());
   for (const auto& [key, element] : json.items()) {
-    if (key == kTimeKey || key == kEventKey) continue;
+    if (key == kRecordedTimeKey || key == kRecordedEventKey) continue;
     auto value = valueOf(element, 0);
     if (!value) {
       return fault(jsonText(Value(key)) + " is nested too deep or out of range");
@@ -147,9 +133,7 @@ std::optional<LineFault> checkMetric(const RecordedEvent& event) {
   return std::nullopt;
 }
 
-}  // namespace
-
-std::variant<RecordedEvent, LineFault> parseEventLine(std::string_view line) {
+std::variant<RecordedEvent, LineFault> parseAnyLine(std::string_view line) {
   auto parsed = parseJson(line);
   if (auto* bad = std::get_if<LineFault>(&parsed)) return std::move(*bad);
   const Json& json = std::get<Json>(parsed);
@@ -158,18 +142,32 @@ std::variant<RecordedEvent, LineFault> parseEventLine(std::string_view line) {
   if (auto bad = readTime(json, event)) return std::move(*bad);
   if (auto bad = readKind(json, event)) return std::move(*bad);
   if (auto bad = readEntries(json, event)) return std::move(*bad);
-  if (auto bad = checkMetric(event)) return std::move(*bad);
   return event;
+}
+
+}  // namespace
+
+std::variant<RecordedEvent, LineFault> parseEventLine(std::string_view line) {
+  std::variant<RecordedEvent, LineFault> parsed;
+  if (auto plain = readPlainLine(line)) {
+    parsed = std::move(*plain);
+  } else {
+    parsed = parseAnyLine(line);
+  }
+  if (const auto* event = std::get_if<RecordedEvent>(&parsed)) {
+    if (auto bad = checkMetric(*event)) return std::move(*bad);
+  }
+  return parsed;
 }
 
 std::string eventLine(const RecordedEvent& event) {
   std::string line = "{\"time_ms\": " + std::to_string(event.timeMs) + ", \"event\": ";
-  for (const KindName& row : kKindNames) {
+  for (const RecordedKindName& row : kRecordedKindNames) {
     if (row.kind == event.kind) appendJsonString(line, row.name);
   }
   for (const auto& [key, value] : event.entries) {
     // These two say what the event is; a dictionary cannot say otherwise.
-    if (key.view() == kTimeKey || key.view() == kEventKey) continue;
+    if (key.view() == kRecordedTimeKey || key.view() == kRecordedEventKey) continue;
     line += ", ";
     appendJsonString(line, key);
     line += ": ";

@@ -1,7 +1,9 @@
 // One event of a recording.
 #pragma once
 
+#include <array>
 #include <cstdint>
+#include <optional>
 #include <string_view>
 
 #include "base/Dictionary.h"
@@ -15,6 +17,25 @@ struct RecordedEvent {
   RecordedKind kind = RecordedKind::metric;
   Dictionary entries;  // the event dictionary, keys in order; the payload as bytes
 };
+
+// The keys of a line that say what the event is, and the words for its kind.
+inline constexpr std::string_view kRecordedTimeKey = "time_ms";
+inline constexpr std::string_view kRecordedEventKey = "event";
+struct RecordedKindName {
+  RecordedKind kind;
+  std::string_view name;
+};
+inline constexpr std::array kRecordedKindNames = {
+    RecordedKindName{RecordedKind::metric, "metric"},
+    RecordedKindName{RecordedKind::trigger, "trigger"},
+};
+
+constexpr std::optional<RecordedKind> recordedKind(std::string_view name) {
+  for (const RecordedKindName& row : kRecordedKindNames) {
+    if (row.name == name) return row.kind;
+  }
+  return std::nullopt;
+}
 
 // The keys of the event dictionary that a recording knows; any other one is kept as it came.
 inline constexpr std::string_view kRecordedMetricKey = "kKeyMetricID";
