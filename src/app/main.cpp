@@ -7,6 +7,7 @@
 #include <iostream>
 #include <memory>
 
+#include "app/BatchedOutput.h"
 #include "app/Display.h"
 #include "app/Options.h"
 #include "app/PictureKeeper.h"
@@ -97,6 +98,7 @@ int main(int argc, char** argv) {
   int programNameOnly = 1;
   const QGuiApplication application(programNameOnly, argv);
   const qel::SignalQuit signalQuit;
+  const qel::BatchedOutput output;
   const qel::QuickRunLoop runLoop;
   findResources();
   qel::AppDelegate delegate;

@@ -3,6 +3,7 @@
 #include <unistd.h>
 
 #include <cerrno>
+#include <utility>
 
 namespace qel {
 
@@ -24,19 +25,40 @@ void DescriptorSink::write(std::string_view line) {
   _error = writeAll(_descriptor, _line);
 }
 
+BatchingSink::BatchingSink(int descriptor, std::function<void()> lineWaits)
+    : _descriptor(descriptor),
+      _isTerminal(::isatty(descriptor) == 1),
+      _lineWaits(std::move(lineWaits)) {}
+
 BatchingSink::~BatchingSink() { flush(); }
 
 void BatchingSink::write(std::string_view line) {
   constexpr std::size_t kBatch = 65536;
-  const std::lock_guard lock(_mutex);
-  _waiting += line;
-  _waiting += '\n';
-  if (_waiting.size() >= kBatch) flushLocked();
+  bool begins = false;
+  {
+    const std::lock_guard lock(_mutex);
+    begins = _waiting.empty();
+    _waiting += line;
+    _waiting += '\n';
+    if (_isTerminal || _waiting.size() >= kBatch) flushLocked();
+    begins = begins && !_waiting.empty();
+  }
+  if (begins && _lineWaits) _lineWaits();
 }
 
 void BatchingSink::flush() {
   const std::lock_guard lock(_mutex);
   flushLocked();
+}
+
+std::optional<BatchingSink::Clock::time_point> BatchingSink::flushWhenDue(Clock::time_point now) {
+  constexpr auto kPause = std::chrono::milliseconds(20);
+  const std::lock_guard lock(_mutex);
+  if (_waiting.empty()) return std::nullopt;
+  if (now < _lastWrite + kPause) return _lastWrite + kPause;
+  flushLocked();
+  _lastWrite = now;
+  return std::nullopt;
 }
 
 int BatchingSink::error() {

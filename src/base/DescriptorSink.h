@@ -1,7 +1,10 @@
 // Lines to a file descriptor, one at a time or in batches.
 #pragma once
 
+#include <chrono>
+#include <functional>
 #include <mutex>
+#include <optional>
 #include <string>
 #include <string_view>
 
@@ -26,22 +29,32 @@ class DescriptorSink final : public LogSink {
   int _error = 0;
 };
 
-// Collects lines and writes them by the batch, and what is left on flush and at its end.
+// Collects lines and writes them by the batch, and what is left on flush and at its end. To a
+// terminal every line goes at once.
 class BatchingSink final : public LogSink {
  public:
-  explicit BatchingSink(int descriptor) : _descriptor(descriptor) {}
+  using Clock = std::chrono::steady_clock;
+
+  // `lineWaits` is called, on the thread that writes, when a line begins to wait.
+  explicit BatchingSink(int descriptor, std::function<void()> lineWaits = {});
   ~BatchingSink() override;
   void write(std::string_view line) override;
-  void flush();
+  void flush() override;
+  // For a reader who wants to see lines soon: flushes when the last write is a moment ago. Else
+  // tells when it will be, if lines wait. A quiet sink so writes at once, a busy one by the batch.
+  std::optional<Clock::time_point> flushWhenDue(Clock::time_point now);
   // The error number of the first write that failed, else 0; nothing is written after it.
   int error();
 
  private:
   void flushLocked();
 
+  const int _descriptor;
+  const bool _isTerminal;
+  const std::function<void()> _lineWaits;
   std::mutex _mutex;
   std::string _waiting;
-  int _descriptor;
+  Clock::time_point _lastWrite;
   int _error = 0;
 };
 

@@ -10,7 +10,7 @@ namespace qel {
 namespace {
 
 std::vector<std::function<void()>>& handlers() {
-  static std::vector<std::function<void()>> registered;
+  static auto& registered = *new std::vector<std::function<void()>>;  // needed to the very end
   return registered;
 }
 

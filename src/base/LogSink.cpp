@@ -2,7 +2,10 @@
 
 #include <unistd.h>
 
+#include <cstdlib>
+
 #include "base/DescriptorSink.h"
+#include "base/FatalError.h"
 #include "base/SystemLogSink.h"
 
 namespace qel {
@@ -10,9 +13,17 @@ namespace {
 
 using Sink = std::shared_ptr<LogSink>;
 
+void flushStandardOutput() { standardOutput().flush(); }
+
+Sink* makeStandardOutputSlot() {
+  std::atexit(flushStandardOutput);
+  atFatalError(flushStandardOutput);
+  return new Sink(std::make_shared<DescriptorSink>(STDOUT_FILENO));
+}
+
 // Neither slot is ever destroyed: threads may log while the process ends.
 Sink& standardOutputSlot() {
-  static auto& sink = *new Sink(std::make_shared<DescriptorSink>(STDOUT_FILENO));
+  static auto& sink = *makeStandardOutputSlot();
   return sink;
 }
 

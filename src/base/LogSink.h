@@ -11,6 +11,8 @@ class LogSink {
  public:
   virtual ~LogSink() = default;
   virtual void write(std::string_view line) = 0;
+  // Hands on what the sink still holds.
+  virtual void flush() {}
 };
 
 // Drops every line.
@@ -21,7 +23,8 @@ class NullSink final : public LogSink {
 
 // The two sinks of the process. At first standard output is the real one, line by line, and the
 // system log is syslog. Setting is for start-up and tests, before other threads log; an empty
-// pointer drops every line.
+// pointer drops every line. Standard output is flushed when the process ends by itself, and before
+// a fatal error ends it.
 LogSink& standardOutput();
 LogSink& systemLog();
 void setStandardOutput(std::shared_ptr<LogSink> sink);

@@ -65,9 +65,9 @@ class LiveTable {
       most = std::min<std::size_t>(most, size.ws_row - 1U);  // more would scroll
     }
     if (!inPlace && _drawn) output.line("");
-    for (std::size_t i = 0; i < most; ++i) {
-      output.line(inPlace && i == 0 ? kClear + lines[i] : lines[i]);
-    }
+    std::string text = inPlace ? kClear : "";  // in one piece, so that it does not flicker
+    for (std::size_t i = 0; i < most; ++i) text += (i == 0 ? "" : "\n") + lines[i];
+    output.line(text);
     output.flush();
   }
 
@@ -81,8 +81,8 @@ class LiveTable {
 };
 
 void showLines(MainLoop& loop, Output& output) {
-  output.flush();
-  while (loop.runOnce(std::nullopt)) output.flush();
+  auto due = output.flushWhenDue();
+  while (loop.runOnce(due)) due = output.flushWhenDue();
 }
 
 void showTable(MainLoop& loop, Output& output, const std::vector<std::string>& screen) {

@@ -4,12 +4,11 @@
 #include <chrono>
 #include <optional>
 
-#include "tesk/bus/WakeUp.h"
+#include "tools/StopSignals.h"
 
 namespace qel::tools {
 
-// One, on the main thread, made before other threads. While it lives the first SIGINT or SIGTERM
-// ends the loop; a second one of the same kind ends the program, should a write hold it up.
+// One, on the main thread, made before other threads. SIGINT and SIGTERM end the loop.
 class MainLoop {
  public:
   using Clock = std::chrono::steady_clock;
@@ -27,9 +26,9 @@ class MainLoop {
   bool runOnce(std::optional<Clock::time_point> until);
 
  private:
-  bool isStopping();
+  bool isStopping() const;
 
-  tesk::bus::WakeUp _wakeUp;
+  StopSignals _signals;
   bool _watchesOutput = false;
   bool _outputClosed = false;
   bool _more = true;  // work may have come before this loop

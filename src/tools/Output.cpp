@@ -25,6 +25,12 @@ void Output::flush() {
   check();
 }
 
+std::optional<BatchingSink::Clock::time_point> Output::flushWhenDue() {
+  const auto due = _sink->flushWhenDue(BatchingSink::Clock::now());
+  check();
+  return due;
+}
+
 void Output::check() {
   const int error = _sink->error();
   if (error == 0) return;

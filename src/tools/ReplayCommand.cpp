@@ -1,13 +1,26 @@
 // qelctl replay: a recording through the dispatcher, and what the dispatcher says.
 
 #include <CLI/CLI.hpp>
+#include <csignal>
 #include <memory>
 
 #include "base/LogSink.h"
 #include "tools/Commands.h"
 #include "tools/RecordingFeed.h"
+#include "tools/StopSignals.h"
+#include "tools/ToolError.h"
 
 namespace qel::tools {
+
+namespace {
+
+// With every line of the events so far. The handler of the first signal has gone by itself.
+void endBySignal(int signal, Output& output) {
+  output.flush();
+  std::raise(signal);
+}
+
+}  // namespace
 
 void addReplayCommand(CLI::App& app, Action& chosen) {
   auto* command = app.add_subcommand("replay", "Print the dispatcher's lines for a recording");
@@ -16,7 +29,19 @@ void addReplayCommand(CLI::App& app, Action& chosen) {
   command->callback([options, &chosen] {
     chosen = [options](Output& output) {
       setStandardOutput(output.sink());
-      feedRecording(*options, [&output] { output.check(); });
+      const StopSignals signals(StopSignals::Waiting::fails);
+      const auto lookForSignal = [&] {
+        if (signals.arrived() != 0) endBySignal(signals.arrived(), output);
+      };
+      try {
+        feedRecording(*options, [&] {
+          output.check();
+          lookForSignal();
+        });
+      } catch (const ToolError&) {
+        lookForSignal();  // it may be what ended the reading
+        throw;
+      }
     };
   });
 }

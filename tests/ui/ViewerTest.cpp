@@ -1,11 +1,14 @@
 // The program as its users start it.
 
+#include <fcntl.h>
 #include <gtest/gtest.h>
+#include <pty.h>
 #include <spawn.h>
 #include <sys/wait.h>
 #include <unistd.h>
 
 #include <algorithm>
+#include <array>
 #include <chrono>
 #include <csignal>
 #include <cstdlib>
@@ -108,6 +111,83 @@ TEST_F(Viewer, keepsAPictureAndEndsOnATermination) {
     std::string start(4, ' ');
     std::ifstream(picture, std::ios::binary).read(start.data(), 4);
     EXPECT_EQ(start, "\x89PNG");
+  }
+}
+
+// What qelwatch has written so far to where its standard output goes.
+class RunningViewer {
+ public:
+  explicit RunningViewer(std::vector<std::string> words, bool onTerminal) {
+    int in = -1;
+    if (onTerminal) {
+      EXPECT_EQ(::openpty(&_out, &in, nullptr, nullptr, nullptr), 0);
+    } else {
+      std::array<int, 2> ends{};
+      EXPECT_EQ(::pipe(ends.data()), 0);
+      _out = ends[0];
+      in = ends[1];
+    }
+    ::fcntl(_out, F_SETFL, O_NONBLOCK);
+    ::fcntl(_out, F_SETFD, FD_CLOEXEC);
+    words.insert(words.begin(), QELWATCH_PROGRAM);
+    std::vector<char*> argv;
+    for (std::string& word : words) argv.push_back(word.data());
+    argv.push_back(nullptr);
+    posix_spawn_file_actions_t actions;
+    ::posix_spawn_file_actions_init(&actions);
+    ::posix_spawn_file_actions_adddup2(&actions, in, STDOUT_FILENO);
+    EXPECT_EQ(::posix_spawn(&_pid, argv[0], &actions, nullptr, argv.data(), environ), 0);
+    ::posix_spawn_file_actions_destroy(&actions);
+    ::close(in);
+  }
+  ~RunningViewer() { ::close(_out); }
+  RunningViewer(const RunningViewer&) = delete;
+  RunningViewer& operator=(const RunningViewer&) = delete;
+
+  const std::string& out() {
+    std::array<char, 4096> piece{};
+    for (ssize_t count = 0; (count = ::read(_out, piece.data(), piece.size())) > 0;) {
+      _text.append(piece.data(), static_cast<std::size_t>(count));
+    }
+    return _text;
+  }
+
+  // A minute is for a machine in trouble.
+  bool says(const std::string& wanted) {
+    const auto deadline = std::chrono::steady_clock::now() + std::chrono::minutes(1);
+    while (out().find(wanted) == std::string::npos) {
+      if (std::chrono::steady_clock::now() > deadline) return false;
+      std::this_thread::sleep_for(std::chrono::milliseconds(5));
+    }
+    return true;
+  }
+
+  // Its exit code, or minus the signal that ended it.
+  int end(int signal) {
+    ::kill(_pid, signal);
+    int status = 0;
+    EXPECT_EQ(::waitpid(_pid, &status, 0), _pid);
+    return WIFEXITED(status) ? WEXITSTATUS(status) : -WTERMSIG(status);
+  }
+
+ private:
+  int _out = -1;
+  std::string _text;
+  pid_t _pid = 0;
+};
+
+TEST_F(Viewer, itsReaderSeesEveryLineThoughNoMoreCome) {
+  const std::string recording = home / "three.jsonl";
+  const std::string event = R"({"time_ms": 1, "event": "trigger", "kKeyTriggerID": 8323091})";
+  std::ofstream(recording) << event << '\n' << event << '\n' << event << '\n';
+  for (const bool onTerminal : {false, true}) {
+    for (const int signal : {SIGTERM, SIGINT}) {
+      RunningViewer viewer({"--source", "recording:" + recording}, onTerminal);
+      const std::string line = std::string("I dont care for events") + (onTerminal ? "\r\n" : "\n");
+      EXPECT_TRUE(viewer.says(line + line + line)) << viewer.out();
+      EXPECT_EQ(viewer.end(signal), 0);
+      EXPECT_EQ(viewer.out().back(), '\n');
+    }
   }
 }
 
