@@ -34,14 +34,19 @@ Rectangle {
 
     Rectangle {
         id: tint
+
+        // So thin a colour fades in a few steps as smoothly as in many, and every step is drawn.
+        readonly property int steps: 8
+        property real strength: 0
+
         anchors.fill: parent
         color: Theme.pressTint
-        opacity: 0
+        opacity: Math.ceil(strength * steps) / steps
 
         NumberAnimation {
             id: fade
             target: tint
-            property: "opacity"
+            property: "strength"
             from: 1
             to: 0
             duration: Theme.changeMs
