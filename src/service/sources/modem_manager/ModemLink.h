@@ -9,9 +9,8 @@
 #include "service/sources/modem_manager/BusCalls.h"
 #include "service/sources/modem_manager/ModemPicture.h"
 #include "service/sources/modem_manager/ObjectTree.h"
-#include "service/sources/modem_manager/PolledMethod.h"
 #include "service/sources/modem_manager/SaidOnce.h"
-#include "service/sources/modem_manager/SharedSetting.h"
+#include "service/sources/modem_manager/WatchedModem.h"
 #include "tesk/bus/BusAddress.h"
 
 namespace qel::service {
@@ -46,20 +45,6 @@ class ModemLink {
   void finish();
 
  private:
-  // What is done with the one modem; made anew for another.
-  struct Watched {
-    Watched(const std::string& path, std::uint32_t rateS);
-    bool changesSettings() const { return signalRate.isUnderWay() || placeSources.isUnderWay(); }
-
-    const std::string path;
-    ModemAnswers answers;
-    PolledMethod cells;
-    PolledMethod place;
-    SharedSetting<std::uint32_t> signalRate;
-    SharedSetting<std::uint32_t, bool> placeSources;
-    std::uint32_t accessTechnologies = 0;
-  };
-
   void process();
   void choose();
   void leave();
@@ -73,7 +58,7 @@ class ModemLink {
   SaidOnce& _said;
   const std::unique_ptr<sdbus::IConnection> _connection;
   // Before the calls, whose answers go there: nothing is answered while it goes.
-  std::unique_ptr<Watched> _watched;
+  std::unique_ptr<WatchedModem> _watched;
   BusCalls _calls;
   ObjectTree _tree;
   Clock::time_point _askAgainAt;

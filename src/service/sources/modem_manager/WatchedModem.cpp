@@ -1,0 +1,147 @@
+#include "service/sources/modem_manager/WatchedModem.h"
+
+#include <algorithm>
+#include <utility>
+#include <vector>
+
+#include "service/sources/modem_manager/CellReadings.h"
+#include "service/sources/modem_manager/Names.h"
+
+namespace qel::service {
+namespace {
+
+using namespace std::chrono_literals;
+
+constexpr MethodRow kGetCellInfo = {
+    mm::kModem, "GetCellInfo",
+    "no cell information: not allowed to call GetCellInfo (run as root, or let the bus policy pass "
+    "org.freedesktop.ModemManager1.Modem.GetCellInfo and polkit the action "
+    "org.freedesktop.ModemManager1.Device.Control)",
+    "no cell information: the modem does not support GetCellInfo"};
+constexpr MethodRow kGetLocation = {
+    mm::kLocation, "GetLocation",
+    "no location area: not allowed to call GetLocation (polkit action "
+    "org.freedesktop.ModemManager1.Location)",
+    "no location area: the modem does not support GetLocation"};
+
+constexpr SettingRow kSignalRate = {
+    mm::kSignal, "Setup",
+    "signal levels come at the pace that other programs ask for: not allowed to set it (polkit "
+    "action org.freedesktop.ModemManager1.Device.Control)",
+    "the modem has no signal levels to report", true};
+// Whoever has switched it off meanwhile knows why.
+constexpr SettingRow kPlaceSources = {
+    mm::kLocation, "Setup",
+    "no location area: not allowed to switch 3gpp-lac-ci on (polkit action "
+    "org.freedesktop.ModemManager1.Device.Control)",
+    "no location area: the modem does not support 3gpp-lac-ci", false};
+
+constexpr std::size_t kMostCells = 256;
+
+std::vector<CellReading> cellsIn(sdbus::MethodReply& reply) {
+  std::vector<BusProperties> cells;
+  reply >> cells;
+  std::vector<CellReading> readings;
+  for (const BusProperties& cell : cells) {
+    if (readings.size() == kMostCells) break;
+    if (auto reading = cellReading(cell)) readings.push_back(std::move(*reading));
+  }
+  return readings;
+}
+
+std::string identityOf(const std::string& path, const BusInterfaces& modem) {
+  const auto imei = busValue<std::string>(propertiesOf(modem, mm::kModem), "EquipmentIdentifier");
+  return imei && !imei->empty() ? *imei : path;
+}
+
+std::optional<std::tuple<std::uint32_t>> rateIn(const BusInterfaces& modem) {
+  const auto rateS = busUnsigned(propertiesOf(modem, mm::kSignal), "Rate");
+  return rateS ? std::optional(std::tuple(*rateS)) : std::nullopt;
+}
+
+// What tells of a place, and whether that is pushed with the properties. Only where the modem can
+// tell the place of the cell.
+std::optional<std::tuple<std::uint32_t, bool>> placeSourcesIn(const BusInterfaces& modem) {
+  const BusProperties& location = propertiesOf(modem, mm::kLocation);
+  const auto sources = busUnsigned(location, "Enabled");
+  const bool able = (busUnsigned(location, "Capabilities").value_or(0) & mm::kPlaceOfCell) != 0;
+  if (!sources || !able) return std::nullopt;
+  return std::tuple(*sources, busValue<bool>(location, "SignalsLocation").value_or(false));
+}
+
+// The cell's place is switched on and not pushed.
+bool placeMustBeAsked(const BusInterfaces& modem) {
+  const BusProperties& location = propertiesOf(modem, mm::kLocation);
+  return (busUnsigned(location, "Enabled").value_or(0) & mm::kPlaceOfCell) != 0 &&
+         !busValue<bool>(location, "SignalsLocation").value_or(false);
+}
+
+std::uint32_t wholeSeconds(std::chrono::milliseconds period) {
+  return static_cast<std::uint32_t>(std::max<std::int64_t>(1, period / 1s));
+}
+
+}  // namespace
+
+WatchedModem::WatchedModem(const std::string& modem, std::chrono::milliseconds period)
+    : _path(modem),
+      _period(period),
+      _cells(
+          kGetCellInfo, modem,
+          [this](sdbus::MethodReply& reply) { _answers.cells = cellsIn(reply); },
+          [this] { _answers.cells.reset(); }),
+      _place(
+          kGetLocation, modem,
+          [this](sdbus::MethodReply& reply) {
+            std::map<std::uint32_t, sdbus::Variant> locations;
+            reply >> locations;
+            _answers.place = placeIn(locations);
+          },
+          [this] { _answers.place.clear(); }),
+      _signalRate(kSignalRate, modem, rateIn,
+                  [rateS = wholeSeconds(period)](const std::tuple<std::uint32_t>& found) {
+                    const auto [now] = found;
+                    return now == 0 || now > rateS ? std::tuple(rateS) : found;
+                  }),
+      _placeSources(kPlaceSources, modem, placeSourcesIn,
+                    [this](std::tuple<std::uint32_t, bool> found) {
+                      const bool needed = _cells.isSettled() && !tellsServingCell(_answers);
+                      if (needed) std::get<0>(found) |= mm::kPlaceOfCell;
+                      return found;
+                    }) {}
+
+void WatchedModem::step(BusCalls& calls, SaidOnce& said, const BusInterfaces& modem,
+                        Clock::time_point now) {
+  if (!isEnabled(modem)) {
+    _answers = {};
+    return;
+  }
+  const std::uint32_t technologies =
+      busUnsigned(propertiesOf(modem, mm::kModem), "AccessTechnologies").value_or(0);
+  // The cells and the place are of before the phone moved.
+  if (std::exchange(_accessTechnologies, technologies) != technologies) {
+    _answers.place.clear();
+    _cells.callSoon();
+    _place.callSoon();
+  }
+  const std::string identity = identityOf(_path, modem);
+  _cells.step(calls, said, identity, now, _period);
+  if (placeMustBeAsked(modem)) {
+    _place.step(calls, said, identity, now, _period);
+  } else {
+    _answers.place.clear();
+  }
+  _signalRate.step(calls, said, identity, modem, now);
+  _placeSources.step(calls, said, identity, modem, now);
+}
+
+WatchedModem::Clock::time_point WatchedModem::due(const BusInterfaces& modem) const {
+  if (!isEnabled(modem)) return Clock::time_point::max();
+  return placeMustBeAsked(modem) ? std::min(_cells.due(), _place.due()) : _cells.due();
+}
+
+void WatchedModem::restore(BusCalls& calls, const BusInterfaces& modem) {
+  _signalRate.restore(calls, modem);
+  _placeSources.restore(calls, modem);
+}
+
+}  // namespace qel::service

@@ -1,0 +1,48 @@
+// The modem that is watched: what is asked of it beside its properties, and what is set.
+#pragma once
+
+#include <chrono>
+#include <cstdint>
+#include <string>
+
+#include "service/sources/modem_manager/BusCalls.h"
+#include "service/sources/modem_manager/ModemReading.h"
+#include "service/sources/modem_manager/PolledMethod.h"
+#include "service/sources/modem_manager/SaidOnce.h"
+#include "service/sources/modem_manager/SharedSetting.h"
+
+namespace qel::service {
+
+// One thread; never waits. Outlives the calls that it makes, or they are forgotten.
+class WatchedModem {
+ public:
+  using Clock = std::chrono::steady_clock;
+
+  // Cells and place are asked for, and the signal is measured, once in each period at least.
+  WatchedModem(const std::string& modem, std::chrono::milliseconds period);
+  WatchedModem(const WatchedModem&) = delete;
+  WatchedModem& operator=(const WatchedModem&) = delete;
+
+  const std::string& path() const { return _path; }
+  const ModemAnswers& answers() const { return _answers; }
+
+  // Calls what is due; `modem` is what is known of it.
+  void step(BusCalls& calls, SaidOnce& said, const BusInterfaces& modem, Clock::time_point now);
+  Clock::time_point due(const BusInterfaces& modem) const;
+
+  // Leaves the settings as they were found, once none is being changed any more.
+  void restore(BusCalls& calls, const BusInterfaces& modem);
+  bool changesSettings() const { return _signalRate.isUnderWay() || _placeSources.isUnderWay(); }
+
+ private:
+  const std::string _path;
+  const std::chrono::milliseconds _period;
+  ModemAnswers _answers;
+  PolledMethod _cells;
+  PolledMethod _place;
+  SharedSetting<std::uint32_t> _signalRate;
+  SharedSetting<std::uint32_t, bool> _placeSources;
+  std::uint32_t _accessTechnologies = 0;
+};
+
+}  // namespace qel::service
