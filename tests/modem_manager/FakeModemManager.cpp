@@ -38,19 +38,25 @@ FakeModemManager::~FakeModemManager() {
 }
 
 void FakeModemManager::live() {
+  bool busIsThere = true;  // without it, what is asked of this object goes nowhere
+  const auto wait = [&] {
+    std::array<pollfd, 2> waited = {{{_wakeUp.descriptor(), POLLIN, 0}}};
+    if (!busIsThere) {
+      ::poll(waited.data(), 1, -1);
+      return;
+    }
+    const auto bus = _connection->getEventLoopPollData();
+    waited[1] = {bus.fd, bus.events, 0};
+    ::poll(waited.data(), waited.size(), bus.getPollTimeout());
+  };
   while (!_stopping) {
     try {
-      const auto bus = _connection->getEventLoopPollData();
-      std::array<pollfd, 2> waited = {{{bus.fd, bus.events, 0}, {_wakeUp.descriptor(), POLLIN, 0}}};
-      ::poll(waited.data(), waited.size(), bus.getPollTimeout());
+      wait();
       _wakeUp.clear();
-      while (_connection->processPendingRequest()) {
+      while (busIsThere && _connection->processPendingRequest()) {
       }
     } catch (const sdbus::Error&) {
-      // The bus is gone; what is asked of this object goes nowhere.
-      pollfd waited{_wakeUp.descriptor(), POLLIN, 0};
-      ::poll(&waited, 1, -1);
-      _wakeUp.clear();
+      busIsThere = false;
     }
     std::deque<std::function<void()>> tasks;
     {
