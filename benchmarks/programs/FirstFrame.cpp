@@ -1,5 +1,6 @@
-// first-frame RUNS PROGRAM [ARGUMENT…]: the time from the start of a Qt Quick program to its first
-// frame, in ms, the median of the runs; then the processor time until then. The toolkit's own log
+// first-frame RUNS PROGRAM [ARGUMENT…] [-- PROGRAM [ARGUMENT…]]…: for each program a line with the
+// time from its start to its first frame and the processor time until then, in ms, the medians of
+// the runs. The programs take turns, so that each sees the same machine. The toolkit's own log
 // tells when the frame is there.
 
 #include <fcntl.h>
@@ -9,20 +10,34 @@
 #include <sys/wait.h>
 #include <unistd.h>
 
+#include <algorithm>
 #include <array>
 #include <cstdio>
 #include <cstdlib>
 #include <string>
+#include <string_view>
+#include <vector>
 
 #include "programs/Figures.h"
 
 namespace qel::benchmarks {
 namespace {
 
-struct Start {
-  double elapsedMs = 0;
-  double processorMs = 0;
+struct Starts {
+  std::vector<double> elapsedMs;
+  std::vector<double> processorMs;
 };
+
+// The words of each program, each ended by a null pointer.
+std::vector<char**> programsOf(char** words) {
+  std::vector<char**> programs = {words};
+  for (; *words; ++words) {
+    if (std::string_view(*words) != "--") continue;
+    *words = nullptr;
+    programs.push_back(words + 1);
+  }
+  return programs;
+}
 
 double milliseconds(const timeval& time) {
   return static_cast<double>(time.tv_sec) * 1e3 + static_cast<double>(time.tv_usec) / 1e3;
@@ -40,7 +55,7 @@ bool waitForFrame(int descriptor) {
   return true;
 }
 
-bool run(char** words, Start& start) {
+bool run(char** words, Starts& starts) {
   std::array<int, 2> ends{};
   if (::pipe2(ends.data(), O_CLOEXEC) != 0) return false;
   posix_spawn_file_actions_t actions;
@@ -53,13 +68,13 @@ bool run(char** words, Start& start) {
   ::posix_spawn_file_actions_destroy(&actions);
   ::close(ends[1]);
   const bool drawn = spawned && waitForFrame(ends[0]);
-  start.elapsedMs = Milliseconds(Clock::now() - begun).count();
+  starts.elapsedMs.push_back(Milliseconds(Clock::now() - begun).count());
   ::close(ends[0]);
   if (!spawned) return false;
   ::kill(process, SIGKILL);
   rusage used{};
   ::wait4(process, nullptr, 0, &used);
-  start.processorMs = milliseconds(used.ru_utime) + milliseconds(used.ru_stime);
+  starts.processorMs.push_back(milliseconds(used.ru_utime) + milliseconds(used.ru_stime));
   return drawn;
 }
 
@@ -69,18 +84,18 @@ bool run(char** words, Start& start) {
 int main(int argc, char** argv) {
   using namespace qel::benchmarks;
   const int runs = argc > 2 ? std::atoi(argv[1]) : 0;
+  const auto programs = programsOf(argv + std::min(argc, 2));
   if (runs < 1) return 64;
   ::setenv("QT_LOGGING_RULES", "qt.scenegraph.time.renderloop=true", 1);
-  std::vector<double> elapsed;
-  std::vector<double> processor;
+  std::vector<Starts> starts(programs.size());
   for (int i = 0; i < runs; ++i) {
-    Start start;
-    if (!run(argv + 2, start)) {
-      std::fprintf(stderr, "first-frame: %s drew nothing\n", argv[2]);
+    for (std::size_t k = 0; k < programs.size(); ++k) {
+      if (run(programs[k], starts[k])) continue;
+      std::fprintf(stderr, "first-frame: %s drew nothing\n", programs[k][0]);
       return 1;
     }
-    elapsed.push_back(start.elapsedMs);
-    processor.push_back(start.processorMs);
   }
-  std::printf("%.1f %.1f\n", median(elapsed), median(processor));
+  for (const Starts& of : starts) {
+    std::printf("%.1f %.1f\n", median(of.elapsedMs), median(of.processorMs));
+  }
 }
