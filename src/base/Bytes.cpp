@@ -1,5 +1,6 @@
 #include "base/Bytes.h"
 
+#include <algorithm>
 #include <array>
 
 namespace qel {
@@ -74,22 +75,22 @@ std::optional<Bytes> bytesFromBase64(std::string_view text) {
   if (text.size() % 4 != 0) return std::nullopt;
   std::size_t padding = 0;
   while (padding < 2 && padding < text.size() && text[text.size() - 1 - padding] == '=') ++padding;
-  Bytes bytes;
-  bytes.reserve(text.size() / 4 * 3);
-  std::uint32_t bits = 0;
-  int held = 0;
-  for (const char c : text.substr(0, text.size() - padding)) {
-    const int value = kBase64Values[static_cast<unsigned char>(c)];
-    if (value < 0) return std::nullopt;
-    bits = bits << 6 | static_cast<std::uint32_t>(value);
-    held += 6;
-    if (held >= 8) {
-      held -= 8;
-      bytes.push_back(static_cast<std::uint8_t>(bits >> held));
-      bits &= (1U << held) - 1;
+  const std::size_t digits = text.size() - padding;
+  const std::size_t size = text.size() / 4 * 3 - padding;
+  Bytes bytes(size);
+  for (std::size_t group = 0; group * 4 < digits; ++group) {
+    int value = 0;  // of four digits; negative once one of them is none
+    for (std::size_t i = group * 4; i < group * 4 + 4; ++i) {
+      value = value << 6 | (i < digits ? kBase64Values[static_cast<unsigned char>(text[i])] : 0);
     }
+    const auto bits = static_cast<std::uint32_t>(value);
+    const std::size_t end = std::min(group * 3 + 3, size);
+    std::uint32_t left = bits << 8;
+    for (std::size_t i = group * 3; i < end; ++i, left <<= 8) {
+      bytes[i] = static_cast<std::uint8_t>(left >> 24);
+    }
+    if (value < 0 || left != 0) return std::nullopt;
   }
-  if (bits != 0) return std::nullopt;
   return bytes;
 }
 
