@@ -32,10 +32,12 @@ class Scanner {
 
   std::optional<std::string_view> text() {
     if (!take('"')) return std::nullopt;
-    const auto isPlain = [](char c) { return c >= ' ' && c <= '~' && c != '"' && c != '\\'; };
-    const auto size = lengthWhile(isPlain);
-    if (size == _left.size() || _left[size] != '"') return std::nullopt;
+    const std::size_t size = _left.find('"');
+    if (size == std::string_view::npos) return std::nullopt;
     const std::string_view text = _left.substr(0, size);
+    bool isPlain = true;
+    for (const char c : text) isPlain &= c >= ' ' && c <= '~' && c != '\\';
+    if (!isPlain) return std::nullopt;
     _left.remove_prefix(size + 1);
     return text;
   }
