@@ -44,7 +44,7 @@ void nameApplication() {
   QGuiApplication::setApplicationDisplayName(kName);
   QGuiApplication::setApplicationVersion(QStringLiteral(QELWATCH_VERSION));
   QGuiApplication::setOrganizationName(kName);
-  QGuiApplication::setDesktopFileName(kName);
+  QGuiApplication::setDesktopFileName(QStringLiteral(QEL_APP_ID));
 }
 
 void findResources() {
