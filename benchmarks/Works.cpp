@@ -63,34 +63,35 @@ Step decodeStock() {
   };
 }
 
-// Every value of the dictionary and of those within it.
-std::size_t visit(const Dictionary& dictionary) {
-  std::size_t kinds = 0;
-  for (const auto& [key, value] : dictionary) {
-    kinds += static_cast<std::size_t>(value.kind()) + key.view().size();
-    if (const auto* nested = value.asDictionary()) kinds += visit(*nested);
-    if (const auto* list = value.asList()) {
-      for (const Value& element : *list) {
-        kinds += static_cast<std::size_t>(element.kind());
-        if (const auto* entry = element.asDictionary()) kinds += visit(*entry);
-      }
-    }
-  }
+std::size_t visit(const Dictionary& dictionary);
+
+std::size_t visit(const Value& value) {
+  auto kinds = static_cast<std::size_t>(value.kind());
+  if (value.kind() < Value::Kind::list) return kinds;
+  if (const auto* nested = value.asDictionary()) return kinds + visit(*nested);
+  for (const Value& element : *value.asList()) kinds += visit(element);
   return kinds;
 }
 
+// Every key and value of the dictionary and of those within it.
+std::size_t visit(const Dictionary& dictionary) {
+  std::size_t seen = 0;
+  for (const auto& [key, value] : dictionary) seen += key.view().size() + visit(value);
+  return seen;
+}
+
 Step dictionaryOurs() {
-  return [decode = decoders()](std::size_t i) {
-    const auto message = decode[i](payloads()[i].bytes);
-    benchmark::DoNotOptimize(visit(message->dictionaryRepresentation()));
-  };
+  return
+      [describe = forEachPayload([](const Payload& payload) {
+         return findMetricMessage(payload.metric)->describe;
+       })](std::size_t i) { benchmark::DoNotOptimize(visit(*describe[i](payloads()[i].bytes))); };
 }
 
 Step encodeOurs() {
-  return [kept = messages(), writer = PBDataWriter()](std::size_t i) mutable {
-    writer.clear();
-    kept[i]->writeTo(writer);
-    benchmark::DoNotOptimize(writer.data().data());
+  return [kept = messages(), writer = std::make_shared<PBDataWriter>()](std::size_t i) {
+    writer->clear();
+    kept[i]->writeTo(*writer);
+    benchmark::DoNotOptimize(writer->data().data());
   };
 }
 
@@ -121,8 +122,8 @@ Step textOurs() {
 constexpr double kStartMs = 1500000000000.0;
 
 Step timeOurs() {
-  return [](std::size_t i) {
-    benchmark::DoNotOptimize(dateText(kStartMs + static_cast<double>(i) * 40.0, systemTimeZone()));
+  return [dates = DateTexts(systemTimeZone())](std::size_t i) mutable {
+    benchmark::DoNotOptimize(dates.at(kStartMs + static_cast<double>(i) * 40.0).data());
   };
 }
 

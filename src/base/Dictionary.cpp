@@ -1,4 +1,4 @@
-#include "base/Dictionary.h"
+#include "base/Value.h"
 
 #include <algorithm>
 
@@ -19,15 +19,36 @@ const Dictionary::Entry& Dictionary::at(std::size_t position) const {
   return _entries[position];
 }
 
+namespace {
+
+// Most keys that differ do so in length or in their first character.
+bool isUnder(const Dictionary::Entry& entry, std::string_view key) {
+  const std::string_view other = entry.key;
+  return other.size() == key.size() &&
+         (key.empty() || (other.front() == key.front() && other == key));
+}
+
+}  // namespace
+
 const Value* Dictionary::find(std::string_view key) const {
   for (const Entry& entry : _entries) {
-    if (entry.key.view() == key) return &entry.value;
+    if (isUnder(entry, key)) return &entry.value;
   }
   return nullptr;
 }
 
 Value* Dictionary::find(std::string_view key) {
   return const_cast<Value*>(std::as_const(*this).find(key));
+}
+
+Value* Dictionary::find(std::string_view key, std::size_t& place) {
+  if (place >= size() || !isUnder(_entries[place], key)) {
+    const auto found =
+        std::find_if(begin(), end(), [key](const Entry& e) { return isUnder(e, key); });
+    if (found == end()) return nullptr;
+    place = static_cast<std::size_t>(found - begin());
+  }
+  return &_entries[place].value;
 }
 
 void Dictionary::set(Text key, Value value) {
@@ -39,14 +60,18 @@ void Dictionary::set(Text key, Value value) {
 }
 
 void Dictionary::remove(std::string_view key) {
-  std::erase_if(_entries, [key](const Entry& entry) { return entry.key.view() == key; });
+  const auto found = std::ranges::find(_entries, key, [](const Entry& e) { return e.key.view(); });
+  if (found != _entries.end()) _entries.erase(found);
 }
 
 void Dictionary::assign(Text key, const Value* value) {
-  if (value) {
-    set(std::move(key), *value);
+  Value* present = find(key);
+  if (!value) {
+    if (present) remove(key);
+  } else if (present) {
+    *present = *value;
   } else {
-    remove(key);
+    append(std::move(key), *value);
   }
 }
 

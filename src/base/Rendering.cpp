@@ -4,38 +4,70 @@
 #include <array>
 #include <charconv>
 #include <cmath>
+#include <cstdint>
+#include <cstring>
 
 #include "base/Utf8.h"
 
 namespace qel {
 namespace {
 
-template <class Integer>
-void appendInteger(std::string& out, Integer value) {
-  std::array<char, 24> digits;
-  const auto end = std::to_chars(digits.data(), digits.data() + digits.size(), value).ptr;
-  out.append(digits.data(), end);
-}
+// The end of a string that is being written: room is looked for once a piece, not once a character.
+// Where writing stands is passed along as a plain pointer.
+class Line {
+ public:
+  explicit Line(std::string& out) : _out(out) { widen(out.size(), kUsual); }
 
-void appendFloat(std::string& out, float value) {
-  if (!std::isfinite(value)) {
-    out += "null";
-    return;
+  char* start() const { return _start; }
+  // Where to write when `count` more characters are to come.
+  char* room(char* at, std::size_t count) {
+    if (static_cast<std::size_t>(_end - at) >= count) [[likely]]
+      return at;
+    const auto used = static_cast<std::size_t>(at - _out.data());
+    widen(used, std::max(count, used));
+    return _out.data() + used;
   }
-  std::array<char, 80> digits;  // the longest is the smallest subnormal, 48 characters
-  const auto end =
-      std::to_chars(digits.data(), digits.data() + digits.size(), value, std::chars_format::fixed)
-          .ptr;
-  const std::string_view text(digits.data(), static_cast<std::size_t>(end - digits.data()));
-  out += text;
-  if (text.find('.') == std::string_view::npos) out += ".0";
+  void finish(const char* at) { _out.resize(static_cast<std::size_t>(at - _out.data())); }
+
+ private:
+  static constexpr std::size_t kUsual = 512;
+
+  void widen(std::size_t used, std::size_t count) {
+    _out.resize(used + count);
+    _start = _out.data() + used;
+    _end = _start + count;
+  }
+
+  std::string& _out;
+  char* _start;
+  char* _end;
+};
+
+// The first and the last `Word` of the text, which are all of it when it is not too long for that.
+template <class Word>
+void putEnds(char* at, std::string_view text) {
+  const std::size_t last = text.size() - sizeof(Word);
+  std::memcpy(at, text.data(), sizeof(Word));
+  std::memcpy(at + last, text.data() + last, sizeof(Word));
 }
 
-void appendBytes(std::string& out, const Bytes& bytes) {
-  out += '<';
-  appendHex(out, bytes);
-  out += '>';
+// Keys and names are short.
+[[gnu::always_inline]] inline char* put(char* at, std::string_view text) {
+  if (text.size() - 8 <= 8) {
+    putEnds<std::uint64_t>(at, text);
+  } else if (text.size() - 4 <= 4) {
+    putEnds<std::uint32_t>(at, text);
+  } else {
+    std::memcpy(at, text.data(), text.size());
+  }
+  return at + text.size();
 }
+
+// The room that is always there for a piece: any number (the longest is the smallest subnormal
+// float, of 48 characters) and the marks around it.
+constexpr std::size_t kRoom = 64;
+
+std::string bytesText(const Bytes& bytes) { return '<' + hexText(bytes) + '>'; }
 
 void appendEscaped(std::string& out, char c) {
   switch (c) {
@@ -66,101 +98,187 @@ void appendEscaped(std::string& out, char c) {
   }
 }
 
-// Characters that stand for themselves: printable ASCII without quote and backslash.
-constexpr std::array<bool, 256> makePlainCharacters() {
-  std::array<bool, 256> plain{};
-  for (std::size_t c = 0x20; c < 0x80; ++c) plain[c] = c != '"' && c != '\\';
-  return plain;
+// Printable ASCII without quote and backslash stands for itself. Eight characters at a time: a bit
+// is set in the top of each byte that is one of the others (bytes above one of these may be set
+// too).
+constexpr std::uint64_t kOnes = 0x0101010101010101;
+constexpr std::uint64_t kTops = 0x8080808080808080;
+
+constexpr std::uint64_t below(std::uint64_t word, std::uint8_t least) {
+  return (word - least * kOnes) & ~word & kTops;
+}
+constexpr std::uint64_t equal(std::uint64_t word, char c) {
+  return below(word ^ static_cast<std::uint8_t>(c) * kOnes, 1);
 }
 
-constexpr auto kPlain = makePlainCharacters();
+bool isPlain(std::uint64_t word) {
+  return ((word & kTops) | below(word, 0x20) | equal(word, '"') | equal(word, '\\')) == 0;
+}
 
-bool isPlain(char c) { return kPlain[static_cast<unsigned char>(c)]; }
+bool isPlain(char c) { return static_cast<signed char>(c) >= 0x20 && c != '"' && c != '\\'; }
 
-void appendSpecial(std::string& out, char c) {
-  if (static_cast<unsigned char>(c) >= 0x80) {
-    out += c;  // part of a longer UTF-8 sequence
-  } else {
-    appendEscaped(out, c);
+bool isPlain(std::string_view text) {
+  for (; text.size() >= sizeof(std::uint64_t); text.remove_prefix(sizeof(std::uint64_t))) {
+    std::uint64_t word = 0;
+    std::memcpy(&word, text.data(), sizeof word);
+    if (!isPlain(word)) return false;
   }
+  return std::ranges::all_of(text, [](char c) { return isPlain(c); });
 }
 
-void appendList(std::string& out, const List& list) {
-  out += '[';
-  const char* separator = "";
+std::string escaped(std::string_view text) {
+  std::string out;
+  for (const char c : text) {
+    if (isPlain(c) || static_cast<signed char>(c) < 0) {
+      out += c;
+    } else {
+      appendEscaped(out, c);
+    }
+  }
+  return out;
+}
+
+// Within the room that there is.
+char* putQuoted(char* at, std::string_view plain) {
+  *at++ = '"';
+  at = put(at, plain);
+  *at++ = '"';
+  return at;
+}
+
+[[gnu::noinline]] char* putString(Line& line, char* at, std::string_view text) {
+  if (!isPlain(text)) {
+    const std::string escapes = escaped(isValidUtf8(text) ? text : withReplacements(text));
+    return putQuoted(line.room(at, escapes.size() + kRoom), escapes);
+  }
+  return putQuoted(line.room(at, text.size() + kRoom), text);
+}
+
+[[gnu::noinline]] char* putFloat(char* at, float value) {
+  if (!std::isfinite(value)) return put(at, "null");
+  char* end = std::to_chars(at, at + kRoom, value, std::chars_format::fixed).ptr;
+  return std::find(at, end, '.') == end ? put(end, ".0") : end;
+}
+
+constexpr std::array<char, 200> makePairs() {
+  std::array<char, 200> pairs{};
+  for (std::size_t i = 0; i < pairs.size(); ++i) {
+    pairs[i] = static_cast<char>('0' + (i % 2 == 0 ? i / 20 : i / 2 % 10));
+  }
+  return pairs;
+}
+
+// "00" to "99".
+constexpr auto kPairs = makePairs();
+
+char* putDigit(char* at, std::uint32_t value) {
+  *at = static_cast<char>('0' + value);
+  return at + 1;
+}
+
+char* putPair(char* at, std::uint32_t value) {
+  std::memcpy(at, &kPairs[2 * value], 2);
+  return at + 2;
+}
+
+char* putLargeInteger(char* at, std::uint64_t value);
+
+// Nearly all numbers of a metric have at most four digits.
+[[gnu::always_inline]] inline char* putInteger(char* at, std::uint64_t value) {
+  if (value >= 10000) return putLargeInteger(at, value);
+  const auto small = static_cast<std::uint32_t>(value);
+  if (small < 10) return putDigit(at, small);
+  if (small < 100) return putPair(at, small);
+  at = small < 1000 ? putDigit(at, small / 100) : putPair(at, small / 100);
+  return putPair(at, small % 100);
+}
+
+[[gnu::noinline]] char* putLargeInteger(char* at, std::uint64_t value) {
+  const auto last = static_cast<std::uint32_t>(value % 10000);
+  at = putInteger(at, value / 10000);
+  return putPair(putPair(at, last / 100), last % 100);
+}
+
+char* putInteger(char* at, std::int64_t value) {
+  const auto bits = static_cast<std::uint64_t>(value);
+  if (value >= 0) return putInteger(at, bits);
+  *at++ = '-';
+  return putInteger(at, 0 - bits);
+}
+
+char* putList(Line& line, char* at, const List& list);
+char* putDictionary(Line& line, char* at, const Dictionary& dictionary);
+
+// There must be kRoom.
+[[gnu::always_inline]] inline char* putValue(Line& line, char* at, const Value& value) {
+  switch (value.kind()) {
+    case Value::Kind::null:
+      return put(at, "null");
+    case Value::Kind::boolean:
+      return put(at, *value.asBoolean() ? "true" : "false");
+    case Value::Kind::signedInteger:
+      return putInteger(at, *value.asInt64());
+    case Value::Kind::unsignedInteger:
+      return putInteger(at, *value.asUInt64());
+    case Value::Kind::floating:
+      return putFloat(at, *value.asFloat());
+    case Value::Kind::text:
+      return putString(line, at, *value.asText());
+    case Value::Kind::bytes:
+      return putString(line, at, bytesText(*value.asBytes()));
+    case Value::Kind::list:
+      return putList(line, at, *value.asList());
+    case Value::Kind::dictionary:
+      return putDictionary(line, at, *value.asDictionary());
+  }
+  return at;
+}
+
+// Elements are written with a separator behind each, and the last one is taken back.
+constexpr std::string_view kSeparator = ", ";
+
+char* putList(Line& line, char* at, const List& list) {
+  at = line.room(at, kRoom);
+  *at++ = '[';
   for (const Value& value : list) {
-    out += separator;
-    appendJson(out, value);
-    separator = ", ";
+    at = put(putValue(line, line.room(at, kRoom), value), kSeparator);
   }
-  out += ']';
+  if (!list.empty()) at -= kSeparator.size();
+  at = line.room(at, kRoom);
+  *at++ = ']';
+  return at;
+}
+
+char* putDictionary(Line& line, char* at, const Dictionary& dictionary) {
+  at = line.room(at, kRoom);
+  *at++ = '{';
+  for (const auto& [key, value] : dictionary) {
+    const std::string_view name = key;
+    at = line.room(at, name.size() + 2 * kRoom);
+    at = key.isName() ? putQuoted(at, name) : line.room(putString(line, at, name), kRoom);
+    at = put(putValue(line, put(at, ": "), value), kSeparator);
+  }
+  if (!dictionary.empty()) at -= kSeparator.size();
+  at = line.room(at, kRoom);
+  *at++ = '}';
+  return at;
 }
 
 }  // namespace
 
 void appendJsonString(std::string& out, std::string_view text) {
-  auto special = std::ranges::find_if_not(text, isPlain);
-  if (special != text.end() && !isValidUtf8(text)) {
-    appendJsonString(out, withReplacements(text));
-    return;
-  }
-  out += '"';
-  auto plain = text.begin();
-  while (special != text.end()) {
-    out.append(plain, special);
-    appendSpecial(out, *special);
-    plain = special + 1;
-    special = std::find_if_not(plain, text.end(), isPlain);
-  }
-  out.append(plain, special);
-  out += '"';
+  Line line(out);
+  line.finish(putString(line, line.start(), text));
 }
 
 void appendJson(std::string& out, const Dictionary& dictionary) {
-  out += '{';
-  const char* separator = "";
-  for (const auto& [key, value] : dictionary) {
-    out += separator;
-    appendJsonString(out, key);
-    out += ": ";
-    appendJson(out, value);
-    separator = ", ";
-  }
-  out += '}';
+  Line line(out);
+  line.finish(putDictionary(line, line.start(), dictionary));
 }
 
 void appendJson(std::string& out, const Value& value) {
-  switch (value.kind()) {
-    case Value::Kind::null:
-      out += "null";
-      break;
-    case Value::Kind::boolean:
-      out += *value.asBoolean() ? "true" : "false";
-      break;
-    case Value::Kind::signedInteger:
-      appendInteger(out, *value.asInt64());
-      break;
-    case Value::Kind::unsignedInteger:
-      appendInteger(out, *value.asUInt64());
-      break;
-    case Value::Kind::floating:
-      appendFloat(out, *value.asFloat());
-      break;
-    case Value::Kind::text:
-      appendJsonString(out, *value.asText());
-      break;
-    case Value::Kind::bytes:
-      out += '"';
-      appendBytes(out, *value.asBytes());
-      out += '"';
-      break;
-    case Value::Kind::list:
-      appendList(out, *value.asList());
-      break;
-    case Value::Kind::dictionary:
-      appendJson(out, *value.asDictionary());
-      break;
-  }
+  Line line(out);
+  line.finish(putValue(line, line.room(line.start(), kRoom), value));
 }
 
 std::string jsonText(const Value& value) {
@@ -185,7 +303,7 @@ std::string cellText(const Value& value) {
       out = *value.asText();
       break;
     case Value::Kind::bytes:
-      appendBytes(out, *value.asBytes());
+      out = bytesText(*value.asBytes());
       break;
     default:
       appendJson(out, value);

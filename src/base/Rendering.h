@@ -4,7 +4,6 @@
 #include <string>
 #include <string_view>
 
-#include "base/Dictionary.h"
 #include "base/Value.h"
 
 namespace qel {

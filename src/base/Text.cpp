@@ -1,24 +1,22 @@
 #include "base/Text.h"
 
 #include <cstring>
+#include <limits>
 
 #include "base/FatalError.h"
 
 namespace qel {
 
-void Text::refuseSize() { fatalError("text longer than 4 GiB"); }
-
-Text::Text(std::string_view copied) : _size(checkedSize(copied)) {
-  if (_size == 0) return;
-  char* characters = new char[_size];
-  std::memcpy(characters, copied.data(), _size);
-  _data = characters;
-  _owned = true;
-}
-
-Text::Text(const Text& other) {
-  Text copy = other._owned ? Text(other.view()) : borrowed(other.view());
-  swap(copy);
+Text::Text(std::string_view copied) {
+  if (copied.empty()) return;
+  if (copied.size() > std::numeric_limits<std::uint32_t>::max()) {
+    fatalError("text longer than 4 GiB");
+  }
+  void* characters = SmallBlocks::take(copied.size());
+  std::memcpy(characters, copied.data(), copied.size());
+  _data = static_cast<const char*>(characters);
+  _size = static_cast<std::uint32_t>(copied.size());
+  _owned = 1;
 }
 
 }  // namespace qel

@@ -1,9 +1,15 @@
 #include "base/TimeZone.h"
 
+#include <sys/stat.h>
+
 #include <array>
+#include <atomic>
 #include <charconv>
 #include <cmath>
+#include <cstdlib>
 #include <ctime>
+#include <mutex>
+#include <optional>
 
 #include "base/FatalError.h"
 
@@ -25,6 +31,46 @@ class SystemTimeZone final : public TimeZone {
             .second = local.tm_sec,
             .zone = local.tm_zone};
   }
+
+  std::uint64_t version() const override {
+    std::timespec now{};
+    ::clock_gettime(CLOCK_MONOTONIC_COARSE, &now);
+    if (_lookedAt.exchange(now.tv_sec, std::memory_order_relaxed) != now.tv_sec) look();
+    return _version.load(std::memory_order_relaxed);
+  }
+
+ private:
+  // What the C library makes its zone of.
+  struct Origin {
+    std::string variable;
+    dev_t device = 0;
+    ino_t file = 0;
+    std::int64_t changed = 0;  // in nanoseconds
+    bool operator==(const Origin&) const = default;
+  };
+
+  static Origin origin() {
+    const char* variable = std::getenv("TZ");
+    struct stat file = {};
+    ::stat("/etc/localtime", &file);
+    return {.variable = variable ? variable : "/",
+            .device = file.st_dev,
+            .file = file.st_ino,
+            .changed = file.st_mtim.tv_sec * std::int64_t{1000000000} + file.st_mtim.tv_nsec};
+  }
+
+  void look() const {
+    const std::lock_guard lock(_mutex);
+    Origin found = origin();
+    if (found == _origin) return;
+    _origin = std::move(found);
+    ++_version;
+  }
+
+  mutable std::atomic<std::time_t> _lookedAt = -1;
+  mutable std::atomic<std::uint64_t> _version = 0;
+  mutable std::mutex _mutex;
+  mutable Origin _origin;
 };
 
 void appendPadded(std::string& out, std::int64_t number, std::size_t width) {
@@ -35,6 +81,24 @@ void appendPadded(std::string& out, std::int64_t number, std::size_t width) {
   const auto length = static_cast<std::size_t>(end - digits.data());
   if (length < width) out.append(width - length, '0');
   out.append(digits.data(), length);
+}
+
+char* putTwoDigits(char* at, unsigned number) {
+  *at++ = static_cast<char>('0' + number / 10);
+  *at++ = static_cast<char>('0' + number % 10);
+  return at;
+}
+
+constexpr std::int64_t kQuarter = 900;
+
+// The seconds from the start of the hour, where they count on evenly through the quarter that
+// starts at `start` and nothing else changes.
+std::optional<unsigned> evenQuarter(const CivilTime& start, const CivilTime& end) {
+  const auto second = [](const CivilTime& time) { return time.minute * 60 + time.second; };
+  const bool even = start.year == end.year && start.month == end.month && start.day == end.day &&
+                    start.hour == end.hour && start.zone == end.zone &&
+                    second(start) + kQuarter - 1 == second(end);
+  return even ? std::optional(static_cast<unsigned>(second(start))) : std::nullopt;
 }
 
 }  // namespace
@@ -61,6 +125,35 @@ std::string dateText(double milliseconds, const TimeZone& zone) {
   out += ' ';
   out += time.zone;
   return out;
+}
+
+std::string_view DateTexts::at(double milliseconds) {
+  if (!holds(milliseconds)) moveTo(milliseconds);
+  if (holds(milliseconds)) {
+    const auto passed = static_cast<unsigned>(milliseconds - _start) / 1000;
+    char* minute = _text.data() + _minute;
+    putTwoDigits(putTwoDigits(minute, (_firstSecond + passed) / 60) + 1,
+                 (_firstSecond + passed) % 60);
+  }
+  return _text;
+}
+
+void DateTexts::moveTo(double milliseconds) {
+  constexpr double kExact = 0x1p50;  // up to here parts of a second count
+  _version = _zone.version();
+  _text = dateText(milliseconds, _zone);
+  _end = _start;
+  if (!(std::abs(milliseconds) < kExact)) return;
+  const auto second = static_cast<std::int64_t>(std::floor(milliseconds / 1000.0));
+  const std::int64_t start = second - (second % kQuarter + kQuarter) % kQuarter;
+  const CivilTime first = _zone.at(start);
+  const auto firstSecond = evenQuarter(first, _zone.at(start + kQuarter - 1));
+  if (!firstSecond) return;
+  constexpr std::size_t kMinuteAndSecond = 5;
+  _minute = _text.size() - first.zone.size() - 1 - kMinuteAndSecond;
+  _firstSecond = *firstSecond;
+  _start = static_cast<double>(start) * 1000.0;
+  _end = static_cast<double>(start + kQuarter) * 1000.0;
 }
 
 }  // namespace qel

@@ -4,87 +4,58 @@
 #include <limits>
 #include <new>
 
-#include "base/Dictionary.h"
-
 namespace qel {
 
-Value::Value(Bytes value) : _kind(Kind::bytes) { _as.bytes = new Bytes(std::move(value)); }
-Value::Value(List value) : _kind(Kind::list) { _as.list = new List(std::move(value)); }
-Value::Value(Dictionary value) : _kind(Kind::dictionary) {
-  _as.dictionary = new Dictionary(std::move(value));
+Value::Value(Bytes value) : _kind(Kind::bytes), _owns(true) {
+  _as.bytes = new (SmallBlocks::take(sizeof(Bytes))) Bytes(std::move(value));
 }
 
-Value::Value(const Value& other) : _kind(other._kind) {
-  switch (_kind) {
+void Value::copy(const Value& other) {
+  switch (other._kind) {
     case Kind::text:
-      new (&_as.text) Text(other._as.text);
+      new (this) Value(*other.asText());
       break;
     case Kind::bytes:
-      _as.bytes = new Bytes(*other._as.bytes);
+      new (this) Value(*other._as.bytes);
       break;
     case Kind::list:
-      _as.list = new List(*other._as.list);
+      new (this) Value(other._as.list);
       break;
     case Kind::dictionary:
-      _as.dictionary = new Dictionary(*other._as.dictionary);
+      new (this) Value(other._as.dictionary);
       break;
     default:
-      _as.takeOver(other._as);
+      break;
   }
-}
-
-Value& Value::operator=(const Value& other) {
-  if (this != &other) *this = Value(other);
-  return *this;
-}
-
-Value& Value::operator=(Value&& other) noexcept {
-  if (this == &other) return *this;
-  Value taken(std::move(other));  // `other` may live below this value
-  destroy();
-  new (this) Value(std::move(taken));
-  return *this;
 }
 
 void Value::destroy() {
   switch (_kind) {
     case Kind::text:
-      _as.text.~Text();
+      SmallBlocks::give(const_cast<char*>(_as.characters), _size);
       break;
     case Kind::bytes:
-      delete _as.bytes;
+      _as.bytes->~Bytes();
+      SmallBlocks::give(_as.bytes, sizeof(Bytes));
       break;
     case Kind::list:
-      delete _as.list;
+      _as.list.~List();
       break;
     case Kind::dictionary:
-      delete _as.dictionary;
+      _as.dictionary.~Dictionary();
       break;
     default:
       break;
   }
-  _kind = Kind::null;
 }
 
-std::optional<bool> Value::asBoolean() const {
-  if (_kind != Kind::boolean) return std::nullopt;
-  return _as.boolean;
-}
-
-std::optional<std::string_view> Value::asText() const {
-  if (_kind != Kind::text) return std::nullopt;
-  return _as.text.view();
-}
-
-std::optional<std::uint64_t> Value::asUInt64() const {
-  if (_kind == Kind::unsignedInteger) return _as.unsignedInteger;
+std::optional<std::uint64_t> Value::otherAsUInt64() const {
   const auto narrow = asInt64();
   if (!narrow || *narrow < 0) return std::nullopt;
   return static_cast<std::uint64_t>(*narrow);
 }
 
-std::optional<std::int64_t> Value::asInt64() const {
-  if (_kind == Kind::signedInteger) return _as.signedInteger;
+std::optional<std::int64_t> Value::otherAsInt64() const {
   if (_kind == Kind::unsignedInteger &&
       _as.unsignedInteger <= std::uint64_t{std::numeric_limits<std::int64_t>::max()}) {
     return static_cast<std::int64_t>(_as.unsignedInteger);
@@ -105,8 +76,7 @@ std::optional<std::int32_t> Value::asInt32() const {
   return static_cast<std::int32_t>(*wide);
 }
 
-std::optional<float> Value::asFloat() const {
-  if (_kind == Kind::floating) return _as.floating;
+std::optional<float> Value::otherAsFloat() const {
   // Every integer up to 2^64 is below the range of single precision; only its digits may not fit.
   if (_kind == Kind::signedInteger) {
     const float rounded = static_cast<float>(_as.signedInteger);
@@ -155,13 +125,13 @@ bool operator==(const Value& a, const Value& b) {
     case Kind::floating:
       return a._as.floating == b._as.floating;
     case Kind::text:
-      return a._as.text == b._as.text;
+      return a.asText() == b.asText();
     case Kind::bytes:
       return *a._as.bytes == *b._as.bytes;
     case Kind::list:
-      return *a._as.list == *b._as.list;
+      return a._as.list == b._as.list;
     case Kind::dictionary:
-      return *a._as.dictionary == *b._as.dictionary;
+      return a._as.dictionary == b._as.dictionary;
   }
   return false;
 }

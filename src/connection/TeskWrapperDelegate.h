@@ -3,7 +3,7 @@
 
 #include <optional>
 
-#include "base/Dictionary.h"
+#include "base/Value.h"
 
 namespace qel {
 

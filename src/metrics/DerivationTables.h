@@ -9,33 +9,31 @@ namespace qel::derivations {
 
 // Index to unit: RSRP (3GPP TS 36.133, 9.1.4) and CPICH RSCP (TS 25.133, 9.1.1) in dBm, RXLEV in
 // dBm (TS 45.008, 8.1.4), RSRQ (TS 36.133, 9.1.7) and CPICH Ec/N0 (TS 25.133, 9.1.2) in half dB.
-constexpr Rewrite rsrpDbm(std::string_view key) {
+constexpr Rewrite rsrpDbm(Name key) {
   return {.key = key, .kind = Rewrite::Kind::addInteger, .operand = -140};
 }
-constexpr Rewrite rsrqDb(std::string_view key) {
+constexpr Rewrite rsrqDb(Name key) {
   return {.key = key, .kind = Rewrite::Kind::scaleFloat, .factor = 0.5F, .offset = -19.5F};
 }
-constexpr Rewrite rscpDbm(std::string_view key) {
+constexpr Rewrite rscpDbm(Name key) {
   return {.key = key, .kind = Rewrite::Kind::addInteger, .operand = -116};
 }
-constexpr Rewrite ecnoDb(std::string_view key) {
+constexpr Rewrite ecnoDb(Name key) {
   return {.key = key, .kind = Rewrite::Kind::scaleFloat, .factor = 0.5F, .offset = -24.5F};
 }
-constexpr Rewrite rxlevDbm(std::string_view key) {
+constexpr Rewrite rxlevDbm(Name key) {
   return {.key = key, .kind = Rewrite::Kind::addInteger, .operand = -110};
 }
-constexpr Rewrite halfDb(std::string_view key) {
+constexpr Rewrite halfDb(Name key) {
   return {.key = key, .kind = Rewrite::Kind::scaleFloat, .factor = 0.5F, .offset = 0.0F};
 }
-constexpr Rewrite wholeOfHundredths(std::string_view key) {
+constexpr Rewrite wholeOfHundredths(Name key) {
   return {.key = key, .kind = Rewrite::Kind::divideInteger, .operand = 100};
 }
-constexpr Rewrite hundredths(std::string_view key) {
+constexpr Rewrite hundredths(Name key) {
   return {.key = key, .kind = Rewrite::Kind::divideFloat, .factor = 100.0F};
 }
-constexpr Rewrite bandwidthMhz(std::string_view key) {
-  return {.key = key, .kind = Rewrite::Kind::bandwidth};
-}
+constexpr Rewrite bandwidthMhz(Name key) { return {.key = key, .kind = Rewrite::Kind::bandwidth}; }
 
 inline constexpr std::array kUtraRewrites = {rscpDbm("rscp"), ecnoDb("ecno")};
 inline constexpr std::array kGeranRewrites = {rxlevDbm("rxlev")};
@@ -52,8 +50,8 @@ inline constexpr std::array kBandList = {
 inline constexpr std::array kTrackingAreaList = {
     Rewrite{.key = "tai_list", .kind = Rewrite::Kind::listText}};
 
-inline constexpr std::array<std::string_view, 1> kTime = {"timestamp"};
-inline constexpr std::array<std::string_view, 2> kModeAndTime = {"connected_mode", "timestamp"};
+inline constexpr std::array<Name, 1> kTime = {"timestamp"};
+inline constexpr std::array<Name, 2> kModeAndTime = {"connected_mode", "timestamp"};
 
 template <auto record, auto list>
 EntryList& in(MetricStore& store) {
@@ -61,9 +59,9 @@ EntryList& in(MetricStore& store) {
 }
 using Store = MetricStore;
 
-constexpr ListCopy copy(std::string_view key, EntryList& (*target)(MetricStore&),
+constexpr ListCopy copy(Name key, EntryList& (*target)(MetricStore&),
                         std::span<const Rewrite> rewrites = {},
-                        std::span<const std::string_view> carried = kTime) {
+                        std::span<const Name> carried = kTime) {
   return {key, target, rewrites, carried};
 }
 

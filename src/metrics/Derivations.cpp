@@ -12,7 +12,7 @@ namespace {
 std::int64_t checkedSum(const Rewrite& rewrite, std::int64_t value) {
   std::int64_t sum = 0;
   if (__builtin_add_overflow(value, std::int64_t{rewrite.operand}, &sum)) {
-    fatalError("arithmetic overflow in \"" + std::string(rewrite.key) + "\"");
+    fatalError("arithmetic overflow in \"" + std::string(rewrite.key.view()) + "\"");
   }
   return sum;
 }
@@ -38,20 +38,68 @@ bool allDictionaries(const List& list) {
       list, [](const Value& value) { return value.kind() == Value::Kind::dictionary; });
 }
 
+// `value` is the one under the rewrite's key.
+void rewriteValue(const Rewrite& rewrite, Value& value, Dictionary& record,
+                  const BandwidthTable& bandwidths) {
+  switch (rewrite.kind) {
+    case Rewrite::Kind::addInteger:
+      if (const auto integer = value.asInt64()) value = checkedSum(rewrite, *integer);
+      break;
+    case Rewrite::Kind::divideInteger:
+      if (const auto integer = value.asInt64()) value = *integer / rewrite.operand;
+      break;
+    case Rewrite::Kind::scaleFloat:
+      if (const auto number = value.asFloat()) value = *number * rewrite.factor + rewrite.offset;
+      break;
+    case Rewrite::Kind::divideFloat:
+      if (const auto number = value.asFloat()) value = *number / rewrite.factor;
+      break;
+    case Rewrite::Kind::bandwidth:
+      rewriteBandwidth(rewrite, value, record, bandwidths);
+      break;
+    case Rewrite::Kind::listText:
+      if (value.asList()) value = jsonText(value);
+      break;
+    case Rewrite::Kind::integerListText:
+      if (const List* list = value.asList(); list && allIntegers(*list)) value = jsonText(value);
+      break;
+  }
+}
+
+// Makes `entry` as reported, with room for what is carried.
+void refill(Dictionary& entry, const Dictionary& reported, const ListCopy& copy) {
+  entry.clear();
+  Dictionary::Entries::Filling filling(entry.entries(), reported.size() + copy.carried.size());
+  for (const Dictionary::Entry& each : reported) filling.append(each);
+}
+
+// Makes the list that of the reported dictionaries. What there is is used again.
+void refill(EntryList& target, const List& reported, const ListCopy& copy) {
+  target.reserve(reported.size());
+  while (target.size() < reported.size()) target.emplace_back();
+  while (target.size() > reported.size()) target.erase(target.end() - 1);
+  for (std::size_t i = 0; i < reported.size(); ++i) {
+    refill(target[i], *reported[i].asDictionary(), copy);
+  }
+}
+
 void copyList(const ListCopy& copy, const Dictionary& record, MetricStore& store,
               const BandwidthTable& bandwidths) {
   EntryList& target = copy.target(store);
-  target.clear();
   const Value* source = record.find(copy.key);
   const List* list = source ? source->asList() : nullptr;
-  if (!list || !allDictionaries(*list)) return;
-  target.reserve(list->size());
-  for (const Value& value : *list) {
-    Dictionary& entry = target.emplace_back(*value.asDictionary());
-    for (const Rewrite& rewrite : copy.rewrites) applyRewrite(rewrite, entry, bandwidths);
-    for (const std::string_view key : copy.carried) {
-      entry.assign(Text::borrowed(key), record.find(key));
+  if (!list || !allDictionaries(*list)) return target.clear();
+  refill(target, *list, copy);
+  for (const Rewrite& rewrite : copy.rewrites) {
+    std::size_t place = 0;
+    for (Dictionary& entry : target) {
+      Value* value = entry.find(rewrite.key, place);
+      if (value) rewriteValue(rewrite, *value, entry, bandwidths);
     }
+  }
+  for (const Name key : copy.carried) {
+    const Value* carried = record.find(key);
+    for (Dictionary& entry : target) entry.assign(key, carried);
   }
 }
 
@@ -59,33 +107,7 @@ void copyList(const ListCopy& copy, const Dictionary& record, MetricStore& store
 
 void applyRewrite(const Rewrite& rewrite, Dictionary& record, const BandwidthTable& bandwidths) {
   Value* value = record.find(rewrite.key);
-  if (!value) return;
-  const auto integer = value->asInt64();
-  const auto number = value->asFloat();
-  const List* list = value->asList();
-  switch (rewrite.kind) {
-    case Rewrite::Kind::addInteger:
-      if (integer) *value = checkedSum(rewrite, *integer);
-      break;
-    case Rewrite::Kind::divideInteger:
-      if (integer) *value = *integer / rewrite.operand;
-      break;
-    case Rewrite::Kind::scaleFloat:
-      if (number) *value = *number * rewrite.factor + rewrite.offset;
-      break;
-    case Rewrite::Kind::divideFloat:
-      if (number) *value = *number / rewrite.factor;
-      break;
-    case Rewrite::Kind::bandwidth:
-      rewriteBandwidth(rewrite, *value, record, bandwidths);
-      break;
-    case Rewrite::Kind::listText:
-      if (list) *value = jsonText(*value);
-      break;
-    case Rewrite::Kind::integerListText:
-      if (list && allIntegers(*list)) *value = jsonText(*value);
-      break;
-  }
+  if (value) rewriteValue(rewrite, *value, record, bandwidths);
 }
 
 void project(const Dictionary& record, Dictionary& projection) {

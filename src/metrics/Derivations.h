@@ -22,7 +22,7 @@ struct Rewrite {
     integerListText  // list of integers → its text
   };
 
-  std::string_view key;
+  Name key;
   Kind kind;
   std::int32_t operand = 0;
   float factor = 0;
@@ -32,10 +32,10 @@ struct Rewrite {
 // Copies the dictionaries of a list of the record into a list of the store: emptied, then one entry
 // each, rewritten, with the record's values under `carried` (absent there: removed from the entry).
 struct ListCopy {
-  std::string_view key;
+  Name key;
   EntryList& (*target)(MetricStore&);
   std::span<const Rewrite> rewrites;
-  std::span<const std::string_view> carried;
+  std::span<const Name> carried;
 };
 
 // What a handler does with its record after storing it, in this order.

@@ -22,7 +22,7 @@ template <class Message>
 constexpr DispatchRow row(std::int64_t identifier, Store::Slot Store::*slot,
                           std::string_view logText,
                           const Derivation& derivation = derivations::kNone) {
-  return {identifier, decodeMessage<Message>, slot, logText, derivation};
+  return {identifier, Message::dictionaryWithData, slot, logText, derivation};
 }
 
 constexpr std::array kDispatchTable = {
@@ -97,13 +97,22 @@ constexpr std::array kDispatchTable = {
 
 static_assert(kDispatchTable.size() == 29);
 
+// The rows by identifier.
+constexpr auto kByIdentifier = [] {
+  std::array<const DispatchRow*, kDispatchTable.size()> rows{};
+  std::ranges::transform(kDispatchTable, rows.begin(), [](const auto& row) { return &row; });
+  std::ranges::sort(rows, {}, &DispatchRow::identifier);
+  return rows;
+}();
+
 }  // namespace
 
 std::span<const DispatchRow> dispatchTable() { return kDispatchTable; }
 
 const DispatchRow* findDispatchRow(std::int64_t identifier) {
-  const auto found = std::ranges::find(kDispatchTable, identifier, &DispatchRow::identifier);
-  return found == kDispatchTable.end() ? nullptr : &*found;
+  const auto found =
+      std::ranges::lower_bound(kByIdentifier, identifier, {}, &DispatchRow::identifier);
+  return found != kByIdentifier.end() && (*found)->identifier == identifier ? *found : nullptr;
 }
 
 }  // namespace qel

@@ -13,8 +13,8 @@ namespace qel {
 
 // One handled metric.
 struct DispatchRow {
-  std::int64_t identifier;  // as events carry it
-  DecodeMessage decode;     // by the metric's message class
+  std::int64_t identifier;   // as events carry it
+  DescribePayload describe;  // by the metric's message class
   MetricStore::Slot MetricStore::*slot;
   std::string_view logText;  // the record follows at once
   Derivation derivation;

@@ -1,23 +1,22 @@
 #include "metrics/MetricStore.h"
 
 #include <initializer_list>
-#include <string_view>
 
 namespace qel {
 namespace {
 
-Dictionary emptyTexts(std::initializer_list<std::string_view> keys) {
+Dictionary emptyTexts(std::initializer_list<Name> keys) {
   Dictionary record;
   record.reserve(keys.size());
-  for (const std::string_view key : keys) record.append(Text::borrowed(key), Text());
+  for (const Name key : keys) record.append(key, Text());
   return record;
 }
 
 }  // namespace
 
 EntryList placeholderList() {
-  constexpr std::string_view kWaiting = "Waiting for Update";
-  return {Dictionary{{Text::borrowed(kWaiting), Text::borrowed(kWaiting)}}};
+  constexpr Name kWaiting = "Waiting for Update";
+  return {Dictionary{{kWaiting, kWaiting}}};
 }
 
 LTE::LTE()

@@ -2,16 +2,15 @@
 #pragma once
 
 #include <optional>
-#include <vector>
 
-#include "base/Dictionary.h"
+#include "base/Value.h"
 
 namespace qel {
 
 // Main thread only, no lock. Nothing is ever cleared or aged. A reader that keeps a record copies
 // it; changing a copy changes nothing here.
 
-using EntryList = std::vector<Dictionary>;
+using EntryList = Sequence<Dictionary>;
 
 // The one entry of a list that no report has filled yet: "Waiting for Update" both ways.
 EntryList placeholderList();

@@ -1,8 +1,7 @@
 #include "metrics/MetricValidator.h"
 
 #include <array>
-#include <cinttypes>
-#include <cstdio>
+#include <string>
 
 #include "base/FatalError.h"
 #include "base/Rendering.h"
@@ -12,11 +11,23 @@ namespace qel {
 namespace {
 
 // "%2X" of a 64-bit integer.
-std::string hexadecimal(std::int64_t number) {
-  std::array<char, 24> digits;
-  const int length =
-      std::snprintf(digits.data(), digits.size(), "%2" PRIX64, static_cast<std::uint64_t>(number));
-  return {digits.data(), static_cast<std::size_t>(length)};
+void appendHexadecimal(std::string& out, std::int64_t number) {
+  std::array<char, 16> digits;
+  auto first = digits.end();
+  auto left = static_cast<std::uint64_t>(number);
+  do {
+    *--first = "0123456789ABCDEF"[left % 16];
+    left /= 16;
+  } while (left != 0);
+  const auto count = static_cast<std::size_t>(digits.end() - first);
+  if (count < 2) out += ' ';
+  out.append(first, count);
+}
+
+[[noreturn]] void refusePayload(std::int64_t identifier) {
+  std::string reason = "metric ";
+  appendHexadecimal(reason, identifier);
+  fatalError(reason + " has an undecodable payload");
 }
 
 }  // namespace
@@ -35,7 +46,7 @@ std::shared_ptr<MetricValidator> MetricValidator::create(std::shared_ptr<TeskWra
 }
 
 MetricValidator::MetricValidator(std::shared_ptr<TeskWrapper> wrapper, const TimeZone& zone)
-    : mySharedTeskInstance(std::move(wrapper)), _zone(zone) {
+    : mySharedTeskInstance(std::move(wrapper)), _dates(zone) {
   // Handlers stand before there is a delegate: an event that comes in between is logged and gone.
   if (mySharedTeskInstance) mySharedTeskInstance->listen();
 }
@@ -53,7 +64,7 @@ bool MetricValidator::processMetric(const Dictionary& event) {
   const Value* identifier = event.find(metricIDKey);
   metricID = identifier ? identifier->asInt64() : std::nullopt;
   if (!metricID) fatalError("a metric event without an integer under \"" + metricIDKey + "\"");
-  standardOutput().write("Metric ID in Hex = " + hexadecimal(*metricID));
+  logHexadecimal(*metricID);
 
   const DispatchRow* row = findDispatchRow(*metricID);
   if (!row) {
@@ -62,26 +73,35 @@ bool MetricValidator::processMetric(const Dictionary& event) {
   }
   const Value* payload = event.find(payloadKey);
   const Bytes* bytes = payload ? payload->asBytes() : nullptr;
-  const auto message = row->decode(bytes ? ByteView(*bytes) : ByteView());
-  if (!message) fatalError("metric " + hexadecimal(*metricID) + " has an undecodable payload");
+  auto record = row->describe(bytes ? ByteView(*bytes) : ByteView());
+  if (!record) refusePayload(*metricID);
 
   Slot& slot = this->*row->slot;
-  slot = message->dictionaryRepresentation();
+  slot = std::move(record);
   rewriteTimestamp(*slot);
-  std::string line(row->logText);
-  appendJson(line, *slot);
-  standardOutput().write(line);
+  logRecord(row->logText, *slot);
   applyDerivation(row->derivation, *slot, *this, dlbwlookup);
   return true;
 }
 
-void MetricValidator::rewriteTimestamp(Dictionary& record) const {
-  constexpr std::string_view kTimestamp = "timestamp";
-  Value* value = record.find(kTimestamp);
+void MetricValidator::rewriteTimestamp(Dictionary& record) {
+  Value* value = record.find("timestamp");
   if (!value) return;
   const auto milliseconds = value->asDouble();
   if (!milliseconds) fatalError("a \"timestamp\" that is no number");
-  *value = dateText(*milliseconds, _zone);
+  *value = _dates.at(*milliseconds);
+}
+
+void MetricValidator::logHexadecimal(std::int64_t identifier) {
+  _line = "Metric ID in Hex = ";
+  appendHexadecimal(_line, identifier);
+  standardOutput().write(_line);
+}
+
+void MetricValidator::logRecord(std::string_view text, const Dictionary& record) {
+  _line = text;
+  appendJson(_line, record);
+  standardOutput().write(_line);
 }
 
 }  // namespace qel

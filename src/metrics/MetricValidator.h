@@ -77,9 +77,12 @@ class MetricValidator final : public MetricStore,
 
  private:
   MetricValidator(std::shared_ptr<TeskWrapper> wrapper, const TimeZone& zone);
-  void rewriteTimestamp(Dictionary& record) const;
+  void rewriteTimestamp(Dictionary& record);
+  void logHexadecimal(std::int64_t identifier);
+  void logRecord(std::string_view text, const Dictionary& record);
 
-  const TimeZone& _zone;
+  DateTexts _dates;
+  std::string _line;  // the one being logged, kept for its memory
 };
 
 }  // namespace qel

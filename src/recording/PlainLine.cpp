@@ -10,12 +10,12 @@ namespace qel {
 namespace {
 
 // Keys that a dictionary need not copy.
-constexpr std::array<std::string_view, 4> kUsualKeys = {kRecordedMetricKey, kRecordedPayloadKey,
-                                                        "kKeyProfileID", "kKeyTriggerID"};
+constexpr std::array<Name, 4> kUsualKeys = {"kKeyMetricID", "kKeyPayload", "kKeyProfileID",
+                                            "kKeyTriggerID"};
 
 Text keyText(std::string_view key) {
-  const auto* const usual = std::ranges::find(kUsualKeys, key);
-  return usual == kUsualKeys.end() ? Text(key) : Text::borrowed(*usual);
+  const auto* const usual = std::ranges::find(kUsualKeys, key, &Name::view);
+  return usual == kUsualKeys.end() ? Text(key) : Text(*usual);
 }
 
 // Takes the parts of a plain line off its front.

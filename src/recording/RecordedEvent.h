@@ -6,7 +6,7 @@
 #include <optional>
 #include <string_view>
 
-#include "base/Dictionary.h"
+#include "base/Value.h"
 
 namespace qel {
 

@@ -5,7 +5,7 @@
 #include <optional>
 #include <string_view>
 
-#include "base/Dictionary.h"
+#include "base/Value.h"
 #include "service/CommandCodes.h"
 #include "tesk/Transport.h"
 

@@ -5,7 +5,7 @@
 #include <string_view>
 
 #include "base/Bytes.h"
-#include "base/Dictionary.h"
+#include "base/Value.h"
 
 namespace tesk {
 

@@ -52,6 +52,42 @@ TEST(JsonText, escapesWhatJsonCannotHold) {
   EXPECT_EQ(jsonText(Value("é€😀")), "\"é€😀\"");
 }
 
+TEST(JsonText, escapesWhereverItStands) {
+  for (std::size_t place = 0; place < 20; ++place) {
+    std::string text(20, 'x');
+    text[place] = '"';
+    EXPECT_EQ(jsonText(Value(text)),
+              '"' + text.substr(0, place) + "\\\"" + text.substr(place + 1) + '"');
+    text[place] = '\x7F';
+    EXPECT_EQ(jsonText(Value(text)), '"' + text + '"');
+  }
+}
+
+TEST(JsonText, writesIntegersOfEveryLength) {
+  std::uint64_t number = 1;
+  for (int digits = 1; digits < 20; ++digits, number *= 10) {
+    for (const std::uint64_t value : {number - 1, number, number + 1, 9 * number}) {
+      EXPECT_EQ(jsonText(Value(value)), std::to_string(value));
+      const auto negative = -static_cast<std::int64_t>(number);
+      EXPECT_EQ(jsonText(Value(negative)), std::to_string(negative));
+    }
+  }
+}
+
+TEST(JsonText, findsRoomForLongTextsAndManyElements) {
+  const std::string text(100000, 'y');
+  Dictionary dictionary;
+  dictionary.append(Text(text), text);
+  dictionary.append("list", List(3000, Value(std::numeric_limits<std::int64_t>::min())));
+  const std::string rendered = jsonText(dictionary);
+  EXPECT_TRUE(rendered.starts_with("{\"" + text + "\": \"" + text + "\", \"list\": [-92233"));
+  const std::string_view marks = R"({"": "", "list": []})";
+  EXPECT_EQ(rendered.size(), marks.size() + 2 * text.size() + 3000 * 20 + 2999 * 2);
+  std::string line = "before ";
+  appendJson(line, Dictionary{{"a", 1}});
+  EXPECT_EQ(line, "before {\"a\": 1}");
+}
+
 TEST(JsonText, replacesBytesThatAreNotUtf8) {
   EXPECT_EQ(jsonText(Value("a\xFFz")), "\"a\xEF\xBF\xBDz\"");
 }

@@ -4,8 +4,6 @@
 
 #include <limits>
 
-#include "base/Dictionary.h"
-
 namespace qel {
 namespace {
 
@@ -81,11 +79,11 @@ TEST(Value, canTakeTheValueOfItsOwnElement) {
 }
 
 TEST(Text, borrowsOnlyWhatItIsToldTo) {
-  EXPECT_TRUE(Text::borrowed("key").isBorrowed());
-  EXPECT_TRUE(Text(Text::borrowed("key")).isBorrowed());
+  EXPECT_TRUE(Text(Name("key")).isName());
+  EXPECT_TRUE(Text(Text(Name("key"))).isName());
   const Text owned(std::string(100, 'x'));
   const Text copy = owned;
-  EXPECT_FALSE(copy.isBorrowed());
+  EXPECT_FALSE(copy.isName());
   EXPECT_EQ(copy.view(), std::string(100, 'x'));
 }
 

@@ -9,7 +9,7 @@
 #include <string>
 #include <vector>
 
-#include "base/Dictionary.h"
+#include "base/Value.h"
 #include "support/PrivateBus.h"
 #include "tesk/Transport.h"
 #include "tesk/bus/BusConnector.h"

@@ -87,7 +87,7 @@ TEST(RepeatedMessageAccessors, addCountReplaceAndClear) {
   EXPECT_EQ(message.rxInfosCount(), 2U);
   EXPECT_EQ(message.rxInfoAtIndex(1), second);
   message.setRxInfos({second});
-  EXPECT_EQ(message.rxInfos(), std::vector{second});
+  EXPECT_EQ(message.rxInfos(), (MessageList<RxInfo>{second}));
   message.clearRxInfos();
   EXPECT_EQ(message.rxInfosCount(), 0U);
   EXPECT_TRUE(message.data().empty());

@@ -34,8 +34,8 @@ TEST(CopyTo, replacesWhatTheSourceHasAndLeavesTheRest) {
       // A packed list is copied even when it is empty.
       const bool fromSource = testing::kIsPacked<Field> || isPresent(*source, field);
       const Message& origin = fromSource ? *source : *before;
-      EXPECT_EQ(isPresent(destination, field), isPresent(origin, field)) << field.key;
-      EXPECT_TRUE(sameEntry(destination, origin, field.key)) << field.key;
+      EXPECT_EQ(isPresent(destination, field), isPresent(origin, field)) << field.key.view();
+      EXPECT_TRUE(sameEntry(destination, origin, field.key)) << field.key.view();
     });
   });
 }
@@ -48,7 +48,7 @@ TEST(CopyTo, sharesNestedMessagesWithTheSource) {
     forEachField<Message>([&](const auto& field) {
       using Field = std::remove_cvref_t<decltype(field)>;
       if constexpr (testing::kIsMessage<Field> || testing::kIsMessageList<Field>) {
-        EXPECT_EQ(copy.*field.member, source.get()->*field.member) << field.key;
+        EXPECT_EQ(copy.*field.member, source.get()->*field.member) << field.key.view();
       }
     });
   });
@@ -73,12 +73,12 @@ void expectNothingShared(const Message& copy, const Message& source) {
     const auto& original = source.*field.member;
     if constexpr (testing::kIsMessage<Field>) {
       if (!original) return;
-      EXPECT_NE(copied, original) << field.key;
+      EXPECT_NE(copied, original) << field.key.view();
       expectNothingShared(*copied, *original);
     } else if constexpr (testing::kIsMessageList<Field>) {
       ASSERT_EQ(copied.size(), original.size());
       for (std::size_t i = 0; i < copied.size(); ++i) {
-        EXPECT_NE(copied[i], original[i]) << field.key;
+        EXPECT_NE(copied[i], original[i]) << field.key.view();
         expectNothingShared(*copied[i], *original[i]);
       }
     }

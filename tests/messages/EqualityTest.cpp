@@ -27,8 +27,8 @@ TEST(IsEqual, noticesEveryFieldThatBecomesAbsent) {
       if (!isPresent(*message, field)) return;
       const auto other = message->deepCopy();
       testing::makeAbsent(*other, field);
-      EXPECT_FALSE(other->isEqual(*message)) << field.key;
-      EXPECT_FALSE(message->isEqual(*other)) << field.key;
+      EXPECT_FALSE(other->isEqual(*message)) << field.key.view();
+      EXPECT_FALSE(message->isEqual(*other)) << field.key.view();
       ++noticed;
     });
   });
@@ -45,7 +45,7 @@ TEST(IsEqual, noticesEveryScalarThatChanges) {
         const auto other = message->deepCopy();
         auto& value = (*other).*field.member;
         value = static_cast<std::remove_cvref_t<decltype(value)>>(!value);
-        EXPECT_FALSE(other->isEqual(*message)) << field.key;
+        EXPECT_FALSE(other->isEqual(*message)) << field.key.view();
       }
     });
   });
@@ -60,9 +60,9 @@ TEST(IsEqual, ignoresWhatIsStoredUnderAClearPresenceBit) {
         if (isPresent(*message, field)) return;
         const auto other = message->deepCopy();
         (*other).*field.member = 1;
-        EXPECT_TRUE(other->isEqual(*message)) << field.key;
-        EXPECT_EQ(other->hash(), message->hash()) << field.key;
-        EXPECT_EQ(other->data(), message->data()) << field.key;
+        EXPECT_TRUE(other->isEqual(*message)) << field.key.view();
+        EXPECT_EQ(other->hash(), message->hash()) << field.key.view();
+        EXPECT_EQ(other->data(), message->data()) << field.key.view();
       }
     });
   });

@@ -30,7 +30,7 @@ TEST(MergeFrom, intoAnEmptyMessageGivesAnEqualOneThatSharesWhatIsNested) {
     forEachField<Message>([&](const auto& field) {
       using Field = std::remove_cvref_t<decltype(field)>;
       if constexpr (testing::kIsMessage<Field> || testing::kIsMessageList<Field>) {
-        EXPECT_EQ(merged.*field.member, source.get()->*field.member) << field.key;
+        EXPECT_EQ(merged.*field.member, source.get()->*field.member) << field.key.view();
       }
     });
   });
@@ -44,25 +44,25 @@ void expectMerged(const Message& merged, const Message& before, const Message& s
   const auto& theirs = source.*field.member;
   if constexpr (testing::kIsMessageList<Field>) {
     const std::size_t kept = (before.*field.member).size();
-    ASSERT_EQ(ours.size(), kept + theirs.size()) << field.key;
+    ASSERT_EQ(ours.size(), kept + theirs.size()) << field.key.view();
     for (std::size_t i = 0; i < theirs.size(); ++i) EXPECT_EQ(ours[kept + i], theirs[i]);
   } else if constexpr (testing::kIsPacked<Field>) {
     auto expected = (before.*field.member).values;
-    expected.insert(expected.end(), theirs.values.begin(), theirs.values.end());
-    EXPECT_EQ(ours.values, expected) << field.key;
+    for (const auto value : theirs.values) expected.push_back(value);
+    EXPECT_EQ(ours.values, expected) << field.key.view();
   } else if constexpr (testing::kIsMessage<Field>) {
     ASSERT_EQ(static_cast<bool>(ours), isPresent(before, field) || isPresent(source, field));
     if (isPresent(before, field) && theirs) {
-      EXPECT_NE(ours, theirs) << field.key << " is merged, not taken over";
+      EXPECT_NE(ours, theirs) << field.key.view() << " is merged, not taken over";
       auto expected = (before.*field.member)->deepCopy();
       expected->mergeFrom(*theirs);
-      EXPECT_TRUE(ours->isEqual(*expected)) << field.key;
+      EXPECT_TRUE(ours->isEqual(*expected)) << field.key.view();
     } else if (theirs) {
-      EXPECT_EQ(ours, theirs) << field.key << " is taken over, not copied";
+      EXPECT_EQ(ours, theirs) << field.key.view() << " is taken over, not copied";
     }
   } else {
     const Message& origin = isPresent(source, field) ? source : before;
-    EXPECT_TRUE(sameEntry(merged, origin, field.key)) << field.key;
+    EXPECT_TRUE(sameEntry(merged, origin, field.key)) << field.key.view();
   }
 }
 
@@ -87,11 +87,11 @@ TEST(MergeFrom, itselfDoublesTheListsAndKeepsTheRest) {
       const auto& now = (*message).*field.member;
       const auto& then = (*before).*field.member;
       if constexpr (testing::kIsMessageList<Field>) {
-        EXPECT_EQ(now.size(), 2 * then.size()) << field.key;
+        EXPECT_EQ(now.size(), 2 * then.size()) << field.key.view();
       } else if constexpr (testing::kIsPacked<Field>) {
-        EXPECT_EQ(now.count(), 2 * then.count()) << field.key;
+        EXPECT_EQ(now.count(), 2 * then.count()) << field.key.view();
       } else if constexpr (!testing::kIsMessage<Field>) {
-        EXPECT_TRUE(sameEntry(*message, *before, field.key)) << field.key;
+        EXPECT_TRUE(sameEntry(*message, *before, field.key)) << field.key.view();
       }
     });
   });

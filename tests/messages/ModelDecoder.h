@@ -9,7 +9,7 @@
 #include <string>
 #include <vector>
 
-#include "base/Dictionary.h"
+#include "base/Value.h"
 
 namespace qel::testing {
 

@@ -116,7 +116,7 @@ TEST(WriterMark, fillsInALengthOfAsFewBytesAsItNeeds) {
     PBDataWriterPlaceMark(writer, mark, 2);
     for (std::size_t i = 0; i < size; ++i) PBDataWriterWriteUint32Field(writer, 0x25, kPBNoTag);
     PBDataWriterRecallMark(writer, mark);
-    EXPECT_EQ(writer.data(), testing::delimitedField(2, Bytes(size, 0x25)));
+    EXPECT_EQ(writer.takeData(), testing::delimitedField(2, Bytes(size, 0x25)));
   }
 }
 
@@ -131,7 +131,7 @@ TEST(WriterMark, nests) {
   PBDataWriterRecallMark(writer, inner);
   PBDataWriterWriteUint32Field(writer, 6, 4);
   PBDataWriterRecallMark(writer, outer);
-  EXPECT_EQ(writer.data(),
+  EXPECT_EQ(writer.takeData(),
             testing::delimitedField(1, testing::joined(testing::varintField(2, 5),
                                                        testing::delimitedField(3, Bytes(200, 1)),
                                                        testing::varintField(4, 6))));

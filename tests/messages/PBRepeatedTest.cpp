@@ -31,7 +31,7 @@ TEST(PBRepeated, addsSetsCopiesAndClearsUnsignedValues) {
 
   constexpr std::array<std::uint32_t, 3> kValues = {3, 1, 2};
   PBRepeatedUInt32Set(array, kValues.data(), kValues.size());
-  EXPECT_EQ(array.values, (std::vector<std::uint32_t>{3, 1, 2}));
+  EXPECT_EQ(array.values, (Sequence<std::uint32_t>{3, 1, 2}));
   EXPECT_FALSE(PBRepeatedUInt32IsEqual(copy, array));
   EXPECT_EQ(PBRepeatedUInt32NSArray(array), (List{3U, 1U, 2U}));
 
@@ -56,7 +56,7 @@ TEST(PBRepeated, addsSetsCopiesAndClearsSignedValues) {
 
   constexpr std::array<std::int32_t, 3> kValues = {-3, 1, 2};
   PBRepeatedInt32Set(array, kValues.data(), kValues.size());
-  EXPECT_EQ(array.values, (std::vector<std::int32_t>{-3, 1, 2}));
+  EXPECT_EQ(array.values, (Sequence<std::int32_t>{-3, 1, 2}));
   EXPECT_FALSE(PBRepeatedInt32IsEqual(copy, array));
   EXPECT_EQ(PBRepeatedInt32NSArray(array), (List{-3, 1, 2}));
 

@@ -3,7 +3,7 @@
 
 #include <google/protobuf/message.h>
 
-#include "base/Dictionary.h"
+#include "base/Value.h"
 
 namespace qel::testing {
 

@@ -90,7 +90,11 @@ TEST(DispatchTable, pairsEachIdentifierWithItsClassSlotAndLogText) {
     EXPECT_EQ(expected.identifier, expected.constant);
     const DispatchRow* row = findDispatchRow(expected.identifier);
     ASSERT_NE(row, nullptr);
-    EXPECT_EQ(row->decode({})->className(), expected.className);
+    const auto* metric =
+        findMetricMessage(static_cast<std::uint32_t>(expected.identifier - kMetricEventBase));
+    ASSERT_NE(metric, nullptr);
+    EXPECT_EQ(metric->className, expected.className);
+    EXPECT_EQ(row->describe, metric->describe);
     EXPECT_TRUE(row->slot == expected.slot);
     EXPECT_EQ(row->logText, expected.logText);
   }

@@ -1,7 +1,7 @@
 // Feeds encoded metrics to a dispatcher, as the wrapper would.
 #pragma once
 
-#include "base/Dictionary.h"
+#include "base/Value.h"
 #include "messages/runtime/PBCodable.h"
 #include "metrics/MetricValidator.h"
 #include "support/FixedTimeZone.h"

@@ -6,7 +6,7 @@
 #include <string>
 #include <vector>
 
-#include "base/Dictionary.h"
+#include "base/Value.h"
 #include "tesk/Transport.h"
 
 namespace qel::testing {

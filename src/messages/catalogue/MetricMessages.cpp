@@ -15,7 +15,7 @@ namespace {
 
 template <class Message>
 constexpr MetricMessage row(std::uint32_t identifier) {
-  return {identifier, Message::kClassName, decodeMessage<Message>};
+  return {identifier, Message::kClassName, decodeMessage<Message>, Message::dictionaryWithData};
 }
 
 constexpr std::array<MetricMessage, 30> kMetricMessages = {

@@ -3,6 +3,7 @@
 
 #include <cstdint>
 #include <memory>
+#include <optional>
 #include <span>
 #include <string_view>
 
@@ -14,6 +15,9 @@ namespace qel {
 // Decodes a payload: the message, or nothing when the bytes are damaged.
 using DecodeMessage = std::shared_ptr<PBCodable> (*)(ByteView payload);
 
+// The dictionary form of a payload, or nothing when the bytes are damaged.
+using DescribePayload = std::optional<Dictionary> (*)(ByteView payload);
+
 template <class Message>
 std::shared_ptr<PBCodable> decodeMessage(ByteView payload) {
   return Message::initWithData(payload);
@@ -23,6 +27,7 @@ struct MetricMessage {
   std::uint32_t identifier;  // as in the catalogue, 16 bits
   std::string_view className;
   DecodeMessage decode;
+  DescribePayload describe;
 };
 
 // The 30 metrics whose payload has a message class.

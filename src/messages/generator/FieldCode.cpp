@@ -105,15 +105,14 @@ const Template kObject = {{{"const $held$& $name$() const", "return _$name$;"},
                           "$Kind$Field<$arguments$>"};
 
 const Template kRepeatedMessage = {
-    {{"const std::vector<std::shared_ptr<$Nested$>>& $name$() const", "return _$name$;"},
-     {"void set$Name$(std::vector<std::shared_ptr<$Nested$>> values)",
-      "_$name$ = std::move(values);"},
+    {{"const MessageList<$Nested$>& $name$() const", "return _$name$;"},
+     {"void set$Name$(MessageList<$Nested$> values)", "_$name$ = std::move(values);"},
      {"void clear$Name$()", "_$name$.clear();"},
      {"void add$One$(std::shared_ptr<$Nested$> value)", "_$name$.push_back(std::move(value));"},
      {"std::size_t $name$Count() const", "return _$name$.size();"},
      {"const std::shared_ptr<$Nested$>& $one$AtIndex(std::size_t index) const",
       "return _$name$.at(index);"}},
-    "std::vector<std::shared_ptr<$Nested$>> _$name$;\n",
+    "MessageList<$Nested$> _$name$;\n",
     "RepeatedMessageField<$Message$, $Nested$>"};
 
 const Template kPacked = {

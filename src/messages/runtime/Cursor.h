@@ -6,20 +6,24 @@
 
 namespace qel {
 
-// The place of the next byte and the end of what may be read. A cursor without a place is that of
-// damaged bytes: nothing more is read with it. Two words, passed and returned by value, so that the
-// compiler keeps them in registers all through a message.
+// The place in damaged bytes: behind every end, so that nothing more is read there.
+inline const std::uint8_t* const kDamaged =
+    reinterpret_cast<const std::uint8_t*>(~std::uintptr_t{0});
+
+// The place of the next byte and the end of what may be read. Two words, passed and returned by
+// value, so that the compiler keeps them in registers all through a message.
 struct Cursor {
   const std::uint8_t* at;
   const std::uint8_t* end;
 
-  static Cursor damaged() { return {nullptr, nullptr}; }
-  bool isDamaged() const { return at == nullptr; }
+  static Cursor damaged() { return {kDamaged, kDamaged}; }
+  bool isDamaged() const { return at == kDamaged; }
+  // Nothing more to read: at the end, or damaged.
   bool isAtEnd() const { return at >= end; }
   std::size_t left() const { return static_cast<std::size_t>(end - at); }
 };
 
-// A varint and the place behind it; no place when it ran past the end, and the value is then 0.
+// A varint and the place behind it; kDamaged when it ran past the end, and the value is then 0.
 struct Varint {
   std::uint64_t value;
   const std::uint8_t* next;
@@ -30,11 +34,13 @@ Varint readLongVarint(const std::uint8_t* at, const std::uint8_t* end);
 
 // The same, with the lengths that nearly all varints have taken on the spot.
 [[gnu::always_inline]] inline Varint readVarint(Cursor cursor) {
-  if (cursor.left() >= 2) [[likely]] {
+  if (!cursor.isAtEnd()) [[likely]] {
     const std::uint64_t first = cursor.at[0];
     if (first < 0x80) return {first, cursor.at + 1};
-    const std::uint64_t second = cursor.at[1];
-    if (second < 0x80) return {(first & 0x7F) | second << 7, cursor.at + 2};
+    if (cursor.left() >= 2) [[likely]] {
+      const std::uint64_t second = cursor.at[1];
+      if (second < 0x80) return {(first & 0x7F) | second << 7, cursor.at + 2};
+    }
   }
   return readLongVarint(cursor.at, cursor.end);
 }

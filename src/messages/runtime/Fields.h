@@ -11,9 +11,10 @@
 #include <string_view>
 #include <tuple>
 #include <type_traits>
-#include <vector>
 
 #include "base/Bytes.h"
+#include "base/Sequence.h"
+#include "base/Text.h"
 #include "messages/runtime/PBRepeated.h"
 
 namespace qel {
@@ -21,16 +22,20 @@ namespace qel {
 // How a scalar travels. All are varints; sint32 is ZigZag-coded.
 enum class Encoding : std::uint8_t { uint64, uint32, int32, sint32, boolean };
 
+// The elements of a repeated message field. They may be shared with other messages.
+template <class Nested>
+using MessageList = Sequence<std::shared_ptr<Nested>>;
+
 // One name of an enumeration; tables of them are sorted by value.
 struct EnumName {
   std::int32_t value;
-  std::string_view name;
+  Name name;
 };
 
 template <class Message, class T, Encoding encoding>
 struct ScalarField {
   std::uint32_t number;
-  std::string_view key;
+  Name key;
   T Message::*member;
   unsigned presenceBit;
 };
@@ -38,7 +43,7 @@ struct ScalarField {
 template <class Message>
 struct EnumField {
   std::uint32_t number;
-  std::string_view key;
+  Name key;
   std::int32_t Message::*member;
   unsigned presenceBit;
   std::span<const EnumName> names;
@@ -47,37 +52,42 @@ struct EnumField {
 template <class Message>
 struct DataField {
   std::uint32_t number;
-  std::string_view key;
+  Name key;
   std::optional<Bytes> Message::*member;
 };
 
 template <class Message>
 struct StringField {
   std::uint32_t number;
-  std::string_view key;
+  Name key;
   std::optional<std::string> Message::*member;
 };
 
 template <class Message, class Nested>
 struct MessageField {
   std::uint32_t number;
-  std::string_view key;
+  Name key;
   std::shared_ptr<Nested> Message::*member;
 };
 
 template <class Message, class Nested>
 struct RepeatedMessageField {
   std::uint32_t number;
-  std::string_view key;
-  std::vector<std::shared_ptr<Nested>> Message::*member;
+  Name key;
+  MessageList<Nested> Message::*member;
 };
 
 template <class Message, class T, Encoding encoding>
 struct PackedField {
   std::uint32_t number;
-  std::string_view key;
+  Name key;
   PBRepeated<T> Message::*member;
 };
+
+template <class Field>
+inline constexpr bool kIsPacked = false;
+template <class Message, class T, Encoding encoding>
+inline constexpr bool kIsPacked<PackedField<Message, T, encoding>> = true;
 
 // The smallest word with a presence bit for each of `count` scalar fields.
 template <unsigned count>
@@ -87,9 +97,9 @@ using PresenceWord = std::conditional_t<
                        std::conditional_t<count <= 32, std::uint32_t, std::uint64_t>>>;
 
 // The name of an enumeration's value, or empty.
-constexpr std::string_view nameOf(std::span<const EnumName> names, std::int32_t value) {
+constexpr Name nameOf(std::span<const EnumName> names, std::int32_t value) {
   const auto found = std::ranges::lower_bound(names, value, {}, &EnumName::value);
-  return found != names.end() && found->value == value ? found->name : std::string_view();
+  return found != names.end() && found->value == value ? found->name : Name();
 }
 
 // Calls visit(field) for every row of the message's table, in field order.

@@ -5,12 +5,9 @@
 #include <memory>
 #include <string>
 #include <tuple>
-#include <type_traits>
-#include <utility>
 
 #include "messages/catalogue/KBBMetricUtility.h"
-#include "messages/runtime/Cursor.h"
-#include "messages/runtime/Fields.h"
+#include "messages/runtime/FieldOrder.h"
 #include "messages/runtime/Presence.h"
 
 namespace qel {
@@ -25,25 +22,9 @@ Cursor skipUnknown(Cursor cursor, std::uint32_t fieldNumber, std::uint8_t wireTy
 template <class Message>
 Cursor readMessage(Message& message, Cursor cursor);
 
-// The value that a varint on the wire stands for.
-template <Encoding encoding>
-auto decodedScalar(std::uint64_t varint) {
-  const auto low = static_cast<std::uint32_t>(varint);
-  if constexpr (encoding == Encoding::uint64) return varint;
-  if constexpr (encoding == Encoding::uint32) return low;
-  if constexpr (encoding == Encoding::int32) return static_cast<std::int32_t>(low);
-  if constexpr (encoding == Encoding::sint32) {
-    return static_cast<std::int32_t>(low >> 1 ^ (0U - (low & 1)));
-  }
-  if constexpr (encoding == Encoding::boolean) return varint != 0;
-}
-
-// The part of the input that a varint length in front of it gives; damaged when it is not all
-// there.
-inline Cursor readDelimited(Cursor cursor) {
-  const auto [length, next] = readVarint(cursor);
-  if (!next || length > static_cast<std::uint64_t>(cursor.end - next)) return Cursor::damaged();
-  return {next, next + length};
+template <class Message>
+std::shared_ptr<Message> makeMessage() {
+  return std::allocate_shared<Message>(SmallBlockAllocator<Message>());
 }
 
 // One overload a kind of field. The value is read by the kind of the field, whatever wire type the
@@ -92,23 +73,23 @@ Cursor readNested(Nested& nested, Cursor cursor) {
 
 template <class Message, class Nested>
 Cursor readField(Message& message, Cursor cursor, const MessageField<Message, Nested>& field) {
-  message.*field.member = std::make_shared<Nested>();
+  message.*field.member = makeMessage<Nested>();
   return readNested(*(message.*field.member), cursor);
 }
 
 template <class Message, class Nested>
 Cursor readField(Message& message, Cursor cursor,
                  const RepeatedMessageField<Message, Nested>& field) {
-  constexpr std::size_t kUsualCount = 4;
+  constexpr std::size_t kUsualCount = 7;
   auto& elements = message.*field.member;
-  if (elements.capacity() == 0) elements.reserve(kUsualCount);
-  return readNested(*elements.emplace_back(std::make_shared<Nested>()), cursor);
+  if (elements.empty()) elements.reserve(kUsualCount);
+  return readNested(*elements.emplace_back(makeMessage<Nested>()), cursor);
 }
 
 template <class Message, class T, Encoding encoding>
 Cursor readField(Message& message, Cursor cursor, const PackedField<Message, T, encoding>& field) {
   Cursor run = readDelimited(cursor);
-  while (!run.isDamaged() && !run.isAtEnd()) {
+  while (!run.isAtEnd()) {
     const auto [value, next] = readVarint(run);
     (message.*field.member).values.push_back(decodedScalar<encoding>(value));
     run.at = next;
@@ -116,65 +97,28 @@ Cursor readField(Message& message, Cursor cursor, const PackedField<Message, T, 
   return {run.at, cursor.end};
 }
 
-// The tag with which a field is written, and whether it may come several times in a row.
-template <class Field>
-struct WireForm {
-  static constexpr std::uint32_t kWireType = 2;
-  static constexpr bool kRepeats = false;
-};
-
-template <class Message, class T, Encoding encoding>
-struct WireForm<ScalarField<Message, T, encoding>> {
-  static constexpr std::uint32_t kWireType = 0;
-  static constexpr bool kRepeats = false;
-};
-
+// Takes fields in order into a message.
 template <class Message>
-struct WireForm<EnumField<Message>> {
-  static constexpr std::uint32_t kWireType = 0;
-  static constexpr bool kRepeats = false;
-};
+struct MessageTarget {
+  static constexpr bool kStopsAtEnd = true;
 
-template <class Message, class Nested>
-struct WireForm<RepeatedMessageField<Message, Nested>> {
-  static constexpr std::uint32_t kWireType = 2;
-  static constexpr bool kRepeats = true;
-};
-
-// Whether the tag stands here, in as few bytes as it needs.
-template <std::uint32_t tag>
-bool standsAt(Cursor cursor) {
-  static_assert(tag < 1U << 14, "field numbers of messages are below 2048");
-  if constexpr (tag < 0x80) {
-    return cursor.left() >= 1 && cursor.at[0] == tag;
-  } else {
-    return cursor.left() >= 2 && cursor.at[0] == ((tag & 0x7F) | 0x80) && cursor.at[1] == tag >> 7;
+  template <class Tag, class Field>
+  [[gnu::always_inline]] Cursor read(Cursor cursor, const Field& field) {
+    return readField(message, cursor, field);
   }
-}
-
-// Reads the field with this index if it is what comes next.
-template <class Message, std::size_t index>
-Cursor readExpected(Message& message, Cursor cursor) {
-  constexpr auto& field = std::get<index>(Message::kFields);
-  using Form = WireForm<std::remove_cvref_t<decltype(field)>>;
-  constexpr std::uint32_t kTag = field.number << 3 | Form::kWireType;
-  if constexpr (!KBBMetricUtility::mayBeMetric(field.number)) {
-    while (standsAt<kTag>(cursor)) {
-      cursor = readField(message, {cursor.at + (kTag < 0x80 ? 1 : 2), cursor.end}, field);
-      if (!Form::kRepeats || cursor.isDamaged()) break;
+  template <class Tag, class Nested>
+  Cursor read(Cursor cursor, const RepeatedMessageField<Message, Nested>& field) {
+    cursor = readField(message, cursor, field);
+    while (!cursor.isAtEnd() && Tag::standsAt(cursor)) {
+      cursor = readField(message, Tag::behind(cursor), field);
     }
+    return cursor;
   }
-  return cursor;
-}
+  template <class Field>
+  void leaveOut(const Field&) {}
 
-// Reads fields as long as they come in the order in which they are written.
-template <class Message, std::size_t... index>
-Cursor readInOrder(Message& message, Cursor cursor, std::index_sequence<index...>) {
-  static_cast<void>(((cursor = readExpected<Message, index>(message, cursor),
-                      !cursor.isDamaged() && !cursor.isAtEnd()) &&
-                     ...));
-  return cursor;
-}
+  Message& message;
+};
 
 // Reads the value of the field with this number, or skips it when the message has no such field.
 template <class Message>
@@ -193,7 +137,7 @@ Cursor readNumbered(Message& message, Cursor cursor, std::uint32_t number, std::
 template <class Message>
 [[gnu::noinline]] Cursor readInAnyOrder(Message& message, Cursor cursor) {
   constexpr std::uint8_t kEndOfGroup = 4;
-  while (!cursor.isDamaged() && !cursor.isAtEnd()) {
+  while (!cursor.isAtEnd()) {
     const auto [tag, next] = readVarint(cursor);
     cursor.at = next;
     const auto wireType = static_cast<std::uint8_t>(tag & 7);
@@ -215,9 +159,9 @@ template <class Message>
 // at the cost of a comparison a field, and says the same as any order does.
 template <class Message>
 Cursor readMessage(Message& message, Cursor cursor) {
-  constexpr std::size_t kFieldCount = std::tuple_size_v<decltype(Message::kFields)>;
-  cursor = readInOrder(message, cursor, std::make_index_sequence<kFieldCount>());
-  if (cursor.isDamaged() || cursor.isAtEnd()) return cursor;
+  MessageTarget<Message> target{message};
+  cursor = readInOrder<Message>(target, cursor);
+  if (cursor.isAtEnd()) return cursor;
   return readInAnyOrder(message, cursor);
 }
 

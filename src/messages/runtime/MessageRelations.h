@@ -114,8 +114,7 @@ bool equalHeld(const std::shared_ptr<Nested>& a, const std::shared_ptr<Nested>& 
 }
 
 template <class Nested>
-bool equalHeld(const std::vector<std::shared_ptr<Nested>>& a,
-               const std::vector<std::shared_ptr<Nested>>& b) {
+bool equalHeld(const MessageList<Nested>& a, const MessageList<Nested>& b) {
   return std::ranges::equal(a, b, [](const auto& x, const auto& y) { return equalHeld(x, y); });
 }
 
@@ -156,7 +155,7 @@ std::size_t hashHeld(const std::shared_ptr<Nested>& nested) {
 }
 
 template <class Nested>
-std::size_t hashHeld(const std::vector<std::shared_ptr<Nested>>& elements) {
+std::size_t hashHeld(const MessageList<Nested>& elements) {
   std::size_t result = elements.size();
   for (const auto& element : elements) result = result * 31 + hashHeld(element);
   return result;

@@ -1,6 +1,9 @@
 // The writing rules of every message class.
 #pragma once
 
+#include <algorithm>
+#include <tuple>
+
 #include "messages/runtime/Fields.h"
 #include "messages/runtime/PBDataWriter.h"
 #include "messages/runtime/Presence.h"
@@ -10,39 +13,133 @@ namespace qel {
 template <class Message>
 void writeMessage(const Message& message, PBDataWriter& writer);
 
+// The varint that a value is on the wire.
 template <Encoding encoding, class T>
-void writeScalar(PBDataWriter& writer, T value, std::uint32_t number) {
-  if constexpr (encoding == Encoding::uint64) PBDataWriterWriteUint64Field(writer, value, number);
-  if constexpr (encoding == Encoding::uint32) PBDataWriterWriteUint32Field(writer, value, number);
-  if constexpr (encoding == Encoding::int32) PBDataWriterWriteInt32Field(writer, value, number);
-  if constexpr (encoding == Encoding::sint32) PBDataWriterWriteSint32Field(writer, value, number);
-  if constexpr (encoding == Encoding::boolean) PBDataWriterWriteBOOLField(writer, value, number);
+std::uint64_t encodedScalar(T value) {
+  if constexpr (encoding == Encoding::int32) return static_cast<std::uint64_t>(std::int64_t{value});
+  if constexpr (encoding == Encoding::sint32) {
+    const std::uint32_t sign = value < 0 ? 0xFFFFFFFFU : 0U;
+    return static_cast<std::uint32_t>(value) << 1 ^ sign;
+  }
+  return static_cast<std::uint64_t>(value);
 }
 
-// One overload a kind of field; what is absent writes nothing.
+// Room is made once for all the scalars of a message, which then are put where a pointer stands.
+// The most bytes that a field takes with its tag and its length; 0 where there is no such bound.
+inline constexpr std::size_t kLongestTag = 2;
+
+constexpr std::size_t longestScalar(Encoding encoding) {
+  switch (encoding) {
+    case Encoding::boolean:
+      return 1;
+    case Encoding::uint32:
+    case Encoding::sint32:
+      return 5;
+    default:
+      return kLongestVarint;
+  }
+}
+
+template <class Field>
+inline constexpr std::size_t kFieldRoom = 0;
 template <class Message, class T, Encoding encoding>
-void writeField(const Message& message, PBDataWriter& writer,
-                const ScalarField<Message, T, encoding>& field) {
-  if (!Presence::get(message, field.presenceBit)) return;
-  writeScalar<encoding>(writer, message.*field.member, field.number);
+inline constexpr std::size_t kFieldRoom<ScalarField<Message, T, encoding>> =
+    kLongestTag + longestScalar(encoding);
+template <class Message>
+inline constexpr std::size_t kFieldRoom<EnumField<Message>> = kLongestTag + kLongestVarint;
+
+template <class Fields>
+inline constexpr std::size_t kRoomOf = 0;
+template <class... Field>
+inline constexpr std::size_t kRoomOf<std::tuple<Field...>> = (kFieldRoom<Field> + ...);
+template <class Fields>
+inline constexpr bool kOnlyScalars = false;
+template <class... Field>
+inline constexpr bool kOnlyScalars<std::tuple<Field...>> = ((kFieldRoom<Field> > 0) && ...);
+
+template <class Message>
+using FieldsOf = std::remove_cv_t<decltype(Message::kFields)>;
+template <class Message>
+inline constexpr std::size_t kRoom = kRoomOf<FieldsOf<Message>>;
+
+// A nested message of scalars whose length always is one byte.
+template <class Message>
+inline constexpr bool kIsSmall = kOnlyScalars<FieldsOf<Message>>&& kRoom<Message> < 0x80;
+
+inline std::uint8_t* putVarint(std::uint8_t* at, std::uint64_t value) {
+  if (value < 0x80) {
+    *at = static_cast<std::uint8_t>(value);
+    return at + 1;
+  }
+  if (value < 0x4000) {
+    at[0] = static_cast<std::uint8_t>(value | 0x80);
+    at[1] = static_cast<std::uint8_t>(value >> 7);
+    return at + 2;
+  }
+  return PBPutVarint(at, value);
+}
+
+inline std::uint8_t* putTag(std::uint8_t* at, std::uint32_t number, std::uint32_t wireType) {
+  return putVarint(at, number << 3 | wireType);
+}
+
+// One overload a kind of field; what is absent writes nothing. Each takes the place where writing
+// stands, with room for the scalars that are still to come, and gives back such a place.
+template <class Message, class T, Encoding encoding>
+[[gnu::always_inline]] inline std::uint8_t* writeField(
+    const Message& message, PBDataWriter&, std::uint8_t* at,
+    const ScalarField<Message, T, encoding>& field) {
+  if (!Presence::get(message, field.presenceBit)) return at;
+  return putVarint(putTag(at, field.number, 0), encodedScalar<encoding>(message.*field.member));
 }
 
 template <class Message>
-void writeField(const Message& message, PBDataWriter& writer, const EnumField<Message>& field) {
-  if (!Presence::get(message, field.presenceBit)) return;
-  writeScalar<Encoding::int32>(writer, message.*field.member, field.number);
+[[gnu::always_inline]] inline std::uint8_t* writeField(const Message& message, PBDataWriter&,
+                                                       std::uint8_t* at,
+                                                       const EnumField<Message>& field) {
+  if (!Presence::get(message, field.presenceBit)) return at;
+  return putVarint(putTag(at, field.number, 0),
+                   encodedScalar<Encoding::int32>(message.*field.member));
+}
+
+// Writes through the functions of the writer, with room for the message's scalars again afterwards.
+template <class Message, class Write>
+std::uint8_t* writeBetween(PBDataWriter& writer, std::uint8_t* at, Write&& write) {
+  writer.writtenTo(at);
+  write();
+  return writer.room(kRoom<Message>);
 }
 
 template <class Message>
-void writeField(const Message& message, PBDataWriter& writer, const DataField<Message>& field) {
+std::uint8_t* writeField(const Message& message, PBDataWriter& writer, std::uint8_t* at,
+                         const DataField<Message>& field) {
   const auto& data = message.*field.member;
-  if (data) PBDataWriterWriteDataField(writer, *data, field.number);
+  if (!data) return at;
+  return writeBetween<Message>(writer, at,
+                               [&] { PBDataWriterWriteDataField(writer, *data, field.number); });
 }
 
 template <class Message>
-void writeField(const Message& message, PBDataWriter& writer, const StringField<Message>& field) {
+std::uint8_t* writeField(const Message& message, PBDataWriter& writer, std::uint8_t* at,
+                         const StringField<Message>& field) {
   const auto& text = message.*field.member;
-  if (text) PBDataWriterWriteStringField(writer, *text, field.number);
+  if (!text) return at;
+  return writeBetween<Message>(writer, at,
+                               [&] { PBDataWriterWriteStringField(writer, *text, field.number); });
+}
+
+// Of a small nested message: its tag, its length and itself.
+template <class Nested>
+inline constexpr std::size_t kSmallRoom = kLongestTag + 1 + kRoom<Nested>;
+
+template <class Nested>
+[[gnu::always_inline]] inline std::uint8_t* putSmall(const Nested& nested, PBDataWriter& writer,
+                                                     std::uint8_t* at, std::uint32_t number) {
+  std::uint8_t* length = putTag(at, number, 2);
+  at = length + 1;
+  forEachField<Nested>([&](const auto& field) { at = writeField(nested, writer, at, field); });
+  *length = static_cast<std::uint8_t>(at - length - 1);
+  return at;
 }
 
 // As PBDataWriterWriteSubmessage, with the class known.
@@ -54,35 +151,55 @@ void writeNested(const Nested& nested, PBDataWriter& writer, std::uint32_t numbe
   PBDataWriterRecallMark(writer, mark);
 }
 
+// Any number of nested messages of one field.
 template <class Message, class Nested>
-void writeField(const Message& message, PBDataWriter& writer,
-                const MessageField<Message, Nested>& field) {
-  const auto& nested = message.*field.member;
-  if (nested) writeNested(*nested, writer, field.number);
-}
-
-template <class Message, class Nested>
-void writeField(const Message& message, PBDataWriter& writer,
-                const RepeatedMessageField<Message, Nested>& field) {
-  for (const auto& element : message.*field.member) {
-    writeNested(*element, writer, field.number);
+std::uint8_t* writeAll(PBDataWriter& writer, std::uint8_t* at, std::uint32_t number,
+                       std::span<const std::shared_ptr<Nested>> all) {
+  writer.writtenTo(at);
+  if constexpr (kIsSmall<Nested>) {
+    at = writer.room(all.size() * kSmallRoom<Nested> + kRoom<Message>);
+    for (const auto& nested : all) at = putSmall(*nested, writer, at, number);
+    return at;
+  } else {
+    for (const auto& nested : all) writeNested(*nested, writer, number);
+    return writer.room(kRoom<Message>);
   }
 }
 
+template <class Message, class Nested>
+std::uint8_t* writeField(const Message& message, PBDataWriter& writer, std::uint8_t* at,
+                         const MessageField<Message, Nested>& field) {
+  const auto& nested = message.*field.member;
+  if (!nested) return at;
+  return writeAll<Message, Nested>(writer, at, field.number, {&nested, 1});
+}
+
+template <class Message, class Nested>
+std::uint8_t* writeField(const Message& message, PBDataWriter& writer, std::uint8_t* at,
+                         const RepeatedMessageField<Message, Nested>& field) {
+  return writeAll<Message, Nested>(writer, at, field.number, message.*field.member);
+}
+
 template <class Message, class T, Encoding encoding>
-void writeField(const Message& message, PBDataWriter& writer,
-                const PackedField<Message, T, encoding>& field) {
+std::uint8_t* writeField(const Message& message, PBDataWriter& writer, std::uint8_t* at,
+                         const PackedField<Message, T, encoding>& field) {
   const auto& values = (message.*field.member).values;
-  if (values.empty()) return;
-  PBDataWriterMark mark;
-  PBDataWriterPlaceMark(writer, mark, field.number);
-  for (const T value : values) writeScalar<encoding>(writer, value, kPBNoTag);
-  PBDataWriterRecallMark(writer, mark);
+  if (values.empty()) return at;
+  return writeBetween<Message>(writer, at, [&] {
+    PBDataWriterMark mark;
+    PBDataWriterPlaceMark(writer, mark, field.number);
+    for (const T value : values) {
+      writer.writtenTo(putVarint(writer.room(kLongestVarint), encodedScalar<encoding>(value)));
+    }
+    PBDataWriterRecallMark(writer, mark);
+  });
 }
 
 template <class Message>
 void writeMessage(const Message& message, PBDataWriter& writer) {
-  forEachField<Message>([&](const auto& field) { writeField(message, writer, field); });
+  std::uint8_t* at = writer.room(kRoom<Message>);
+  forEachField<Message>([&](const auto& field) { at = writeField(message, writer, at, field); });
+  writer.writtenTo(at);
 }
 
 }  // namespace qel

@@ -7,7 +7,7 @@
 #include <string_view>
 
 #include "base/Bytes.h"
-#include "base/Dictionary.h"
+#include "base/Value.h"
 #include "messages/runtime/PBDataReader.h"
 #include "messages/runtime/PBDataWriter.h"
 

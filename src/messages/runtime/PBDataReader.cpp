@@ -1,28 +1,44 @@
 #include "messages/runtime/PBDataReader.h"
 
+#include <type_traits>
 #include <vector>
 
 #include "messages/runtime/Cursor.h"
 
 namespace qel {
 
-Varint readLongVarint(const std::uint8_t* at, const std::uint8_t* end) {
-  constexpr unsigned kLongest = 10;
+namespace {
+
+constexpr unsigned kLongest = 10;
+
+// Up to `count` bytes, all of which are there; a length that is known is unrolled.
+template <class Count>
+[[gnu::always_inline]] inline Varint readVarintWithin(const std::uint8_t* at, Count count,
+                                                      Varint unended) {
   std::uint64_t value = 0;
-  for (unsigned i = 0; i < kLongest; ++i) {
-    if (at >= end) return {0, nullptr};
-    const std::uint8_t byte = *at++;
-    value |= static_cast<std::uint64_t>(byte & 0x7F) << (7 * i);
-    if (byte < 0x80) return {value, at};
+  for (unsigned i = 0; i < count; ++i) {
+    const std::uint64_t byte = at[i];
+    value |= (byte & 0x7F) << 7 * i;
+    if (byte < 0x80) return {value, at + i + 1};
   }
-  return {0, at};
+  return unended;
+}
+
+}  // namespace
+
+Varint readLongVarint(const std::uint8_t* at, const std::uint8_t* end) {
+  if (end - at >= std::ptrdiff_t{kLongest}) {
+    return readVarintWithin(at, std::integral_constant<unsigned, kLongest>(), {0, at + kLongest});
+  }
+  return readVarintWithin(at, static_cast<unsigned>(end - at), {0, kDamaged});
 }
 
 std::uint64_t PBReaderReadVarint(PBDataReader& reader) {
   const std::uint8_t* end = reader._bytes + reader._length;
   const auto [value, next] = readLongVarint(reader._bytes + reader._pos, end);
-  reader._error = reader._error || !next;
-  reader._pos = next ? static_cast<std::uint64_t>(next - reader._bytes) : reader._length;
+  const bool damaged = next == kDamaged;
+  reader._error = reader._error || damaged;
+  reader._pos = damaged ? reader._length : static_cast<std::uint64_t>(next - reader._bytes);
   return value;
 }
 

@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <array>
 #include <cstring>
+#include <utility>
 
 #include "messages/runtime/PBCodable.h"
 
@@ -15,13 +16,21 @@ constexpr std::uint32_t kDelimited = 2;
 
 void PBDataWriter::grow(std::size_t count) {
   constexpr std::size_t kSmallest = 128;
-  _output.resize(std::max({kSmallest, 2 * _output.size(), _size + count}));
+  const std::size_t used = size();
+  _output.resize(std::max({kSmallest, 2 * _output.size(), used + count}));
+  _at = _output.data() + used;
+  _end = _output.data() + _output.size();
+}
+
+Bytes PBDataWriter::takeData() {
+  _output.resize(size());
+  _at = _end = nullptr;
+  return std::exchange(_output, {});
 }
 
 void PBDataWriterWriteDataField(PBDataWriter& writer, ByteView value, std::uint32_t field) {
   PBDataWriterWriteVarint(writer, value.size(), field, kDelimited);
-  std::ranges::copy(value, writer.room(value.size()));
-  writer.written(value.size());
+  writer.writtenTo(std::ranges::copy(value, writer.room(value.size())).out);
 }
 
 void PBDataWriterWriteStringField(PBDataWriter& writer, std::string_view value,
@@ -47,11 +56,12 @@ void PBDataWriterPlaceMark(PBDataWriter& writer, PBDataWriterMark& mark, std::ui
 void PBDataWriterRecallMark(PBDataWriter& writer, const PBDataWriterMark& mark) {
   const std::size_t size = writer.size() - mark.start;
   std::array<std::uint8_t, kLongestVarint> length;
-  const std::size_t lengthSize = PBPutVarint(length.data(), size);
+  const auto lengthSize =
+      static_cast<std::size_t>(PBPutVarint(length.data(), size) - length.data());
   std::uint8_t* content = writer.room(lengthSize) - size;
   if (lengthSize > 1) std::memmove(content + lengthSize - 1, content, size);
   std::copy_n(length.data(), lengthSize, content - 1);
-  writer.written(lengthSize - 1);
+  writer.writtenTo(content + size + lengthSize - 1);
 }
 
 }  // namespace qel

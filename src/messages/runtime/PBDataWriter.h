@@ -15,30 +15,30 @@ class PBCodable;
 // again allocates nothing.
 class PBDataWriter {
  public:
-  const Bytes& data() const {
-    _output.resize(_size);
-    return _output;
-  }
-  Bytes takeData() {
-    _output.resize(std::exchange(_size, 0));
-    return std::move(_output);
-  }
-  void clear() { _size = 0; }
+  PBDataWriter() = default;
+  PBDataWriter(const PBDataWriter&) = delete;
+  PBDataWriter& operator=(const PBDataWriter&) = delete;
 
-  std::size_t size() const { return _size; }
-  // The next `count` bytes of the buffer, for writing; written says how many of them are filled.
+  // What is written. Valid until more is.
+  ByteView data() const { return {_output.data(), size()}; }
+  Bytes takeData();
+  void clear() { _at = _output.data(); }
+
+  std::size_t size() const { return static_cast<std::size_t>(_at - _output.data()); }
+  // The next `count` bytes of the buffer, for writing; writtenTo says where what is filled ends.
   std::uint8_t* room(std::size_t count) {
-    if (_output.size() - _size < count) [[unlikely]]
+    if (static_cast<std::size_t>(_end - _at) < count) [[unlikely]]
       grow(count);
-    return _output.data() + _size;
+    return _at;
   }
-  void written(std::size_t count) { _size += count; }
+  void writtenTo(std::uint8_t* end) { _at = end; }
 
  private:
   void grow(std::size_t count);
 
-  mutable Bytes _output;  // at least _size long; what is behind is room
-  std::size_t _size = 0;
+  Bytes _output;
+  std::uint8_t* _at = nullptr;   // in _output, behind what is written
+  std::uint8_t* _end = nullptr;  // of _output
 };
 
 // What PBDataWriterPlaceMark remembers: where the marked content starts.
@@ -52,24 +52,22 @@ inline constexpr std::uint32_t kPBNoTag = 0xFFFFFFFF;
 // The longest varint has ten bytes.
 inline constexpr std::size_t kLongestVarint = 10;
 
-// Fills in the varint at this place; its length.
-inline std::size_t PBPutVarint(std::uint8_t* at, std::uint64_t value) {
-  std::size_t length = 0;
+// Fills in the varint at this place; the place behind it.
+inline std::uint8_t* PBPutVarint(std::uint8_t* at, std::uint64_t value) {
   while (value >= 0x80) {
-    at[length++] = static_cast<std::uint8_t>(value | 0x80);
+    *at++ = static_cast<std::uint8_t>(value | 0x80);
     value >>= 7;
   }
-  at[length++] = static_cast<std::uint8_t>(value);
-  return length;
+  *at++ = static_cast<std::uint8_t>(value);
+  return at;
 }
 
 // A field that is a varint, or the tag and length of one that is delimited.
 inline void PBDataWriterWriteVarint(PBDataWriter& writer, std::uint64_t value, std::uint32_t field,
                                     std::uint32_t wireType) {
   std::uint8_t* at = writer.room(2 * kLongestVarint);
-  std::size_t length = 0;
-  if (field != kPBNoTag) length = PBPutVarint(at, std::uint64_t{field} << 3 | wireType);
-  writer.written(length + PBPutVarint(at + length, value));
+  if (field != kPBNoTag) at = PBPutVarint(at, std::uint64_t{field} << 3 | wireType);
+  writer.writtenTo(PBPutVarint(at, value));
 }
 
 // Each appends one field. Integers are varints; a negative int32 takes ten bytes.

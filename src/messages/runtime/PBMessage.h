@@ -5,6 +5,7 @@
 
 #include <array>
 #include <memory>
+#include <optional>
 
 #include "messages/runtime/Fields.h"
 #include "messages/runtime/PBCodable.h"
@@ -18,6 +19,8 @@ class PBMessage : public PBCodable {
   // A message from its encoded form, or nothing when the bytes are damaged. No bytes at all are a
   // message without fields.
   static std::shared_ptr<Message> initWithData(ByteView bytes);
+  // The dictionary form of that message, or nothing, by a shorter way.
+  static std::optional<Dictionary> dictionaryWithData(ByteView bytes);
 
   std::string_view className() const final { return Message::kClassName; }
   Dictionary dictionaryRepresentation() const final;

@@ -4,7 +4,7 @@
 #include <string>
 
 #include "base/FatalError.h"
-#include "messages/runtime/MessageDictionary.h"
+#include "messages/runtime/DictionaryReader.h"
 #include "messages/runtime/MessageReader.h"
 #include "messages/runtime/MessageRelations.h"
 #include "messages/runtime/MessageWriter.h"
@@ -27,11 +27,21 @@ auto& sameClass(Codable& message, std::string_view operation) {
 
 template <class Message>
 std::shared_ptr<Message> PBMessage<Message>::initWithData(ByteView bytes) {
-  auto message = std::make_shared<Message>();
+  auto message = makeMessage<Message>();
   if (bytes.empty()) return message;
   const Cursor whole{bytes.data(), bytes.data() + bytes.size()};
   if (readMessage(*message, whole).isDamaged()) return nullptr;
   return message;
+}
+
+template <class Message>
+std::optional<Dictionary> PBMessage<Message>::dictionaryWithData(ByteView bytes) {
+  std::optional<Dictionary> dictionary(std::in_place);
+  const Cursor whole{bytes.data(), bytes.data() + bytes.size()};
+  if (!readDictionary<Message>(*dictionary, whole).isDamaged()) return dictionary;
+  const auto message = initWithData(bytes);
+  if (!message) return std::nullopt;
+  return messageDictionary(*message);
 }
 
 template <class Message>
@@ -61,7 +71,7 @@ void PBMessage<Message>::copyTo(PBCodable& destination) const {
 
 template <class Message>
 std::shared_ptr<Message> PBMessage<Message>::deepCopy() const {
-  auto copy = std::make_shared<Message>();
+  auto copy = makeMessage<Message>();
   copyMessage(*copy, self());
   detachMessage(*copy);
   return copy;

@@ -8,12 +8,12 @@ namespace {
 
 template <class T>
 void clear(PBRepeated<T>& array) {
-  std::vector<T>().swap(array.values);
+  array.values = {};
 }
 
 template <class T>
 void set(PBRepeated<T>& array, const T* list, std::size_t count) {
-  array.values = std::vector<T>(list, list + count);
+  array.values = Sequence<T>(list, list + count);
 }
 
 template <class T>
@@ -25,7 +25,7 @@ std::size_t hash(const PBRepeated<T>& array) {
 
 template <class T>
 List numbers(const PBRepeated<T>& array) {
-  return {array.values.begin(), array.values.end()};
+  return List(array.values.begin(), array.values.end());
 }
 
 }  // namespace

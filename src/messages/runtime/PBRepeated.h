@@ -3,15 +3,15 @@
 
 #include <cstdint>
 #include <span>
-#include <vector>
 
+#include "base/Sequence.h"
 #include "base/Value.h"
 
 namespace qel {
 
 template <class T>
 struct PBRepeated {
-  std::vector<T> values;
+  Sequence<T> values;
 
   const T* list() const { return values.data(); }
   std::size_t count() const { return values.size(); }

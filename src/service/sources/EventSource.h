@@ -5,7 +5,7 @@
 #include <memory>
 #include <string>
 
-#include "base/Dictionary.h"
+#include "base/Value.h"
 #include "service/CommandCodes.h"
 #include "service/ServiceEvent.h"
 #include "service/sources/ListenerSignal.h"

@@ -5,7 +5,7 @@
 #include <optional>
 #include <string>
 
-#include "base/Dictionary.h"
+#include "base/Value.h"
 
 namespace qel {
 

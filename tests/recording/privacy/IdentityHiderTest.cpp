@@ -39,7 +39,7 @@ void fillField(Message& message, const MessageField<Message, Nested>& field) {
 }
 template <class Message, class Nested>
 void fillField(Message& message, const RepeatedMessageField<Message, Nested>& field) {
-  (message.*field.member).assign(2, filled<Nested>());
+  message.*field.member = qel::MessageList<Nested>(2, filled<Nested>());
 }
 template <class Message, class Field>
 void fillField(Message&, const Field&) {}

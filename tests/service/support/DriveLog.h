@@ -6,7 +6,7 @@
 #include <string_view>
 #include <vector>
 
-#include "base/Dictionary.h"
+#include "base/Value.h"
 #include "service/ServiceEvent.h"
 
 namespace qel::testing {

@@ -8,7 +8,7 @@
 #include <string>
 #include <vector>
 
-#include "base/Dictionary.h"
+#include "base/Value.h"
 #include "tesk/Constants.h"
 #include "tesk/Transport.h"
 

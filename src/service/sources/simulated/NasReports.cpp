@@ -168,7 +168,7 @@ std::optional<Bytes> emmContext(const PhoneView& view, std::uint64_t timeMs) {
 }
 
 std::optional<Bytes> bearers(const PhoneView& view, std::uint64_t timeMs) {
-  std::vector<std::shared_ptr<BearerContext>> active = {internet(view)};
+  MessageList<BearerContext> active = {internet(view)};
   if (view.on(Technology::lte)) active.push_back(voice());
   if (view.on(Technology::umts) && view.phone.connection().connected()) {
     active.push_back(messaging());
