@@ -34,6 +34,8 @@
 namespace qel::benchmarks {
 namespace {
 
+using BusBytes = std::vector<std::uint8_t>;  // as the bus library knows them
+
 using namespace std::chrono_literals;
 
 constexpr int kRuns = 5;
@@ -140,16 +142,19 @@ constexpr const char* kSignalPath = "/bench/Events";
 void emitSignals(Shared& shared, const std::string& address, std::vector<RecordedEvent> events) {
   const auto connection = tesk::bus::connectTo({address});
   const auto object = sdbus::createObject(*connection, kSignalPath);
-  object->registerSignal("Metric").onInterface(kSignalName).withParameters<std::int64_t, Bytes>();
+  object->registerSignal("Metric")
+      .onInterface(kSignalName)
+      .withParameters<std::int64_t, BusBytes>();
   object->finishRegistration();
   connection->requestName(kSignalName);
   connection->enterEventLoopAsync();
   shared.ready = true;
   sendWanted(shared, events, [&object](const Dictionary& entries) {
+    const Bytes& payload = *entries.find(kRecordedPayloadKey)->asBytes();
     object->emitSignal("Metric")
         .onInterface(kSignalName)
         .withArguments(*entries.find(kSentKey)->asInt64(),
-                       *entries.find(kRecordedPayloadKey)->asBytes());
+                       BusBytes(payload.begin(), payload.end()));
   });
 }
 
@@ -228,7 +233,7 @@ Result overSignals(Shared& shared, const std::string& address) {
   std::vector<double> delays;
   proxy->uponSignal("Metric")
       .onInterface(kSignalName)
-      .call([&](const std::int64_t& sent, const Bytes&) {
+      .call([&](const std::int64_t& sent, const BusBytes&) {
         delays.push_back(msSince(sent));
         ++shared.stored;
       });

@@ -8,9 +8,11 @@
 #include <string_view>
 #include <vector>
 
+#include "base/SmallBlocks.h"
+
 namespace qel {
 
-using Bytes = std::vector<std::uint8_t>;
+using Bytes = std::vector<std::uint8_t, SmallBlockAllocator<std::uint8_t>>;
 using ByteView = std::span<const std::uint8_t>;
 
 // Lower-case hexadecimal, two digits a byte, no separators.

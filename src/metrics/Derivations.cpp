@@ -38,6 +38,13 @@ bool allDictionaries(const List& list) {
       list, [](const Value& value) { return value.kind() == Value::Kind::dictionary; });
 }
 
+Text listText(const Value& list) {
+  static std::string text;  // kept for its memory
+  text.clear();
+  appendJson(text, list);
+  return text;
+}
+
 // `value` is the one under the rewrite's key.
 void rewriteValue(const Rewrite& rewrite, Value& value, Dictionary& record,
                   const BandwidthTable& bandwidths) {
@@ -58,10 +65,10 @@ void rewriteValue(const Rewrite& rewrite, Value& value, Dictionary& record,
       rewriteBandwidth(rewrite, value, record, bandwidths);
       break;
     case Rewrite::Kind::listText:
-      if (value.asList()) value = jsonText(value);
+      if (value.asList()) value = listText(value);
       break;
     case Rewrite::Kind::integerListText:
-      if (const List* list = value.asList(); list && allIntegers(*list)) value = jsonText(value);
+      if (const List* list = value.asList(); list && allIntegers(*list)) value = listText(value);
       break;
   }
 }

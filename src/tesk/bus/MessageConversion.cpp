@@ -8,13 +8,16 @@ namespace tesk::bus {
 namespace {
 
 using qel::Value;
+using BusBytes = std::vector<std::uint8_t>;  // as the bus library knows them
 
 std::optional<sdbus::Variant> variantOf(const Value& value) {
   if (const auto boolean = value.asBoolean()) return sdbus::Variant(*boolean);
   if (value.kind() == Value::Kind::floating) return std::nullopt;
   if (const auto integer = value.asInt64()) return sdbus::Variant(*integer);
   if (const auto text = value.asText()) return sdbus::Variant(std::string(*text));
-  if (const qel::Bytes* data = value.asBytes()) return sdbus::Variant(*data);
+  if (const qel::Bytes* data = value.asBytes()) {
+    return sdbus::Variant(BusBytes(data->begin(), data->end()));
+  }
   return std::nullopt;
 }
 
@@ -22,6 +25,14 @@ template <class Held>
 bool take(const sdbus::Variant& variant, Value& value) {
   if (!variant.containsValueOfType<Held>()) return false;
   value = Value(variant.get<Held>());
+  return true;
+}
+
+template <>
+bool take<BusBytes>(const sdbus::Variant& variant, Value& value) {
+  if (!variant.containsValueOfType<BusBytes>()) return false;
+  const BusBytes bytes = variant.get<BusBytes>();
+  value = Value(qel::Bytes(bytes.begin(), bytes.end()));
   return true;
 }
 
@@ -48,7 +59,7 @@ Message fromVariants(const VariantMap& variants) {
   qel::Dictionary entries;
   for (const auto& [key, variant] : variants) {
     entries.set(key, firstOf<std::int64_t, std::uint64_t, std::int32_t, std::uint32_t, std::int16_t,
-                             std::uint16_t, std::uint8_t, bool, std::string, qel::Bytes>(variant));
+                             std::uint16_t, std::uint8_t, bool, std::string, BusBytes>(variant));
   }
   return Message(std::move(entries));
 }
