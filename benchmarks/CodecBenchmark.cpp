@@ -1,29 +1,33 @@
-// Time and allocations of each work, for one payload.
+// Time and allocations of each work, for one payload. Takes the options of Google Benchmark.
 
 #include <benchmark/benchmark.h>
 
 #include <string>
+#include <vector>
 
 #include "AllocationCounter.h"
+#include "Report.h"
 #include "Works.h"
 #include "base/LogSink.h"
+#include "peers/PeerWorks.h"
 
 namespace qel::bench {
 namespace {
 
 void measure(benchmark::State& state, const Work& work) {
-  const auto step = work.prepare();
-  for (std::size_t i = 0; i < kPayloads; ++i) step(i);
+  const auto step = work.prepare(*work.payloads);
+  const std::size_t count = work.payloads->size();
+  for (std::size_t i = 0; i < count; ++i) step(i);
   std::uint64_t allocated = 0;
   for (auto _ : state) {
     const std::uint64_t before = allocations();
-    for (std::size_t i = 0; i < kPayloads; ++i) step(i);
+    for (std::size_t i = 0; i < count; ++i) step(i);
     allocated += allocations() - before;
   }
-  const double total = static_cast<double>(state.iterations()) * double{kPayloads};
-  state.counters["allocations"] = static_cast<double>(allocated) / total;
-  state.counters["each"] =
-      benchmark::Counter(total, benchmark::Counter::kIsRate | benchmark::Counter::kInvert);
+  const auto payloads = static_cast<double>(count);
+  state.counters["payloads"] = payloads;
+  state.counters["allocations"] =
+      static_cast<double>(allocated) / (static_cast<double>(state.iterations()) * payloads);
 }
 
 }  // namespace
@@ -31,10 +35,21 @@ void measure(benchmark::State& state, const Work& work) {
 
 int main(int argc, char** argv) {
   qel::setSystemLog(nullptr);
+  qel::bench::checkPeers();
+  std::vector<std::string> names;
   for (const auto& work : qel::bench::works()) {
-    const std::string name = std::string(work.group) + " (" + std::string(work.who) + ")";
-    benchmark::RegisterBenchmark(name.c_str(), qel::bench::measure, work);
+    names.push_back(work.group + '|' + std::string(work.who));
+    benchmark::RegisterBenchmark(names.back().c_str(), qel::bench::measure, work);
   }
-  benchmark::Initialize(&argc, argv);
-  benchmark::RunSpecifiedBenchmarks();
+  // Short repetitions by turns, so that what else the machine does falls on all alike.
+  std::string repetitions = "--benchmark_repetitions=7";
+  std::string time = "--benchmark_min_time=0.05";
+  std::string turns = "--benchmark_enable_random_interleaving=true";
+  std::vector<char*> arguments{argv[0], repetitions.data(), time.data(), turns.data()};
+  arguments.insert(arguments.end(), argv + 1, argv + argc);
+  auto count = static_cast<int>(arguments.size());
+  benchmark::Initialize(&count, arguments.data());
+  if (benchmark::ReportUnrecognizedArguments(count, arguments.data())) return 1;
+  qel::bench::Report report(names);
+  benchmark::RunSpecifiedBenchmarks(&report);
 }

@@ -188,11 +188,11 @@ std::vector<Payload> phoneMix(std::size_t count) {
   Dice dice;
   std::vector<Payload> payloads;
   payloads.reserve(count);
-  std::uint64_t time = 1500000000000;
+  std::uint64_t time = kMixStartMs;
   while (payloads.size() < count) {
     const Kind& kind = draw(dice);
     payloads.push_back({kind.metric, kind.make(dice, time)});
-    time += 40;
+    time += kMixStepMs;
   }
   return payloads;
 }

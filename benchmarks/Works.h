@@ -1,21 +1,28 @@
-// The works that are measured: each is done once for every payload of the phone's mix.
+// The works that are measured: each is done once for every one of its payloads.
 #pragma once
 
 #include <functional>
-#include <span>
+#include <string>
 #include <string_view>
+#include <vector>
+
+#include "PhoneMix.h"
 
 namespace qel::bench {
 
-inline constexpr std::size_t kPayloads = 2000;
+// Does a work for one payload, by its position.
+using Step = std::function<void(std::size_t payload)>;
 
 struct Work {
-  std::string_view group;  // what is done
-  std::string_view who;    // by whom: "ours", or a peer
-  // Prepares what the work starts from; what it returns does the work for one payload.
-  std::function<void(std::size_t payload)> (*prepare)();
+  std::string group;     // what is done
+  std::string_view who;  // by whom: "ours", or a peer
+  // Prepares what the work starts from. The payloads must outlive what it returns.
+  Step (*prepare)(const std::vector<Payload>& payloads);
+  const std::vector<Payload>* payloads;  // for as long as the program runs
 };
 
-std::span<const Work> works();
+// Those over the phone's mix, then decoding class by class. The first of each group is what the
+// others are compared with.
+std::vector<Work> works();
 
 }  // namespace qel::bench

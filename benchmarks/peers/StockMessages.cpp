@@ -1,4 +1,4 @@
-#include "StockMessages.h"
+#include "peers/StockMessages.h"
 
 #include <google/protobuf/message.h>
 

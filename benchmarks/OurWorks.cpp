@@ -1,0 +1,110 @@
+#include "OurWorks.h"
+
+#include <benchmark/benchmark.h>
+
+#include <memory>
+#include <optional>
+#include <string>
+
+#include "MemorySink.h"
+#include "base/Rendering.h"
+#include "base/TimeZone.h"
+#include "messages/catalogue/KBBMetricUtility.h"
+#include "messages/catalogue/MetricMessages.h"
+#include "metrics/MetricValidator.h"
+
+namespace qel::bench {
+namespace {
+
+template <class Make>
+auto forEach(const std::vector<Payload>& payloads, Make make) {
+  std::vector<decltype(make(payloads.front()))> made;
+  for (const Payload& payload : payloads) made.push_back(make(payload));
+  return made;
+}
+
+std::vector<std::shared_ptr<PBCodable>> messagesOf(const std::vector<Payload>& payloads) {
+  return forEach(payloads, [](const Payload& payload) {
+    return findMetricMessage(payload.metric)->decode(payload.bytes);
+  });
+}
+
+std::size_t visit(const Dictionary& dictionary);
+
+std::size_t visit(const Value& value) {
+  auto kinds = static_cast<std::size_t>(value.kind());
+  if (value.kind() < Value::Kind::list) return kinds;
+  if (const auto* nested = value.asDictionary()) return kinds + visit(*nested);
+  for (const Value& element : *value.asList()) kinds += visit(element);
+  return kinds;
+}
+
+// Every key and value of the dictionary and of those within it.
+std::size_t visit(const Dictionary& dictionary) {
+  std::size_t seen = 0;
+  for (const auto& [key, value] : dictionary) seen += key.view().size() + visit(value);
+  return seen;
+}
+
+}  // namespace
+
+Step decodeOurs(const std::vector<Payload>& payloads) {
+  const auto decoder = [](const Payload& payload) {
+    return findMetricMessage(payload.metric)->decode;
+  };
+  return [&payloads, decode = forEach(payloads, decoder)](std::size_t i) {
+    benchmark::DoNotOptimize(decode[i](payloads[i].bytes));
+  };
+}
+
+Step dictionaryOurs(const std::vector<Payload>& payloads) {
+  const auto describer = [](const Payload& payload) {
+    return findMetricMessage(payload.metric)->describe;
+  };
+  return [&payloads, describe = forEach(payloads, describer)](std::size_t i) {
+    benchmark::DoNotOptimize(visit(*describe[i](payloads[i].bytes)));
+  };
+}
+
+Step encodeOurs(const std::vector<Payload>& payloads) {
+  return [kept = messagesOf(payloads), writer = std::make_shared<PBDataWriter>()](std::size_t i) {
+    writer->clear();
+    kept[i]->writeTo(*writer);
+    benchmark::DoNotOptimize(writer->data().data());
+  };
+}
+
+Step textOurs(const std::vector<Payload>& payloads) {
+  std::vector<Dictionary> dictionaries;
+  for (const auto& message : messagesOf(payloads)) {
+    dictionaries.push_back(message->dictionaryRepresentation());
+  }
+  return [dictionaries, line = std::string()](std::size_t i) mutable {
+    line.clear();
+    appendJson(line, dictionaries[i]);
+    benchmark::DoNotOptimize(line.data());
+  };
+}
+
+Step timeOurs(const std::vector<Payload>&) {
+  return [dates = DateTexts(systemTimeZone())](std::size_t i) mutable {
+    benchmark::DoNotOptimize(dates.at(static_cast<double>(kMixStartMs + i * kMixStepMs)).data());
+  };
+}
+
+Dictionary eventOf(const Payload& payload) {
+  return {{"kKeyMetricID", payload.metric + kMetricEventBase},
+          {"kKeyProfileID", 0},
+          {"kKeyPayload", payload.bytes}};
+}
+
+Step eventOurs(const std::vector<Payload>& payloads) {
+  std::vector<std::optional<Dictionary>> events;
+  for (const Payload& payload : payloads) events.emplace_back(eventOf(payload));
+  setStandardOutput(std::make_shared<MemorySink>());
+  return [events, validator = MetricValidator::create(nullptr)](std::size_t i) {
+    validator->metricsDidUpdate(events[i]);
+  };
+}
+
+}  // namespace qel::bench

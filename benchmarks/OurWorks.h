@@ -1,0 +1,19 @@
+// What is measured of our own code.
+#pragma once
+
+#include "Works.h"
+#include "base/Value.h"
+
+namespace qel::bench {
+
+Step decodeOurs(const std::vector<Payload>& payloads);
+Step dictionaryOurs(const std::vector<Payload>& payloads);
+Step encodeOurs(const std::vector<Payload>& payloads);
+Step textOurs(const std::vector<Payload>& payloads);
+Step timeOurs(const std::vector<Payload>& payloads);
+Step eventOurs(const std::vector<Payload>& payloads);
+
+// A metric event as the service sends it.
+Dictionary eventOf(const Payload& payload);
+
+}  // namespace qel::bench

@@ -1,0 +1,28 @@
+// The message classes of the mix, by peers that know nothing like a common base class.
+#pragma once
+
+#include <cstdint>
+#include <memory>
+#include <span>
+#include <string>
+#include <string_view>
+
+#include "base/Bytes.h"
+
+namespace qel::bench {
+
+struct PeerMessage {
+  std::uint32_t metric;
+  bool (*decode)(ByteView payload);  // into a fresh object, which then goes; false when damaged
+  std::shared_ptr<const void> (*keep)(ByteView payload);
+  // Into `memory`, which is used again; valid as long as that.
+  std::string_view (*encode)(const void* kept, std::string& memory);
+};
+
+std::span<const PeerMessage> protozeroMessages();
+std::span<const PeerMessage> nanopbMessages();
+
+// Ends the program when there is none of the metric.
+const PeerMessage& findPeerMessage(std::span<const PeerMessage> messages, std::uint32_t metric);
+
+}  // namespace qel::bench

@@ -1,0 +1,138 @@
+#include "peers/PeerWorks.h"
+
+#include <benchmark/benchmark.h>
+#include <google/protobuf/message.h>
+
+#include <array>
+#include <cstdlib>
+#include <ctime>
+#include <memory>
+
+#include "peers/PeerMessages.h"
+#include "peers/PlainEntries.h"
+#include "peers/StockMessages.h"
+
+namespace qel::bench {
+namespace {
+
+using google::protobuf::Message;
+
+template <class Make>
+auto forEach(const std::vector<Payload>& payloads, Make make) {
+  std::vector<decltype(make(payloads.front()))> made;
+  for (const Payload& payload : payloads) made.push_back(make(payload));
+  return made;
+}
+
+auto decodersOf(const std::vector<Payload>& payloads, std::span<const PeerMessage> messages) {
+  return forEach(payloads, [&](const Payload& payload) {
+    return findPeerMessage(messages, payload.metric).decode;
+  });
+}
+
+Step decodeBy(std::span<const PeerMessage> messages, const std::vector<Payload>& payloads) {
+  return [&payloads, decode = decodersOf(payloads, messages)](std::size_t i) {
+    if (!decode[i](payloads[i].bytes)) std::abort();
+  };
+}
+
+struct Kept {
+  std::shared_ptr<const void> message;
+  decltype(PeerMessage::encode) encode;
+};
+
+Step encodeBy(std::span<const PeerMessage> messages, const std::vector<Payload>& payloads) {
+  const auto keep = [&](const Payload& payload) {
+    const PeerMessage& message = findPeerMessage(messages, payload.metric);
+    return Kept{message.keep(payload.bytes), message.encode};
+  };
+  return [kept = forEach(payloads, keep), memory = std::string()](std::size_t i) mutable {
+    benchmark::DoNotOptimize(kept[i].encode(kept[i].message.get(), memory).data());
+  };
+}
+
+// One reader a metric, found before anything is measured.
+Step visitBy(EntriesReader (*readerOf)(std::uint32_t metric),
+             const std::vector<Payload>& payloads) {
+  const auto reader = [&](const Payload& payload) { return readerOf(payload.metric); };
+  return [&payloads, read = forEach(payloads, reader)](std::size_t i) {
+    benchmark::DoNotOptimize(visit(read[i](payloads[i].bytes)));
+  };
+}
+
+}  // namespace
+
+const PeerMessage& findPeerMessage(std::span<const PeerMessage> messages, std::uint32_t metric) {
+  for (const PeerMessage& message : messages) {
+    if (message.metric == metric) return message;
+  }
+  std::abort();
+}
+
+Step decodeStock(const std::vector<Payload>& payloads) {
+  const auto prototype = [](const Payload& payload) { return stockPrototype(payload.metric); };
+  return [&payloads, prototypes = forEach(payloads, prototype)](std::size_t i) {
+    const Bytes& bytes = payloads[i].bytes;
+    const std::unique_ptr<Message> message(prototypes[i]->New());
+    message->ParseFromArray(bytes.data(), static_cast<int>(bytes.size()));
+    benchmark::DoNotOptimize(message.get());
+  };
+}
+
+Step encodeStock(const std::vector<Payload>& payloads) {
+  const auto parse = [](const Payload& payload) {
+    std::shared_ptr<Message> message(stockPrototype(payload.metric)->New());
+    message->ParseFromArray(payload.bytes.data(), static_cast<int>(payload.bytes.size()));
+    return message;
+  };
+  return [kept = forEach(payloads, parse), out = std::string()](std::size_t i) mutable {
+    kept[i]->SerializeToString(&out);
+    benchmark::DoNotOptimize(out.data());
+  };
+}
+
+Step entriesStock(const std::vector<Payload>& payloads) { return visitBy(stockEntries, payloads); }
+
+Step decodeProtozero(const std::vector<Payload>& payloads) {
+  return decodeBy(protozeroMessages(), payloads);
+}
+
+Step encodeProtozero(const std::vector<Payload>& payloads) {
+  return encodeBy(protozeroMessages(), payloads);
+}
+
+Step entriesProtozero(const std::vector<Payload>& payloads) {
+  return visitBy(protozeroEntries, payloads);
+}
+
+Step decodeNanopb(const std::vector<Payload>& payloads) {
+  return decodeBy(nanopbMessages(), payloads);
+}
+
+Step encodeNanopb(const std::vector<Payload>& payloads) {
+  return encodeBy(nanopbMessages(), payloads);
+}
+
+Step textFmt(const std::vector<Payload>& payloads) {
+  const auto entries = [](const Payload& payload) {
+    return protozeroEntries(payload.metric)(payload.bytes);
+  };
+  return [all = forEach(payloads, entries), line = std::string()](std::size_t i) mutable {
+    line.clear();
+    appendFmt(line, all[i]);
+    benchmark::DoNotOptimize(line.data());
+  };
+}
+
+Step timeStrftime(const std::vector<Payload>&) {
+  return [](std::size_t i) {
+    const auto seconds = static_cast<std::time_t>((kMixStartMs + i * kMixStepMs) / 1000);
+    std::tm local{};
+    ::localtime_r(&seconds, &local);
+    std::array<char, 64> text;
+    benchmark::DoNotOptimize(
+        std::strftime(text.data(), text.size(), "%Y-%m-%d %H:%M:%S %Z", &local));
+  };
+}
+
+}  // namespace qel::bench
