@@ -31,7 +31,8 @@ const std::vector<std::vector<Payload>>& mixByMetric() {
 void addDecoding(std::vector<Work>& works, const std::string& group,
                  const std::vector<Payload>& payloads) {
   works.push_back({group, "libprotobuf", decodeStock, &payloads});
-  works.push_back({group, "protozero", decodeProtozero, &payloads});
+  works.push_back({group, "protozero, stack", decodeProtozero, &payloads});
+  works.push_back({group, "protozero, shared", keepProtozero, &payloads});
   works.push_back({group, "nanopb", decodeNanopb, &payloads});
   works.push_back({group, "ours", decodeOurs, &payloads});
 }
@@ -56,7 +57,7 @@ std::vector<Work> works() {
   add("text of a dictionary", "ours", textOurs);
   add("time text, warm", "strftime", timeStrftime);
   add("time text, warm", "ours", timeOurs);
-  add("one metric event", "libprotobuf", eventStock);
+  add("one metric event", "libprotobuf, std::map, streams", eventStock);
   add("one metric event", "ours", eventOurs);
 
   for (const auto& payloads : mixByMetric()) {

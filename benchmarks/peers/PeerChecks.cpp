@@ -86,6 +86,11 @@ std::string fmtText(EntriesReader (*readerOf)(std::uint32_t), const Payload& pay
   return text;
 }
 
+void checkOurs(const Payload& payload) {
+  const auto message = findMetricMessage(payload.metric)->decode(payload.bytes);
+  require(message && message->data() == payload.bytes, "ours", payload.metric);
+}
+
 // What is read and written again are the same bytes.
 void checkCodec(const Payload& payload) {
   const auto check = [&](std::span<const PeerMessage> messages, std::string_view who) {
@@ -130,6 +135,7 @@ void checkEvent(const Payload& payload) {
 
 void checkPeers() {
   for (const Payload& payload : phoneMix(500)) {
+    checkOurs(payload);
     checkCodec(payload);
     checkEntries(payload);
     checkEvent(payload);

@@ -97,6 +97,15 @@ Step decodeProtozero(const std::vector<Payload>& payloads) {
   return decodeBy(protozeroMessages(), payloads);
 }
 
+Step keepProtozero(const std::vector<Payload>& payloads) {
+  const auto keeper = [](const Payload& payload) {
+    return findPeerMessage(protozeroMessages(), payload.metric).keep;
+  };
+  return [&payloads, keep = forEach(payloads, keeper)](std::size_t i) {
+    benchmark::DoNotOptimize(keep[i](payloads[i].bytes));
+  };
+}
+
 Step encodeProtozero(const std::vector<Payload>& payloads) {
   return encodeBy(protozeroMessages(), payloads);
 }

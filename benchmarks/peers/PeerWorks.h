@@ -10,8 +10,10 @@ Step decodeStock(const std::vector<Payload>& payloads);
 Step encodeStock(const std::vector<Payload>& payloads);
 Step entriesStock(const std::vector<Payload>& payloads);  // by reflection
 
-// protozero, into structs that own what they hold, on the stack.
+// protozero, into structs that own what they hold: on the stack, as long as the work lasts, or made
+// to be kept by a std::shared_ptr, as ours are.
 Step decodeProtozero(const std::vector<Payload>& payloads);
+Step keepProtozero(const std::vector<Payload>& payloads);
 Step encodeProtozero(const std::vector<Payload>& payloads);
 Step entriesProtozero(const std::vector<Payload>& payloads);  // without structs between
 
