@@ -94,7 +94,9 @@ PlainList& listOf(PlainEntries& entries, std::string_view key) {
   const auto found = std::find_if(entries.rbegin(), entries.rend(),
                                   [&](const PlainEntry& entry) { return entry.key == key; });
   if (found != entries.rend()) return std::get<PlainList>(found->value.is);
-  return std::get<PlainList>(entries.emplace_back(PlainEntry{key, {PlainList()}}).value.is);
+  auto& list = std::get<PlainList>(entries.emplace_back(PlainEntry{key, {PlainList()}}).value.is);
+  list.reserve(4);
+  return list;
 }
 
 void appendFmt(std::string& out, const PlainEntries& entries) { FmtWriter{out}(entries); }

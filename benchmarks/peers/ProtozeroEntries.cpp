@@ -87,6 +87,7 @@ PlainValue valueOf(protozero::pbf_reader& reader, const Field& field) {
 
 PlainEntries entriesOf(protozero::pbf_reader reader, const Fields& fields) {
   PlainEntries entries;
+  entries.reserve(8);  // most messages have some such number of fields
   while (reader.next()) {
     const auto tag = reader.tag();
     if (tag >= fields.size() || fields[tag].key.empty()) {

@@ -322,6 +322,13 @@ struct KCellularActivatedBearerContexts {
   std::vector<BearerContext> bearerContexts;
 };
 
+// A new element at the end. Most lists have a few, so room for these is made at once.
+template <class Element>
+Element& another(std::vector<Element>& list) {
+  if (list.empty()) list.reserve(4);
+  return list.emplace_back();
+}
+
 // What is there lands on top of `message`. Throws protozero::exception on damaged bytes.
 void read(std::string_view data, KCellularLteRsrpRsrqSinr& message);
 void read(std::string_view data, KCellularLteTxPower& message);

@@ -47,7 +47,7 @@ void read(std::string_view data, KCellularLteNbrEutraCellMeas& message) {
         message.timestamp = reader.get_uint64();
         break;
       case tag_and_type(Tag::measNbrEutra, kLengthDelimited):
-        read(reader.get_message(), message.measNbrEutra.emplace_back());
+        read(reader.get_message(), another(message.measNbrEutra));
         break;
       default:
         reader.skip();
@@ -138,7 +138,7 @@ void read(std::string_view data, KCellularEmmContext& message) {
         message.ueOpMode = reader.get_enum();
         break;
       case tag_and_type(Tag::taiList, kLengthDelimited):
-        read(reader.get_message(), message.taiList.emplace_back());
+        read(reader.get_message(), another(message.taiList));
         break;
       case tag_and_type(Tag::guti, kLengthDelimited):
         if (!message.guti) message.guti.emplace();
@@ -221,7 +221,7 @@ void read(std::string_view data, KCellularActivatedBearerContexts& message) {
         message.bearerContextCount = reader.get_uint32();
         break;
       case tag_and_type(Tag::bearerContexts, kLengthDelimited):
-        read(reader.get_message(), message.bearerContexts.emplace_back());
+        read(reader.get_message(), another(message.bearerContexts));
         break;
       default:
         reader.skip();

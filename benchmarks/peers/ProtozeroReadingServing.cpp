@@ -75,7 +75,7 @@ void read(std::string_view data, KCellularLteRsrpRsrqSinr& message) {
         read(reader.get_message(), *message.avgValues);
         break;
       case tag_and_type(Tag::instValues, kLengthDelimited):
-        read(reader.get_message(), message.instValues.emplace_back());
+        read(reader.get_message(), another(message.instValues));
         break;
       default:
         reader.skip();
@@ -115,7 +115,7 @@ void read(std::string_view data, KCellularLteTxPower& message) {
         message.timestamp = reader.get_uint64();
         break;
       case tag_and_type(Tag::txPowerInfo, kLengthDelimited):
-        read(reader.get_message(), message.txPowerInfo.emplace_back());
+        read(reader.get_message(), another(message.txPowerInfo));
         break;
       default:
         reader.skip();
@@ -300,7 +300,7 @@ void read(std::string_view data, KCellularLteSelReselCellInfo& message) {
         message.priorityOperatingFreq = reader.get_uint32();
         break;
       case tag_and_type(Tag::nbrEutra, kLengthDelimited):
-        read(reader.get_message(), message.nbrEutra.emplace_back());
+        read(reader.get_message(), another(message.nbrEutra));
         break;
       default:
         reader.skip();
