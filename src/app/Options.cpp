@@ -27,7 +27,8 @@ std::optional<Options> parseOptions(int argc, const char* const* argv, int& exit
   line.set_version_flag("--version", "qelwatch " QELWATCH_VERSION);
   auto* source = line.add_option("--source", options.source,
                                  "values from within, without the baseband manager service: "
-                                 "simulated[,seed=N][,speed=N] or recording:FILE[,speed=N][,loop]")
+                                 "simulated[,seed=N][,speed=N], recording:FILE[,speed=N][,loop] or "
+                                 "modem-manager[:IMEI|:PATH]")
                      ->type_name("SOURCE");
   line.add_option("--bus", options.bus,
                   "where the baseband manager service is: system, session or a bus address")

@@ -10,6 +10,7 @@ namespace qel {
 namespace {
 
 const QString kRecording = QStringLiteral("recording:");
+const QString kModemManager = QStringLiteral("modem-manager");
 
 }  // namespace
 
@@ -46,6 +47,7 @@ int Source::openWithin(const std::string& source) {
 QString sourceInWords(const std::string& source) {
   if (source.empty()) return QStringLiteral("Baseband manager service");
   const QString text = QString::fromStdString(source);
+  if (text.startsWith(kModemManager)) return QStringLiteral("Modem of this device");
   if (!text.startsWith(kRecording)) return QStringLiteral("Simulated modem");
   const QString file = text.mid(kRecording.size()).section(u',', 0, 0);
   return QStringLiteral("Recording ") + QFileInfo(file).fileName();
