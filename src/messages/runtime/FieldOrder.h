@@ -85,8 +85,7 @@ template <class Message, class Target, std::size_t... index>
 // Goes through the fields of the class once and gives those that are there to the target, which has
 //   Cursor read<Tag>(Cursor, field)  reads what stands behind the tag; a repeated field whole
 //   void leaveOut(field)             the field is not there
-//   kStopsAtEnd                      whether it need not hear of fields that are not there at the
-//   end
+//   kStopsAtEnd                      whether it need not hear of absent fields behind the last one
 // Stops in front of what is not in order.
 template <class Message, class Target>
 [[gnu::always_inline]] inline Cursor readInOrder(Target& target, Cursor cursor) {
