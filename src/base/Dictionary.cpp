@@ -28,13 +28,16 @@ bool isUnder(const Dictionary::Entry& entry, std::string_view key) {
          (key.empty() || (other.front() == key.front() && other == key));
 }
 
+// The entry under the key, or the end.
+const Dictionary::Entry* search(const Dictionary& dictionary, std::string_view key) {
+  return std::ranges::find_if(dictionary, [key](const auto& entry) { return isUnder(entry, key); });
+}
+
 }  // namespace
 
 const Value* Dictionary::find(std::string_view key) const {
-  for (const Entry& entry : _entries) {
-    if (isUnder(entry, key)) return &entry.value;
-  }
-  return nullptr;
+  const Entry* found = search(*this, key);
+  return found == end() ? nullptr : &found->value;
 }
 
 Value* Dictionary::find(std::string_view key) {
@@ -43,8 +46,7 @@ Value* Dictionary::find(std::string_view key) {
 
 Value* Dictionary::find(std::string_view key, std::size_t& place) {
   if (place >= size() || !isUnder(_entries[place], key)) {
-    const auto found =
-        std::find_if(begin(), end(), [key](const Entry& e) { return isUnder(e, key); });
+    const Entry* found = search(*this, key);
     if (found == end()) return nullptr;
     place = static_cast<std::size_t>(found - begin());
   }
@@ -60,18 +62,15 @@ void Dictionary::set(Text key, Value value) {
 }
 
 void Dictionary::remove(std::string_view key) {
-  const auto found = std::ranges::find(_entries, key, [](const Entry& e) { return e.key.view(); });
-  if (found != _entries.end()) _entries.erase(found);
+  const Entry* found = search(*this, key);
+  if (found != end()) _entries.erase(_entries.begin() + (found - begin()));
 }
 
 void Dictionary::assign(Text key, const Value* value) {
-  Value* present = find(key);
-  if (!value) {
-    if (present) remove(key);
-  } else if (present) {
-    *present = *value;
+  if (value) {
+    set(std::move(key), *value);
   } else {
-    append(std::move(key), *value);
+    remove(key);
   }
 }
 

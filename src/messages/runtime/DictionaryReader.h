@@ -68,7 +68,6 @@ struct EntriesTarget {
 
   template <class Tag, class Nested>
   Cursor read(Cursor cursor, const RepeatedMessageField<Message, Nested>& field) {
-    constexpr std::size_t kUsualCount = 8;
     List list;
     list.reserve(kUsualCount);
     cursor = readNestedDictionary<Nested>(list, cursor);

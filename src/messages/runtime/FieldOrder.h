@@ -35,6 +35,9 @@ auto decodedScalar(std::uint64_t varint) {
   return {next, next + length};
 }
 
+// Room for the elements of a repeated message field, which seldom has more.
+inline constexpr std::size_t kUsualCount = 8;
+
 // The wire type with which a field is written.
 template <class Field>
 inline constexpr std::uint32_t kWireType = 2;

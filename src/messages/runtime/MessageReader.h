@@ -80,7 +80,6 @@ Cursor readField(Message& message, Cursor cursor, const MessageField<Message, Ne
 template <class Message, class Nested>
 Cursor readField(Message& message, Cursor cursor,
                  const RepeatedMessageField<Message, Nested>& field) {
-  constexpr std::size_t kUsualCount = 8;
   auto& elements = message.*field.member;
   if (elements.empty()) elements.reserve(kUsualCount);
   return readNested(*elements.emplace_back(makeMessage<Nested>()), cursor);

@@ -17,10 +17,7 @@ void writeMessage(const Message& message, PBDataWriter& writer);
 template <Encoding encoding, class T>
 std::uint64_t encodedScalar(T value) {
   if constexpr (encoding == Encoding::int32) return static_cast<std::uint64_t>(std::int64_t{value});
-  if constexpr (encoding == Encoding::sint32) {
-    const std::uint32_t sign = value < 0 ? 0xFFFFFFFFU : 0U;
-    return static_cast<std::uint32_t>(value) << 1 ^ sign;
-  }
+  if constexpr (encoding == Encoding::sint32) return PBZigZag(value);
   return static_cast<std::uint64_t>(value);
 }
 
@@ -66,21 +63,8 @@ inline constexpr std::size_t kRoom = kRoomOf<FieldsOf<Message>>;
 template <class Message>
 inline constexpr bool kIsSmall = kOnlyScalars<FieldsOf<Message>>&& kRoom<Message> < 0x80;
 
-inline std::uint8_t* putVarint(std::uint8_t* at, std::uint64_t value) {
-  if (value < 0x80) {
-    *at = static_cast<std::uint8_t>(value);
-    return at + 1;
-  }
-  if (value < 0x4000) {
-    at[0] = static_cast<std::uint8_t>(value | 0x80);
-    at[1] = static_cast<std::uint8_t>(value >> 7);
-    return at + 2;
-  }
-  return PBPutVarint(at, value);
-}
-
 inline std::uint8_t* putTag(std::uint8_t* at, std::uint32_t number, std::uint32_t wireType) {
-  return putVarint(at, number << 3 | wireType);
+  return PBPutVarint(at, number << 3 | wireType);
 }
 
 // One overload a kind of field; what is absent writes nothing. Each takes the place where writing
@@ -90,7 +74,7 @@ template <class Message, class T, Encoding encoding>
     const Message& message, PBDataWriter&, std::uint8_t* at,
     const ScalarField<Message, T, encoding>& field) {
   if (!Presence::get(message, field.presenceBit)) return at;
-  return putVarint(putTag(at, field.number, 0), encodedScalar<encoding>(message.*field.member));
+  return PBPutVarint(putTag(at, field.number, 0), encodedScalar<encoding>(message.*field.member));
 }
 
 template <class Message>
@@ -98,8 +82,8 @@ template <class Message>
                                                        std::uint8_t* at,
                                                        const EnumField<Message>& field) {
   if (!Presence::get(message, field.presenceBit)) return at;
-  return putVarint(putTag(at, field.number, 0),
-                   encodedScalar<Encoding::int32>(message.*field.member));
+  return PBPutVarint(putTag(at, field.number, 0),
+                     encodedScalar<Encoding::int32>(message.*field.member));
 }
 
 // Writes through the functions of the writer, with room for the message's scalars again afterwards.
@@ -189,7 +173,7 @@ std::uint8_t* writeField(const Message& message, PBDataWriter& writer, std::uint
     PBDataWriterMark mark;
     PBDataWriterPlaceMark(writer, mark, field.number);
     for (const T value : values) {
-      writer.writtenTo(putVarint(writer.room(kLongestVarint), encodedScalar<encoding>(value)));
+      writer.writtenTo(PBPutVarint(writer.room(kLongestVarint), encodedScalar<encoding>(value)));
     }
     PBDataWriterRecallMark(writer, mark);
   });

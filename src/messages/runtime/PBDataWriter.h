@@ -52,14 +52,28 @@ inline constexpr std::uint32_t kPBNoTag = 0xFFFFFFFF;
 // The longest varint has ten bytes.
 inline constexpr std::size_t kLongestVarint = 10;
 
-// Fills in the varint at this place; the place behind it.
+// Fills in the varint at this place; the place behind it. Nearly all take one or two bytes.
 inline std::uint8_t* PBPutVarint(std::uint8_t* at, std::uint64_t value) {
+  if (value < 0x80) {
+    *at = static_cast<std::uint8_t>(value);
+    return at + 1;
+  }
+  if (value < 0x4000) {
+    at[0] = static_cast<std::uint8_t>(value | 0x80);
+    at[1] = static_cast<std::uint8_t>(value >> 7);
+    return at + 2;
+  }
   while (value >= 0x80) {
     *at++ = static_cast<std::uint8_t>(value | 0x80);
     value >>= 7;
   }
   *at++ = static_cast<std::uint8_t>(value);
   return at;
+}
+
+inline std::uint32_t PBZigZag(std::int32_t value) {
+  const std::uint32_t sign = value < 0 ? 0xFFFFFFFFU : 0U;
+  return static_cast<std::uint32_t>(value) << 1 ^ sign;
 }
 
 // A field that is a varint, or the tag and length of one that is delimited.
@@ -85,8 +99,7 @@ inline void PBDataWriterWriteInt32Field(PBDataWriter& writer, std::int32_t value
 }
 inline void PBDataWriterWriteSint32Field(PBDataWriter& writer, std::int32_t value,
                                          std::uint32_t field) {
-  const std::uint32_t sign = value < 0 ? 0xFFFFFFFFU : 0U;
-  PBDataWriterWriteVarint(writer, static_cast<std::uint32_t>(value) << 1 ^ sign, field, 0);
+  PBDataWriterWriteVarint(writer, PBZigZag(value), field, 0);
 }
 inline void PBDataWriterWriteBOOLField(PBDataWriter& writer, bool value, std::uint32_t field) {
   PBDataWriterWriteVarint(writer, value ? 1 : 0, field, 0);
