@@ -36,6 +36,20 @@ class Counting final : public EventSequence {
   std::uint64_t _passedMs = 0;
 };
 
+// One event, over and over.
+class Looping final : public EventSequence {
+ public:
+  std::optional<ServiceEvent> next() override {
+    ++_given;
+    return metricEvent(19972, 7000);
+  }
+  bool beginsAnew() const override { return _given > 1; }
+  SourceAnswer query(std::uint32_t /*metric*/) override { return {}; }
+
+ private:
+  std::uint64_t _given = 0;
+};
+
 class Receiver final : public EventReceiver {
  public:
   Taken take(const ServiceEvent& event) override {
@@ -99,6 +113,18 @@ TEST_F(PacedSourceTest, PlaysItsSequenceInTimeAndOrder) {
   EXPECT_EQ(receiver->timesMs(), (std::vector<std::uint64_t>{1000, 2000, 3000}));
   EXPECT_EQ(clock.waits(), (std::vector<std::uint64_t>{1000, 2000}));
   EXPECT_EQ(source->description(), "counting");
+}
+
+// A recording of one instant that loops was as many events as the machine could make.
+TEST_F(PacedSourceTest, PausesBetweenRoundsOfOneInstant) {
+  const auto source = std::make_unique<PacedSource>(
+      "looping", [] { return std::make_unique<Looping>(); }, 1, clock);
+  receiver->inside = [&] {
+    if (receiver->timesMs().size() == 4) source->stop();
+  };
+  source->start(receiver, listeners);
+  ASSERT_TRUE(receiver->waitForEvents(4));
+  EXPECT_EQ(clock.waits(), (std::vector<std::uint64_t>{1000, 2000, 3000}));
 }
 
 TEST_F(PacedSourceTest, AnEventThatNobodyListensToWaitsForTheNextListener) {

@@ -5,6 +5,7 @@
 #include <thread>
 
 #include "service/support/FakeWaitClock.h"
+#include "support/RecordingSink.h"
 
 namespace qel {
 namespace {
@@ -61,6 +62,74 @@ TEST(Pacer, BeginsAnewWhenTimeGoesBack) {
   EXPECT_TRUE(pacer.wait(1000, never));
   EXPECT_TRUE(pacer.wait(1300, never));
   EXPECT_THAT(clock.waits(), ElementsAre(400));
+}
+
+// Was compared with the event from which time is counted, so that a second round and any step back
+// behind that event left everything overdue.
+TEST(Pacer, AStepBackBehindTheFirstEventCountsAnewToo) {
+  FakeWaitClock clock;
+  Pacer pacer(clock, 1);
+  const std::stop_token never;
+  pacer.wait(1000, never);
+  pacer.wait(3000, never);  // at 2000
+  EXPECT_TRUE(pacer.wait(1000, never));
+  EXPECT_TRUE(pacer.wait(1200, never));
+  EXPECT_TRUE(pacer.wait(1100, never));
+  EXPECT_TRUE(pacer.wait(1400, never));
+  EXPECT_THAT(clock.waits(), ElementsAre(2000, 2200, 2500));
+}
+
+// Was as long a silence as the gap.
+TEST(Pacer, AGapOfMoreThanAMinutePassesAsASecondAndIsLogged) {
+  const testing::CapturedSystemLog systemLog;
+  FakeWaitClock clock;
+  Pacer pacer(clock, 2);
+  const std::stop_token never;
+  pacer.wait(1'500'000'000'000, never);
+  pacer.wait(1'500'000'060'000, never);  // just short enough
+  EXPECT_THAT(systemLog.lines(), IsEmpty());
+  pacer.wait(1'500'003'660'000, never);
+  pacer.wait(1'500'003'660'200, never);
+  EXPECT_THAT(clock.waits(), ElementsAre(30'000, 30'500, 30'600));
+  EXPECT_THAT(systemLog.lines(),
+              ElementsAre("no event from 1500000060000 to 1500003660000 (ms since 1970): "
+                          "the gap passes as 1000 ms"));
+}
+
+TEST(Pacer, OnlyTheFirstGapsAreLogged) {
+  const testing::CapturedSystemLog systemLog;
+  FakeWaitClock clock;
+  Pacer pacer(clock, 1);
+  const std::stop_token never;
+  for (std::uint64_t i = 0; i < 100; ++i) pacer.wait(i * 100'000, never);
+  ASSERT_EQ(systemLog.lines().size(), 10U);
+  EXPECT_THAT(systemLog.lines().back(), ::testing::EndsWith("; further gaps are not logged"));
+  EXPECT_EQ(clock.nowMs(), 99'000U);
+}
+
+TEST(Pacer, TheLastMomentOfAllIsNoGapThatOverflows) {
+  FakeWaitClock clock;
+  Pacer pacer(clock, 1);
+  const std::stop_token never;
+  const std::uint64_t last = ~std::uint64_t{0};
+  pacer.wait(last - 70'000, never);
+  pacer.wait(last, never);
+  pacer.wait(0, never);
+  pacer.wait(last, never);
+  EXPECT_THAT(clock.waits(), ElementsAre(1000, 2000));
+}
+
+TEST(Pacer, EveryRoundBeginsAfterAPause) {
+  FakeWaitClock clock;
+  Pacer pacer(clock, 1e6);
+  const std::stop_token never;
+  pacer.wait(5000, never);
+  EXPECT_TRUE(pacer.beginRound(never));
+  EXPECT_TRUE(pacer.wait(5000, never));
+  EXPECT_THAT(clock.waits(), ElementsAre(1000));
+  std::stop_source stop;
+  stop.request_stop();
+  EXPECT_FALSE(pacer.beginRound(stop.get_token()));
 }
 
 TEST(Pacer, CountsAnewAfterAPause) {

@@ -52,6 +52,17 @@ TEST_F(RecordingSequenceTest, BeginsAnewWhenItLoops) {
   EXPECT_THAT(timesMs, ::testing::ElementsAre(10, 20, 30, 40, 10, 20, 30, 40, 10));
 }
 
+TEST_F(RecordingSequenceTest, SaysWhichEventBeginsAnotherRound) {
+  auto events = sequence(true);
+  std::vector<bool> begins;
+  for (int i = 0; i < 9; ++i) {
+    events.next();
+    begins.push_back(events.beginsAnew());
+  }
+  EXPECT_THAT(begins,
+              ::testing::ElementsAre(false, false, false, false, true, false, false, false, true));
+}
+
 TEST_F(RecordingSequenceTest, ALoopOverAFileThatHasBecomeEmptyEnds) {
   auto events = sequence(true);
   for (int i = 0; i < 4; ++i) events.next();

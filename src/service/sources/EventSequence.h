@@ -15,6 +15,8 @@ class EventSequence {
   virtual ~EventSequence() = default;
   // In time order; nothing at the end.
   virtual std::optional<ServiceEvent> next() = 0;
+  // Whether the event given last is the first of another round of the same events.
+  virtual bool beginsAnew() const { return false; }
   // That event's moment has come.
   virtual void passed(const ServiceEvent& /*event*/) {}
   // The metric as it is at the moment, by its 16-bit identifier.

@@ -11,9 +11,14 @@ struct PacedSource::Run {
   Run(std::unique_ptr<EventSequence> events, WaitClock& clock, double speed)
       : sequence(std::move(events)), pacer(clock, speed) {}
 
-  std::optional<ServiceEvent> next() {
+  struct Next {
+    std::optional<ServiceEvent> event;
+    bool beginsAnew = false;
+  };
+  Next next() {
     const std::lock_guard lock(mutex);
-    return sequence->next();
+    auto event = sequence->next();
+    return {std::move(event), sequence->beginsAnew()};
   }
   void passed(const ServiceEvent& event) {
     const std::lock_guard lock(mutex);
@@ -73,8 +78,9 @@ void PacedSource::play(Run& run) {
   // Once stopped, nothing is touched any more but the run: the source, its clock and the whole
   // process may be on their way out.
   while (!stop.stop_requested()) {
-    const auto event = run.next();
-    if (!event || !run.pacer.wait(event->timeMs, stop)) return;
+    const auto [event, beginsAnew] = run.next();
+    if (!event || (beginsAnew && !run.pacer.beginRound(stop))) return;
+    if (!run.pacer.wait(event->timeMs, stop)) return;
     run.passed(*event);
     if (!hand(run, *event)) return;
   }

@@ -96,9 +96,11 @@ std::optional<ServiceEvent> RecordingSequence::read() {
 }
 
 std::optional<ServiceEvent> RecordingSequence::next() {
+  _beginsAnew = false;
   if (auto event = read()) return event;
   // One attempt: a file that has become empty must not be read for ever.
   if (!_loops || !_reader || !reopen()) return std::nullopt;
+  _beginsAnew = true;
   return read();
 }
 

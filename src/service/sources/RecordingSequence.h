@@ -25,6 +25,7 @@ class RecordingSequence final : public EventSequence {
   RecordingSequence(std::string path, bool loops, std::shared_ptr<const EventOfMetric> firsts);
 
   std::optional<ServiceEvent> next() override;
+  bool beginsAnew() const override { return _beginsAnew; }
   void passed(const ServiceEvent& event) override;
   SourceAnswer query(std::uint32_t metric) override;
 
@@ -37,6 +38,7 @@ class RecordingSequence final : public EventSequence {
   const std::shared_ptr<const EventOfMetric> _firsts;
   std::unique_ptr<RecordingReader> _reader;
   EventOfMetric _newest;
+  bool _beginsAnew = false;
 };
 
 }  // namespace qel::service
