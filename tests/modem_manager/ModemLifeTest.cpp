@@ -109,6 +109,19 @@ TEST(ModemManagerSource, RepeatsWhatHoldsAndAnswersQueriesWithIt) {
   EXPECT_EQ(none.message, "metric 19992 has no value that the modem gives");
 }
 
+// A listener that came while the modem had nothing new to say waited for the next report.
+TEST(ModemManagerSource, TellsANewListenerEverythingAtOnce) {
+  ModemWorld world({}, {std::chrono::hours(1), std::chrono::milliseconds(500)});
+  world.manager->add(kModemPath, modemWithRsrp(-80));
+  world.start();
+  ASSERT_TRUE(world.waitForRsrp(-80));
+  for (int i = 0; i < 3; ++i) {
+    const int before = world.log->count(metric::kLteRsrpRsrqSinr);
+    world.listeners->changed();
+    EXPECT_TRUE(world.log->waitForCount(metric::kLteRsrpRsrqSinr, before + 1));
+  }
+}
+
 TEST(CellInformation, ThatIsNotAllowedIsNamedInOneLineAndNotAskedForAgain) {
   for (const char* error : {"org.freedesktop.DBus.Error.AccessDenied",
                             "org.freedesktop.ModemManager1.Error.Core.Unauthorized"}) {

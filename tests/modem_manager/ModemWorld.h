@@ -140,17 +140,18 @@ inline bool becomesTrue(const std::function<bool()>& condition) {
   return true;
 }
 
-// A bus, a ModemManager and a source that watches it with a short period.
+// A bus, a ModemManager and a source that watches it, with a short period unless told otherwise.
 class ModemWorld {
  public:
-  explicit ModemWorld(service::ModemWish wish = {})
+  static constexpr service::ModemTiming kShort{std::chrono::milliseconds(100),
+                                               std::chrono::milliseconds(500)};
+
+  explicit ModemWorld(service::ModemWish wish = {}, service::ModemTiming timing = kShort)
       : manager(std::make_unique<FakeModemManager>(bus.address())),
         log(std::make_shared<MetricLog>()),
         source(std::make_unique<service::ModemManagerSource>(
-            wish, tesk::bus::BusAddress{bus.address()},
-            service::ModemTiming{std::chrono::milliseconds(100), std::chrono::milliseconds(500)})) {
-  }
-  void start() { source->start(log, std::make_shared<service::ListenerSignal>()); }
+            wish, tesk::bus::BusAddress{bus.address()}, timing)) {}
+  void start() { source->start(log, listeners); }
 
   // Whether the metric can be had.
   bool has(std::uint32_t metric) const {
@@ -166,6 +167,7 @@ class ModemWorld {
   PrivateBus bus;
   std::unique_ptr<FakeModemManager> manager;
   std::shared_ptr<MetricLog> log;
+  std::shared_ptr<service::ListenerSignal> listeners = std::make_shared<service::ListenerSignal>();
   std::unique_ptr<service::ModemManagerSource> source;
 };
 

@@ -3,8 +3,13 @@
 
 #include <condition_variable>
 #include <cstdint>
+#include <memory>
 #include <mutex>
 #include <stop_token>
+#include <utility>
+#include <vector>
+
+#include "tesk/bus/WakeUp.h"
 
 namespace qel::service {
 
@@ -21,8 +26,19 @@ class ListenerSignal {
     {
       const std::lock_guard lock(_mutex);
       ++_generation;
+      std::erase_if(_sleepers, [](const Sleeper& sleeper) { return sleeper.expired(); });
+      for (const Sleeper& sleeper : _sleepers) {
+        if (const auto there = sleeper.lock()) there->signal();
+      }
     }
     _changed.notify_all();
+  }
+
+  // Wakes it too at every change, for as long as it is there: for whoever waits in poll.
+  using Sleeper = std::weak_ptr<const tesk::bus::WakeUp>;
+  void wake(Sleeper sleeper) {
+    const std::lock_guard lock(_mutex);
+    _sleepers.push_back(std::move(sleeper));
   }
 
   // False when stopped.
@@ -35,6 +51,7 @@ class ListenerSignal {
   mutable std::mutex _mutex;
   std::condition_variable_any _changed;
   std::uint64_t _generation = 0;
+  std::vector<Sleeper> _sleepers;
 };
 
 }  // namespace qel::service

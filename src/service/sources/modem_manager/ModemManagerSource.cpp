@@ -59,6 +59,7 @@ struct ModemManagerSource::Run {
                     [this](const ServiceEvent& event) { hand(event); });
       if (stopping) break;
       link.waitAndProcess(wakeUp.descriptor(), keeper.due());
+      wakeUp.clear();
     }
     link.finish();
   }
@@ -79,10 +80,15 @@ struct ModemManagerSource::Run {
     }
   }
 
+  // New listeners do not shorten it.
   void rest(std::chrono::milliseconds pause) {
-    if (stopping) return;
-    pollfd waited{wakeUp.descriptor(), POLLIN, 0};
-    ::poll(&waited, 1, static_cast<int>(pause.count()));
+    const auto end = Steady::now() + pause;
+    for (auto left = pause; !stopping && left > 0ms;
+         left = std::chrono::ceil<std::chrono::milliseconds>(end - Steady::now())) {
+      pollfd waited{wakeUp.descriptor(), POLLIN, 0};
+      ::poll(&waited, 1, static_cast<int>(left.count()));
+      wakeUp.clear();
+    }
   }
 
   const ModemWish wish;
@@ -90,7 +96,7 @@ struct ModemManagerSource::Run {
   const ModemTiming timing;
   std::weak_ptr<EventReceiver> receiver;
   std::shared_ptr<ListenerSignal> listeners;
-  const tesk::bus::WakeUp wakeUp;  // for the end alone, so it is never cleared
+  const tesk::bus::WakeUp wakeUp;  // for the end and for new listeners
   std::atomic<bool> stopping = false;
   MetricKeeper keeper;
   // The thread only.
@@ -111,6 +117,7 @@ void ModemManagerSource::start(std::weak_ptr<EventReceiver> receiver,
   run->receiver = std::move(receiver);
   run->listeners = std::move(listeners);
   run->generation = run->listeners->generation();
+  run->listeners->wake(std::shared_ptr<const tesk::bus::WakeUp>(run, &run->wakeUp));
   const std::lock_guard lock(_mutex);
   _run = run;
   _threads.start([run] { run->play(); });
