@@ -123,10 +123,10 @@ tesk::CommandResult ServiceCore::queryMetric(Session& session, const Dictionary&
   event.entries.set(tesk::kKeyProfileID, profile);
   event.entries.set(tesk::kKeyTriggerRef, triggerRef);
   event.entries.set(tesk::kKeyTriggerID, trigger);
-  std::string reason;
-  if (!examineEvent(event, reason)) {
-    _undecodableLog.note(reason);
-    return refusal(CommandCode::metricNotAvailable, std::move(reason));
+  EventFault fault;
+  if (!examineEvent(event, fault)) {
+    _undecodableLog.note(fault.reason);
+    return refusal(CommandCode::metricNotAvailable, std::move(fault.reason));
   }
   if (!session.answer(event)) {
     return refusal(CommandCode::deliveryOff, "events are off: the metric cannot be delivered");

@@ -23,6 +23,7 @@ struct CoreStatus {
   std::uint64_t received = 0;                // events taken from the source
   std::uint64_t delivered = 0;               // to sessions, each counted; answers to queries too
   std::uint64_t undecodable = 0;             // of those received: not delivered to anyone
+  std::uint64_t withoutContent = 0;          // likewise: reports that no table could draw
   std::uint64_t droppedByConfiguration = 0;  // deliveries that a configuration kept back
   std::uint64_t droppedWhileOff = 0;
   std::uint64_t commands = 0;

@@ -72,12 +72,12 @@ std::vector<std::shared_ptr<Session>> ServiceCore::sessions() const {
 }
 
 EventReceiver::Taken ServiceCore::take(const ServiceEvent& event) {
-  std::string reason;
-  const auto subject = examineEvent(event, reason);
+  EventFault fault;
+  const auto subject = examineEvent(event, fault);
   if (!subject) {
     ++_received;
-    ++_undecodable;
-    _undecodableLog.note(reason);
+    ++(fault.withoutContent ? _withoutContent : _undecodable);
+    _undecodableLog.note(fault.reason);
     return Taken::yes;
   }
   // Whether anyone listens is known only from the offers themselves: a look beforehand could be
@@ -119,6 +119,7 @@ CoreStatus ServiceCore::status() const {
   status.received = _received;
   status.delivered = _delivered;
   status.undecodable = _undecodable;
+  status.withoutContent = _withoutContent;
   status.droppedByConfiguration = _droppedByConfiguration;
   status.droppedWhileOff = _droppedWhileOff;
   status.commands = _commands;

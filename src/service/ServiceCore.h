@@ -96,6 +96,7 @@ class ServiceCore final : public EventReceiver, public std::enable_shared_from_t
   std::atomic<std::uint64_t> _received = 0;
   std::atomic<std::uint64_t> _delivered = 0;
   std::atomic<std::uint64_t> _undecodable = 0;
+  std::atomic<std::uint64_t> _withoutContent = 0;
   std::atomic<std::uint64_t> _droppedByConfiguration = 0;
   std::atomic<std::uint64_t> _droppedWhileOff = 0;
   std::atomic<std::uint64_t> _commands = 0;

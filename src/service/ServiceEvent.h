@@ -22,8 +22,15 @@ struct EventSubject {
   std::int64_t identifier = 0;
 };
 
-// The subject of an event that a client can make sense of: identifiers in place and the payload of
-// a metric with a message class decodable. Else nothing, and `reason` says what is wrong.
-std::optional<EventSubject> examineEvent(const ServiceEvent& event, std::string& reason);
+// Why an event goes to nobody.
+struct EventFault {
+  bool withoutContent = false;  // a report from which a table would draw what is not in it
+  std::string reason;           // one line
+};
+
+// The subject of an event that a client can make sense of and draw: identifiers in place, and the
+// payload of a metric with a message class decodable and with content. A metric without a payload
+// is an empty message. Else nothing, and `fault` says what is wrong.
+std::optional<EventSubject> examineEvent(const ServiceEvent& event, EventFault& fault);
 
 }  // namespace qel::service

@@ -31,16 +31,17 @@ void printJson(const ServiceStatus& status, Output& output) {
                                     {"delivered", client.delivered},
                                     {"dropped", client.dropped}});
   }
-  output.line(
-      jsonText(Dictionary{{"version", status.version},
-                          {"source", status.source},
-                          {"source_running", status.sourceRunning},
-                          {"configurations", std::move(configurations)},
-                          {"clients", std::move(clients)},
-                          {"events", Dictionary{{"received", status.eventsReceived},
-                                                {"delivered", status.eventsDelivered},
-                                                {"dropped", status.eventsDropped},
-                                                {"undecodable", status.eventsUndecodable}}}}));
+  output.line(jsonText(
+      Dictionary{{"version", status.version},
+                 {"source", status.source},
+                 {"source_running", status.sourceRunning},
+                 {"configurations", std::move(configurations)},
+                 {"clients", std::move(clients)},
+                 {"events", Dictionary{{"received", status.eventsReceived},
+                                       {"delivered", status.eventsDelivered},
+                                       {"dropped", status.eventsDropped},
+                                       {"undecodable", status.eventsUndecodable},
+                                       {"without_content", status.eventsWithoutContent}}}}));
 }
 
 // Names come from other programs: as JSON strings they cannot play tricks on a terminal.
@@ -62,7 +63,8 @@ void printText(const ServiceStatus& status, Output& output) {
   }
   output.line("events          " + number(status.eventsReceived) + " received, " +
               number(status.eventsDelivered) + " delivered, " + number(status.eventsDropped) +
-              " dropped, " + number(status.eventsUndecodable) + " undecodable");
+              " dropped, " + number(status.eventsUndecodable) + " undecodable, " +
+              number(status.eventsWithoutContent) + " without content");
 }
 
 }  // namespace

@@ -225,6 +225,14 @@ TEST_F(CommandsTest, AnAnswerThatNoClientCouldReadIsRefused) {
                 CommandCode::metricNotAvailable, "undecodable payload of metric 19972");
 }
 
+TEST_F(CommandsTest, AnAnswerWithoutContentIsRefused) {
+  const testing::CapturedSystemLog systemLog;
+  source->answer.entries = {{tesk::kKeyMetricID, std::int64_t{0x3C0000} + 11788},
+                            {tesk::kKeyPayload, Bytes{}}};
+  expectRefused(tesk::kCommandQueryMetric, queryRequest(0x7F0000 + 11788).entries(),
+                CommandCode::metricNotAvailable, "nothing to show in metric 11788");
+}
+
 TEST_F(CommandsTest, AQueryWithEventsOffSaysSo) {
   core->eventsOff(*session);
   expectRefused(tesk::kCommandQueryMetric, queryRequest(kQueryRrcState).entries(),

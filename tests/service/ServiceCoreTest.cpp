@@ -198,7 +198,7 @@ TEST_F(ServiceCoreTest, AnUndecodablePayloadReachesNobodyAndIsCounted) {
               HasSubstr("undecodable payload of metric 19972 (KCellularLteRrcState)"));
 }
 
-TEST_F(ServiceCoreTest, EventsWithoutTheirIdentifierOrPayloadReachNobody) {
+TEST_F(ServiceCoreTest, EventsWithoutTheirIdentifierOrWithAPayloadThatIsNoBytesReachNobody) {
   const testing::CapturedSystemLog systemLog;
   const auto session = listener(log);
   install(*session, configuration({{kRrcState}}, {{0, 0xFFFFFFFF}}));
@@ -206,11 +206,38 @@ TEST_F(ServiceCoreTest, EventsWithoutTheirIdentifierOrPayloadReachNobody) {
   source->send({1, metric, {}});
   source->send({1, metric, {{tesk::kKeyMetricID, "3952132"}}});
   source->send({1, metric, {{tesk::kKeyMetricID, kRrcState}, {tesk::kKeyPayload, Bytes{}}}});
-  source->send({1, metric, {{tesk::kKeyMetricID, 0x3C4E04}}});
   source->send({1, metric, {{tesk::kKeyMetricID, 0x3C4E04}, {tesk::kKeyPayload, "08"}}});
   source->send({1, tesk::kEventTrigger, {{"other", 1}}});
   EXPECT_EQ(log.count(), 0U);
-  EXPECT_EQ(core->status().undecodable, 6U);
+  EXPECT_EQ(core->status().undecodable, 5U);
+}
+
+// It was dropped here and an empty message to a replay.
+TEST_F(ServiceCoreTest, AMetricWithoutAPayloadIsAnEmptyMessage) {
+  const auto session = listener(log);
+  install(*session, configuration({{kRrcState}}));
+  const ServiceEvent event{1, tesk::kEventMetric, {{tesk::kKeyMetricID, 0x3C4E04}}};
+  EXPECT_EQ(source->send(event), Taken::yes);
+  ASSERT_EQ(log.count(), 1U);
+  EXPECT_EQ(log.events()[0].entries, event.entries);
+}
+
+// Such a report ended the viewer when its table was opened.
+TEST_F(ServiceCoreTest, AReportWithoutContentReachesNobodyIsCountedAndSaidOnce) {
+  const testing::CapturedSystemLog systemLog;
+  const auto session = listener(log);
+  install(*session, configuration({{20330}, {11788}}));
+  EXPECT_EQ(source->send(metricEvent(20330, 1000, {0x08, 0x01})), Taken::yes);  // a time alone
+  EXPECT_EQ(source->send(metricEvent(11788, 1000, {})), Taken::yes);
+  EXPECT_EQ(source->send({1, tesk::kEventMetric, {{tesk::kKeyMetricID, 0x3C0000 + 11788}}}),
+            Taken::yes);
+  EXPECT_EQ(log.count(), 0U);
+  EXPECT_EQ(core->status().received, 3U);
+  EXPECT_EQ(core->status().withoutContent, 3U);
+  EXPECT_EQ(core->status().undecodable, 0U);
+  ASSERT_EQ(systemLog.lines().size(), 1U);
+  EXPECT_THAT(systemLog.lines()[0],
+              HasSubstr("nothing to show in metric 20330 (KCellularLteRsrpRsrqSinr)"));
 }
 
 TEST_F(ServiceCoreTest, AMetricWithoutMessageClassPassesAsItIs) {

@@ -69,6 +69,14 @@ TEST(QelctlReplay, reportsAndIgnoresALastLineCutOff) {
   EXPECT_EQ(linesOf(outcome.err).size(), 1U);
 }
 
+TEST(QelctlReplay, takesAMetricWithoutAPayloadAsAnEmptyMessage) {
+  const TemporaryRecording recording(
+      "{\"time_ms\": 1, \"event\": \"metric\", \"kKeyMetricID\": 3952132}\n");
+  const Outcome outcome = qelctl({"replay", recording.path()});
+  EXPECT_EQ(outcome.exitCode, 0);
+  EXPECT_EQ(linesOf(outcome.out).at(1), "Current RRC state is {}");
+}
+
 TEST(QelctlReplay, endsAsTheViewerDoesOnAnUndecodablePayload) {
   const TemporaryRecording recording(rrcState(3) + metricLine(V::K_LTE_RRC_STATE, Bytes{0x08}));
   const Outcome outcome = qelctl({"replay", recording.path()});

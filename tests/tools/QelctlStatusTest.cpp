@@ -48,6 +48,26 @@ TEST_F(QelctlStatus, tellsItToPeople) {
   EXPECT_EQ(outcome.out.find('\x1B'), std::string::npos);
 }
 
+// Reports without content went to every viewer and ended it.
+TEST(QelctlStatusOfARecording, countsReportsThatNoTableCouldDraw) {
+  const TemporaryRecording recording(metricLine(0x3C0000 + 11788, Bytes{}) +
+                                     metricLine(0x3C0000 + 20330, Bytes{0x08, 0x01}) +
+                                     metricLine(0x3C0000 + 19992, Bytes{}));
+  const PrivateBus bus;
+  const ServiceProcess service(bus, "recording:" + recording.path());
+  Client client(bus, "tester");
+  ASSERT_TRUE(client.waitForReachable(true));
+  ASSERT_EQ(client.install(7, {11788, 20330, 19992}).code, 0);
+  client.transport().eventsOn();
+  ASSERT_TRUE(client.waitForMetrics(1));
+  EXPECT_EQ(client.metrics().front(), 0x3C0000 + 19992);
+  const std::vector<std::string> words = {"status", "--bus", bus.address()};
+  EXPECT_NE(qelctl(words).out.find("0 undecodable, 2 without content"), std::string::npos);
+  const auto told = nlohmann::json::parse(qelctl({"status", "--json", "--bus", bus.address()}).out);
+  EXPECT_EQ(told["events"]["without_content"], 2);
+  EXPECT_EQ(told["events"]["received"], 3);
+}
+
 void expectAbsent(const std::vector<std::string>& words, const std::string& why) {
   const Outcome outcome = qelctl(words);
   EXPECT_EQ(outcome.exitCode, 69) << words.front();

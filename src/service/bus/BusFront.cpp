@@ -135,7 +135,7 @@ BusFront::Counted BusFront::counted() const {
   const CoreStatus status = _core->status();
   std::uint64_t dropped = _droppedOfGone;
   for (const auto& [busName, client] : _clients) dropped += client->stream().dropped();
-  return {status.received, status.delivered, dropped, status.undecodable};
+  return {status.received, status.delivered, dropped, status.undecodable, status.withoutContent};
 }
 
 void BusFront::signalCounters() {
@@ -146,6 +146,9 @@ void BusFront::signalCounters() {
   if (now.delivered != _signalled.delivered) properties.emplace_back("EventsDelivered");
   if (now.dropped != _signalled.dropped) properties.emplace_back("EventsDropped");
   if (now.undecodable != _signalled.undecodable) properties.emplace_back("EventsUndecodable");
+  if (now.withoutContent != _signalled.withoutContent) {
+    properties.emplace_back("EventsWithoutContent");
+  }
   _signalled = now;
   _signalledAt = SteadyClock::now();
   changed(properties);

@@ -36,6 +36,7 @@ class BusFront final : public sdbus::AdaptorInterfaces<tesk::BasebandManager1_ad
     std::uint64_t delivered = 0;
     std::uint64_t dropped = 0;
     std::uint64_t undecodable = 0;
+    std::uint64_t withoutContent = 0;
     friend bool operator==(const Counted&, const Counted&) = default;
   };
 
@@ -53,6 +54,7 @@ class BusFront final : public sdbus::AdaptorInterfaces<tesk::BasebandManager1_ad
   std::uint64_t EventsDelivered() override;
   std::uint64_t EventsDropped() override;
   std::uint64_t EventsUndecodable() override;
+  std::uint64_t EventsWithoutContent() override;
 
   std::string caller() const;
   BusClient& callingClient();

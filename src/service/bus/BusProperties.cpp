@@ -26,5 +26,6 @@ std::uint64_t BusFront::EventsReceived() { return counted().received; }
 std::uint64_t BusFront::EventsDelivered() { return counted().delivered; }
 std::uint64_t BusFront::EventsDropped() { return counted().dropped; }
 std::uint64_t BusFront::EventsUndecodable() { return counted().undecodable; }
+std::uint64_t BusFront::EventsWithoutContent() { return counted().withoutContent; }
 
 }  // namespace qel::service

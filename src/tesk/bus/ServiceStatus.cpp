@@ -55,6 +55,7 @@ ServiceStatus statusOf(const Properties& properties) {
   take(properties, "EventsDelivered", status.eventsDelivered);
   take(properties, "EventsDropped", status.eventsDropped);
   take(properties, "EventsUndecodable", status.eventsUndecodable);
+  take(properties, "EventsWithoutContent", status.eventsWithoutContent);
   return status;
 }
 

@@ -28,6 +28,7 @@ struct ServiceStatus {
   std::uint64_t eventsDelivered = 0;  // each client counted
   std::uint64_t eventsDropped = 0;
   std::uint64_t eventsUndecodable = 0;
+  std::uint64_t eventsWithoutContent = 0;
 };
 
 // Asks once, over a connection of its own, and waits a few seconds at most for the answer. Any
