@@ -1,51 +1,26 @@
 #include "bus/ServiceProcess.h"
 
-#include <spawn.h>
-#include <sys/wait.h>
-#include <unistd.h>
-
 #include <chrono>
-#include <csignal>
-#include <stdexcept>
 
 #include "messages/device_config.h"
 #include "tesk/Constants.h"
 
 namespace qel::testing {
 
-ServiceProcess::ServiceProcess(const PrivateBus& bus, std::string source,
-                               std::string stateDirectory)
-    : _words{QEL_BASEBANDD, "--bus", bus.address(), "--source", std::move(source)} {
-  if (!stateDirectory.empty()) {
-    _words.emplace_back("--state");
-    _words.push_back(std::move(stateDirectory));
-  }
-  start();
+namespace {
+
+std::vector<std::string> wordsOf(const PrivateBus& bus, const std::string& source,
+                                 const std::string& stateDirectory) {
+  std::vector<std::string> words{QEL_BASEBANDD, "--bus", bus.address(), "--source", source};
+  if (!stateDirectory.empty()) words.insert(words.end(), {"--state", stateDirectory});
+  return words;
 }
 
-ServiceProcess::~ServiceProcess() {
-  if (_pid == 0) return;
-  signal(SIGKILL);
-  waitForEnd();
-}
+}  // namespace
 
-void ServiceProcess::start() {
-  std::vector<char*> argv;
-  for (std::string& word : _words) argv.push_back(word.data());
-  argv.push_back(nullptr);
-  if (::posix_spawn(&_pid, argv[0], nullptr, nullptr, argv.data(), environ) != 0) {
-    throw std::runtime_error("basebandd cannot be run");
-  }
-}
-
-void ServiceProcess::signal(int number) const { ::kill(_pid, number); }
-
-int ServiceProcess::waitForEnd() {
-  int status = 0;
-  ::waitpid(_pid, &status, 0);
-  _pid = 0;
-  return WIFEXITED(status) ? WEXITSTATUS(status) : -WTERMSIG(status);
-}
+ServiceProcess::ServiceProcess(const PrivateBus& bus, const std::string& source,
+                               const std::string& stateDirectory)
+    : ChildProcess({.words = wordsOf(bus, source, stateDirectory)}) {}
 
 Client::Client(const PrivateBus& bus, const std::string& name) {
   const auto connector =

@@ -1,8 +1,6 @@
 // The service as a program of its own, and what its clients see.
 #pragma once
 
-#include <sys/types.h>
-
 #include <condition_variable>
 #include <memory>
 #include <mutex>
@@ -10,28 +8,17 @@
 #include <vector>
 
 #include "base/Value.h"
+#include "support/ChildProcess.h"
 #include "support/PrivateBus.h"
 #include "tesk/Transport.h"
 #include "tesk/bus/BusConnector.h"
 
 namespace qel::testing {
 
-class ServiceProcess {
+class ServiceProcess : public ChildProcess {
  public:
-  ServiceProcess(const PrivateBus& bus, std::string source, std::string stateDirectory = "");
-  ~ServiceProcess();
-  ServiceProcess(const ServiceProcess&) = delete;
-  ServiceProcess& operator=(const ServiceProcess&) = delete;
-
-  void start();
-  void signal(int number) const;
-  // Its exit code, or minus the signal that ended it.
-  int waitForEnd();
-  pid_t pid() const { return _pid; }
-
- private:
-  std::vector<std::string> _words;
-  pid_t _pid = 0;
+  ServiceProcess(const PrivateBus& bus, const std::string& source,
+                 const std::string& stateDirectory = "");
 };
 
 // A client over the bus that keeps its events.

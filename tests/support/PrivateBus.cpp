@@ -72,9 +72,16 @@ void PrivateBus::start() {
   if (failed != 0) throw std::runtime_error("dbus-daemon cannot be run");
 }
 
-void PrivateBus::stop() {
+void PrivateBus::stop() { end(SIGTERM); }
+void PrivateBus::kill() { end(SIGKILL); }
+
+void PrivateBus::signal(int number) const {
+  if (_pid != 0) ::kill(_pid, number);
+}
+
+void PrivateBus::end(int signalNumber) {
   if (_pid == 0) return;
-  ::kill(_pid, SIGTERM);
+  signal(signalNumber);
   ::waitpid(_pid, nullptr, 0);
   _pid = 0;
 }

@@ -18,11 +18,16 @@ class PrivateBus {
 
   const std::string& address() const { return _address; }
 
-  // Ends the daemon, and starts it again on the same address.
+  // Ends the daemon, and starts it again on the same address. A killed one ends nothing in order.
   void stop();
+  void kill();
   void start();
+  void signal(int number) const;
+  pid_t pid() const { return _pid; }
 
  private:
+  void end(int signalNumber);
+
   std::string _directory;
   std::string _address;
   pid_t _pid = 0;
