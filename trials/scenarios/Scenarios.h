@@ -1,0 +1,37 @@
+// Everything that can be tried.
+#pragma once
+
+#include "harness/Trial.h"
+
+namespace qel::trials {
+
+void killService(Trial& trial);
+void killBus(Trial& trial);
+void killViewer(Trial& trial);
+void killRecorder(Trial& trial);
+
+void stopService(Trial& trial);
+void stopBus(Trial& trial);
+void stopWatchers(Trial& trial);
+
+void floodOfDelivery(Trial& trial);
+void floodOfDeliveryByThree(Trial& trial);
+void floodOfNames(Trial& trial);
+void floodOfConfigurations(Trial& trial);
+void floodOfApplications(Trial& trial);
+void floodOfAlternation(Trial& trial);
+void floodOfTags(Trial& trial);
+void silentClients(Trial& trial);
+
+void floodOfRecording(Trial& trial);
+void floodOfDrive(Trial& trial);
+
+void lyingServices(Trial& trial);
+
+void fullDisk(Trial& trial);
+void shortFiles(Trial& trial);
+
+void jumpingClock(Trial& trial);
+void movingZone(Trial& trial);
+
+}  // namespace qel::trials
