@@ -184,6 +184,7 @@ TEST(ModemOnGsm, TellsItsCellsAndSignal) {
   ModemWorld world;
   world.manager->setCells(cellsAround(2));
   auto modem = modemOn(kOnGsm);
+  modem.at(kModem3gpp).at("OperatorCode") = std::string("310410");
   modem.at(kSignal).at("Gsm") = FakeDictionary{{"rssi", level(-77)}};
   world.manager->add(kModemPath, modem);
   world.start();

@@ -87,7 +87,10 @@ std::optional<double> validRsrp(std::optional<double> dbm) { return within(dbm, 
 std::optional<double> validRsrq(std::optional<double> db) { return within(db, -34, 2.5); }
 std::optional<double> validRscp(std::optional<double> dbm) { return within(dbm, -121, -24); }
 std::optional<double> validEcno(std::optional<double> db) { return within(db, -32, 0); }
-std::optional<double> validRssi(std::optional<double> dbm) { return within(dbm, -125, -20); }
+std::optional<double> validRssi(std::optional<double> dbm) {
+  constexpr double kNoSignal = -125;
+  return dbm != kNoSignal ? within(dbm, kNoSignal, -20) : std::nullopt;
+}
 std::optional<double> validSnr(std::optional<double> db) { return within(db, -30, 50); }
 
 std::optional<CellReading> cellReading(const BusProperties& cell) {

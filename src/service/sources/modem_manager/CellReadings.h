@@ -26,7 +26,7 @@ std::optional<double> validRsrp(std::optional<double> dbm);  // 36.133, clause 9
 std::optional<double> validRsrq(std::optional<double> db);   // 36.133, clause 9.1.7
 std::optional<double> validRscp(std::optional<double> dbm);  // 25.133, clause 9.1.1
 std::optional<double> validEcno(std::optional<double> db);   // 25.133, clause 9.1.2
-std::optional<double> validRssi(std::optional<double> dbm);
+std::optional<double> validRssi(std::optional<double> dbm);  // -125 is how modems say none
 std::optional<double> validSnr(std::optional<double> db);
 
 }  // namespace qel::service

@@ -66,6 +66,7 @@ struct ModemPicture {
   bool cellsKnown = false;                            // the modem lists cells
   std::vector<CellReading> neighbours;                // of all technologies
   std::optional<std::vector<BearerReading>> bearers;  // those that are connected
+  bool bearersUnread = false;                         // there are others that refuse to be read
   std::string imsi;                                   // digits, or nothing
   std::string iccid;
 };

@@ -51,6 +51,8 @@ Bytes addressOf(const BusProperties& configuration, const char* key, int family)
   std::array<std::uint8_t, 16> address{};
   const std::string text = busValue<std::string>(configuration, key).value_or("");
   if (::inet_pton(family, text.c_str(), address.data()) != 1) return {};
+  // 0.0.0.0 and :: are no addresses (RFC 1122, 3.2.1.3; RFC 4291, 2.5.2).
+  if (std::ranges::count(address, 0) == std::ssize(address)) return {};
   const std::ptrdiff_t size = family == AF_INET ? 4 : 16;
   return {address.begin(), address.begin() + size};
 }
@@ -89,21 +91,20 @@ std::optional<BearerReading> bearerReading(const BusProperties& bearer) {
   return reading;
 }
 
-// Nothing until all of them have been read.
-std::optional<std::vector<BearerReading>> bearersOf(const BusObjects& objects,
-                                                    const BusInterfaces& modem) {
+// Nothing until all of them have been asked for.
+void readBearers(ModemPicture& picture, const BusObjects& objects, const BusInterfaces& modem) {
   const auto paths =
       busValue<std::vector<sdbus::ObjectPath>>(propertiesOf(modem, mm::kModem), "Bearers");
-  if (!paths) return std::nullopt;
+  if (!paths) return;
   std::vector<BearerReading> bearers;
   for (const std::string& path : *paths) {
     const BusInterfaces& object = objectAt(objects, path);
-    if (!object.contains(mm::kBearer)) return std::nullopt;
-    if (auto bearer = bearerReading(propertiesOf(object, mm::kBearer))) {
-      bearers.push_back(std::move(*bearer));
-    }
+    if (!object.contains(mm::kBearer)) return;
+    const BusProperties& properties = propertiesOf(object, mm::kBearer);
+    if (!busValue<bool>(properties, "Connected")) picture.bearersUnread = true;
+    if (auto bearer = bearerReading(properties)) bearers.push_back(std::move(*bearer));
   }
-  return bearers;
+  picture.bearers = std::move(bearers);
 }
 
 const CellReading* servingAmong(const std::vector<CellReading>& cells,
@@ -114,11 +115,14 @@ const CellReading* servingAmong(const std::vector<CellReading>& cells,
   return found == cells.end() ? nullptr : &*found;
 }
 
-std::optional<Technology> technologyOf(std::uint32_t bits, const ModemAnswers& answers) {
-  if (bits == mm::kAnyTechnology) bits = 0;  // says nothing
-  for (const TechnologyBits& row : kTechnologies) {
-    if ((bits & row.bits) != 0) return row.technology;
-  }
+std::optional<Technology> technologyOf(std::uint32_t bits) {
+  if (bits == mm::kAnyTechnology) return std::nullopt;  // says nothing
+  const auto row = std::ranges::find_if(
+      kTechnologies, [bits](const TechnologyBits& known) { return (bits & known.bits) != 0; });
+  return row == kTechnologies.end() ? std::nullopt : std::optional(row->technology);
+}
+
+std::optional<Technology> technologyOf(const ModemAnswers& answers) {
   const CellReading* serving = answers.cells ? servingAmong(*answers.cells, {}) : nullptr;
   return serving ? std::optional(serving->technology) : std::nullopt;
 }
@@ -137,12 +141,14 @@ void complete(CellReading& cell, const CellReading& place) {
   fill(cell.network, place.network);
 }
 
-void readCells(ModemPicture& picture, const BusInterfaces& modem, const ModemAnswers& answers) {
+void readCells(ModemPicture& picture, const ModemAnswers& answers) {
   const CellReading* serving = nullptr;
   if (answers.cells) {
     serving = servingAmong(*answers.cells, picture.technology);
-    // With a serving cell of another technology the list is of before the phone moved.
-    picture.cellsKnown = serving || !servingAmong(*answers.cells, {});
+    // With a serving cell of another technology the list is of before the phone moved. Modems that
+    // list no cells of UMTS answer with an empty list there.
+    picture.cellsKnown = (serving || !servingAmong(*answers.cells, {})) &&
+                         !(answers.cells->empty() && picture.technology == Technology::umts);
   }
   if (picture.cellsKnown) {
     std::ranges::copy_if(*answers.cells, std::back_inserter(picture.neighbours),
@@ -151,14 +157,16 @@ void readCells(ModemPicture& picture, const BusInterfaces& modem, const ModemAns
   if (!picture.technology) return;
   CellReading cell = serving ? *serving : CellReading();
   cell.technology = *picture.technology;
-  std::string place = answers.place;
-  if (const auto locations = busValue<std::map<std::uint32_t, sdbus::Variant>>(
-          propertiesOf(modem, mm::kLocation), "Location");
-      locations && !placeIn(*locations).empty()) {
-    place = placeIn(*locations);
+  if (picture.network) {
+    // Some modems' lists turn the digits of networks round: 310041 for 310410.
+    if (cell.network && cell.network != picture.network) {
+      for (CellReading& neighbour : picture.neighbours) neighbour.network.reset();
+    }
+    cell.network = picture.network;
   }
-  if (const auto reading = placeReading(place, *picture.technology)) complete(cell, *reading);
-  fill(cell.network, picture.network);
+  if (const auto reading = placeReading(answers.place, *picture.technology)) {
+    complete(cell, *reading);
+  }
   if (cell.network || cell.area || cell.cellId || cell.channel || cell.code) picture.serving = cell;
 }
 
@@ -190,18 +198,24 @@ ModemPicture pictureOf(const BusObjects& objects, const std::string& modem,
   picture.registration = busUnsigned(registered, "RegistrationState");
   picture.packetService = busUnsigned(registered, "PacketServiceState");
   picture.network = networkCode(busValue<std::string>(registered, "OperatorCode").value_or(""));
-  picture.bearers = bearersOf(objects, interfaces);
+  readBearers(picture, objects, interfaces);
   const auto simPath = busValue<sdbus::ObjectPath>(own, "Sim").value_or(mm::kNoObject);
   const BusProperties& sim = propertiesOf(objectAt(objects, simPath), mm::kSim);
   picture.imsi = digitsOf(sim, "Imsi", 6, 15);             // 23.003, clause 2.2
   picture.iccid = digitsOf(sim, "SimIdentifier", 18, 20);  // ITU-T E.118
   if (isEnabled(interfaces)) {
     picture.accessTechnologies = busUnsigned(own, "AccessTechnologies").value_or(0);
-    picture.technology = technologyOf(picture.accessTechnologies, answers);
-    readCells(picture, interfaces, answers);
+    picture.technology = technologyOf(picture.accessTechnologies);
+    fill(picture.technology, technologyOf(answers));
+    readCells(picture, answers);
     readLevels(picture, interfaces);
   }
   return picture;
+}
+
+std::optional<Technology> technologyIn(const BusInterfaces& modem) {
+  return technologyOf(
+      busUnsigned(propertiesOf(modem, mm::kModem), "AccessTechnologies").value_or(0));
 }
 
 bool tellsServingCell(const ModemAnswers& answers) {
@@ -223,6 +237,12 @@ std::vector<ModemPart> partsOf(const BusInterfaces& modem) {
     if (bearer != mm::kNoObject) parts.push_back({bearer, mm::kBearer});
   }
   return parts;
+}
+
+std::string pushedPlaceIn(const BusInterfaces& modem) {
+  const auto locations = busValue<std::map<std::uint32_t, sdbus::Variant>>(
+      propertiesOf(modem, mm::kLocation), "Location");
+  return locations ? placeIn(*locations) : "";
 }
 
 std::string placeIn(const std::map<std::uint32_t, sdbus::Variant>& locations) {

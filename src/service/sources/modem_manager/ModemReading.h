@@ -17,7 +17,7 @@ using BusObjects = std::map<std::string, BusInterfaces>;
 // What methods have answered, beside the properties.
 struct ModemAnswers {
   std::optional<std::vector<CellReading>> cells;  // none: GetCellInfo is not to be had
-  std::string place;                              // of GetLocation; may be empty
+  std::string place;                              // of the serving cell; may be empty
 };
 
 // Whether the list of cells says where the serving one is.
@@ -26,6 +26,9 @@ bool tellsServingCell(const ModemAnswers& answers);
 // `modem` is a path in `objects`, where its SIM and bearers are too once they have been read.
 ModemPicture pictureOf(const BusObjects& objects, const std::string& modem,
                        const ModemAnswers& answers);
+
+// The technology in use, as far as the modem names it.
+std::optional<Technology> technologyIn(const BusInterfaces& modem);
 
 // Enabled, so that its radio works.
 bool isEnabled(const BusInterfaces& modem);
@@ -39,5 +42,7 @@ std::vector<ModemPart> partsOf(const BusInterfaces& modem);
 
 // The place of the serving cell in a dictionary of locations; empty when it is not in there.
 std::string placeIn(const std::map<std::uint32_t, sdbus::Variant>& locations);
+// The one that comes with the properties.
+std::string pushedPlaceIn(const BusInterfaces& modem);
 
 }  // namespace qel::service

@@ -157,10 +157,12 @@ std::optional<Bytes> modemMmCommonInfo(const ModemPicture& modem, std::uint64_t 
 }
 
 std::optional<Bytes> modemBearers(const ModemPicture& modem, std::uint64_t timeMs) {
-  if (!modem.bearers) return std::nullopt;
+  if (!modem.bearers || (modem.bearers->empty() && modem.bearersUnread)) return std::nullopt;
   KCellularActivatedBearerContexts message;
   message.setTimestamp(timeMs);
-  message.setBearerContextCount(static_cast<std::uint32_t>(modem.bearers->size()));
+  if (!modem.bearersUnread) {
+    message.setBearerContextCount(static_cast<std::uint32_t>(modem.bearers->size()));
+  }
   for (const BearerReading& bearer : *modem.bearers) {
     message.addBearerContexts(contextOf(bearer, modem.technology == Technology::lte));
   }

@@ -12,6 +12,7 @@ namespace {
 
 // From the technology in use; plain UMTS leaves open what else the cell offers.
 std::optional<std::int32_t> packetAccess(std::uint32_t technologies) {
+  if (technologies == mm::kAnyTechnology) return std::nullopt;
   constexpr std::int32_t kDownlink = 1;
   constexpr std::int32_t kUplink = 2;
   const bool both = (technologies & mm::kHspa) != 0;

@@ -4,7 +4,7 @@
 #include <utility>
 #include <vector>
 
-#include "service/sources/modem_manager/CellReadings.h"
+#include "service/sources/modem_manager/CellList.h"
 #include "service/sources/modem_manager/Names.h"
 
 namespace qel::service {
@@ -35,19 +35,6 @@ constexpr SettingRow kPlaceSources = {
     "no location area: not allowed to switch 3gpp-lac-ci on (polkit action "
     "org.freedesktop.ModemManager1.Device.Control)",
     "no location area: the modem does not support 3gpp-lac-ci", false};
-
-constexpr std::size_t kMostCells = 256;
-
-std::vector<CellReading> cellsIn(sdbus::MethodReply& reply) {
-  std::vector<BusProperties> cells;
-  reply >> cells;
-  std::vector<CellReading> readings;
-  for (const BusProperties& cell : cells) {
-    if (readings.size() == kMostCells) break;
-    if (auto reading = cellReading(cell)) readings.push_back(std::move(*reading));
-  }
-  return readings;
-}
 
 std::string identityOf(const std::string& path, const BusInterfaces& modem) {
   const auto imei = busValue<std::string>(propertiesOf(modem, mm::kModem), "EquipmentIdentifier");
@@ -94,9 +81,9 @@ WatchedModem::WatchedModem(const std::string& modem, std::chrono::milliseconds p
           [this](sdbus::MethodReply& reply) {
             std::map<std::uint32_t, sdbus::Variant> locations;
             reply >> locations;
-            _answers.place = placeIn(locations);
+            _askedPlace = placeIn(locations);
           },
-          [this] { _answers.place.clear(); }),
+          [this] { _askedPlace.clear(); }),
       _signalRate(kSignalRate, modem, rateIn,
                   [rateS = wholeSeconds(period)](const std::tuple<std::uint32_t>& found) {
                     const auto [now] = found;
@@ -113,13 +100,15 @@ void WatchedModem::step(BusCalls& calls, SaidOnce& said, const BusInterfaces& mo
                         Clock::time_point now) {
   if (!isEnabled(modem)) {
     _answers = {};
+    _pushedPlace = {};
+    _askedPlace.clear();
     return;
   }
   const std::uint32_t technologies =
       busUnsigned(propertiesOf(modem, mm::kModem), "AccessTechnologies").value_or(0);
   // The cells and the place are of before the phone moved.
   if (std::exchange(_accessTechnologies, technologies) != technologies) {
-    _answers.place.clear();
+    _askedPlace.clear();
     _cells.callSoon();
     _place.callSoon();
   }
@@ -128,8 +117,11 @@ void WatchedModem::step(BusCalls& calls, SaidOnce& said, const BusInterfaces& mo
   if (placeMustBeAsked(modem)) {
     _place.step(calls, said, identity, now, _period);
   } else {
-    _answers.place.clear();
+    _askedPlace.clear();
   }
+  _pushedPlace.notice(pushedPlaceIn(modem), technologyIn(modem), now);
+  const std::string pushed = _pushedPlace.current();
+  _answers.place = pushed.empty() ? _askedPlace : pushed;
   _signalRate.step(calls, said, identity, modem, now);
   _placeSources.step(calls, said, identity, modem, now);
 }

@@ -8,6 +8,7 @@
 #include "service/sources/modem_manager/BusCalls.h"
 #include "service/sources/modem_manager/ModemReading.h"
 #include "service/sources/modem_manager/PolledMethod.h"
+#include "service/sources/modem_manager/PushedPlace.h"
 #include "service/sources/modem_manager/SaidOnce.h"
 #include "service/sources/modem_manager/SharedSetting.h"
 
@@ -38,6 +39,8 @@ class WatchedModem {
   const std::string _path;
   const std::chrono::milliseconds _period;
   ModemAnswers _answers;
+  PushedPlace _pushedPlace;
+  std::string _askedPlace;
   PolledMethod _cells;
   PolledMethod _place;
   SharedSetting<std::uint32_t> _signalRate;
