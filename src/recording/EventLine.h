@@ -5,17 +5,16 @@
 #include <string_view>
 #include <variant>
 
+#include "recording/JsonLine.h"
 #include "recording/RecordedEvent.h"
 
 namespace qel {
 
-// Why a line is no event. A line that is no JSON at all may be one that was cut off.
-struct LineFault {
-  bool isJson = false;
-  std::string reason;
-};
-
+// In linear time. Whatever is wrong with the line, beyond its limits too, is a fault.
 std::variant<RecordedEvent, LineFault> parseEventLine(std::string_view line);
+
+// Whether a reader takes the line of the event for it, if the line is not too long.
+bool hasReadableForm(const RecordedEvent& event);
 
 // Without the newline. Bytes other than the payload are written as their "<hex>" text.
 std::string eventLine(const RecordedEvent& event);

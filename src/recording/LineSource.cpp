@@ -1,83 +1,45 @@
 #include "recording/LineSource.h"
 
-#include <fcntl.h>
-#include <sys/stat.h>
-#include <unistd.h>
-#include <zlib.h>
+#include <algorithm>
+#include <utility>
 
-#include <cerrno>
-#include <cstring>
+#include "recording/LineLimits.h"
 
 namespace qel {
-namespace {
-
-constexpr std::size_t kChunkBytes = 64 * 1024;
-constexpr std::size_t kLongestLineBytes = 16 * 1024 * 1024;
-
-}  // namespace
 
 std::unique_ptr<LineSource> LineSource::open(const std::string& path, std::string& error) {
-  const int descriptor = ::open(path.c_str(), O_RDONLY | O_CLOEXEC);
-  if (descriptor < 0) {
-    error = std::strerror(errno);
-    return nullptr;
-  }
-  struct stat status {};
-  if (::fstat(descriptor, &status) == 0 && S_ISDIR(status.st_mode)) {
-    ::close(descriptor);
-    error = std::strerror(EISDIR);
-    return nullptr;
-  }
-  // zlib reads a file that does not begin as gzip as it stands.
-  gzFile file = ::gzdopen(descriptor, "rb");
-  if (!file) {
-    ::close(descriptor);
-    error = std::strerror(ENOMEM);
-    return nullptr;
-  }
-  return std::unique_ptr<LineSource>(new LineSource(file));
+  auto bytes = FileBytes::open(path, error);
+  if (!bytes) return nullptr;
+  return std::unique_ptr<LineSource>(new LineSource(std::move(bytes)));
 }
 
-LineSource::~LineSource() { ::gzclose(_file); }
-
 bool LineSource::fill() {
-  if (_ended) return false;
-  _chunk.resize(kChunkBytes);
-  _position = 0;
-  const int count = ::gzread(_file, _chunk.data(), kChunkBytes);
-  _chunk.resize(count > 0 ? static_cast<std::size_t>(count) : 0);
-  if (count > 0) return true;
-  _ended = true;
-  int code = Z_OK;
-  const char* const text = ::gzerror(_file, &code);
-  if (code == Z_BUF_ERROR) {
-    _streamCutOff = true;
-  } else if (count < 0) {
-    _errorIsDamage = code != Z_ERRNO;
-    _error = _errorIsDamage ? "damaged gzip data" : text;
-  }
-  return false;
+  if (!_ended) _chunk = _bytes->next();
+  _ended = _chunk.empty();
+  return !_ended;
+}
+
+std::string LineSource::error() const {
+  return errorIsDamage() ? "damaged gzip data" : _bytes->error();
 }
 
 LineSource::Outcome LineSource::next(std::string& line) {
   line.clear();
   bool tooLong = false;
-  while (_position < _chunk.size() || fill()) {
-    const std::size_t newline = _chunk.find('\n', _position);
-    const std::size_t stop = newline == std::string::npos ? _chunk.size() : newline;
-    if (line.size() + (stop - _position) > kLongestLineBytes) {
-      tooLong = true;
-      line.clear();
-    }
-    if (!tooLong) line.append(_chunk, _position, stop - _position);
-    _position = stop;
-    if (newline == std::string::npos) continue;
-    ++_position;
-    return tooLong ? Outcome::tooLong : Outcome::line;
+  while (!_chunk.empty() || fill()) {
+    const std::size_t size = std::min(_chunk.find('\n'), _chunk.size());
+    tooLong = tooLong || line.size() + size > kLongestLineBytes;
+    if (!tooLong) line.append(_chunk, 0, size);
+    const bool isWhole = size < _chunk.size();
+    _chunk.remove_prefix(size + (isWhole ? 1 : 0));
+    if (isWhole) return tooLong ? Outcome::tooLong : Outcome::line;
   }
-  if (!_error.empty()) return Outcome::failed;
+  const FileBytes::End why = _bytes->end();
+  if (why == FileBytes::End::damaged || why == FileBytes::End::failed) return Outcome::failed;
   if (tooLong) return Outcome::tooLong;
-  return line.empty() ? Outcome::end : Outcome::unfinished;
+  if (!line.empty()) return Outcome::unfinished;
+  const bool isRest = why == FileBytes::End::notCompressed && !std::exchange(_restTold, true);
+  return isRest ? Outcome::notCompressed : Outcome::end;
 }
 
 }  // namespace qel

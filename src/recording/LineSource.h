@@ -1,51 +1,47 @@
 // Lines of a text file, plain or gzip, one at a time.
 #pragma once
 
-#include <cstddef>
+#include <cstdint>
 #include <memory>
 #include <string>
+#include <string_view>
 
-struct gzFile_s;
+#include "recording/FileBytes.h"
 
 namespace qel {
 
 // Holds one chunk and one line of the file, never more. One thread.
 class LineSource {
  public:
-  enum class Outcome {
-    line,        // a line that ended with a newline
-    unfinished,  // the last bytes of the file, without a newline
-    tooLong,     // a line beyond the limit; its rest was skipped
-    end,         // nothing left
-    failed,      // the file cannot be read on: see error()
+  enum class Outcome : std::uint8_t {
+    line,           // a line that ended with a newline
+    unfinished,     // the last bytes of the file, without a newline
+    tooLong,        // a line beyond the limit; its rest was skipped
+    notCompressed,  // all that follows a compressed stream and is none
+    end,            // nothing left
+    failed,         // the file cannot be read on: see error()
   };
 
   // Nothing when the file cannot be opened; `error` then says why.
   static std::unique_ptr<LineSource> open(const std::string& path, std::string& error);
-  ~LineSource();
-  LineSource(const LineSource&) = delete;
-  LineSource& operator=(const LineSource&) = delete;
 
   Outcome next(std::string& line);
 
   // At the end: the gzip stream stopped in the middle.
-  bool streamCutOff() const { return _streamCutOff; }
+  bool streamCutOff() const { return _bytes->end() == FileBytes::End::cutOff; }
   // After `failed`.
-  const std::string& error() const { return _error; }
-  bool errorIsDamage() const { return _errorIsDamage; }
+  std::string error() const;
+  bool errorIsDamage() const { return _bytes->end() == FileBytes::End::damaged; }
 
  private:
-  explicit LineSource(gzFile_s* file) : _file(file) {}
+  explicit LineSource(std::unique_ptr<FileBytes> bytes) : _bytes(std::move(bytes)) {}
   // False at the end of the file, or on failure.
   bool fill();
 
-  gzFile_s* _file;
-  std::string _chunk;
-  std::size_t _position = 0;
+  const std::unique_ptr<FileBytes> _bytes;
+  std::string_view _chunk;
   bool _ended = false;
-  bool _streamCutOff = false;
-  bool _errorIsDamage = false;
-  std::string _error;
+  bool _restTold = false;  // that there is something else behind the stream
 };
 
 }  // namespace qel

@@ -5,6 +5,7 @@
 #include <utility>
 
 #include "base/Bytes.h"
+#include "recording/LineLimits.h"
 
 namespace qel {
 namespace {
@@ -101,7 +102,8 @@ class PlainLine {
     if (*key == kRecordedTimeKey) return readTime(scanner);
     if (*key == kRecordedEventKey) return readKind(scanner);
     auto value = readValue(*key, scanner);
-    if (!value || event.entries.contains(*key)) return false;
+    if (!value || event.entries.size() + kKeysOfTheLine == kMostKeysOfAnObject) return false;
+    if (event.entries.contains(*key)) return false;
     event.entries.append(keyText(*key), std::move(*value));
     return true;
   }

@@ -39,6 +39,10 @@ std::optional<RecordedEvent> RecordingReader::take(LineSource::Outcome outcome) 
     reject("line too long");
     return std::nullopt;
   }
+  if (outcome == LineSource::Outcome::notCompressed) {
+    reject("not compressed, as what comes before it is");
+    return std::nullopt;
+  }
   auto parsed = parseEventLine(_line);
   if (auto* event = std::get_if<RecordedEvent>(&parsed)) return std::move(*event);
   const LineFault& bad = std::get<LineFault>(parsed);

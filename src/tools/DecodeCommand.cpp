@@ -4,13 +4,13 @@
 #include <iostream>
 #include <iterator>
 #include <memory>
-#include <nlohmann/json.hpp>
 #include <optional>
 #include <string>
 
 #include "base/Bytes.h"
 #include "base/Rendering.h"
 #include "messages/catalogue/MetricMessages.h"
+#include "recording/JsonLine.h"
 #include "tools/Commands.h"
 #include "tools/MetricArgument.h"
 #include "tools/ToolError.h"
@@ -31,8 +31,29 @@ std::string rendered(const PBCodable& message, const Options& options, const cha
   return jsonText(message.dictionaryRepresentation());
 }
 
+// Of a line of a batch, and of a payload on standard input.
+constexpr std::size_t kLongestInputBytes = 16 * 1024 * 1024;
+
+// Takes characters up to the end or the given one. False when there are too many.
+template <class Buffer>
+bool takeInput(Buffer& taken, std::optional<char> end) {
+  using Traits = std::char_traits<char>;
+  std::streambuf& input = *std::cin.rdbuf();
+  for (int next = input.sbumpc(); next != Traits::eof(); next = input.sbumpc()) {
+    const char c = Traits::to_char_type(next);
+    if (c == end) return true;
+    if (taken.size() == kLongestInputBytes) return false;
+    taken.push_back(static_cast<typename Buffer::value_type>(c));
+  }
+  return true;
+}
+
 Bytes standardInput() {
-  return Bytes(std::istreambuf_iterator<char>(std::cin), std::istreambuf_iterator<char>());
+  Bytes bytes;
+  if (!takeInput(bytes, std::nullopt)) {
+    throw ToolError(EX_DATAERR, "standard input", "longer than 16 MB");
+  }
+  return bytes;
 }
 
 void decodeOne(const Options& options, Output& output) {
@@ -54,20 +75,29 @@ struct Request {
   Bytes payload;
 };
 
+// A number that is no 64-bit integer is that of no metric.
+std::int64_t metricOf(const Value& value) {
+  const bool isInteger =
+      value.kind() == Value::Kind::signedInteger || value.kind() == Value::Kind::unsignedInteger;
+  if (!isInteger) throw std::invalid_argument("\"metric\" is not an integer");
+  return value.asInt64().value_or(-1);
+}
+
 Request parseRequest(const std::string& line) {
-  const auto json = nlohmann::json::parse(line, nullptr, false);
-  if (!json.is_object()) throw std::invalid_argument("not a JSON object");
-  const auto metric = json.find("metric");
-  if (metric == json.end() || !metric->is_number_integer()) {
-    throw std::invalid_argument("\"metric\" is not an integer");
+  const auto parsed = parseJsonLine(line);
+  const auto* object = std::get_if<Dictionary>(&parsed);
+  if (!object) {
+    const LineFault& fault = std::get<LineFault>(parsed);
+    throw std::invalid_argument(fault.isJson ? fault.reason : "not a JSON object");
   }
-  const auto payload = json.find("payload");
-  if (payload == json.end() || !payload->is_string()) {
-    throw std::invalid_argument("\"payload\" is not a string");
-  }
-  auto bytes = bytesFromHex(payload->get_ref<const std::string&>());
+  const Value* metric = object->find("metric");
+  if (!metric) throw std::invalid_argument("\"metric\" is not an integer");
+  const Value* payload = object->find("payload");
+  const auto hex = payload ? payload->asText() : std::nullopt;
+  if (!hex) throw std::invalid_argument("\"payload\" is not a string");
+  auto bytes = bytesFromHex(*hex);
   if (!bytes) throw std::invalid_argument("\"payload\" is not hexadecimal bytes");
-  return {metric->get<std::int64_t>(), std::move(*bytes)};
+  return {metricOf(*metric), std::move(*bytes)};
 }
 
 std::shared_ptr<PBCodable> decoded(const Request& request) {
@@ -79,8 +109,10 @@ std::shared_ptr<PBCodable> decoded(const Request& request) {
 void decodeBatch(const Options& options, Output& output) {
   std::ios::sync_with_stdio(false);
   std::string line;
-  for (std::size_t number = 1; std::getline(std::cin, line); ++number) {
+  for (std::size_t number = 1; std::cin.peek() != EOF; ++number) {
     try {
+      line.clear();
+      if (!takeInput(line, '\n')) throw std::invalid_argument("longer than 16 MB");
       const auto message = decoded(parseRequest(line));
       output.line(message ? rendered(*message, options, "\"") : "null");
     } catch (const std::invalid_argument& error) {

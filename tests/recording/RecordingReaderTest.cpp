@@ -178,6 +178,70 @@ TEST(RecordingReader, ALineBeyondReasonIsBadAndTheNextIsFound) {
   EXPECT_EQ(readAll(file, BadLines::skip).timesMs, (Times{1, 2}));
 }
 
+TEST(RecordingReader, ALineOfTheLongestLengthIsRead) {
+  std::string line(kFirst.substr(0, kFirst.size() - 1));
+  line.resize(1024 * 1024, ' ');
+  const TemporaryFile longest(".jsonl", text({line, "\n", kSecond}));
+  EXPECT_EQ(readAll(longest).timesMs, (Times{1, 2}));
+  const TemporaryFile longer(".jsonl", text({line, " \n", kSecond}));
+  EXPECT_EQ(readAll(longer).fault->message, longer.path() + ":1: line too long");
+}
+
+TEST(RecordingReader, WhatDecompressesToAnEndlessLineIsOneBadLine) {
+  const TemporaryFile file(".gz",
+                           gzipped(text({kFirst, std::string(64U << 20U, ' '), "\n", kSecond})));
+  const Read read = readAll(file, BadLines::skip);
+  EXPECT_EQ(read.timesMs, (Times{1, 2}));
+  EXPECT_EQ(read.skipped, 1U);
+}
+
+// Ended the program, with --skip-bad too.
+TEST(RecordingReader, ANumberOutOfRangeIsABadLine) {
+  const TemporaryFile file(
+      ".jsonl",
+      text({kFirst, "{\"time_ms\": 1, \"event\": \"trigger\", \"x\": 1e400}\n", kSecond}));
+  EXPECT_EQ(readAll(file).fault->message,
+            file.path() + ":2: \"x\" is nested too deep or out of range");
+  EXPECT_EQ(readAll(file, BadLines::skip).timesMs, (Times{1, 2}));
+}
+
+TEST(RecordingReader, ReadsCompressedStreamsInARow) {
+  const std::string half = gzipped("{\"time_ms\": 3, \"event\": ");
+  const std::string otherHalf = gzipped("\"trigger\"}\n");
+  const TemporaryFile file(".gz",
+                           text({gzipped(kFirst), gzipped(""), half, otherHalf, gzipped(kSecond)}));
+  const Read read = readAll(file);
+  EXPECT_EQ(read.timesMs, (Times{1, 3, 2}));
+  EXPECT_FALSE(read.fault);
+  EXPECT_FALSE(read.cutOff);
+}
+
+TEST(RecordingReader, TheLastOfSeveralStreamsMayEndAnywhere) {
+  const std::string last = gzipped(kSecond);
+  for (std::size_t length = 1; length < last.size(); ++length) {
+    const TemporaryFile file(".gz",
+                             text({gzipped(kFirst), std::string_view(last).substr(0, length)}));
+    const Read read = readAll(file);
+    EXPECT_EQ(read.timesMs.front(), 1U) << length;
+    EXPECT_FALSE(read.fault) << length;
+    EXPECT_TRUE(read.cutOff) << length;
+  }
+}
+
+// Was dropped without a word.
+TEST(RecordingReader, PlainTextBehindACompressedStreamIsABadLine) {
+  const TemporaryFile file(".gz", text({gzipped(text({kFirst, kSecond})), kFirst, kSecond}));
+  const Read failed = readAll(file);
+  EXPECT_EQ(failed.timesMs, (Times{1, 2}));
+  ASSERT_TRUE(failed.fault);
+  EXPECT_EQ(failed.fault->kind, RecordingFault::Kind::badData);
+  EXPECT_EQ(failed.fault->message, file.path() + ":3: not compressed, as what comes before it is");
+  const Read skipped = readAll(file, BadLines::skip);
+  EXPECT_EQ(skipped.timesMs, (Times{1, 2}));
+  EXPECT_EQ(skipped.skipped, 1U);
+  EXPECT_FALSE(skipped.fault);
+}
+
 TEST(RecordingReader, CountsLinesFromOne) {
   const TemporaryFile file(".jsonl", text({kFirst, kSecond}));
   RecordingFault fault;

@@ -44,6 +44,30 @@ TEST(Qelctl, refusesBadData) {
   expectError({"decode", "19972", "08"}, 65, "KCellularLteRrcState: the payload cannot be decoded");
 }
 
+// Ended with an internal error, with --skip-bad too.
+TEST(Qelctl, namesTheLineOfANumberOutOfRange) {
+  const TemporaryRecording recording(std::string("{\"time_ms\": 1e400}\n") + kTriggerLine);
+  expectError({"replay", recording.path()}, 65, recording.path() + ":1: \"time_ms\" is");
+  const Outcome skipped = qelctl({"replay", recording.path(), "--skip-bad"});
+  EXPECT_EQ(skipped.exitCode, 0);
+  EXPECT_EQ(skipped.err, "qelctl: " + recording.path() + ": bad lines skipped: 1\n");
+  const Outcome batch = qelctl({"decode", "--batch"}, R"({"metric": 1e400, "payload": ""})");
+  EXPECT_EQ(batch.exitCode, 65);
+  EXPECT_EQ(batch.err,
+            "qelctl: standard input, line 1: \"metric\" is nested too deep or out of range\n");
+}
+
+TEST(Qelctl, readsNoEndlessInput) {
+  const std::string zeros = " < /dev/zero; echo $? >&2";
+  for (const char* arguments : {" decode 19972", " decode --batch"}) {
+    const Outcome outcome = run("/bin/sh", {"-c", std::string(QEL_QELCTL) + arguments + zeros});
+    const auto lines = linesOf(outcome.err);
+    ASSERT_EQ(lines.size(), 2U) << outcome.err;
+    EXPECT_TRUE(lines[0].ends_with(": longer than 16 MB")) << lines[0];
+    EXPECT_EQ(lines[1], "65");
+  }
+}
+
 TEST(Qelctl, saysThatAFileIsNotThere) {
   for (const char* command : {"replay", "store", "screens"}) {
     expectError({command, "/nonexistent.jsonl"}, 66, "/nonexistent.jsonl");
