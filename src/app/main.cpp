@@ -3,6 +3,7 @@
 #include <QtGui/QGuiApplication>
 #include <QtQml/QQmlApplicationEngine>
 #include <QtQuick/QQuickWindow>
+#include <csignal>
 #include <cstdlib>
 #include <iostream>
 #include <memory>
@@ -88,6 +89,7 @@ int main(int argc, char** argv) {
   int exitCode = EXIT_SUCCESS;
   const auto options = qel::parseOptions(argc, argv, exitCode);
   if (!options) return exitCode;
+  std::signal(SIGXFSZ, SIG_IGN);  // a file at its limit shows as a failed write
   if (options->verbose) logOnStandardErrorToo();
   qel::Source source;
   exitCode = source.open(*options);

@@ -1,6 +1,7 @@
 #include "recording/RecordingWriter.h"
 
 #include <fcntl.h>
+#include <sys/stat.h>
 #include <unistd.h>
 
 #include <cerrno>
@@ -9,6 +10,7 @@
 
 #include "recording/EventLine.h"
 #include "recording/LineCompressor.h"
+#include "recording/LineLimits.h"
 
 namespace qel {
 namespace {
@@ -20,15 +22,30 @@ ByteView bytesOf(std::string_view text) {
   return {reinterpret_cast<const std::uint8_t*>(text.data()), text.size()};
 }
 
+// Empties a file that was there and takes it away from everybody else. Empty, or why that fails.
+std::string takeOver(int descriptor) {
+  struct stat status {};
+  if (::fstat(descriptor, &status) != 0) return std::strerror(errno);
+  if (!S_ISREG(status.st_mode)) return {};
+  // Whoever owns a file reads it whatever its mode says.
+  if (status.st_uid != ::geteuid()) return "belongs to another user";
+  if (::fchmod(descriptor, kFileMode) != 0 || ::ftruncate(descriptor, 0) != 0) {
+    return std::strerror(errno);
+  }
+  return {};
+}
+
 }  // namespace
 
 std::unique_ptr<RecordingWriter> RecordingWriter::create(const std::string& path,
                                                          std::string& error, Existing existing) {
-  const int whenThere = existing == Existing::refused ? O_EXCL : O_TRUNC;
+  const int whenThere = existing == Existing::refused ? O_EXCL : 0;
   const int descriptor =
       ::open(path.c_str(), O_WRONLY | O_CREAT | O_CLOEXEC | whenThere, kFileMode);
-  if (descriptor < 0) {
-    error = path + ": " + std::strerror(errno);
+  std::string why = descriptor < 0 ? std::strerror(errno) : takeOver(descriptor);
+  if (!why.empty()) {
+    if (descriptor >= 0) ::close(descriptor);
+    error = path + ": " + why;
     return nullptr;
   }
   return std::unique_ptr<RecordingWriter>(
@@ -67,7 +84,12 @@ bool RecordingWriter::put(ByteView bytes) {
 bool RecordingWriter::write(const RecordedEvent& event) {
   if (!_error.empty()) return false;
   if (_descriptor < 0) return fail(EBADF);
-  const std::string line = eventLine(event) + '\n';
+  std::string line = hasReadableForm(event) ? eventLine(event) : "";
+  if (line.empty() || line.size() > kLongestLineBytes) {
+    ++_eventsLeftOut;
+    return true;
+  }
+  line += '\n';
   if (!put(_compressor ? ByteView(_compressor->line(line)) : bytesOf(line))) return false;
   ++_eventsWritten;
   return true;

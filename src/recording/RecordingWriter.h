@@ -19,8 +19,9 @@ class RecordingWriter {
   // What becomes of a file that is there already.
   enum class Existing : std::uint8_t { replaced, refused };
 
-  // Gzip when the name ends in ".gz". Others than the owner may not read it. Nothing when it cannot
-  // be opened; `error` is then one line, "FILE: WHY".
+  // Gzip when the name ends in ".gz". Others than the owner may not read it, also when the file was
+  // there; one that belongs to somebody else is refused. Nothing when it cannot be opened; `error`
+  // is then one line, "FILE: WHY".
   static std::unique_ptr<RecordingWriter> create(const std::string& path, std::string& error,
                                                  Existing existing = Existing::replaced);
   // Plain text to a descriptor, which stays the caller's. `name` stands for the file in errors.
@@ -29,7 +30,8 @@ class RecordingWriter {
   RecordingWriter(const RecordingWriter&) = delete;
   RecordingWriter& operator=(const RecordingWriter&) = delete;
 
-  // False when the file could not be written; from then on nothing is written any more.
+  // False when the file could not be written; from then on nothing is written any more. An event
+  // whose line no reader would take is left out.
   bool write(const RecordedEvent& event);
   // Waits until what was written is on the disk, where there is one.
   void sync() const;
@@ -37,6 +39,7 @@ class RecordingWriter {
   bool close();
 
   std::uint64_t eventsWritten() const { return _eventsWritten; }
+  std::uint64_t eventsLeftOut() const { return _eventsLeftOut; }
   // As they are in the file.
   std::uint64_t bytesWritten() const { return _bytesWritten; }
   // After a false: one line, "FILE: WHY", and the error number.
@@ -52,6 +55,7 @@ class RecordingWriter {
   int _descriptor;
   std::unique_ptr<LineCompressor> _compressor;  // none: plain text
   std::uint64_t _eventsWritten = 0;
+  std::uint64_t _eventsLeftOut = 0;
   std::uint64_t _bytesWritten = 0;
   std::string _error;
   int _errorNumber = 0;

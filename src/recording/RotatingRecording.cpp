@@ -133,6 +133,7 @@ bool RotatingRecording::rotate(TimePoint now) {
   if (!next) return false;
   syncDirectory(directoryOf(_path));
   _finishedEvents += _writer->eventsWritten();
+  _finishedLeftOut += _writer->eventsLeftOut();
   _finishedBytes += _writer->bytesWritten();
   ++_filesFinished;
   _writer = std::move(next);

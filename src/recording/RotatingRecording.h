@@ -41,6 +41,8 @@ class RotatingRecording {
 
   // Over all files.
   std::uint64_t events() const { return _finishedEvents + _writer->eventsWritten(); }
+  // Events whose line no reader would take.
+  std::uint64_t eventsLeftOut() const { return _finishedLeftOut + _writer->eventsLeftOut(); }
   std::uint64_t bytes() const { return _finishedBytes + _writer->bytesWritten(); }
   std::uint64_t filesFinished() const { return _filesFinished; }
 
@@ -61,6 +63,7 @@ class RotatingRecording {
   TimePoint _begun;
   TimePoint _synced;
   std::uint64_t _finishedEvents = 0;
+  std::uint64_t _finishedLeftOut = 0;
   std::uint64_t _finishedBytes = 0;
   std::uint64_t _filesFinished = 0;
   std::string _error;

@@ -3,21 +3,13 @@
 #include <chrono>
 #include <utility>
 
+#include "recording/EventLine.h"
 #include "tesk/Constants.h"
 
 namespace qel::tools {
 namespace {
 
 using std::chrono::steady_clock;
-
-// Whether a reader of recordings would take it for an event.
-bool hasForm(const RecordedEvent& event) {
-  const Value* payload = event.entries.find(kRecordedPayloadKey);
-  if (payload && !payload->asBytes()) return false;
-  if (event.kind != RecordedKind::metric) return true;
-  const Value* metric = event.entries.find(kRecordedMetricKey);
-  return metric && metric->kind() != Value::Kind::floating && metric->asInt64();
-}
 
 }  // namespace
 
@@ -26,7 +18,7 @@ Recorder::Recorder(std::unique_ptr<RotatingRecording> recording,
     : _recording(std::move(recording)), _hider(std::move(hider)), _clock(clock) {}
 
 bool Recorder::isRecordable(RecordedEvent& event) {
-  if (!hasForm(event)) {
+  if (!hasReadableForm(event)) {
     ++_shapeless;
     return false;
   }
@@ -53,8 +45,9 @@ bool Recorder::close() {
 
 Recorder::Progress Recorder::progress() const {
   const std::lock_guard lock(_mutex);
+  const std::uint64_t formless = _shapeless + _recording->eventsLeftOut();
   return {_recording->events(), _recording->bytes(), _recording->filesFinished(),
-          _shapeless + (_hider ? _hider->undecodable() : 0), _hider ? _hider->stripped() : 0};
+          formless + (_hider ? _hider->undecodable() : 0), _hider ? _hider->stripped() : 0};
 }
 
 std::string Recorder::error() const {

@@ -59,6 +59,7 @@ int main(int argc, char* argv[]) {
   }
 
   std::signal(SIGPIPE, SIG_IGN);  // a closed pipe shows as a failed write
+  std::signal(SIGXFSZ, SIG_IGN);  // and so does a file that has reached its limit
   setSystemLog(verbose ? std::make_shared<DescriptorSink>(STDERR_FILENO) : nullptr);
   tools::Output output;
   try {

@@ -122,6 +122,119 @@ TEST(EventLine, DeepNestingIsRefusedWithoutHarm) {
               HasSubstr("nested too deep"));
 }
 
+std::string lineWith(const std::string& entries) {
+  return R"({"time_ms": 1, "event": "trigger")" + entries + "}";
+}
+
+// Ended the program with the parser's exception.
+TEST(EventLine, ANumberBeyondEveryTypeIsAFaultOfItsLine) {
+  for (const char* number : {"1e400", "-1e400", "1e999999999", "[[1e400]]", "{\"y\": 1e400}"}) {
+    const LineFault fault = faultOf(lineWith(std::string(R"(, "x": )") + number));
+    EXPECT_EQ(fault.reason, "\"x\" is nested too deep or out of range") << number;
+    EXPECT_TRUE(fault.isJson) << number;
+  }
+  EXPECT_TRUE(faultOf(R"({"time_ms": 1e400, "event": "trigger"})").isJson);
+  EXPECT_EQ(faultOf("1e400").reason, "not a JSON object");
+  EXPECT_EQ(faultOf("[1e400]").reason, "not a JSON object");
+}
+
+TEST(EventLine, NumbersTooSmallForTheirTypeAreZero) {
+  EXPECT_EQ(eventOf(lineWith(R"(, "x": 1e-400, "y": -1e-60)")).entries,
+            (Dictionary{{"x", 0.0F}, {"y", -0.0F}}));
+}
+
+// The largest number was written in digits that were then out of range.
+TEST(EventLine, TheLargestNumberIsReadAsItIsWritten) {
+  RecordedEvent event;
+  event.kind = RecordedKind::trigger;
+  event.entries = {{"x", std::numeric_limits<float>::max()},
+                   {"y", std::numeric_limits<float>::lowest()}};
+  EXPECT_EQ(eventOf(eventLine(event)).entries, event.entries);
+  EXPECT_FALSE(faultOf(lineWith(R"(, "x": 3.5e38)")).reason.empty());
+}
+
+std::string keys(std::size_t count) {
+  std::string text;
+  for (std::size_t i = 0; i < count; ++i) text += ", \"k" + std::to_string(i) + "\": 1";
+  return text;
+}
+
+// Each key was compared with all those before it: 300,000 of them took minutes.
+TEST(EventLine, KeysBeyondTheLimitAreNotRead) {
+  EXPECT_EQ(eventOf(lineWith(keys(254))).entries.size(), 254U);
+  EXPECT_EQ(eventOf(lineWith(keys(253) + R"(, "x": null)")).entries.size(), 254U) << "not plain";
+  for (const char* more : {"", R"(, "x": null)"}) {
+    const LineFault fault = faultOf(lineWith(keys(255) + more));
+    EXPECT_EQ(fault.reason, "more than 256 keys in one object");
+    EXPECT_TRUE(fault.isJson);
+  }
+  EXPECT_EQ(faultOf(lineWith(keys(300'000))).reason, "more than 256 keys in one object");
+  EXPECT_EQ(faultOf(lineWith(R"(, "x": {"a": 1)" + keys(256) + "}")).reason,
+            "more than 256 keys in one object");
+}
+
+TEST(EventLine, ValuesBeyondTheLimitAreNotRead) {
+  const auto list = [](std::size_t count) {
+    std::string text = R"(, "x": [0)";
+    for (std::size_t i = 1; i < count; ++i) text += ",0";
+    return lineWith(text + "]");
+  };
+  EXPECT_EQ(eventOf(list(65536 - 3)).entries.find("x")->asList()->size(), 65533U);
+  EXPECT_EQ(faultOf(list(65536 - 2)).reason, "more than 65536 values");
+}
+
+TEST(EventLine, ObjectsAndArraysNestAsDeepAsTheLimit) {
+  const auto nested = [](std::size_t depth) {
+    return lineWith(R"(, "x": )" + std::string(depth, '[') + std::string(depth, ']'));
+  };
+  EXPECT_EQ(eventOf(nested(31)).entries.size(), 1U);
+  EXPECT_THAT(faultOf(nested(32)).reason, HasSubstr("nested too deep"));
+}
+
+TEST(EventLine, OfAKeyThatComesAgainTheLastValueCounts) {
+  EXPECT_EQ(eventOf(lineWith(R"(, "x": 1, "y": 2, "x": 3, "time_ms": 9)")).entries,
+            (Dictionary{{"x", 3}, {"y", 2}}));
+}
+
+TEST(EventLine, AFaultQuotesNoMoreThanAMessageCanHold) {
+  const std::string name(100'000, 'n');
+  EXPECT_LT(faultOf(R"({"time_ms": 1, "event": ")" + name + "\"}").reason.size(), 200U);
+  EXPECT_LT(faultOf(lineWith(", \"" + name + "\": 1e300")).reason.size(), 200U);
+}
+
+Value nestedLists(std::size_t depth) {
+  Value value{List()};
+  for (std::size_t i = 1; i < depth; ++i) value = List{std::move(value)};
+  return value;
+}
+
+Dictionary numbered(std::size_t count) {
+  Dictionary dictionary;
+  for (std::size_t i = 0; i < count; ++i) dictionary.append(std::to_string(i), 1);
+  return dictionary;
+}
+
+TEST(EventLine, WhatHasAReadableFormIsReadAndNothingElse) {
+  const auto isRead = [](Dictionary entries) {
+    RecordedEvent event;
+    event.kind = RecordedKind::trigger;
+    event.entries = std::move(entries);
+    const bool read = std::holds_alternative<RecordedEvent>(parseEventLine(eventLine(event)));
+    EXPECT_EQ(hasReadableForm(event), read);
+    return read;
+  };
+  EXPECT_TRUE(isRead(numbered(254)));
+  EXPECT_FALSE(isRead(numbered(255)));
+  EXPECT_TRUE(isRead({{"x", numbered(256)}}));
+  EXPECT_FALSE(isRead({{"x", numbered(257)}}));
+  EXPECT_TRUE(isRead({{"x", nestedLists(31)}}));
+  EXPECT_FALSE(isRead({{"x", nestedLists(32)}}));
+  EXPECT_TRUE(isRead({{"x", List(65536 - 3, Value(1))}}));
+  EXPECT_FALSE(isRead({{"x", List(65536 - 2, Value(1))}}));
+  EXPECT_FALSE(isRead({{"kKeyPayload", "no base64"}}));
+  EXPECT_TRUE(isRead({{"x", "\xFF\0\n"}, {"y", std::numeric_limits<float>::quiet_NaN()}}));
+}
+
 TEST(EventLine, WritingAndReadingGiveTheSameEvent) {
   RecordedEvent event;
   event.timeMs = 1'700'000'000'123;

@@ -2,6 +2,7 @@
 
 #include <gmock/gmock.h>
 #include <signal.h>
+#include <sys/stat.h>
 #include <sys/wait.h>
 #include <unistd.h>
 
@@ -52,6 +53,18 @@ TEST_P(RecordingWriterOf, WritesWhatTheReaderReads) {
   const Content content = contentOf(file.path());
   EXPECT_EQ(content.events, 100U);
   EXPECT_FALSE(content.cutOff);
+}
+
+// A file that everybody could read stayed so.
+TEST_P(RecordingWriterOf, TakesAFileThatWasThereAwayFromOthers) {
+  const TemporaryFile file(GetParam(), "old\n");
+  ASSERT_EQ(::chmod(file.path().c_str(), 0666), 0);
+  std::string error;
+  const auto writer = RecordingWriter::create(file.path(), error);
+  ASSERT_TRUE(writer) << error;
+  struct stat status {};
+  ASSERT_EQ(::stat(file.path().c_str(), &status), 0);
+  EXPECT_EQ(status.st_mode & 07777U, 0600U);
 }
 
 TEST_P(RecordingWriterOf, ReplacesAnOlderFile) {
@@ -112,6 +125,35 @@ INSTANTIATE_TEST_SUITE_P(PlainAndGzip, RecordingWriterOf, ::testing::Values(".js
                          [](const auto& parameter) {
                            return std::string_view(parameter.param) == ".jsonl" ? "Plain" : "Gzip";
                          });
+
+TEST(RecordingWriter, LeavesAFileOfSomebodyElseAlone) {
+  if (::geteuid() != 0) GTEST_SKIP() << "only root can give a file away";
+  const TemporaryFile file(".jsonl", "theirs\n");
+  ASSERT_EQ(::chown(file.path().c_str(), 12345, 12345), 0);
+  std::string error;
+  EXPECT_FALSE(RecordingWriter::create(file.path(), error));
+  EXPECT_EQ(error, file.path() + ": belongs to another user");
+  EXPECT_EQ(file.content(), "theirs\n");
+}
+
+// An event that a reader refuses made the whole recording unreadable.
+TEST(RecordingWriter, LeavesOutWhatNoReaderWouldTake) {
+  const TemporaryFile file(".jsonl");
+  std::string error;
+  const auto writer = RecordingWriter::create(file.path(), error);
+  RecordedEvent tooLong = event(0);
+  tooLong.entries.set("kKeyPayload", Bytes(1024 * 1024));
+  RecordedEvent tooMany = event(0);
+  for (int i = 0; i < 300; ++i) tooMany.entries.append(std::to_string(i), i);
+  EXPECT_TRUE(writer->write(event(0)));
+  EXPECT_TRUE(writer->write(tooLong));
+  EXPECT_TRUE(writer->write(tooMany));
+  EXPECT_TRUE(writer->write(event(1)));
+  EXPECT_EQ(writer->eventsWritten(), 2U);
+  EXPECT_EQ(writer->eventsLeftOut(), 2U);
+  EXPECT_TRUE(writer->close());
+  EXPECT_EQ(contentOf(file.path()).events, 2U);
+}
 
 TEST(RecordingWriter, GzipIsChosenByTheName) {
   const TemporaryFile file(".jsonl.gz");

@@ -205,6 +205,33 @@ TEST_F(QelctlRecord, stopsWhenTheDiskIsFull) {
   EXPECT_EQ(lines.back(), "74");
 }
 
+// The signal for it killed the program.
+TEST_F(QelctlRecord, endsWholeWhenAFileMayNotGrow) {
+  for (const char* name : {"limit.jsonl", "limit.jsonl.gz"}) {
+    const std::string path = file(name);
+    const std::string command =
+        std::string(QEL_QELCTL) + " record '" + path + "' --bus '" + bus.address() + "'";
+    const Outcome outcome = run("/bin/sh", {"-c", "ulimit -f 16; " + command + "; echo $? >&2"});
+    const auto lines = linesOf(outcome.err);
+    ASSERT_GE(lines.size(), 2U) << outcome.err;
+    EXPECT_EQ(lines[lines.size() - 2], "qelctl: " + path + ": File too large");
+    EXPECT_EQ(lines.back(), "74");
+    EXPECT_EQ(fs::file_size(path), 16U * 512);
+    const Outcome replayed = qelctl({"replay", path});
+    EXPECT_EQ(replayed.exitCode, 0) << replayed.err;
+    EXPECT_NE(replayed.out.find("Received Valid Metric"), std::string::npos);
+  }
+}
+
+// A file that everybody could read stayed so.
+TEST_F(QelctlRecord, letsNobodyElseReadWhatItReplaces) {
+  const std::string path = file("open.jsonl");
+  std::ofstream(path) << "old\n";
+  fs::permissions(path, fs::perms(0666));
+  EXPECT_EQ(ask({"record", path, "--duration", "0.1", "--force"}).exitCode, 0);
+  EXPECT_EQ(fs::status(path).permissions(), fs::perms(0600));
+}
+
 TEST_F(QelctlRecord, saysWhatItCannotWrite) {
   const Outcome outcome = ask({"record", "/nonexistent/a.jsonl"});
   EXPECT_EQ(outcome.exitCode, 74);

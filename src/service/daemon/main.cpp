@@ -79,6 +79,7 @@ int main(int argc, char** argv) {
   const auto options = parseOptions(argc, argv, exitCode);
   if (!options) return exitCode;
   const int stop = stopSignals();
+  std::signal(SIGXFSZ, SIG_IGN);  // a file at its limit shows as a failed write
   using Echo = qel::SystemLogSink::Echo;
   qel::setSystemLog(std::make_shared<qel::SystemLogSink>(
       "basebandd", options->verbose ? Echo::standardError : Echo::none));
