@@ -2,6 +2,7 @@
 #include <utility>
 
 #include "messages/catalogue/KBBMetricUtility.h"
+#include "messages/catalogue/TagLog.h"
 #include "service/Request.h"
 #include "service/ServiceCore.h"
 #include "tesk/Constants.h"
@@ -44,31 +45,9 @@ tesk::CommandResult ServiceCore::performCommand(Session& session, std::string_vi
   return result;
 }
 
-void ServiceCore::remember(Session& session, std::int64_t application) {
-  constexpr std::size_t kMostClients = 256;
+void ServiceCore::join(Session& session, std::int64_t application) {
   session.setApplication(application);
-  {
-    const std::lock_guard lock(_keptMutex);
-    auto& applications = _kept.applicationOfClient;
-    const auto known = applications.find(session.clientName());
-    const bool isNew = known == applications.end();
-    if (isNew ? applications.size() < kMostClients : known->second != application) {
-      applications.insert_or_assign(session.clientName(), application);
-      _keeper->save(_kept);
-    }
-  }
   _listeners->changed();
-}
-
-void ServiceCore::rememberConfiguration(std::int64_t application, const Bytes* payload) {
-  const std::lock_guard lock(_keptMutex);
-  const KeptState before = _kept;
-  if (payload) {
-    _kept.configurations.insert_or_assign(application, *payload);
-  } else {
-    _kept.configurations.erase(application);
-  }
-  if (_kept != before) _keeper->save(_kept);
 }
 
 tesk::CommandResult ServiceCore::addConfiguration(Session& session, const Dictionary& entries) {
@@ -78,11 +57,15 @@ tesk::CommandResult ServiceCore::addConfiguration(Session& session, const Dictio
   request.payloadType();
   if (request.refused()) return *request.refused();
   std::string reason;
-  auto configuration = DeviceConfiguration::fromPayload(*payload, reason);
-  if (!configuration) return refusal(CommandCode::notAConfiguration, "kKeyPayload " + reason);
-  _configurations.install(application, std::move(*configuration));
-  rememberConfiguration(application, payload);
-  remember(session, application);
+  CommandCode code{};
+  const CountedTagLines lines;
+  auto configuration = DeviceConfiguration::fromPayload(*payload, reason, code);
+  noteTagLines(lines.count());
+  if (!configuration) return refusal(code, "kKeyPayload " + reason);
+  const auto refused =
+      _book.install(session.clientName(), application, *payload, std::move(*configuration));
+  if (refused) return *refused;
+  join(session, application);
   return {};
 }
 
@@ -90,9 +73,8 @@ tesk::CommandResult ServiceCore::clearConfiguration(Session& session, const Dict
   Request request(entries);
   const std::int64_t application = request.integer(tesk::kKeyAppID);
   if (request.refused()) return *request.refused();
-  _configurations.clear(application);
-  rememberConfiguration(application, nullptr);
-  remember(session, application);
+  _book.clear(session.clientName(), application);
+  join(session, application);
   return {};
 }
 
@@ -116,7 +98,8 @@ tesk::CommandResult ServiceCore::queryMetric(Session& session, const Dictionary&
                                                    " is not the metric of kKeyTriggerID " +
                                                    std::to_string(trigger));
   }
-  remember(session, application);
+  _book.note(session.clientName(), application);
+  if (session.application() != application) join(session, application);
   SourceAnswer answer = _source->query(*metric);
   if (answer.code != CommandCode::done) return refusal(answer.code, std::move(answer.message));
   ServiceEvent event{answer.timeMs, tesk::kEventMetric, std::move(answer.entries)};
@@ -124,7 +107,7 @@ tesk::CommandResult ServiceCore::queryMetric(Session& session, const Dictionary&
   event.entries.set(tesk::kKeyTriggerRef, triggerRef);
   event.entries.set(tesk::kKeyTriggerID, trigger);
   EventFault fault;
-  if (!examineEvent(event, fault)) {
+  if (!examine(event, fault)) {
     _undecodableLog.note(fault.reason);
     return refusal(CommandCode::metricNotAvailable, std::move(fault.reason));
   }

@@ -4,6 +4,7 @@
 
 #include "messages/catalogue/KBBMetricUtility.h"
 #include "messages/device_config.h"
+#include "service/Limits.h"
 
 namespace qel::service {
 namespace {
@@ -15,11 +16,30 @@ bool inCatalogue(std::uint32_t metric) {
          KBBMetricUtility::catalogue().end();
 }
 
+bool isTooMany(const char* what, std::size_t count, std::size_t limit, std::string& reason) {
+  if (count <= limit) return false;
+  reason = "has " + std::to_string(count) + " " + what + ", at most " + std::to_string(limit) +
+           " are taken";
+  return true;
+}
+
 }  // namespace
 
 std::optional<DeviceConfiguration> DeviceConfiguration::fromPayload(ByteView payload,
                                                                     std::string& reason) {
+  CommandCode code{};
+  return fromPayload(payload, reason, code);
+}
+
+std::optional<DeviceConfiguration> DeviceConfiguration::fromPayload(ByteView payload,
+                                                                    std::string& reason,
+                                                                    CommandCode& code) {
+  code = CommandCode::configurationTooLarge;
+  if (isTooMany("bytes", payload.size(), limits::kPayloadBytes, reason)) return std::nullopt;
   const auto message = DeviceConfig::initWithData(payload);
+  const std::size_t entries = message ? message->metricsCount() + message->triggersCount() : 0;
+  if (isTooMany("entries", entries, limits::kConfigurationEntries, reason)) return std::nullopt;
+  code = CommandCode::notAConfiguration;
   if (!message || message->format() != kFormat) {
     reason = "is no configuration";
     return std::nullopt;

@@ -8,13 +8,17 @@
 #include <vector>
 
 #include "base/Bytes.h"
+#include "service/CommandCodes.h"
 
 namespace qel::service {
 
 // Immutable once made, so that any thread may read it.
 class DeviceConfiguration {
  public:
-  // Nothing when the payload is no configuration; `reason` then says why.
+  // Nothing when the payload is no configuration, or larger than the service takes; `reason` then
+  // says why, and `code` is the one to refuse it with. A payload that is too large is not read.
+  static std::optional<DeviceConfiguration> fromPayload(ByteView payload, std::string& reason,
+                                                        CommandCode& code);
   static std::optional<DeviceConfiguration> fromPayload(ByteView payload, std::string& reason);
 
   // The reporting period of a metric that is wanted (0: every report), by its 16-bit identifier.

@@ -3,43 +3,30 @@
 #include <algorithm>
 #include <utility>
 
+#include "messages/catalogue/TagLog.h"
+
 namespace qel::service {
 
 std::shared_ptr<ServiceCore> ServiceCore::create(std::unique_ptr<EventSource> source,
                                                  const Clock& clock,
-                                                 std::unique_ptr<StateKeeper> keeper) {
-  if (!keeper) keeper = std::make_unique<ForgetfulKeeper>();
-  return std::shared_ptr<ServiceCore>(new ServiceCore(std::move(source), clock, std::move(keeper)));
+                                                 std::unique_ptr<StateKeeper> keeper,
+                                                 WaitClock& waitClock) {
+  return std::shared_ptr<ServiceCore>(
+      new ServiceCore(std::move(source), clock, std::move(keeper), waitClock));
 }
 
 ServiceCore::ServiceCore(std::unique_ptr<EventSource> source, const Clock& clock,
-                         std::unique_ptr<StateKeeper> keeper)
-    : _undecodableLog(clock), _keeper(std::move(keeper)), _source(std::move(source)) {
-  restore();
-}
-
-void ServiceCore::restore() {
-  _kept = _keeper->load();
-  std::erase_if(_kept.configurations, [this](const auto& kept) {
-    std::string reason;
-    auto configuration = DeviceConfiguration::fromPayload(kept.second, reason);
-    if (configuration) _configurations.install(kept.first, std::move(*configuration));
-    return !configuration;
-  });
-}
+                         std::unique_ptr<StateKeeper> keeper, WaitClock& waitClock)
+    : _undecodableLog(clock),
+      _tagLog(clock, "not logged one by one: "),
+      _book(std::move(keeper), _configurations, clock, waitClock),
+      _source(std::move(source)) {}
 
 ServiceCore::~ServiceCore() { _source->stop(); }
 
-std::optional<std::int64_t> ServiceCore::applicationOf(std::string_view clientName) const {
-  const std::lock_guard lock(_keptMutex);
-  const auto known = _kept.applicationOfClient.find(clientName);
-  if (known == _kept.applicationOfClient.end()) return std::nullopt;
-  return known->second;
-}
-
 std::shared_ptr<Session> ServiceCore::open(std::string_view clientName, tesk::EventSink sink) {
   auto session = std::make_shared<Session>(std::string(clientName), std::move(sink),
-                                           _configurations, applicationOf(clientName));
+                                           _configurations, _book.opened(clientName));
   const std::lock_guard lock(_mutex);
   _sessions.push_back(session);
   return session;
@@ -48,7 +35,8 @@ std::shared_ptr<Session> ServiceCore::open(std::string_view clientName, tesk::Ev
 void ServiceCore::close(const std::shared_ptr<Session>& session) {
   session->close();
   const std::lock_guard lock(_mutex);
-  std::erase(_sessions, session);
+  if (std::erase(_sessions, session) == 0) return;
+  _book.closed(session->clientName());
   if (_sessions.empty() && _sourceRunning) {
     _source->stop();
     _sourceRunning = false;
@@ -56,7 +44,7 @@ void ServiceCore::close(const std::shared_ptr<Session>& session) {
 }
 
 void ServiceCore::eventsOn(Session& session) {
-  session.eventsOn();
+  if (!session.eventsOn()) return;
   _listeners->changed();
   const std::lock_guard lock(_mutex);
   if (_sourceRunning || _sessions.empty()) return;
@@ -71,9 +59,23 @@ std::vector<std::shared_ptr<Session>> ServiceCore::sessions() const {
   return _sessions;
 }
 
+// Whoever receives the event reads it again: what that logs is not to be said twice, nor is one
+// payload to fill the log.
+std::optional<EventSubject> ServiceCore::examine(const ServiceEvent& event, EventFault& fault) {
+  const CountedTagLines lines;
+  auto subject = examineEvent(event, fault);
+  noteTagLines(lines.count());
+  return subject;
+}
+
+void ServiceCore::noteTagLines(std::size_t lines) {
+  if (lines == 0) return;
+  _tagLog.note(std::to_string(lines) + " lines about metric identifiers in place of fields");
+}
+
 EventReceiver::Taken ServiceCore::take(const ServiceEvent& event) {
   EventFault fault;
-  const auto subject = examineEvent(event, fault);
+  const auto subject = examine(event, fault);
   if (!subject) {
     ++_received;
     ++(fault.withoutContent ? _withoutContent : _undecodable);

@@ -15,8 +15,8 @@
 #include "base/Clock.h"
 #include "service/ConfigurationStore.h"
 #include "service/Counters.h"
+#include "service/KeptBook.h"
 #include "service/Session.h"
-#include "service/StateKeeper.h"
 #include "service/UndecodableLog.h"
 #include "service/sources/EventSource.h"
 #include "tesk/Transport.h"
@@ -29,11 +29,13 @@ namespace qel::service {
 // last session closes.
 class ServiceCore final : public EventReceiver, public std::enable_shared_from_this<ServiceCore> {
  public:
-  // `clock` outlives the core; it only spaces out log lines. With a keeper, configurations and
-  // whose they are outlive the core.
+  // Both clocks outlive the core: one spaces out log lines and tells when a client was there last,
+  // the other spaces out what is written. With a keeper, configurations and whose they are outlive
+  // the core.
   static std::shared_ptr<ServiceCore> create(std::unique_ptr<EventSource> source,
                                              const Clock& clock = systemClock(),
-                                             std::unique_ptr<StateKeeper> keeper = nullptr);
+                                             std::unique_ptr<StateKeeper> keeper = nullptr,
+                                             WaitClock& waitClock = steadyWaitClock());
   ~ServiceCore() override;
 
   // A session starts with events off. A client that comes back under the same name belongs to the
@@ -69,29 +71,26 @@ class ServiceCore final : public EventReceiver, public std::enable_shared_from_t
   static const std::array<Command, 3> kCommands;
 
   ServiceCore(std::unique_ptr<EventSource> source, const Clock& clock,
-              std::unique_ptr<StateKeeper> keeper);
-  void restore();
-  std::optional<std::int64_t> applicationOf(std::string_view clientName) const;
+              std::unique_ptr<StateKeeper> keeper, WaitClock& waitClock);
 
   tesk::CommandResult addConfiguration(Session& session, const Dictionary& request);
   tesk::CommandResult clearConfiguration(Session& session, const Dictionary& request);
   tesk::CommandResult queryMetric(Session& session, const Dictionary& request);
-  // Notes whose command it was, and the payload that it installed (none: cleared), if any.
-  void remember(Session& session, std::int64_t application);
-  void rememberConfiguration(std::int64_t application, const Bytes* payload);
+  // From now on the session is of this application.
+  void join(Session& session, std::int64_t application);
+  std::optional<EventSubject> examine(const ServiceEvent& event, EventFault& fault);
+  void noteTagLines(std::size_t lines);
   std::vector<std::shared_ptr<Session>> sessions() const;
 
   ConfigurationStore _configurations;
   const std::shared_ptr<ListenerSignal> _listeners = std::make_shared<ListenerSignal>();
   UndecodableLog _undecodableLog;
+  UndecodableLog _tagLog;
+  KeptBook _book;
 
   mutable std::mutex _mutex;
   std::vector<std::shared_ptr<Session>> _sessions;
   bool _sourceRunning = false;
-
-  mutable std::mutex _keptMutex;  // also held while the keeper writes
-  KeptState _kept;
-  const std::unique_ptr<StateKeeper> _keeper;
 
   std::atomic<std::uint64_t> _received = 0;
   std::atomic<std::uint64_t> _delivered = 0;

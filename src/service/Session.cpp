@@ -21,9 +21,9 @@ void Session::setApplication(std::int64_t application) {
   _application = application;
 }
 
-void Session::eventsOn() {
+bool Session::eventsOn() {
   const std::lock_guard lock(_deliveryMutex);
-  if (!_closed) _on = true;
+  return !_closed && !_on.exchange(true);
 }
 
 void Session::eventsOff() {

@@ -33,7 +33,8 @@ class Session {
   std::optional<std::int64_t> application() const;
   void setApplication(std::int64_t application);
 
-  void eventsOn();
+  // False when nothing changed: they were on, or the session is closed.
+  bool eventsOn();
   void eventsOff();
   // Ends delivery for good.
   void close();

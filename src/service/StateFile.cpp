@@ -24,16 +24,18 @@ constexpr std::uint32_t kFormat = 1;
 Bytes encoded(const KeptState& state) {
   ServiceState message;
   message.setFormat(kFormat);
-  for (const auto& [application, payload] : state.configurations) {
+  for (const auto& [application, installed] : state.configurations) {
     auto kept = std::make_shared<KeptConfiguration>();
     kept->setApplication(static_cast<std::uint64_t>(application));
-    kept->setPayload(payload);
+    kept->setPayload(installed.payload);
+    if (!installed.client.empty()) kept->setClient(installed.client);
     message.addConfiguration(std::move(kept));
   }
-  for (const auto& [name, application] : state.applicationOfClient) {
+  for (const auto& [name, use] : state.applicationOfClient) {
     auto kept = std::make_shared<KeptClient>();
     kept->setName(name);
-    kept->setApplication(static_cast<std::uint64_t>(application));
+    kept->setApplication(static_cast<std::uint64_t>(use.application));
+    if (use.usedMs != 0) kept->setUsedMs(use.usedMs);
     message.addClient(std::move(kept));
   }
   return message.data();
@@ -45,11 +47,13 @@ std::optional<KeptState> decoded(const Bytes& bytes) {
   KeptState state;
   for (const auto& kept : message->configurations()) {
     if (!kept->hasPayload()) return std::nullopt;
-    state.configurations[static_cast<std::int64_t>(kept->application())] = *kept->payload();
+    state.configurations[static_cast<std::int64_t>(kept->application())] = {
+        *kept->payload(), kept->client().value_or("")};
   }
   for (const auto& kept : message->clients()) {
     if (!kept->hasName()) return std::nullopt;
-    state.applicationOfClient[*kept->name()] = static_cast<std::int64_t>(kept->application());
+    state.applicationOfClient[*kept->name()] = {static_cast<std::int64_t>(kept->application()),
+                                                kept->usedMs()};
   }
   return state;
 }

@@ -12,7 +12,7 @@ constexpr std::uint64_t kLineEveryMs = 10'000;
 }  // namespace
 
 void UndecodableLog::note(std::string_view reason) {
-  std::string line = "baseband event not delivered: ";
+  std::string line = _beginning;
   {
     const std::lock_guard lock(_mutex);
     const std::uint64_t nowMs = _clock.nowMs();

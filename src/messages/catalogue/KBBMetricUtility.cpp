@@ -3,7 +3,7 @@
 #include <algorithm>
 #include <array>
 
-#include "base/LogSink.h"
+#include "messages/catalogue/TagLog.h"
 
 namespace qel {
 namespace {
@@ -59,7 +59,7 @@ std::span<const MetricName> KBBMetricUtility::catalogue() { return kCatalogue; }
 
 bool KBBMetricUtility::look(std::uint32_t tag, std::string_view /*messageClass*/) {
   if (!std::ranges::binary_search(kSortedIdentifiers, tag)) return false;
-  systemLog().write("valid metricId tag");
+  writeTagLine("valid metricId tag");
   return true;
 }
 

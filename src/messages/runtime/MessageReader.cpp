@@ -3,7 +3,7 @@
 #include <array>
 #include <cstdio>
 
-#include "base/LogSink.h"
+#include "messages/catalogue/TagLog.h"
 #include "messages/runtime/PBDataReader.h"
 
 namespace qel {
@@ -12,7 +12,7 @@ void logUnknownTag(std::uint32_t fieldNumber, std::uint32_t value) {
   std::array<char, 48> line;
   const int length =
       std::snprintf(line.data(), line.size(), "Unknown tag: %x:%u", fieldNumber, value);
-  systemLog().write({line.data(), static_cast<std::size_t>(length)});
+  writeTagLine({line.data(), static_cast<std::size_t>(length)});
 }
 
 Cursor skipUnknown(Cursor cursor, std::uint32_t fieldNumber, std::uint8_t wireType) {

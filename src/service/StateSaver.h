@@ -1,0 +1,51 @@
+// Writes the service's state in a thread of its own.
+#pragma once
+
+#include <condition_variable>
+#include <cstdint>
+#include <functional>
+#include <memory>
+#include <mutex>
+#include <thread>
+
+#include "service/StateKeeper.h"
+#include "service/sources/WaitClock.h"
+
+namespace qel::service {
+
+// A change after a quiet second is written at once; those that follow are written together, a
+// second later; what is left is written at the end. So a loss of power costs a second at most, and
+// a disk that is slow or full costs the service's clients nothing.
+class StateSaver {
+ public:
+  static constexpr std::uint64_t kPauseMs = 1000;
+
+  // `state` gives what is to be written, on the saver's thread. It and `clock` outlive the saver.
+  StateSaver(std::unique_ptr<StateKeeper> keeper, std::function<KeptState()> state,
+             WaitClock& clock);
+  ~StateSaver();
+  StateSaver(const StateSaver&) = delete;
+  StateSaver& operator=(const StateSaver&) = delete;
+
+  // To be called after a change, by any thread that holds no lock which `state` needs. When the
+  // change is written at once, this waits for it, a few milliseconds at most: an answered command
+  // then nearly always outlives even a service that is killed.
+  void changed();
+
+ private:
+  void run(const std::stop_token& stop);
+
+  const std::unique_ptr<StateKeeper> _keeper;
+  const std::function<KeptState()> _state;
+  WaitClock& _clock;
+
+  std::mutex _mutex;
+  std::condition_variable_any _moved;
+  std::uint64_t _changes = 0;
+  std::uint64_t _written = 0;  // so many of the changes
+  bool _pausing = false;
+
+  std::jthread _thread;
+};
+
+}  // namespace qel::service

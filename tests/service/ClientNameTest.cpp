@@ -1,0 +1,40 @@
+#include "service/ClientName.h"
+
+#include <gtest/gtest.h>
+
+#include <string>
+
+namespace qel::service {
+namespace {
+
+TEST(ClientNameTest, TakesPrintableTextOfAnyScript) {
+  for (const char* name : {"qelwatch", "a", "my viewer 2", "\xC3\xA9t\xC3\xA9", "\xE6\x89\x8B"}) {
+    EXPECT_EQ(faultOfClientName(name), "") << name;
+  }
+  EXPECT_EQ(faultOfClientName(std::string(64, 'n')), "");
+}
+
+// Eight megabytes of name were taken, kept for ever and shown to every client.
+TEST(ClientNameTest, RefusesALongName) {
+  EXPECT_EQ(faultOfClientName(std::string(65, 'n')), "the client name is longer than 64 bytes");
+  EXPECT_NE(faultOfClientName(std::string(8'000'000, 'n')), "");
+}
+
+TEST(ClientNameTest, RefusesAnEmptyName) {
+  EXPECT_EQ(faultOfClientName(""), "the client name is empty");
+}
+
+TEST(ClientNameTest, RefusesWhatATerminalWouldObey) {
+  for (const char* name : {"a\nb", "\x1B[2J", "\x7F", "\xC2\x9B", "a\xC2\x80", "\xE2\x80\xAE",
+                           "\xE2\x81\xA6 x", "\xD8\x9C", "\xE2\x80\x8F", "\xE2\x80\xA8"}) {
+    EXPECT_EQ(faultOfClientName(name), "the client name has control characters") << name;
+  }
+}
+
+TEST(ClientNameTest, RefusesWhatIsNoText) {
+  EXPECT_EQ(faultOfClientName("\xFF"), "the client name is not UTF-8");
+  EXPECT_EQ(faultOfClientName("\xE2\x80"), "the client name is not UTF-8");
+}
+
+}  // namespace
+}  // namespace qel::service

@@ -1,0 +1,85 @@
+#include "service/StateSaver.h"
+
+#include <gtest/gtest.h>
+
+#include <atomic>
+#include <optional>
+
+#include "service/support/FakeKeeper.h"
+
+namespace qel::service {
+namespace {
+
+using testing::FakeKeeper;
+using testing::HeldWaitClock;
+using testing::KeptStates;
+
+class StateSaverTest : public ::testing::Test {
+ protected:
+  void change() {
+    ++number;
+    saver->changed();
+  }
+  // The numbers of the states that were written.
+  std::vector<std::int64_t> written() const {
+    std::vector<std::int64_t> numbers;
+    for (const KeptState& state : saved->all()) {
+      numbers.push_back(state.configurations.begin()->first);
+    }
+    return numbers;
+  }
+
+  std::atomic<std::int64_t> number = 0;
+  HeldWaitClock clock;
+  std::shared_ptr<KeptStates> saved = std::make_shared<KeptStates>();
+  std::optional<StateSaver> saver{std::in_place, std::make_unique<FakeKeeper>(saved),
+                                  [this] {
+                                    return KeptState{{{number, Bytes{}}}, {}};
+                                  },
+                                  clock};
+};
+
+TEST_F(StateSaverTest, WritesNothingWithoutAChange) {
+  saver.reset();
+  EXPECT_TRUE(saved->all().empty());
+}
+
+TEST_F(StateSaverTest, WritesTheFirstChangeAtOnce) {
+  change();
+  ASSERT_TRUE(saved->waitFor(1));
+  EXPECT_EQ(written(), (std::vector<std::int64_t>{1}));
+}
+
+// Two configurations in turn made the service write and synchronise two thousand times a second.
+TEST_F(StateSaverTest, WritesManyChangesWithinASecondTogether) {
+  change();
+  ASSERT_TRUE(saved->waitFor(1));
+  ASSERT_TRUE(clock.waitForWaits(1));
+  for (int i = 0; i < 1000; ++i) change();
+  clock.advance(StateSaver::kPauseMs - 1);
+  EXPECT_EQ(written(), (std::vector<std::int64_t>{1}));
+  clock.advance(1);
+  ASSERT_TRUE(saved->waitFor(2));
+  EXPECT_EQ(written(), (std::vector<std::int64_t>{1, 1001}));
+}
+
+TEST_F(StateSaverTest, WritesWhatIsLeftAtTheEndWithoutWaiting) {
+  change();
+  ASSERT_TRUE(clock.waitForWaits(1));
+  change();
+  change();
+  saver.reset();
+  EXPECT_EQ(written(), (std::vector<std::int64_t>{1, 3}));
+}
+
+TEST_F(StateSaverTest, WritesAtOnceAgainAfterAQuietSecond) {
+  change();
+  ASSERT_TRUE(clock.waitForWaits(1));
+  clock.advance(StateSaver::kPauseMs);
+  change();
+  ASSERT_TRUE(saved->waitFor(2));
+  EXPECT_EQ(written().back(), 2);
+}
+
+}  // namespace
+}  // namespace qel::service
