@@ -147,6 +147,25 @@ TEST(PlaceOfCell, ThatAnotherProgramHasSwitchedSinceIsLeftAlone) {
   }
 }
 
+// The end of another service that had switched it on as well switched it off for this one too.
+TEST(PlaceOfCell, IsSwitchedOnAgainWhenItWasPutBackOnceAndNotASecondTime) {
+  ModemWorld world;
+  world.manager->answer("GetCellInfo", kUnsupported);
+  world.manager->setPlace("001,01,0,D30156,3E9");
+  world.manager->add(kModemPath, modemWithPlaces(kGps));
+  world.start();
+  ASSERT_TRUE(waitForCell(world, 0xD30156));
+  world.manager->set(kModemPath, kLocation, "Enabled", kGps);
+  ASSERT_TRUE(becomesTrue([&] { return world.manager->placesAskedFor().size() == 2; }));
+  EXPECT_THAT(world.manager->placesAskedFor()[1], Pair(kGps | kPlaceOfCell, false));
+  world.manager->setPlace("001,01,0,D30157,3E9");
+  EXPECT_TRUE(waitForCell(world, 0xD30157));
+  world.manager->set(kModemPath, kLocation, "Enabled", kGps);
+  const int before = world.log->count(metric::kEmmContext);
+  ASSERT_TRUE(world.log->waitForCount(metric::kEmmContext, before + 60));
+  EXPECT_THAT(world.manager->placesAskedFor(), ::testing::SizeIs(2));
+}
+
 TEST(PlaceOfCell, ThatMayNotBeSwitchedIsNamedInOneLine) {
   CapturedSystemLog log;
   ModemWorld world;

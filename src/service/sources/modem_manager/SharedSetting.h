@@ -21,12 +21,14 @@ struct SettingRow {
   const char* interface;
   const char* member;
   const char* deniedAdvice;       // one line: what is missing, and what would allow it
-  const char* unsupportedAdvice;  // one line
-  bool insists;                   // sets it again when another client has changed it back
+  const char* unsupportedAdvice;  // one line; null where nothing is missing then
+  bool insists;                   // sets it again whenever another client has changed it
 };
 
 // Changes it where that is needed, and puts back what it found unless another client has changed it
-// since. One modem's. One thread; never waits.
+// since. Put back to what was found here is also what another service like this one leaves when it
+// ends: then it is changed once more. Whoever does that twice in a minute means it. One modem's.
+// One thread; never waits.
 template <class... Values>
 class SharedSetting {
  public:
@@ -45,10 +47,7 @@ class SharedSetting {
     const auto value = _read(interfaces);
     if (!value || _underWay) return;
     if (_found && *value == _set) _seen = true;
-    if (_found && _seen && *value != _set) {
-      _found.reset();  // now it is another client's
-      _off = _off || !_row.insists;
-    }
+    if (_found && _seen && *value != _set) changedByAnother(*value, now);
     const Value wanted = _want(*value);
     if (wanted == *value || _off || now < _notBefore) return;
     _notBefore = now + kPause;
@@ -61,8 +60,9 @@ class SharedSetting {
           const Refusal refusal = refusalOf(error);
           if (refusal == Refusal::none) return;
           _off = true;
-          said.say(identity,
-                   refusal == Refusal::denied ? _row.deniedAdvice : _row.unsupportedAdvice);
+          const char* advice =
+              refusal == Refusal::denied ? _row.deniedAdvice : _row.unsupportedAdvice;
+          if (advice) said.say(identity, advice);
         });
   }
 
@@ -74,10 +74,20 @@ class SharedSetting {
   }
 
   bool isUnderWay() const { return _underWay; }
+  // Refused, or left to another client.
+  bool isOff() const { return _off; }
 
  private:
   // Between attempts, so that two clients that disagree do not call without end.
   static constexpr std::chrono::seconds kPause{5};
+  static constexpr std::chrono::seconds kMoment{60};
+
+  void changedByAnother(const Value& value, Clock::time_point now) {
+    const bool putBack = value == *_found && (!_putBackAt || now - *_putBackAt > kMoment);
+    if (putBack) _putBackAt = now;
+    _off = _off || !(_row.insists || putBack);
+    _found.reset();  // now it is the other client's
+  }
 
   void settled(const Value& found) {
     _underWay = false;
@@ -104,6 +114,7 @@ class SharedSetting {
   bool _underWay = false;
   bool _off = false;
   Clock::time_point _notBefore;
+  std::optional<Clock::time_point> _putBackAt;
 };
 
 }  // namespace qel::service
