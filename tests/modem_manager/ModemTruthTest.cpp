@@ -1,5 +1,6 @@
 // What a modem says wrongly, of before, or not at all is not told.
 #include <gmock/gmock.h>
+#include <unistd.h>
 
 #include <fstream>
 
@@ -225,6 +226,30 @@ TEST(CellList, KeepsTheServingCellWhereverItStands) {
   ASSERT_TRUE(world.log->waitForCount(metric::kLteNeighbours, 1));
   const auto own = world.log->newest<KCellularLteNbrEutraCellMeas>(metric::kLteNeighbours);
   EXPECT_EQ(own->measNbrEutras().size(), 255U);
+}
+
+std::ptrdiff_t residentMb() {
+  constexpr std::ptrdiff_t kBytesPerMb = 1 << 20;
+  std::ptrdiff_t size = 0;
+  std::ptrdiff_t resident = 0;
+  std::ifstream("/proc/self/statm") >> size >> resident;
+  return resident * ::sysconf(_SC_PAGESIZE) / kBytesPerMb;
+}
+
+// The whole answer was unpacked at once, and what that took was kept for good.
+TEST(CellList, OfTwentyThousandCellsIsNotKeptInMemory) {
+#if defined(__SANITIZE_ADDRESS__) || defined(__SANITIZE_THREAD__)
+  GTEST_SKIP() << "a sanitizer keeps memory that is given back";
+#endif
+  ModemWorld world;
+  world.manager->setCells(crowd(20000));
+  world.manager->add(kModemPath, modemOn(kOnLte));
+  const std::ptrdiff_t before = residentMb();
+  world.start();
+  ASSERT_TRUE(world.log->waitForCount(metric::kLteNeighbours, 1));
+  ASSERT_TRUE(becomesTrue([&] { return world.manager->calls("GetCellInfo") > 3; }));
+  EXPECT_LT(residentMb() - before, 64);
+  RecordProperty("residentMb", static_cast<int>(residentMb() - before));
 }
 
 }  // namespace
