@@ -96,13 +96,21 @@ constexpr std::array kCommands = {
                }},
     CommandRow{"+CGACT?", [](const AtModem&) { return std::string("+CGACT: 1,0"); }},
     CommandRow{"+CGATT?", [](const AtModem&) { return std::string("+CGATT: 1"); }},
-    // The files of the card: its number, and how long the network's code is (31.102,
-    // clause 4.2.18).
+    // The files of the card: its number, how long the network's code is (31.102, clause 4.2.18),
+    // the provider's name and the emergency numbers (51.011, clauses 10.3.11 and 10.3.27).
     CommandRow{
         "+CRSM=176,12258,0,0,10",
         [](const AtModem& modem) { return "+CRSM: 144,0," + quoted(swapped(modem.iccid + 'F')); }},
     CommandRow{"+CRSM=176,28589,0,0,4",
                [](const AtModem&) { return std::string("+CRSM: 144,0,\"00000002\""); }},
+    CommandRow{"+CRSM=176,28486,0,0,17",
+               [](const AtModem&) {
+                 return std::string("+CRSM: 144,0,\"0154657374204E6574FFFFFFFFFFFFFFFF\"");
+               }},
+    CommandRow{"+CRSM=176,28599,0,0,15",
+               [](const AtModem&) {
+                 return std::string("+CRSM: 144,0,\"11F2FF19F1FFFFFFFFFFFFFFFFFFFF\"");
+               }},
 };
 
 }  // namespace

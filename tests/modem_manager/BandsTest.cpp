@@ -116,5 +116,22 @@ TEST(GsmBands, AreLeftOpenWhereANumberStandsForTwoCarriers) {
   for (std::uint32_t channel = 512; channel <= 810; ++channel) EXPECT_FALSE(gsmBandOf(channel));
 }
 
+TEST(GsmBands, AreSettledByTheCountryWhereThatHasOnlyOneOfTheTwo) {
+  for (const std::uint32_t channel : {512U, 661U, 810U}) {
+    for (const std::uint32_t mcc : {302U, 310U, 316U, 334U, 534U, 535U, 544U}) {
+      EXPECT_EQ(gsmBandOf(channel, mcc), kGsmPcs1900) << mcc;
+    }
+    for (const std::uint32_t mcc : {202U, 262U, 454U, 505U, 530U, 655U}) {
+      EXPECT_EQ(gsmBandOf(channel, mcc), kGsmDcs1800) << mcc;
+    }
+    for (const std::uint32_t mcc : {1U, 317U, 338U, 340U, 724U, 748U, 901U}) {
+      EXPECT_FALSE(gsmBandOf(channel, mcc)) << mcc;
+    }
+  }
+  EXPECT_EQ(gsmBandOf(811, 310), kGsmDcs1800);
+  EXPECT_EQ(gsmBandOf(62, 310), kGsm900P);
+  EXPECT_FALSE(gsmBandOf(300, 262));
+}
+
 }  // namespace
 }  // namespace qel

@@ -165,6 +165,12 @@ std::vector<std::uint32_t> FakeModemManager::ratesAskedFor() {
   return rates;
 }
 
+std::vector<std::uint32_t> FakeModemManager::thresholdsAskedFor() {
+  std::vector<std::uint32_t> thresholds;
+  perform([&] { thresholds = _thresholds; });
+  return thresholds;
+}
+
 std::vector<std::pair<std::uint32_t, bool>> FakeModemManager::placesAskedFor() {
   std::vector<std::pair<std::uint32_t, bool>> places;
   perform([&] { places = _places; });
@@ -220,6 +226,16 @@ void FakeModemManager::addMethods(sdbus::IObject& object, const std::string& pat
            location.at("Enabled").write = FakeProperty(sources).write;
            location.at("SignalsLocation").write = FakeProperty(signals).write;
            modem.object->emitPropertiesChangedSignal(kLocation, {"Enabled", "SignalsLocation"});
+         });
+  method(object, kSignal, "SetupThresholds", "a{sv}", "",
+         [this, path](sdbus::MethodCall& call, sdbus::MethodReply&) {
+           FakeDictionary thresholds;
+           call >> thresholds;
+           const auto rssi = thresholds.at("rssi-threshold").get<std::uint32_t>();
+           _thresholds.push_back(rssi);
+           Object& modem = *_objects.at(path);
+           modem.interfaces.at(kSignal).at("RssiThreshold").write = FakeProperty(rssi).write;
+           modem.object->emitPropertiesChangedSignal(kSignal, {"RssiThreshold"});
          });
   method(object, kSignal, "Setup", "u", "",
          [this, path](sdbus::MethodCall& call, sdbus::MethodReply&) {

@@ -61,10 +61,12 @@ class FakeModemManager {
   // What GetCellInfo and GetLocation of every modem answer.
   void setCells(std::vector<FakeDictionary> cells);
   void setPlace(std::string place);
-  // By the method's name: GetCellInfo, GetLocation, Setup (of Signal) or Location.Setup.
+  // By the method's name: GetCellInfo, GetLocation, Setup and SetupThresholds (of Signal) or
+  // Location.Setup.
   void answer(const std::string& method, FakeAnswer how);
   int calls(const std::string& method);
   std::vector<std::uint32_t> ratesAskedFor();
+  std::vector<std::uint32_t> thresholdsAskedFor();
   std::vector<std::pair<std::uint32_t, bool>> placesAskedFor();
 
  private:
@@ -87,6 +89,7 @@ class FakeModemManager {
   std::map<std::string, FakeAnswer> _answers;
   std::map<std::string, int> _calls;
   std::vector<std::uint32_t> _rates;
+  std::vector<std::uint32_t> _thresholds;
   std::vector<std::pair<std::uint32_t, bool>> _places;
   std::vector<sdbus::MethodCall> _unanswered;
 

@@ -99,11 +99,17 @@ TEST_F(RealModem, TellsItsSignalAndFollowsIt) {
 TEST_F(RealModem, TellsItsCardAlsoWhenItIsOff) {
   ASSERT_TRUE(becomesTrue([&] { return has(metric::kSimFiles); }));
   const auto files = log->newest<KCellularSimCardFiles>(metric::kSimFiles);
-  ASSERT_EQ(files->efLists().size(), 2U);
+  ASSERT_EQ(files->efLists().size(), 5U);
   EXPECT_EQ(files->efLists()[0]->content(),
             (Bytes{0x98, 0x00, 0x01, 0x21, 0x43, 0x65, 0x87, 0x09, 0x21, 0xF3}));
   EXPECT_EQ(files->efLists()[1]->content(),
             (Bytes{0x08, 0x09, 0x10, 0x10, 0x21, 0x43, 0x65, 0x87, 0x09}));
+  const Bytes filler(8, 0xFF);
+  Bytes name = {0xFF, 'T', 'e', 's', 't', ' ', 'N', 'e', 't'};
+  name.insert(name.end(), filler.begin(), filler.end());
+  EXPECT_EQ(files->efLists()[2]->content(), name);
+  EXPECT_EQ(files->efLists()[3]->content(), (Bytes{0xFF, 0xFF, 0xFF, 2}));
+  EXPECT_EQ(files->efLists()[4]->content(), (Bytes{0x11, 0xF2, 0xFF, 0x19, 0xF1, 0xFF}));
   const auto common = log->newest<KCellularMmCommonInfo>(metric::kMmCommonInfo);
   EXPECT_EQ(common->imsi(), (Bytes{0x08, 0x09, 0x10, 0x10, 0x21, 0x43, 0x65, 0x87, 0x09}));
   EXPECT_FALSE(has(metric::kLteScellInfo));

@@ -1,5 +1,6 @@
 #include "service/sources/modem_manager/Bands.h"
 
+#include <algorithm>
 #include <array>
 #include <span>
 
@@ -77,6 +78,20 @@ std::optional<std::uint32_t> onlyBandOf(std::uint32_t channel, std::span<const C
   return band;
 }
 
+// By country code (ITU-T E.212): the United States with their islands in the Pacific, Canada and
+// Mexico have no DCS 1800; Europe, Asia, Africa and the rest of Oceania have no PCS 1900. Elsewhere
+// in the Americas there are both.
+std::optional<std::int32_t> bandAt1800Or1900(std::uint32_t mcc) {
+  constexpr std::array<std::uint32_t, 5> kPcsAlone = {302, 334, 534, 535, 544};
+  constexpr std::uint32_t kFirstOfUnitedStates = 310;
+  constexpr std::uint32_t kLastOfUnitedStates = 316;
+  const bool unitedStates = mcc >= kFirstOfUnitedStates && mcc <= kLastOfUnitedStates;
+  if (unitedStates || std::ranges::count(kPcsAlone, mcc) != 0) return kGsmPcs1900;
+  const std::uint32_t region = mcc / 100;
+  const bool dcsAlone = region == 2 || region == 4 || region == 5 || region == 6;
+  return dcsAlone ? std::optional<std::int32_t>(kGsmDcs1800) : std::nullopt;
+}
+
 std::optional<std::int32_t> systemBand(std::optional<std::uint32_t> band) {
   if (!band) return std::nullopt;
   return static_cast<std::int32_t>(*band);
@@ -90,8 +105,10 @@ std::optional<std::int32_t> umtsBandOf(std::uint32_t uarfcn) {
   return systemBand(onlyBandOf(uarfcn, kUmts));
 }
 
-std::optional<std::int32_t> gsmBandOf(std::uint32_t arfcn) {
-  return systemBand(onlyBandOf(arfcn, kGsm));
+std::optional<std::int32_t> gsmBandOf(std::uint32_t arfcn, std::optional<std::uint32_t> mcc) {
+  if (const auto band = onlyBandOf(arfcn, kGsm)) return systemBand(band);
+  constexpr Channels kShared{512, 810, kGsmPcs1900};
+  return mcc && kShared.contain(arfcn) ? bandAt1800Or1900(*mcc) : std::nullopt;
 }
 
 }  // namespace qel::service

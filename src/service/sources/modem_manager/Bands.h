@@ -39,8 +39,9 @@ std::optional<std::uint32_t> lteBandOf(std::uint32_t earfcn);
 // share (V and VI) and for bands that SystemBand does not name.
 std::optional<std::int32_t> umtsBandOf(std::uint32_t uarfcn);
 
-// By the ARFCN: a SystemBand, of the 900 MHz bands the narrowest one (45.005, clause 2). Nothing
-// for 512 to 810, which stand for carriers of DCS 1800 and of PCS 1900.
-std::optional<std::int32_t> gsmBandOf(std::uint32_t arfcn);
+// By the ARFCN: a SystemBand, of the 900 MHz bands the narrowest one (45.005, clause 2). 512 to 810
+// stand for carriers of DCS 1800 and of PCS 1900: there the country decides, where it has only one
+// of the two, and else nothing does.
+std::optional<std::int32_t> gsmBandOf(std::uint32_t arfcn, std::optional<std::uint32_t> mcc = {});
 
 }  // namespace qel::service

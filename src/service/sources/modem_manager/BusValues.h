@@ -33,6 +33,16 @@ std::optional<std::uint32_t> busUnsigned(const BusProperties& properties, const 
 // A floating point number or an integer.
 std::optional<double> busDouble(const BusProperties& properties, const std::string& key);
 
+// By object path.
+using BusObjects = std::map<std::string, BusInterfaces>;
+
+// Empty when there is no such object.
+inline const BusInterfaces& objectAt(const BusObjects& objects, const std::string& path) {
+  static const BusInterfaces kNone;
+  const auto found = objects.find(path);
+  return found == objects.end() ? kNone : found->second;
+}
+
 // Empty when there is no such interface.
 inline const BusProperties& propertiesOf(const BusInterfaces& interfaces, const std::string& name) {
   static const BusProperties kNone;

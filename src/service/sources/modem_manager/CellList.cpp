@@ -21,7 +21,7 @@ std::vector<CellReading> cellsIn(sdbus::MethodReply& reply) {
   for (BusProperties cell; reply >> cell; cell.clear()) {
     auto reading = cellReading(cell);
     if (!reading) continue;
-    auto& list = reading->serving ? serving : others;
+    auto& list = reading->serving || reading->secondary ? serving : others;
     if (list.size() < kMostCells) list.push_back(std::move(*reading));
   }
   reply.clearFlags();

@@ -5,6 +5,8 @@
 #include <charconv>
 #include <cstdint>
 
+#include "service/sources/modem_manager/Names.h"
+
 namespace qel::service {
 namespace {
 
@@ -73,6 +75,30 @@ std::optional<std::uint32_t> atMost(std::uint32_t most, std::optional<std::uint3
   return value && *value <= most ? value : std::nullopt;
 }
 
+// The bandwidth of a carrier of LTE, in Hz or kHz (36.101, clause 5.6).
+std::optional<std::uint32_t> bandwidthCodeOf(std::optional<std::uint32_t> bandwidth) {
+  constexpr std::array<std::uint32_t, 6> kBandwidthsKhz = {1400, 3000, 5000, 10000, 15000, 20000};
+  const auto found = std::ranges::find_if(kBandwidthsKhz, [&](std::uint32_t khz) {
+    return bandwidth == khz || bandwidth == khz * 1000;
+  });
+  if (found == kBandwidthsKhz.end()) return std::nullopt;
+  return static_cast<std::uint32_t>(found - kBandwidthsKhz.begin());
+}
+
+// Nothing for a cell that is neither of the serving ones nor a neighbour.
+std::optional<CellReading> roleOf(const BusProperties& cell) {
+  CellReading reading;
+  const bool serving = busValue<bool>(cell, "serving").value_or(false);
+  const std::uint32_t type = busUnsigned(cell, "serving-cell-type").value_or(0);
+  if (serving && (type == mm::kSecondGroupCell || type == mm::kSecondGroupSecondaryCell)) {
+    return std::nullopt;
+  }
+  reading.primary = serving && type == mm::kPrimaryCell;
+  reading.secondary = serving && type == mm::kSecondaryCell;
+  reading.serving = serving && !reading.secondary;
+  return reading;
+}
+
 std::optional<std::uint32_t> validArea(std::optional<std::uint32_t> area) {
   return area && *area != 0 ? atMost(kLargestArea, area) : std::nullopt;
 }
@@ -96,20 +122,23 @@ std::optional<double> validSnr(std::optional<double> db) { return within(db, -30
 std::optional<CellReading> cellReading(const BusProperties& cell) {
   const CellKeys* keys = keysOf(busUnsigned(cell, "cell-type"));
   if (!keys) return std::nullopt;
-  CellReading reading;
-  reading.technology = keys->technology;
-  reading.serving = busValue<bool>(cell, "serving").value_or(false);
-  reading.network = networkCode(busValue<std::string>(cell, "operator-id").value_or(""));
-  reading.area = validArea(identifier(cell, keys->area));
-  reading.cellId = atMost(keys->largestCellId, identifier(cell, "ci"));
-  reading.channel = atMost(keys->largestChannel, busUnsigned(cell, keys->channel));
-  reading.code = atMost(keys->largestCode, keys->codeIsText ? identifier(cell, keys->code)
-                                                            : busUnsigned(cell, keys->code));
+  auto reading = roleOf(cell);
+  if (!reading) return std::nullopt;
+  reading->technology = keys->technology;
+  reading->network = networkCode(busValue<std::string>(cell, "operator-id").value_or(""));
+  reading->area = validArea(identifier(cell, keys->area));
+  reading->cellId = atMost(keys->largestCellId, identifier(cell, "ci"));
+  reading->channel = atMost(keys->largestChannel, busUnsigned(cell, keys->channel));
+  if (keys->technology == Technology::lte) {
+    reading->bandwidthCode = bandwidthCodeOf(busUnsigned(cell, "bandwidth"));
+  }
+  reading->code = atMost(keys->largestCode, keys->codeIsText ? identifier(cell, keys->code)
+                                                             : busUnsigned(cell, keys->code));
   if (keys->level) {
-    reading.levelDbm = keys->validLevel(busDouble(cell, keys->level));
-    reading.qualityDb = keys->validQuality(busDouble(cell, keys->quality));
+    reading->levelDbm = keys->validLevel(busDouble(cell, keys->level));
+    reading->qualityDb = keys->validQuality(busDouble(cell, keys->quality));
   } else if (const auto rxlev = atMost(kLargestRxlev, busUnsigned(cell, "rx-level"))) {
-    reading.levelDbm = static_cast<double>(*rxlev) - 110;
+    reading->levelDbm = static_cast<double>(*rxlev) - 110;
   }
   return reading;
 }

@@ -54,7 +54,10 @@ std::optional<Bytes> modemGsmCell(const ModemPicture& modem, std::uint64_t timeM
   }
   set(message, &KCellularGsmScellInfo::setLac, cell->area);
   set(message, &KCellularGsmScellInfo::setCellId, cell->cellId);
-  if (cell->channel) set(message, &KCellularGsmScellInfo::setGsmBand, gsmBandOf(*cell->channel));
+  const auto mcc = cell->network ? std::optional(cell->network->mcc) : std::nullopt;
+  if (cell->channel) {
+    set(message, &KCellularGsmScellInfo::setGsmBand, gsmBandOf(*cell->channel, mcc));
+  }
   set(message, &KCellularGsmScellInfo::setArfcn, cell->channel);
   set(message, &KCellularGsmScellInfo::setBsic, cell->code);
   return message.data();

@@ -55,6 +55,7 @@ std::optional<Bytes> modemLteCell(const ModemPicture& modem, std::uint64_t timeM
   message.setTimestamp(timeMs);
   set(message, &KCellularLteScellInfo::setPhyCellId, cell->code);
   set(message, &KCellularLteScellInfo::setDlFreq, cell->channel);
+  set(message, &KCellularLteScellInfo::setDlBw, cell->bandwidthCode);
   set(message, &KCellularLteScellInfo::setCellId, cell->cellId);
   if (cell->channel)
     set(message, &KCellularLteScellInfo::setFreqBandInd, lteBandOf(*cell->channel));
@@ -94,6 +95,25 @@ std::optional<Bytes> modemLteQuality(const ModemPicture& modem, std::uint64_t ti
   message.setNumSamples(1);
   message.setAvgValues(sampleOf(modem));
   message.addInstValues(sampleOf(modem));
+  return message.data();
+}
+
+std::optional<Bytes> modemLteCarriers(const ModemPicture& modem, std::uint64_t timeMs) {
+  if (modem.technology != Technology::lte || !modem.carriers) return std::nullopt;
+  KCellularLteCarrierAggregationStatus message;
+  message.setTimestamp(timeMs);
+  for (const CellReading& cell : *modem.carriers) {
+    auto entry = std::make_shared<SecondaryComponentCarrier>();
+    set(*entry, &SecondaryComponentCarrier::setPci, cell.code);
+    set(*entry, &SecondaryComponentCarrier::setDlEarfcn, cell.channel);
+    if (cell.channel) {
+      set(*entry, &SecondaryComponentCarrier::setDlRfBand, lteBandOf(*cell.channel));
+    }
+    set(*entry, &SecondaryComponentCarrier::setDlBandwidth, cell.bandwidthCode);
+    if (cell.levelDbm) entry->setRsrp(rounded(*cell.levelDbm * 100));  // hundredths
+    if (cell.qualityDb) entry->setRsrq(rounded(*cell.qualityDb * 100));
+    message.addSccList(entry);
+  }
   return message.data();
 }
 

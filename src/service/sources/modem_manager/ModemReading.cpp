@@ -1,12 +1,12 @@
 #include "service/sources/modem_manager/ModemReading.h"
 
-#include <arpa/inet.h>
-
 #include <algorithm>
 #include <array>
 
+#include "service/sources/modem_manager/BearerReadings.h"
 #include "service/sources/modem_manager/CellReadings.h"
 #include "service/sources/modem_manager/Names.h"
+#include "service/sources/modem_manager/SimReadings.h"
 
 namespace qel::service {
 namespace {
@@ -27,85 +27,6 @@ constexpr std::array kTechnologies = {
     TechnologyBits{mm::kAnyUmts, Technology::umts, "Umts", "rscp", validRscp, "ecio", validEcno},
     TechnologyBits{mm::kAnyGsm, Technology::gsm, "Gsm", nullptr, nullptr, nullptr, nullptr},
 };
-
-const BusInterfaces& objectAt(const BusObjects& objects, const std::string& path) {
-  static const BusInterfaces kNone;
-  const auto found = objects.find(path);
-  return found == objects.end() ? kNone : found->second;
-}
-
-std::string digitsOnly(std::string text) {
-  // A filler at the end is how some cards' digits come.
-  while (!text.empty() && (text.back() == 'F' || text.back() == 'f')) text.pop_back();
-  const bool digits = std::ranges::all_of(text, [](char c) { return c >= '0' && c <= '9'; });
-  return digits ? text : std::string();
-}
-
-std::string digitsOf(const BusProperties& properties, const char* key, std::size_t fewest,
-                     std::size_t most) {
-  std::string digits = digitsOnly(busValue<std::string>(properties, key).value_or(""));
-  return digits.size() >= fewest && digits.size() <= most ? digits : std::string();
-}
-
-Bytes addressOf(const BusProperties& configuration, const char* key, int family) {
-  std::array<std::uint8_t, 16> address{};
-  const std::string text = busValue<std::string>(configuration, key).value_or("");
-  if (::inet_pton(family, text.c_str(), address.data()) != 1) return {};
-  // 0.0.0.0 and :: are no addresses (RFC 1122, 3.2.1.3; RFC 4291, 2.5.2).
-  if (std::ranges::count(address, 0) == std::ssize(address)) return {};
-  const std::ptrdiff_t size = family == AF_INET ? 4 : 16;
-  return {address.begin(), address.begin() + size};
-}
-
-struct AddressKind {
-  const char* property;
-  int family;
-  Bytes BearerReading::*address;
-  bool BearerReading::*inUse;
-};
-constexpr std::array kAddressKinds = {
-    AddressKind{"Ip4Config", AF_INET, &BearerReading::address4, &BearerReading::uses4},
-    AddressKind{"Ip6Config", AF_INET6, &BearerReading::address6, &BearerReading::uses6},
-};
-
-// Nothing unless it is connected.
-std::optional<BearerReading> bearerReading(const BusProperties& bearer) {
-  if (!busValue<bool>(bearer, "Connected").value_or(false)) return std::nullopt;
-  BearerReading reading;
-  const auto asked = busValue<BusProperties>(bearer, "Properties").value_or(BusProperties());
-  reading.apn = busValue<std::string>(asked, "apn").value_or("");
-  reading.profile = busUnsigned(bearer, "ProfileId").value_or(0);
-  if (reading.profile == 0) reading.profile = busUnsigned(asked, "profile-id").value_or(0);
-  for (const AddressKind& kind : kAddressKinds) {
-    const auto configuration = busValue<BusProperties>(bearer, kind.property);
-    if (!configuration) continue;
-    reading.*kind.address = addressOf(*configuration, "address", kind.family);
-    reading.*kind.inUse =
-        !(reading.*kind.address).empty() || busUnsigned(*configuration, "method").value_or(0) != 0;
-    for (const char* key : {"dns1", "dns2", "dns3"}) {
-      if (Bytes server = addressOf(*configuration, key, kind.family); !server.empty()) {
-        reading.nameServers.push_back(std::move(server));
-      }
-    }
-  }
-  return reading;
-}
-
-// Nothing until all of them have been asked for.
-void readBearers(ModemPicture& picture, const BusObjects& objects, const BusInterfaces& modem) {
-  const auto paths =
-      busValue<std::vector<sdbus::ObjectPath>>(propertiesOf(modem, mm::kModem), "Bearers");
-  if (!paths) return;
-  std::vector<BearerReading> bearers;
-  for (const std::string& path : *paths) {
-    const BusInterfaces& object = objectAt(objects, path);
-    if (!object.contains(mm::kBearer)) return;
-    const BusProperties& properties = propertiesOf(object, mm::kBearer);
-    if (!busValue<bool>(properties, "Connected")) picture.bearersUnread = true;
-    if (auto bearer = bearerReading(properties)) bearers.push_back(std::move(*bearer));
-  }
-  picture.bearers = std::move(bearers);
-}
 
 const CellReading* servingAmong(const std::vector<CellReading>& cells,
                                 std::optional<Technology> technology) {
@@ -152,9 +73,17 @@ void readCells(ModemPicture& picture, const ModemAnswers& answers) {
   }
   if (picture.cellsKnown) {
     std::ranges::copy_if(*answers.cells, std::back_inserter(picture.neighbours),
-                         [](const CellReading& cell) { return !cell.serving; });
+                         [](const CellReading& cell) { return !cell.serving && !cell.secondary; });
   }
   if (!picture.technology) return;
+  // Who tells the primary carrier tells the others too.
+  if (serving && serving->primary && serving->technology == Technology::lte) {
+    picture.carriers.emplace();
+    std::ranges::copy_if(*answers.cells, std::back_inserter(*picture.carriers),
+                         [](const CellReading& cell) {
+                           return cell.secondary && cell.technology == Technology::lte;
+                         });
+  }
   CellReading cell = serving ? *serving : CellReading();
   cell.technology = *picture.technology;
   if (picture.network) {
@@ -187,6 +116,19 @@ void readLevels(ModemPicture& picture, const BusInterfaces& modem) {
   fill(picture.levels.qualityDb, picture.serving->qualityDb);
 }
 
+// Nothing where the rejected technology has no metric.
+void readRejection(ModemPicture& picture, const BusProperties& registered) {
+  constexpr std::uint32_t kLargestCause = 111;  // 24.008, clause 10.5.3.6; 24.301, 9.9.3.9
+  const auto rejection = busValue<BusProperties>(registered, "NetworkRejection");
+  if (!rejection) return;
+  const std::uint32_t cause = busUnsigned(*rejection, "error").value_or(0);
+  if (cause == 0 || cause > kLargestCause) return;
+  const std::uint32_t bits = busUnsigned(*rejection, "access-technology").value_or(0);
+  const auto technology = technologyOf(bits);
+  if (bits != 0 && !technology) return;
+  picture.rejection = RejectionReading{cause, technology};
+}
+
 }  // namespace
 
 ModemPicture pictureOf(const BusObjects& objects, const std::string& modem,
@@ -198,11 +140,8 @@ ModemPicture pictureOf(const BusObjects& objects, const std::string& modem,
   picture.registration = busUnsigned(registered, "RegistrationState");
   picture.packetService = busUnsigned(registered, "PacketServiceState");
   picture.network = networkCode(busValue<std::string>(registered, "OperatorCode").value_or(""));
-  readBearers(picture, objects, interfaces);
-  const auto simPath = busValue<sdbus::ObjectPath>(own, "Sim").value_or(mm::kNoObject);
-  const BusProperties& sim = propertiesOf(objectAt(objects, simPath), mm::kSim);
-  picture.imsi = digitsOf(sim, "Imsi", 6, 15);             // 23.003, clause 2.2
-  picture.iccid = digitsOf(sim, "SimIdentifier", 18, 20);  // ITU-T E.118
+  readRejection(picture, registered);
+  picture.sim = simReading(propertiesOf(objectAt(objects, simPathOf(own)), mm::kSim));
   if (isEnabled(interfaces)) {
     picture.accessTechnologies = busUnsigned(own, "AccessTechnologies").value_or(0);
     picture.technology = technologyOf(picture.accessTechnologies);
@@ -210,6 +149,7 @@ ModemPicture pictureOf(const BusObjects& objects, const std::string& modem,
     readCells(picture, answers);
     readLevels(picture, interfaces);
   }
+  readBearers(picture, objects, interfaces);
   return picture;
 }
 
@@ -230,13 +170,17 @@ bool isEnabled(const BusInterfaces& modem) {
 std::vector<ModemPart> partsOf(const BusInterfaces& modem) {
   const BusProperties& own = propertiesOf(modem, mm::kModem);
   std::vector<ModemPart> parts;
-  const auto sim = busValue<sdbus::ObjectPath>(own, "Sim");
-  if (sim && *sim != mm::kNoObject) parts.push_back({*sim, mm::kSim});
-  for (const std::string& bearer : busValue<std::vector<sdbus::ObjectPath>>(own, "Bearers")
-                                       .value_or(std::vector<sdbus::ObjectPath>())) {
-    if (bearer != mm::kNoObject) parts.push_back({bearer, mm::kBearer});
-  }
+  if (const std::string sim = simPathOf(own); sim != mm::kNoObject)
+    parts.push_back({sim, mm::kSim});
+  for (const std::string& bearer : bearerPathsOf(modem)) parts.push_back({bearer, mm::kBearer});
   return parts;
+}
+
+bool tellsLevels(const BusInterfaces& modem) {
+  ModemPicture picture;
+  picture.technology = technologyIn(modem);
+  readLevels(picture, modem);
+  return picture.levels.rssiDbm || picture.levels.levelDbm;
 }
 
 std::string pushedPlaceIn(const BusInterfaces& modem) {

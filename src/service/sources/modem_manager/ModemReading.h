@@ -11,9 +11,6 @@
 
 namespace qel::service {
 
-// By object path.
-using BusObjects = std::map<std::string, BusInterfaces>;
-
 // What methods have answered, beside the properties.
 struct ModemAnswers {
   std::optional<std::vector<CellReading>> cells;  // none: GetCellInfo is not to be had
@@ -39,6 +36,9 @@ struct ModemPart {
   const char* interface;
 };
 std::vector<ModemPart> partsOf(const BusInterfaces& modem);
+
+// Whether its signal has a level, in the technology in use.
+bool tellsLevels(const BusInterfaces& modem);
 
 // The place of the serving cell in a dictionary of locations; empty when it is not in there.
 std::string placeIn(const std::map<std::uint32_t, sdbus::Variant>& locations);

@@ -11,6 +11,7 @@ constexpr std::array kReports = {
     ModemReportRow{metric::kLteScellInfo, modemLteCell},
     ModemReportRow{metric::kLteServingMeasurement, modemLteMeasurement},
     ModemReportRow{metric::kLteRsrpRsrqSinr, modemLteQuality},
+    ModemReportRow{metric::kLteCarrierAggregation, modemLteCarriers},
     ModemReportRow{metric::kLteNeighbours, modemLteNeighbours},
     ModemReportRow{metric::kLteInterRat, modemLteOthers},
     ModemReportRow{metric::kUmtsCellInfo, modemUmtsCell},

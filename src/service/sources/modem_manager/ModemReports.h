@@ -23,6 +23,7 @@ std::span<const ModemReportRow> modemReports();
 std::optional<Bytes> modemLteCell(const ModemPicture& modem, std::uint64_t timeMs);
 std::optional<Bytes> modemLteMeasurement(const ModemPicture& modem, std::uint64_t timeMs);
 std::optional<Bytes> modemLteQuality(const ModemPicture& modem, std::uint64_t timeMs);
+std::optional<Bytes> modemLteCarriers(const ModemPicture& modem, std::uint64_t timeMs);
 std::optional<Bytes> modemLteNeighbours(const ModemPicture& modem, std::uint64_t timeMs);
 std::optional<Bytes> modemLteOthers(const ModemPicture& modem, std::uint64_t timeMs);
 

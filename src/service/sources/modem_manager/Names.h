@@ -45,6 +45,19 @@ enum Registration : std::uint32_t {
   kRoamingNoFallback = 10,
 };
 
+// Of a cell's serving-cell-type.
+enum ServingCellType : std::uint32_t {
+  kPrimaryCell = 1,
+  kSecondaryCell = 2,
+  kSecondGroupCell = 3,
+  kSecondGroupSecondaryCell = 4,
+};
+
+// Bits of a bearer's ip-type.
+inline constexpr std::uint32_t kIpv4 = 1U << 0;
+inline constexpr std::uint32_t kIpv6 = 1U << 1;
+inline constexpr std::uint32_t kIpv4v6 = 1U << 2;
+
 enum PacketService : std::uint32_t { kAttached = 1, kDetached = 2 };
 
 }  // namespace qel::service::mm

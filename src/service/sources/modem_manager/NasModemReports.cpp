@@ -1,9 +1,9 @@
-// Registration, packet connections and SIM of a modem.
+// Registration, subscriber and packet connections of a modem.
 #include <algorithm>
 #include <array>
 
 #include "messages/nas.h"
-#include "messages/sim.h"
+#include "service/sources/modem_manager/Filling.h"
 #include "service/sources/modem_manager/ModemReports.h"
 #include "service/sources/modem_manager/Names.h"
 #include "service/sources/simulated/Bcd.h"
@@ -105,11 +105,14 @@ std::shared_ptr<BearerContext> contextOf(const BearerReading& bearer, bool onLte
   return context;
 }
 
-std::shared_ptr<ElementaryFile> fileOf(std::uint32_t identifier, Bytes content) {
-  auto file = std::make_shared<ElementaryFile>();
-  file->setEfId(identifier);
-  file->setContent(std::move(content));
-  return file;
+// Of the domain whose registration was refused; nothing once there is one.
+std::optional<std::int32_t> rejectCauseOf(const ModemPicture& modem, const RegistrationRow& row,
+                                          bool onLte) {
+  if (row.registered || !modem.rejection) return std::nullopt;
+  const auto technology =
+      modem.rejection->technology ? modem.rejection->technology : modem.technology;
+  if (!technology || (*technology == Technology::lte) != onLte) return std::nullopt;
+  return static_cast<std::int32_t>(modem.rejection->cause);
 }
 
 }  // namespace
@@ -120,6 +123,7 @@ std::optional<Bytes> modemEmmContext(const ModemPicture& modem, std::uint64_t ti
   KCellularEmmContext message;
   message.setTimestamp(timeMs);
   message.setRegStatus(row->status);
+  set(message, &KCellularEmmContext::setRejectCause, rejectCauseOf(modem, *row, true));
   return message.data();
 }
 
@@ -130,6 +134,7 @@ std::optional<Bytes> modemMmContext(const ModemPicture& modem, std::uint64_t tim
   message.setTimestamp(timeMs);
   message.setRegStatus(row->status);
   if (auto area = areaOf<KCellularLocationAreaId>(modem, *row)) message.setLai(area);
+  set(message, &KCellularMmContext::setRejectCause, rejectCauseOf(modem, *row, false));
   return message.data();
 }
 
@@ -145,14 +150,15 @@ std::optional<Bytes> modemGmmContext(const ModemPicture& modem, std::uint64_t ti
   if (!detached) {
     if (auto area = areaOf<RoutingAreaId>(modem, *row)) message.setRai(area);
   }
+  set(message, &KCellularGmmContext::setRejectCause, rejectCauseOf(modem, *row, false));
   return message.data();
 }
 
 std::optional<Bytes> modemMmCommonInfo(const ModemPicture& modem, std::uint64_t timeMs) {
-  if (modem.imsi.empty()) return std::nullopt;
+  if (modem.sim.imsi.empty()) return std::nullopt;
   KCellularMmCommonInfo message;
   message.setTimestamp(timeMs);
-  message.setImsi(encodedImsi(modem.imsi));
+  message.setImsi(encodedImsi(modem.sim.imsi));
   return message.data();
 }
 
@@ -165,27 +171,6 @@ std::optional<Bytes> modemBearers(const ModemPicture& modem, std::uint64_t timeM
   }
   for (const BearerReading& bearer : *modem.bearers) {
     message.addBearerContexts(contextOf(bearer, modem.technology == Technology::lte));
-  }
-  return message.data();
-}
-
-std::optional<Bytes> modemSimFiles(const ModemPicture& modem, std::uint64_t timeMs) {
-  constexpr std::uint32_t kIccidFile = 0x2FE2;  // 31.102, clause 4.1; ETSI TS 102 221, 13.2
-  constexpr std::uint32_t kImsiFile = 0x6F07;   // 31.102, clause 4.2.2
-  constexpr std::size_t kIccidBytes = 10;
-  constexpr std::size_t kImsiBytes = 9;
-  if (modem.iccid.empty() && modem.imsi.empty()) return std::nullopt;
-  KCellularSimCardFiles message;
-  message.setTimestamp(timeMs);
-  const auto filled = [](Bytes content, std::size_t size) {
-    content.resize(size, 0xFF);
-    return content;
-  };
-  if (!modem.iccid.empty()) {
-    message.addEfList(fileOf(kIccidFile, filled(swappedDigits(modem.iccid), kIccidBytes)));
-  }
-  if (!modem.imsi.empty()) {
-    message.addEfList(fileOf(kImsiFile, filled(encodedImsi(modem.imsi), kImsiBytes)));
   }
   return message.data();
 }

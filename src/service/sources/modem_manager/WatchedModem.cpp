@@ -24,6 +24,13 @@ constexpr MethodRow kGetLocation = {
     "org.freedesktop.ModemManager1.Location)",
     "no location area: the modem does not support GetLocation"};
 
+constexpr SettingRow kSignalThresholds = {
+    mm::kSignal, "SetupThresholds",
+    "the signal is measured every few seconds: not allowed to have the modem report it (the bus "
+    "policy must pass org.freedesktop.ModemManager1.Modem.Signal.SetupThresholds and polkit the "
+    "action org.freedesktop.ModemManager1.Device.Control)",
+    nullptr, true};
+constexpr std::uint32_t kThresholdDb = 1;
 constexpr SettingRow kSignalRate = {
     mm::kSignal, "Setup",
     "signal levels come at the pace that other programs ask for: not allowed to set it (polkit "
@@ -84,6 +91,14 @@ WatchedModem::WatchedModem(const std::string& modem, std::chrono::milliseconds p
             _askedPlace = placeIn(locations);
           },
           [this] { _askedPlace.clear(); }),
+      _signalThresholds(kSignalThresholds, modem, thresholdsIn,
+                        [](const std::tuple<SignalThresholds>& found) {
+                          auto [wanted] = found;
+                          if (wanted.rssiDb == 0 || wanted.rssiDb > kThresholdDb) {
+                            wanted.rssiDb = kThresholdDb;
+                          }
+                          return std::tuple(wanted);
+                        }),
       _signalRate(kSignalRate, modem, rateIn,
                   [rateS = wholeSeconds(period)](const std::tuple<std::uint32_t>& found) {
                     const auto [now] = found;
@@ -109,6 +124,7 @@ void WatchedModem::step(BusCalls& calls, SaidOnce& said, const BusInterfaces& mo
   // The cells and the place are of before the phone moved.
   if (std::exchange(_accessTechnologies, technologies) != technologies) {
     _askedPlace.clear();
+    _technologySince = now;
     _cells.callSoon();
     _place.callSoon();
   }
@@ -122,8 +138,15 @@ void WatchedModem::step(BusCalls& calls, SaidOnce& said, const BusInterfaces& mo
   _pushedPlace.notice(pushedPlaceIn(modem), technologyIn(modem), now);
   const std::string pushed = _pushedPlace.current();
   _answers.place = pushed.empty() ? _askedPlace : pushed;
-  _signalRate.step(calls, said, identity, modem, now);
+  _signalThresholds.step(calls, said, identity, modem, now);
+  if (mustBeMeasured(modem, now)) _signalRate.step(calls, said, identity, modem, now);
   _placeSources.step(calls, said, identity, modem, now);
+}
+
+// A modem on a network that says nothing of its signal does not report it, whatever it answered.
+bool WatchedModem::mustBeMeasured(const BusInterfaces& modem, Clock::time_point now) const {
+  if (!thresholdsIn(modem) || _signalThresholds.isOff()) return true;
+  return _accessTechnologies != 0 && !tellsLevels(modem) && now >= _technologySince + 2 * _period;
 }
 
 WatchedModem::Clock::time_point WatchedModem::due(const BusInterfaces& modem) const {
@@ -132,6 +155,7 @@ WatchedModem::Clock::time_point WatchedModem::due(const BusInterfaces& modem) co
 }
 
 void WatchedModem::restore(BusCalls& calls, const BusInterfaces& modem) {
+  _signalThresholds.restore(calls, modem);
   _signalRate.restore(calls, modem);
   _placeSources.restore(calls, modem);
 }

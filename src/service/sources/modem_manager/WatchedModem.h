@@ -11,6 +11,7 @@
 #include "service/sources/modem_manager/PushedPlace.h"
 #include "service/sources/modem_manager/SaidOnce.h"
 #include "service/sources/modem_manager/SharedSetting.h"
+#include "service/sources/modem_manager/SignalThresholds.h"
 
 namespace qel::service {
 
@@ -19,7 +20,8 @@ class WatchedModem {
  public:
   using Clock = std::chrono::steady_clock;
 
-  // Cells and place are asked for, and the signal is measured, once in each period at least.
+  // Cells and place are asked for once in each period at least. The signal is measured as often
+  // unless the modem reports it by itself.
   WatchedModem(const std::string& modem, std::chrono::milliseconds period);
   WatchedModem(const WatchedModem&) = delete;
   WatchedModem& operator=(const WatchedModem&) = delete;
@@ -33,9 +35,13 @@ class WatchedModem {
 
   // Leaves the settings as they were found, once none is being changed any more.
   void restore(BusCalls& calls, const BusInterfaces& modem);
-  bool changesSettings() const { return _signalRate.isUnderWay() || _placeSources.isUnderWay(); }
+  bool changesSettings() const {
+    return _signalThresholds.isUnderWay() || _signalRate.isUnderWay() || _placeSources.isUnderWay();
+  }
 
  private:
+  bool mustBeMeasured(const BusInterfaces& modem, Clock::time_point now) const;
+
   const std::string _path;
   const std::chrono::milliseconds _period;
   ModemAnswers _answers;
@@ -43,9 +49,11 @@ class WatchedModem {
   std::string _askedPlace;
   PolledMethod _cells;
   PolledMethod _place;
+  SharedSetting<SignalThresholds> _signalThresholds;
   SharedSetting<std::uint32_t> _signalRate;
   SharedSetting<std::uint32_t, bool> _placeSources;
   std::uint32_t _accessTechnologies = 0;
+  Clock::time_point _technologySince;
 };
 
 }  // namespace qel::service
