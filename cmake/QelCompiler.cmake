@@ -1,4 +1,4 @@
-# Language level, warnings, sanitizers and the compiler cache, the same for every target.
+# Language level, warnings, hardening, sanitizers and the compiler cache, the same for every target.
 
 set(CMAKE_CXX_STANDARD 20)
 set(CMAKE_CXX_STANDARD_REQUIRED ON)
@@ -19,6 +19,32 @@ if(QEL_SANITIZE)
     add_link_options(-fuse-ld=lld)
   endif()
 endif()
+
+# Hardening of all that is compiled in the calling folder and below, as far as compiler and machine
+# have it. Sanitizers look closer themselves. Without optimisation there is nothing to fortify.
+include(CheckCXXCompilerFlag)
+include(CheckPIESupported)
+check_pie_supported()
+function(qel_harden_programs)
+  if(QEL_SANITIZE)
+    return()
+  endif()
+  add_compile_definitions(_GLIBCXX_ASSERTIONS)
+  foreach(flag -fstack-protector-strong -fstack-clash-protection
+               -fcf-protection=full -mbranch-protection=standard)  # these of amd64 and of arm64
+    string(MAKE_C_IDENTIFIER "QEL_HAS${flag}" has)
+    check_cxx_compiler_flag(${flag} ${has})
+    if(${has})
+      add_compile_options(${flag})
+    endif()
+  endforeach()
+  set(level 2)
+  if(CMAKE_CXX_COMPILER_VERSION VERSION_GREATER_EQUAL 12)
+    set(level 3)
+  endif()
+  add_compile_options("$<$<NOT:$<CONFIG:Debug>>:-U_FORTIFY_SOURCE;-D_FORTIFY_SOURCE=${level}>")
+  add_link_options(-Wl,-z,relro -Wl,-z,now)
+endfunction()
 
 # Our own code only; generated foreign code links without it.
 add_library(qel_warnings INTERFACE)
