@@ -15,6 +15,7 @@
 #include "app/SelfTest.h"
 #include "app/SignalQuit.h"
 #include "app/Source.h"
+#include "base/CoreDumps.h"
 #include "base/LogSink.h"
 #include "base/SystemLogSink.h"
 #include "ui/kit/ResourceBundle.h"
@@ -89,6 +90,7 @@ int main(int argc, char** argv) {
   int exitCode = EXIT_SUCCESS;
   const auto options = qel::parseOptions(argc, argv, exitCode);
   if (!options) return exitCode;
+  qel::leaveNoCore();
   std::signal(SIGXFSZ, SIG_IGN);  // a file at its limit shows as a failed write
   if (options->verbose) logOnStandardErrorToo();
   qel::Source source;

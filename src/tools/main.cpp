@@ -8,6 +8,7 @@
 #include <exception>
 #include <memory>
 
+#include "base/CoreDumps.h"
 #include "base/DescriptorSink.h"
 #include "base/LogSink.h"
 #include "tools/Commands.h"
@@ -58,6 +59,7 @@ int main(int argc, char* argv[]) {
     return reportUsage(app, error);
   }
 
+  leaveNoCore();
   std::signal(SIGPIPE, SIG_IGN);  // a closed pipe shows as a failed write
   std::signal(SIGXFSZ, SIG_IGN);  // and so does a file that has reached its limit
   setSystemLog(verbose ? std::make_shared<DescriptorSink>(STDERR_FILENO) : nullptr);

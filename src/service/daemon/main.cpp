@@ -12,6 +12,7 @@
 #include <iostream>
 #include <memory>
 
+#include "base/CoreDumps.h"
 #include "base/LogSink.h"
 #include "base/SystemLogSink.h"
 #include "service/InProcessConnector.h"
@@ -78,6 +79,7 @@ int main(int argc, char** argv) {
   int exitCode = EXIT_SUCCESS;
   const auto options = parseOptions(argc, argv, exitCode);
   if (!options) return exitCode;
+  qel::leaveNoCore();
   const int stop = stopSignals();
   std::signal(SIGXFSZ, SIG_IGN);  // a file at its limit shows as a failed write
   using Echo = qel::SystemLogSink::Echo;
