@@ -117,6 +117,7 @@ void WatchedModem::step(BusCalls& calls, SaidOnce& said, const BusInterfaces& mo
     _answers = {};
     _pushedPlace = {};
     _askedPlace.clear();
+    _accessTechnologies = 0;
     return;
   }
   const std::uint32_t technologies =
