@@ -38,7 +38,7 @@ constexpr std::array kScenarios = {
     Scenario{"flood-recording", "recording in a loop at speed 1000000, seconds", 20, 2,
              floodOfRecording},
     Scenario{"flood-drive", "simulated drive at speed 1000000, seconds", 20, 0, floodOfDrive},
-    Scenario{"lying-services", "a hanging or lying service in its place", 18, 9, lyingServices},
+    Scenario{"lying-services", "a hanging or lying service in its place", 18, 3, lyingServices},
     Scenario{"full-disk", "disk full", 5, 1, fullDisk},
     Scenario{"short-files", "files that may not grow, `/dev/full`", 5, 1, shortFiles},
     Scenario{"jumping-clock", "clock forward and back", 12, 2, jumpingClock},

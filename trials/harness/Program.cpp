@@ -41,6 +41,12 @@ bool Program::hasSaid(const std::string& text) const {
 
 std::string Program::errors() const { return textOf(_process.launch().err); }
 
+std::vector<std::string> offScreen(const std::string& directory) {
+  return {"QT_QPA_PLATFORM=offscreen", "XDG_CONFIG_HOME=" + directory,
+          "XDG_RUNTIME_DIR=" + directory, "HOME=" + directory,
+          "DBUS_SESSION_BUS_ADDRESS=unix:path=/nonexistent"};
+}
+
 std::string textOf(const std::string& file) {
   std::ostringstream text;
   text << std::ifstream(file).rdbuf();

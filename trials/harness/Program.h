@@ -33,6 +33,9 @@ class Program {
   testing::ChildProcess _process;
 };
 
+// Lets a viewer draw off screen, keep its files in the directory and talk to no desktop.
+std::vector<std::string> offScreen(const std::string& directory);
+
 // What stands in the file.
 std::string textOf(const std::string& file);
 

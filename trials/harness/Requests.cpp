@@ -1,5 +1,8 @@
 #include "harness/Requests.h"
 
+#include <array>
+#include <fstream>
+#include <iterator>
 #include <memory>
 
 #include "messages/device_config.h"
@@ -13,13 +16,18 @@ Request installRequest(std::int64_t application, const Bytes& payload) {
           {"kKeyPayloadType", sdbus::Variant(std::int64_t{0})}};
 }
 
-Bytes configurationOfMetrics(std::uint32_t count) {
-  constexpr std::uint32_t kFirst = 53249;
+Bytes viewersConfiguration() {
+  std::ifstream file(QEL_CONFIGURATION, std::ios::binary);
+  return Bytes(std::istreambuf_iterator<char>(file), std::istreambuf_iterator<char>());
+}
+
+Bytes configurationOfMetrics(std::size_t count) {
+  constexpr std::array<std::uint32_t, 4> kMetrics = {19972, 19992, 20005, 16578};
   DeviceConfig configuration;
   configuration.setFormat(1);
-  for (std::uint32_t i = 0; i < count; ++i) {
+  for (std::size_t i = 0; i < count; ++i) {
     auto wanted = std::make_shared<ConfiguredMetric>();
-    wanted->setIdentifier(kFirst + i);
+    wanted->setIdentifier(kMetrics.at(i));
     configuration.addMetric(std::move(wanted));
   }
   return configuration.data();

@@ -13,8 +13,10 @@ using Request = std::map<std::string, sdbus::Variant>;
 
 Request installRequest(std::int64_t application, const Bytes& payload);
 
-// A configuration with so many metrics, from the catalogue's first identifier on, or triggers.
-Bytes configurationOfMetrics(std::uint32_t count);
+// What the viewer asks for.
+Bytes viewersConfiguration();
+// A configuration with so many metrics, four at most, or triggers.
+Bytes configurationOfMetrics(std::size_t count);
 Bytes configurationOfTriggers(std::uint32_t count);
 // A payload whose fields have the numbers of metrics.
 Bytes payloadOfMetricTags(std::size_t size);

@@ -16,12 +16,6 @@ using namespace std::chrono_literals;
 constexpr auto kFirstValuesWithin = 20s;
 constexpr auto kLook = 10ms;
 
-std::string newDirectory() {
-  std::string pattern = (fs::temp_directory_path() / "qel-trial-XXXXXX").string();
-  if (!::mkdtemp(pattern.data())) throw std::runtime_error("no directory for the trial");
-  return pattern;
-}
-
 std::uintmax_t sizeOf(const std::string& file) {
   std::error_code none;
   const auto size = fs::file_size(file, none);
@@ -32,17 +26,9 @@ milliseconds since(Clock::time_point time) {
   return std::chrono::ceil<milliseconds>(Clock::now() - time);
 }
 
-// The viewer draws off screen, and talks to no desktop.
-std::vector<std::string> viewersEnvironment(const std::string& directory) {
-  return {"QT_QPA_PLATFORM=offscreen", "XDG_CONFIG_HOME=" + directory,
-          "XDG_RUNTIME_DIR=" + directory, "HOME=" + directory,
-          "DBUS_SESSION_BUS_ADDRESS=unix:path=/nonexistent"};
-}
-
 }  // namespace
 
-Stand::Stand(Trial& trial, Cast cast)
-    : _trial(trial), _cast(std::move(cast)), _directory(newDirectory()) {
+Stand::Stand(Trial& trial, Cast cast) : _trial(trial), _cast(std::move(cast)) {
   fs::create_directories(stateDirectory());
   startService(_cast.source);
   waitForService();
@@ -60,17 +46,8 @@ Stand::Stand(Trial& trial, Cast cast)
   _configurations = told->configurations;
 }
 
-Stand::~Stand() {
-  _recorder.reset();
-  _viewer.reset();
-  _screen.reset();
-  _service.reset();
-  std::error_code left;
-  fs::remove_all(_directory, left);
-}
-
 std::string Stand::stateDirectory() const {
-  return _cast.stateDirectory.empty() ? _directory + "/state" : _cast.stateDirectory;
+  return _cast.stateDirectory.empty() ? directory() + "/state" : _cast.stateDirectory;
 }
 
 void Stand::startService(const std::string& source) {
@@ -85,9 +62,9 @@ std::unique_ptr<Program> Stand::start(std::string name, std::vector<std::string>
                                       Conditions conditions) const {
   words.insert(words.end(), {"--bus", _bus.address()});
   conditions.environment = _cast.environment;
-  const auto more = viewersEnvironment(_directory);
+  const auto more = offScreen(directory());
   conditions.environment.insert(conditions.environment.end(), more.begin(), more.end());
-  return std::make_unique<Program>(_directory, std::move(name), std::move(words), conditions);
+  return std::make_unique<Program>(directory(), std::move(name), std::move(words), conditions);
 }
 
 void Stand::waitForService() {
@@ -99,9 +76,9 @@ void Stand::waitForService() {
 }
 
 void Stand::addWitnesses() {
-  if (_screen) _witnesses.push_back({_screen.get(), _directory + "/screen.out", "reg_status"});
+  if (_screen) _witnesses.push_back({_screen.get(), directory() + "/screen.out", "reg_status"});
   if (_viewer && _cast.viewersLines.empty()) {
-    _witnesses.push_back({_viewer.get(), _directory + "/viewer.out", "Received Valid Metric"});
+    _witnesses.push_back({_viewer.get(), directory() + "/viewer.out", "Received Valid Metric"});
   }
   if (_recorder) _witnesses.push_back({_recorder.get(), recording(), ""});
 }

@@ -8,6 +8,7 @@
 
 #include "harness/MemoryGroup.h"
 #include "harness/Program.h"
+#include "harness/TemporaryDirectory.h"
 #include "harness/Trial.h"
 #include "support/PrivateBus.h"
 #include "tesk/bus/ServiceStatus.h"
@@ -33,13 +34,10 @@ inline constexpr milliseconds kEndsWithin{2000};
 class Stand {
  public:
   Stand(Trial& trial, Cast cast);
-  ~Stand();
-  Stand(const Stand&) = delete;
-  Stand& operator=(const Stand&) = delete;
 
   testing::PrivateBus& bus() { return _bus; }
-  const std::string& directory() const { return _directory; }
-  std::string recording() const { return _directory + "/recorded.jsonl"; }
+  const std::string& directory() const { return _directory.path(); }
+  std::string recording() const { return directory() + "/recorded.jsonl"; }
   std::string stateDirectory() const;
   Program& service() { return *_service; }
   Program& viewer() { return *_viewer; }
@@ -84,7 +82,7 @@ class Stand {
 
   Trial& _trial;
   const Cast _cast;
-  std::string _directory;
+  const TemporaryDirectory _directory;
   testing::PrivateBus _bus;
   MemoryGroup _group;
   std::unique_ptr<Program> _service;

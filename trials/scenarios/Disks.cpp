@@ -21,7 +21,7 @@ constexpr auto kRecorderEndsWithin = 10s;
 constexpr std::int64_t kApplication = 50;
 
 // The service takes it, though it may not be able to keep it.
-void install(Stand& stand, std::uint32_t metrics) {
+void install(Stand& stand, std::size_t metrics) {
   const auto connection = tesk::bus::connectTo({stand.bus().address()});
   Proxy proxy(*connection);
   const auto events = proxy.Register("trial");

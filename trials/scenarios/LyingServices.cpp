@@ -16,8 +16,8 @@ constexpr auto kEnough = 1500ms;
 constexpr auto kQuestionEndsWithin = 8s;
 
 // What the lying service is told to do; see its own list.
-constexpr std::array kLies = {"hang",   "never-answer", "wrong-types", "errors", "close",
-                              "a-file", "garbage",      "over-long",   "flood"};
+constexpr std::array kLies = {"never-answer", "wrong-types", "garbage",   "hang", "errors",
+                              "close",        "a-file",      "over-long", "flood"};
 
 // Whatever it is told, it ends in time, with an answer or without one.
 void ask(Trial& trial, Stand& stand, const std::string& lie) {

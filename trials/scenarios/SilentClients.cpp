@@ -1,7 +1,5 @@
 // As many clients as the service takes, none of which reads.
 
-#include <fstream>
-#include <iterator>
 #include <list>
 #include <thread>
 
@@ -23,9 +21,8 @@ constexpr std::int64_t kViewersApplication = 2;
 struct SilentClient {
   explicit SilentClient(const std::string& bus) : connection(tesk::bus::connectTo({bus})) {
     events = proxy.Register("trial-silent");
-    std::ifstream file(QEL_CONFIGURATION, std::ios::binary);
-    const Bytes payload((std::istreambuf_iterator<char>(file)), std::istreambuf_iterator<char>());
-    proxy.PerformCommand("kCommandAddConfiguration", installRequest(kViewersApplication, payload));
+    proxy.PerformCommand("kCommandAddConfiguration",
+                         installRequest(kViewersApplication, viewersConfiguration()));
     proxy.SetDelivery(true);
   }
 
@@ -46,7 +43,7 @@ std::size_t fill(std::list<SilentClient>& clients, const std::string& bus) {
 }  // namespace
 
 void silentClients(Trial& trial) {
-  Stand stand(trial, {.source = "simulated,speed=1000"});
+  Stand stand(trial, {.source = "simulated,speed=100"});
   Caller caller(stand.bus().address());
   std::this_thread::sleep_for(500ms);
   std::list<SilentClient> clients;
