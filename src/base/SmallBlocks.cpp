@@ -27,8 +27,11 @@ struct SmallBlocks::Sweeper {
 
 namespace {
 
-#ifdef __SANITIZE_ADDRESS__
+// Each compiler has its own way to say it.
+#if defined(__SANITIZE_ADDRESS__)
 constexpr bool kKeepsBlocks = false;
+#elif defined(__has_feature)
+constexpr bool kKeepsBlocks = !__has_feature(address_sanitizer);
 #else
 constexpr bool kKeepsBlocks = true;
 #endif
