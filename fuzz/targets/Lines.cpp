@@ -26,6 +26,7 @@ void tryInput(Input input) {
   const Bytes bytes = input.rest();
   const std::string_view line = textOf(bytes);
   if (line.find('\n') != std::string_view::npos) return;
+  if (line.find_first_not_of(" \t\r") == std::string_view::npos) return;  // has a fault of its own
   const auto read = parseEventLine(line);
   // A newline is a blank to the general parser, and to the short way the end of its patience.
   const auto generally = parseEventLine("\n" + std::string(line));
@@ -37,6 +38,7 @@ void tryInput(Input input) {
   }
   const auto& event = std::get<RecordedEvent>(read);
   law(isSame(event, std::get<RecordedEvent>(generally)), "both ways read the same event");
+  law(hasReadableForm(event), "what was read has a readable form");
   const std::string written = eventLine(event);
   law(written.find('\n') == std::string::npos, "an event is one line");
   const auto again = parseEventLine(written);

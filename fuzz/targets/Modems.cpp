@@ -117,8 +117,8 @@ ModemAnswers nextAnswers(Input& input) {
 }
 
 void expectTaken(const ServiceEvent& event) {
-  std::string reason;
-  law(examineEvent(event, reason).has_value(), "every report of a modem can be delivered");
+  EventFault fault;
+  law(examineEvent(event, fault).has_value(), "every report of a modem can be delivered");
 }
 
 }  // namespace

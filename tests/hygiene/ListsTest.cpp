@@ -23,7 +23,7 @@ bool isNamedInItsList(const fs::path& file) {
 }
 
 TEST(BuildLists, nameEverySourceFile) {
-  for (const char* folder : {"src", "tests", "trials"}) {
+  for (const char* folder : {"src", "tests", "trials", "fuzz"}) {
     const auto files = filesBelow(folder, {".cpp", ".qml"});
     ASSERT_FALSE(files.empty());
     for (const auto& file : files) {
@@ -64,7 +64,7 @@ TEST(Tests, areNeverSwitchedOff) {
 
 TEST(SourceFiles, stayShort) {
   constexpr std::size_t kLongest = 400;
-  for (const char* folder : {"src", "tests", "trials"}) {
+  for (const char* folder : {"src", "tests", "trials", "fuzz"}) {
     for (const auto& file : filesBelow(folder, {".h", ".cpp", ".inl", ".qml"})) {
       EXPECT_LE(linesOf(file).size(), kLongest) << nameOf(file);
     }
