@@ -153,6 +153,21 @@ TEST(Bearers, AreNotCountedWhereOneRefusesToBeRead) {
   EXPECT_FALSE(bearers->hasBearerContextCount());
 }
 
+TEST(Bearers, BeyondThirtyTwoAreNeitherReadNorCounted) {
+  ModemWorld world;
+  std::vector<sdbus::ObjectPath> paths;
+  for (int i = 0; i < 40; ++i) {
+    paths.emplace_back("/b/" + std::to_string(i));
+    world.manager->add(paths.back(), {{kBearer, {{"Connected", true}}}});
+  }
+  world.manager->add(kModemPath, modemWithBearers(paths));
+  world.start();
+  ASSERT_TRUE(world.log->waitForCount(metric::kBearers, 1));
+  const auto bearers = world.log->newest<KCellularActivatedBearerContexts>(metric::kBearers);
+  EXPECT_EQ(bearers->bearerContexts().size(), 32U);
+  EXPECT_FALSE(bearers->hasBearerContextCount());
+}
+
 // The addresses that stand for none were told as addresses.
 TEST(Bearers, HaveNoAddressThatIsAllZeros) {
   ModemWorld world;
