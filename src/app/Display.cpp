@@ -1,11 +1,15 @@
 #include "app/Display.h"
 
+#include <sys/stat.h>
 #include <unistd.h>
 
 #include <QtCore/QByteArray>
 #include <QtCore/QDir>
 #include <algorithm>
 #include <array>
+#include <cstdlib>
+#include <filesystem>
+#include <system_error>
 
 namespace qel {
 namespace {
@@ -13,6 +17,13 @@ namespace {
 constexpr auto kPlatformVariable = "QT_QPA_PLATFORM";
 constexpr auto kSessionVariable = "XDG_RUNTIME_DIR";
 constexpr std::array kDisplayVariables = {"WAYLAND_DISPLAY", "DISPLAY", kPlatformVariable};
+
+// No link either: its owner could turn it elsewhere.
+bool isOwnAndClosed(const std::string& folder) {
+  struct stat about {};
+  return ::lstat(folder.c_str(), &about) == 0 && S_ISDIR(about.st_mode) &&
+         about.st_uid == ::getuid() && (about.st_mode & (S_IRWXG | S_IRWXO)) == 0;
+}
 
 }  // namespace
 
@@ -23,10 +34,22 @@ bool hasDisplay() {
 
 void useMemoryAsDisplay() { qputenv(kPlatformVariable, QByteArrayLiteral("offscreen")); }
 
-void provideSessionFolder() {
+SessionFolder::SessionFolder() {
   if (!qEnvironmentVariableIsEmpty(kSessionVariable)) return;
-  const QString user = QString::number(::getuid());
-  qputenv(kSessionVariable, (QDir::tempPath() + "/runtime-" + user).toLocal8Bit());
+  const std::string temporary = QDir::tempPath().toStdString();
+  std::string folder = temporary + "/runtime-" + std::to_string(::getuid());
+  ::mkdir(folder.c_str(), S_IRWXU);
+  if (!isOwnAndClosed(folder)) {
+    _made = temporary + "/qelwatch-XXXXXX";
+    if (!::mkdtemp(_made.data())) _made.clear();
+    folder = _made;
+  }
+  if (!folder.empty()) qputenv(kSessionVariable, QByteArray::fromStdString(folder));
+}
+
+SessionFolder::~SessionFolder() {
+  std::error_code error;
+  if (!_made.empty()) std::filesystem::remove_all(_made, error);
 }
 
 }  // namespace qel

@@ -1,6 +1,8 @@
 // Which display the window goes to.
 #pragma once
 
+#include <string>
+
 namespace qel {
 
 // Is there a compositor or a display server, or has somebody chosen a platform?
@@ -9,8 +11,19 @@ bool hasDisplay();
 // Makes the platform draw into memory. Before the application object is made.
 void useMemoryAsDisplay();
 
-// The toolkit wants a folder for the session's files. Where the session has none it gets the one
-// that the toolkit would make up, without the toolkit's remark about it.
-void provideSessionFolder();
+// The toolkit wants a folder for the session's files, in which the session bus would be looked for
+// too. Where the session names none it gets the one that the toolkit would make up, if that is a
+// folder of this user that nobody else may enter, or else a new one, which is gone with this. Made
+// before the application object and before the first connection to a bus.
+class SessionFolder {
+ public:
+  SessionFolder();
+  ~SessionFolder();
+  SessionFolder(const SessionFolder&) = delete;
+  SessionFolder& operator=(const SessionFolder&) = delete;
+
+ private:
+  std::string _made;  // empty: none
+};
 
 }  // namespace qel

@@ -93,11 +93,11 @@ int main(int argc, char** argv) {
   qel::leaveNoCore();
   std::signal(SIGXFSZ, SIG_IGN);  // a file at its limit shows as a failed write
   if (options->verbose) logOnStandardErrorToo();
+  const qel::SessionFolder sessionFolder;
   qel::Source source;
   exitCode = source.open(*options);
   if (exitCode != EXIT_SUCCESS) return exitCode;
   chooseDisplay(*options);
-  qel::provideSessionFolder();
   nameApplication();
   int programNameOnly = 1;
   const QGuiApplication application(programNameOnly, argv);

@@ -4,11 +4,14 @@
 #include <gtest/gtest.h>
 #include <pty.h>
 #include <spawn.h>
+#include <sys/socket.h>
+#include <sys/un.h>
 #include <sys/wait.h>
 #include <unistd.h>
 
 #include <algorithm>
 #include <array>
+#include <cerrno>
 #include <chrono>
 #include <csignal>
 #include <cstdlib>
@@ -199,6 +202,32 @@ TEST_F(Viewer, withoutDisplayDrawsOffScreenAndSaysSo) {
   EXPECT_EQ(outcome.exitCode, 0) << outcome.err;
   EXPECT_EQ(outcome.err, "qelwatch: no display, drawing off screen; the picture is kept in " +
                              picture + "\nqelwatch: self-test: 47 screens, 0 failures\n");
+}
+
+// Once, whoever made the folder that the toolkit makes up could be this user's session bus.
+TEST_F(Viewer, takesNoSessionBusOutOfAFolderThatIsOpenToOthers) {
+  const std::filesystem::path madeUp = home / ("runtime-" + std::to_string(::getuid()));
+  std::filesystem::create_directory(madeUp);
+  std::filesystem::permissions(madeUp, std::filesystem::perms::all);
+  const int strangersBus = ::socket(AF_UNIX, SOCK_STREAM | SOCK_CLOEXEC | SOCK_NONBLOCK, 0);
+  sockaddr_un address{};
+  address.sun_family = AF_UNIX;
+  const std::string path = madeUp / "bus";
+  path.copy(address.sun_path, sizeof address.sun_path - 1);
+  ASSERT_EQ(::bind(strangersBus, reinterpret_cast<sockaddr*>(&address), sizeof address), 0);
+  ASSERT_EQ(::listen(strangersBus, 1), 0);
+  ::setenv("TMPDIR", home.c_str(), 1);
+  ::unsetenv("XDG_RUNTIME_DIR");
+  ::unsetenv("DBUS_SESSION_BUS_ADDRESS");
+  const Outcome outcome = start({"--self-test", "--bus", "session"});
+  EXPECT_EQ(outcome.exitCode, 0) << outcome.err;
+  EXPECT_EQ(::accept(strangersBus, nullptr, nullptr), -1) << "the viewer called it";
+  EXPECT_EQ(errno, EAGAIN);
+  ::close(strangersBus);
+  const auto entries = std::filesystem::directory_iterator(home);
+  EXPECT_TRUE(std::none_of(begin(entries), end(entries), [](const auto& entry) {
+    return entry.path().filename().string().starts_with("qelwatch-");
+  })) << "what it made for itself is left";
 }
 
 }  // namespace
