@@ -10,8 +10,9 @@
 
 namespace qel {
 
-// Main thread, but for the observer. The notice comes and goes by itself. A viewer that started
-// without the service brings itself into service when the service is there for the first time.
+// Main thread, but for the observer. The notice comes and goes by itself. A viewer whose start
+// found no service makes it when the service is there; from the event loop, since it waits for
+// answers.
 class ServiceWatch final : public std::enable_shared_from_this<ServiceWatch> {
  public:
   // What the bus connection is to call; it may outlive the watch.
@@ -25,8 +26,8 @@ class ServiceWatch final : public std::enable_shared_from_this<ServiceWatch> {
   void show();
 
   QPointer<Navigation> _navigation;
-  bool _wasReachable = false;
   bool _reachable = false;
+  QString _since;  // time of the loss; empty when there was none
   QString _notice;
 };
 

@@ -1,8 +1,10 @@
 #include "app/Source.h"
 
 #include <QtCore/QFileInfo>
+#include <chrono>
 #include <iostream>
 
+#include "app/EventLoopWait.h"
 #include "service/InProcessConnector.h"
 #include "tesk/Transport.h"
 
@@ -10,6 +12,7 @@ namespace qel {
 namespace {
 
 const QString kRecording = QStringLiteral("recording:");
+constexpr std::chrono::milliseconds kPatienceOfASelfTest{5000};
 const QString kModemManager = QStringLiteral("modem-manager");
 
 }  // namespace
@@ -22,8 +25,10 @@ Source::~Source() {
 int Source::open(const Options& options) {
   if (!options.source.empty()) return openWithin(options.source);
   _watch = std::make_shared<ServiceWatch>();
-  _connector = std::make_shared<ClosingConnector>(
-      tesk::bus::makeBusConnector({options.bus}, _watch->observer()));
+  const auto patience = options.selfTest ? std::optional(kPatienceOfASelfTest) : std::nullopt;
+  _connector = std::make_shared<ClosingConnector>(tesk::bus::makeBusConnector(
+      {options.bus}, _watch->observer(),
+      [patience] { return std::make_shared<EventLoopWait>(patience); }));
   tesk::setConnector(_connector);
   return 0;
 }

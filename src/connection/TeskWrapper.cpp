@@ -1,11 +1,10 @@
 #include "connection/TeskWrapper.h"
 
 #include <array>
-#include <fstream>
-#include <iterator>
 #include <mutex>
 #include <utility>
 
+#include "base/FileContent.h"
 #include "base/LogSink.h"
 #include "base/Rendering.h"
 #include "tesk/Constants.h"
@@ -17,6 +16,7 @@ constexpr std::string_view kClientName = "qelwatch";
 constexpr std::string_view kQueueLabel = "tesk.qelwatch.serialQ.queue";
 constexpr std::int64_t kAppID = 2;
 constexpr std::int64_t kPayloadType = 0;
+constexpr std::size_t kLargestConfiguration = 1024 * 1024;  // bytes; a larger file reads as empty
 
 // An event stream of the manager and where its events go.
 struct Stream {
@@ -48,22 +48,6 @@ void handOver(const std::shared_ptr<TeskWrapper>& wrapper, const Stream& stream,
   });
 }
 
-// Sends the request; its result is logged and judged.
-bool perform(const std::shared_ptr<tesk::client::Manager>& manager, std::string_view operation,
-             std::string_view command, const tesk::Message& request) {
-  tesk::CommandResult result{static_cast<std::int32_t>(0xE020E002), ""};
-  tesk::Message reply;
-  result = tesk::client::PerformCommand(manager, command, request, reply);
-  logOperation(operation, "error=" + std::to_string(result.code) + " msg=" + result.message);
-  return result.code == 0;
-}
-
-// The content of the file; nothing of one that cannot be read.
-Bytes contentOf(const std::string& path) {
-  std::ifstream file(path, std::ios::binary);
-  return Bytes(std::istreambuf_iterator<char>(file), std::istreambuf_iterator<char>());
-}
-
 }  // namespace
 
 const std::shared_ptr<TeskWrapper>& TeskWrapper::sharedInstance() {
@@ -85,6 +69,16 @@ const std::shared_ptr<SerialQueue>& TeskWrapper::queue() {
   return _queue;
 }
 
+std::shared_ptr<TeskWrapperDelegate> TeskWrapper::delegate() const {
+  const std::lock_guard lock(_delegateMutex);
+  return _delegate.lock();
+}
+
+void TeskWrapper::setDelegate(const std::shared_ptr<TeskWrapperDelegate>& delegate) {
+  const std::lock_guard lock(_delegateMutex);
+  _delegate = delegate;
+}
+
 void TeskWrapper::listen() {
   for (const Stream& stream : kStreams) {
     tesk::client::RegisterEventHandler(
@@ -99,13 +93,23 @@ void TeskWrapper::listen() {
   logOperation("-[TeskWrapper listen]", "listening for events");
 }
 
+bool TeskWrapper::perform(std::string_view operation, std::string_view command,
+                          const tesk::Message& request) {
+  tesk::CommandResult result{static_cast<std::int32_t>(0xE020E002), ""};
+  tesk::Message reply;
+  result = tesk::client::PerformCommand(_teskManager, command, request, reply);
+  logOperation(operation, "error=" + std::to_string(result.code) + " msg=" + result.message);
+  _foundNoService = result.code == tesk::kServiceUnreachable;
+  return result.code == 0;
+}
+
 bool TeskWrapper::addQuixConfigForAppId(std::string_view appId, const std::string& protofFilePath) {
   if (appId != kClientName) return false;
   tesk::Message request;
   request.setInt64(tesk::kKeyAppID, kAppID);
-  request.setData(tesk::kKeyPayload, contentOf(protofFilePath));
+  request.setData(tesk::kKeyPayload, contentOfFile(protofFilePath, kLargestConfiguration));
   request.setInt64(tesk::kKeyPayloadType, kPayloadType);
-  return perform(_teskManager, "-[TeskWrapper addQuixConfigForAppId:andProtofFilePath:]",
+  return perform("-[TeskWrapper addQuixConfigForAppId:andProtofFilePath:]",
                  tesk::kCommandAddConfiguration, request);
 }
 
@@ -113,8 +117,8 @@ bool TeskWrapper::removeQuixConfigForAppid(std::string_view appId) {
   if (appId != kClientName) return false;
   tesk::Message request;
   request.setInt64(tesk::kKeyAppID, kAppID);
-  return perform(_teskManager, "-[TeskWrapper removeQuixConfigForAppid:]",
-                 tesk::kCommandClearConfiguration, request);
+  return perform("-[TeskWrapper removeQuixConfigForAppid:]", tesk::kCommandClearConfiguration,
+                 request);
 }
 
 bool TeskWrapper::querySpecificMetric(std::string_view appId, std::int32_t triggerRef,
@@ -129,10 +133,10 @@ bool TeskWrapper::querySpecificMetric(std::string_view appId, std::int32_t trigg
   request.setInt64(tesk::kKeyTriggerID, triggerID);
   request.setInt64(tesk::kKeyProfileID, profileID);
   request.setInt64(tesk::kKeyMetricID, metricID);
-  return perform(_teskManager,
-                 "-[TeskWrapper querySpecificMetric:triggerRef:triggerType:triggerID:profileID:"
-                 "metricID:]",
-                 tesk::kCommandQueryMetric, request);
+  return perform(
+      "-[TeskWrapper querySpecificMetric:triggerRef:triggerType:triggerID:profileID:"
+      "metricID:]",
+      tesk::kCommandQueryMetric, request);
 }
 
 }  // namespace qel

@@ -3,6 +3,7 @@
 
 #include <cstdint>
 #include <memory>
+#include <mutex>
 #include <string>
 #include <string_view>
 
@@ -29,8 +30,9 @@ class TeskWrapper final : public std::enable_shared_from_this<TeskWrapper> {
   // Subscribes to trigger and metric events and starts their delivery anew.
   void listen();
 
-  std::shared_ptr<TeskWrapperDelegate> delegate() const { return _delegate.lock(); }
-  void setDelegate(const std::shared_ptr<TeskWrapperDelegate>& delegate) { _delegate = delegate; }
+  // Held weakly. May be replaced while events arrive: the queue reads it too.
+  std::shared_ptr<TeskWrapperDelegate> delegate() const;
+  void setDelegate(const std::shared_ptr<TeskWrapperDelegate>& delegate);
 
   // Installs the configuration file for this application. True when the service answered 0.
   bool addQuixConfigForAppId(std::string_view appId, const std::string& protofFilePath);
@@ -41,11 +43,19 @@ class TeskWrapper final : public std::enable_shared_from_this<TeskWrapper> {
                            std::int32_t triggerType, std::int32_t triggerID, std::int32_t profileID,
                            std::int32_t metricID);
 
+  // Whether the last command that was sent had no answer for want of a service.
+  bool foundNoService() const { return _foundNoService; }
+
  private:
   TeskWrapper() = default;
 
+  // Sends the request; its result is logged and judged.
+  bool perform(std::string_view operation, std::string_view command, const tesk::Message& request);
+
   std::shared_ptr<tesk::client::Manager> _teskManager;
   std::shared_ptr<SerialQueue> _queue;
+  bool _foundNoService = false;
+  mutable std::mutex _delegateMutex;
   std::weak_ptr<TeskWrapperDelegate> _delegate;
 };
 

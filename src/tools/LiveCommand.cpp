@@ -104,8 +104,8 @@ void run(const Options& options, Output& output) {
   const auto say = [](const std::string& text) {
     std::fprintf(stderr, "qelctl: %s\n", text.c_str());
   };
-  tesk::setConnector(
-      tesk::bus::makeBusConnector({options.bus}, serviceObserver(say, startAsTheViewerDoes)));
+  tesk::setConnector(tesk::bus::makeBusConnector(
+      {options.bus}, serviceObserver(say, startAsTheViewerDoes), loop.answerWaits()));
   startAsTheViewerDoes();
   if (options.screen.empty()) {
     showLines(loop, output);

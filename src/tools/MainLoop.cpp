@@ -5,8 +5,10 @@
 
 #include <algorithm>
 #include <array>
+#include <atomic>
 #include <cstdint>
 #include <limits>
+#include <memory>
 
 #include "base/DispatchQueue.h"
 
@@ -22,11 +24,41 @@ int waitUntil(std::optional<MainLoop::Clock::time_point> until) {
 
 }  // namespace
 
+class MainLoop::AnswerWait final : public tesk::bus::AnswerWait {
+ public:
+  explicit AnswerWait(MainLoop& loop) : _loop(loop) {}
+
+  void wait() override {
+    const auto end = Clock::now() + kPatience;
+    while (!_woken && !_loop.isStopping() && Clock::now() < end) {
+      pollfd waited{_loop._signals.wakeUp().descriptor(), POLLIN, 0};
+      ::poll(&waited, 1, waitUntil(end));
+      _loop._signals.wakeUp().clear();
+    }
+    _loop._more = true;  // what rang may have been work
+  }
+
+  void wake() override {
+    _woken = true;
+    _loop._signals.wakeUp().signal();
+  }
+
+ private:
+  static constexpr std::chrono::seconds kPatience{5};
+
+  MainLoop& _loop;
+  std::atomic<bool> _woken = false;
+};
+
 MainLoop::MainLoop() {
   MainQueue::shared().setWaker([this] { _signals.wakeUp().signal(); });
 }
 
 MainLoop::~MainLoop() { MainQueue::shared().setWaker({}); }
+
+tesk::bus::AnswerWaitMaker MainLoop::answerWaits() {
+  return [this] { return std::make_shared<AnswerWait>(*this); };
+}
 
 bool MainLoop::isStopping() const { return _signals.arrived() != 0 || _outputClosed; }
 

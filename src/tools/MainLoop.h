@@ -4,6 +4,7 @@
 #include <chrono>
 #include <optional>
 
+#include "tesk/bus/BusConnector.h"
 #include "tools/StopSignals.h"
 
 namespace qel::tools {
@@ -25,7 +26,13 @@ class MainLoop {
   // the program is to end.
   bool runOnce(std::optional<Clock::time_point> until);
 
+  // How this thread waits for the service's answers: a few seconds, and no longer than until the
+  // program is told to end. For connections that do not outlive the loop.
+  tesk::bus::AnswerWaitMaker answerWaits();
+
  private:
+  class AnswerWait;
+
   bool isStopping() const;
 
   StopSignals _signals;

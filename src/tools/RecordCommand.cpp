@@ -7,12 +7,11 @@
 #include <cerrno>
 #include <chrono>
 #include <cstring>
-#include <fstream>
-#include <iterator>
 #include <memory>
 #include <optional>
 #include <string>
 
+#include "base/FileContent.h"
 #include "tools/Commands.h"
 #include "tools/MainLoop.h"
 #include "tools/RecordConnection.h"
@@ -27,6 +26,8 @@ namespace {
 using Clock = MainLoop::Clock;
 using Seconds = std::chrono::duration<double>;
 using namespace std::chrono_literals;
+
+constexpr std::size_t kLargestConfiguration = 1024 * 1024;  // bytes
 
 struct Options {
   std::string file;
@@ -74,11 +75,6 @@ std::unique_ptr<IdentityHider> hiderOf(const Options& options) {
   return std::make_unique<IdentityHider>(Pseudonyms::random());
 }
 
-Bytes contentOf(const std::string& path) {
-  std::ifstream file(path, std::ios::binary);
-  return Bytes(std::istreambuf_iterator<char>(file), std::istreambuf_iterator<char>());
-}
-
 std::string summary(const Options& options, const Recorder& recorder, Clock::duration duration) {
   const Recorder::Progress progress = recorder.progress();
   std::string text = nameOf(options) + ": " +
@@ -118,7 +114,7 @@ void run(const Options& options) {
   MainLoop loop;
   if (goesToStandardOutput(options)) loop.watchStandardOutput();
   findResources();
-  Bytes configuration = contentOf(configurationFile());
+  Bytes configuration = contentOfFile(configurationFile(), kLargestConfiguration);
   requireService(options.bus);
   Recorder recorder(begin(options), hiderOf(options));
   RecordProgress progress;
@@ -130,7 +126,8 @@ void run(const Options& options) {
         recorder.take(eventName, event);
       },
       serviceObserver([&progress](const std::string& text) { progress.say(text); },
-                      [&connection] { connection->begin(); }));
+                      [&connection] { connection->begin(); }),
+      loop.answerWaits());
   const auto begun = connection->begin();
   if (begun.code != 0) failWithoutService(begun.message);
   recordOn(options, loop, recorder, progress, start);

@@ -19,10 +19,11 @@ constexpr std::int64_t kSimFilesMetric = 19;
 }  // namespace
 
 RecordConnection::RecordConnection(std::string bus, Bytes configuration, tesk::EventSink sink,
-                                   tesk::bus::ReachabilityObserver observer)
+                                   tesk::bus::ReachabilityObserver observer,
+                                   tesk::bus::AnswerWaitMaker makeWait)
     : _bus(std::move(bus)),
       _configuration(std::move(configuration)),
-      _transport(tesk::bus::makeBusConnector({_bus}, std::move(observer))
+      _transport(tesk::bus::makeBusConnector({_bus}, std::move(observer), std::move(makeWait))
                      ->connect(kClientName, std::move(sink))) {}
 
 RecordConnection::~RecordConnection() {

@@ -15,7 +15,7 @@ namespace qel::tools {
 class RecordConnection {
  public:
   RecordConnection(std::string bus, Bytes configuration, tesk::EventSink sink,
-                   tesk::bus::ReachabilityObserver observer);
+                   tesk::bus::ReachabilityObserver observer, tesk::bus::AnswerWaitMaker makeWait);
   ~RecordConnection();
   RecordConnection(const RecordConnection&) = delete;
   RecordConnection& operator=(const RecordConnection&) = delete;

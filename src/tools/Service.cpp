@@ -9,6 +9,7 @@
 #include <utility>
 
 #include "base/DispatchQueue.h"
+#include "tesk/bus/Reasons.h"
 #include "tesk/bus/ServiceStatus.h"
 #include "tools/ToolError.h"
 #include "ui/kit/ResourceBundle.h"
@@ -22,6 +23,11 @@ constexpr const char* kService = "baseband manager service";
 constexpr const char* kConfigurationName = "orb_test_lte";
 constexpr const char* kConfigurationType = "deviceconfig";
 
+// "baseband manager service does not answer" after "baseband manager service: ".
+std::string withoutItsName(const std::string& why) {
+  return why.starts_with(tesk::bus::kTheService) ? why.substr(tesk::bus::kTheService.size()) : why;
+}
+
 }  // namespace
 
 void addBusOption(CLI::App& command, std::string& bus) {
@@ -30,7 +36,9 @@ void addBusOption(CLI::App& command, std::string& bus) {
       ->capture_default_str();
 }
 
-void failWithoutService(const std::string& why) { throw ToolError(EX_UNAVAILABLE, kService, why); }
+void failWithoutService(const std::string& why) {
+  throw ToolError(EX_UNAVAILABLE, kService, withoutItsName(why));
+}
 
 void requireService(const std::string& bus) {
   constexpr auto kPatience = 2s;
@@ -49,17 +57,22 @@ tesk::bus::ReachabilityObserver serviceObserver(std::function<void(const std::st
     std::function<void(const std::string&)> say;
     std::function<void()> back;
     bool lost = false;  // main thread only
+    bool wasThere = false;
   };
   const auto state = std::make_shared<State>(State{std::move(say), std::move(back)});
   return [state](bool reachable, const std::string& why) {
     MainQueue::shared().async([state, reachable, why] {
-      if (reachable && std::exchange(state->lost, false)) {
-        state->say(std::string(kService) + ": back");
+      const bool wasLost = std::exchange(state->lost, !reachable);
+      if (!reachable) {
+        const char* what = !state->wasThere ? "waiting for it: "
+                           : wasLost        ? "still waiting for it: "
+                                            : "lost, waiting for it: ";
+        state->say(std::string(kService) + ": " + what + withoutItsName(why));
+      } else if (wasLost) {
+        state->say(std::string(kService) + (state->wasThere ? ": back" : ": there"));
         state->back();
-      } else if (!reachable) {
-        state->lost = true;
-        state->say(std::string(kService) + ": lost, waiting for it: " + why);
       }
+      state->wasThere = state->wasThere || reachable;
     });
   };
 }

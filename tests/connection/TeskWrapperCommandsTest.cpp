@@ -1,4 +1,5 @@
 #include <gtest/gtest.h>
+#include <sys/stat.h>
 
 #include <cstdio>
 #include <fstream>
@@ -59,6 +60,35 @@ TEST_F(TeskWrapperCommands, installSendsTheWholeFile) {
 TEST_F(TeskWrapperCommands, installOfAFileThatCannotBeReadSendsNoBytes) {
   EXPECT_TRUE(wrapper->addQuixConfigForAppId("qelwatch", "/nonexistent/file"));
   EXPECT_EQ(request(), R"({"kKeyAppID": 2, "kKeyPayload": "<>", "kKeyPayloadType": 0})");
+}
+
+// Reading a folder, or memory at an address that is not there, threw through the wrapper once; a
+// pipe without a writer held it up.
+TEST_F(TeskWrapperCommands, installOfWhatIsNoFileSendsNoBytes) {
+  const std::string pipe = ::testing::TempDir() + "qelwatch_install_pipe";
+  std::remove(pipe.c_str());
+  ASSERT_EQ(::mkfifo(pipe.c_str(), 0600), 0);
+  for (const std::string& path : {std::string("/proc"), std::string("/proc/self/mem"), pipe,
+                                  std::string("/dev/zero"), std::string()}) {
+    service->commands.clear();
+    EXPECT_TRUE(wrapper->addQuixConfigForAppId("qelwatch", path)) << path;
+    EXPECT_EQ(request(), R"({"kKeyAppID": 2, "kKeyPayload": "<>", "kKeyPayloadType": 0})") << path;
+  }
+  std::remove(pipe.c_str());
+}
+
+TEST_F(TeskWrapperCommands, installOfAFileBeyondAMebibyteSendsNoBytes) {
+  constexpr std::size_t kMost = 1024 * 1024;
+  const std::string path = ::testing::TempDir() + "qelwatch_large_install_test";
+  for (const std::size_t size : {kMost, kMost + 1}) {
+    std::ofstream(path, std::ios::binary) << std::string(size, 'x');
+    service->commands.clear();
+    EXPECT_TRUE(wrapper->addQuixConfigForAppId("qelwatch", path));
+    ASSERT_EQ(service->commands.size(), 1U);
+    const Bytes* sent = service->commands[0].request.find("kKeyPayload")->asBytes();
+    EXPECT_EQ(sent->size(), size == kMost ? kMost : 0U);
+  }
+  std::remove(path.c_str());
 }
 
 TEST_F(TeskWrapperCommands, queryKeepsTheSignOfItsArguments) {

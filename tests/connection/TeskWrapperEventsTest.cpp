@@ -1,5 +1,6 @@
 #include <gtest/gtest.h>
 
+#include <atomic>
 #include <future>
 #include <thread>
 
@@ -123,6 +124,28 @@ TEST_F(TeskWrapperEvents, aDelegateThatGoesAwayBeforeItsTurnIsNotCalled) {
   EXPECT_TRUE(watched.expired());
   finishQueue(wrapper);
   EXPECT_EQ(wrapper->delegate(), nullptr);
+}
+
+// The queue read the weak pointer while the main thread wrote it, and took a delegate that was
+// gone.
+TEST_F(TeskWrapperEvents, theDelegateMayBeReplacedWhileEventsArrive) {
+  constexpr int kEvents = 2'000;
+  wrapper->listen();
+  std::atomic<bool> sent = false;
+  std::thread sender([this, &sent] {
+    for (int i = 0; i < kEvents; ++i) service->send(tesk::kEventMetric, event);
+    sent = true;
+  });
+  while (!sent) {
+    wrapper->setDelegate(std::make_shared<RecordingDelegate>());  // gone at once
+    wrapper->setDelegate(delegate);
+    wrapper->setDelegate(nullptr);
+  }
+  sender.join();
+  wrapper->setDelegate(delegate);
+  service->send(tesk::kEventTrigger, {{"kKeyTriggerID", 5}});
+  finishQueue(wrapper);
+  EXPECT_EQ(delegate->triggers.size(), 1U);
 }
 
 }  // namespace

@@ -6,46 +6,51 @@
 #include <algorithm>
 #include <array>
 #include <cerrno>
+#include <limits>
+#include <utility>
 
 #include "tesk/bus/BasebandManager1Proxy.h"
 #include "tesk/bus/EventPacket.h"
 #include "tesk/bus/MessageConversion.h"
+#include "tesk/bus/Reasons.h"
 
 namespace tesk::bus {
 namespace {
 
 using namespace std::chrono_literals;
 
-constexpr auto kCallTimeout = 5s;
-constexpr auto kTryAgainAfter = 1s;
+constexpr auto kInterface = tesk::BasebandManager1_proxy::INTERFACE_NAME;
+constexpr auto kAnswerTimeout = 5s;
+constexpr std::uint64_t kNoTimeout = std::numeric_limits<std::uint64_t>::max();
+constexpr std::chrono::milliseconds kFirstPause = 250ms;
+constexpr std::chrono::milliseconds kLongestPause = 2s;
+// The bus keeps a record of every call that it denies.
+constexpr std::chrono::milliseconds kLongestPauseWithoutPermission = 30s;
 constexpr int kPacketsAtOnce = 256;
 
-std::string reasonOf(const sdbus::Error& error) {
-  if (error.getName() == "org.freedesktop.DBus.Error.AccessDenied") {
-    return "no permission to use the baseband manager service (is the user in group baseband?)";
-  }
-  return "baseband manager service not reachable";
-}
+CommandResult unreachable(std::string_view why) { return {kServiceUnreachable, std::string(why)}; }
 
 }  // namespace
 
-class ManagerProxy final : public sdbus::ProxyInterfaces<tesk::BasebandManager1_proxy> {
- public:
-  explicit ManagerProxy(sdbus::IConnection& connection)
-      : ProxyInterfaces(connection, kServiceName, kObjectPath) {
-    registerProxy();
-  }
-  ~ManagerProxy() { unregisterProxy(); }
-};
-
-BusLink::BusLink(const BusAddress& address, std::string clientName, EventSink sink)
-    : _clientName(std::move(clientName)), _sink(std::move(sink)), _connection(connectTo(address)) {
-  _connection->setMethodCallTimeout(kCallTimeout);
+BusLink::BusLink(const BusAddress& address, std::string clientName, EventSink sink, bool deliver)
+    : _clientName(std::move(clientName)),
+      _sink(std::move(sink)),
+      _connection(connectTo(address)),
+      _deliver(deliver),
+      _pause(kFirstPause) {
   watchOwner();
-  _proxy = std::make_unique<ManagerProxy>(*_connection);
+  _proxy = sdbus::createProxy(*_connection, kServiceName, kObjectPath);
+  beginToRegister();
 }
 
-BusLink::~BusLink() = default;
+BusLink::~BusLink() { detach(kNoBus); }
+
+std::optional<BusLink::Reachability> BusLink::reachability() const {
+  if (isOverdue(Clock::now())) return Reachability{false, std::string(kNoAnswer)};
+  if (isAttached()) return Reachability{true, ""};
+  if (!_why) return std::nullopt;
+  return Reachability{false, *_why};
+}
 
 void BusLink::watchOwner() {
   const std::string rule = std::string("type='signal',sender='org.freedesktop.DBus',") +
@@ -54,55 +59,123 @@ void BusLink::watchOwner() {
   _ownerMatch = _connection->addMatch(rule, [this](sdbus::Message&) { _ownerChanged = true; });
 }
 
-bool BusLink::attach() {
-  if (isAttached()) return true;
+void BusLink::beginToRegister() {
   _tryAgainAt.reset();
-  try {
-    _stream = _proxy->Register(_clientName);
-    if (_deliver) _proxy->SetDelivery(true);
-    return true;
-  } catch (const sdbus::Error& error) {
-    detach(reasonOf(error));
-    return false;
-  }
+  _registering = true;
+  const auto answer = [this, number = ++_registration](const sdbus::Error* error,
+                                                       sdbus::UnixFd stream) {
+    if (number == _registration) registered(error, stream);
+  };
+  _proxy->callMethodAsync("Register")
+      .onInterface(kInterface)
+      .withTimeout(kAnswerTimeout)
+      .withArguments(_clientName)
+      .uponReplyInvoke(answer);
 }
 
-void BusLink::detach(std::string why) {
-  _stream.reset();
-  _why = std::move(why);
+void BusLink::registered(const sdbus::Error* error, const sdbus::UnixFd& stream) {
+  _registering = false;
+  if (error) return failed(*error);
+  _stream = stream;
+  _attachedAt = Clock::now();
+  if (_deliver) askForDelivery();
+  for (const Command& command : std::exchange(_waiting, {})) send(command);
+}
+
+void BusLink::failed(const sdbus::Error& error) {
+  const auto why = reasonOf(error);
+  detach(why);
+  // A service that is not there is heard of when it comes.
+  if (isAbsence(error)) return;
+  tryAgainLater(why == kNoPermission ? kLongestPauseWithoutPermission : kLongestPause);
 }
 
 void BusLink::setDelivery(bool on) {
   _deliver = on;
-  if (!isAttached()) return;
-  try {
-    _proxy->SetDelivery(on);
-  } catch (const sdbus::Error& error) {
-    detach(reasonOf(error));
+  if (isAttached()) askForDelivery();
+}
+
+void BusLink::askForDelivery() {
+  const auto answer = [this, number = _registration](const sdbus::Error* error) {
+    if (error && number == _registration) failed(*error);
+  };
+  _proxy->callMethodAsync("SetDelivery")
+      .onInterface(kInterface)
+      .withTimeout(kNoTimeout)
+      .withArguments(_deliver)
+      .uponReplyInvoke(answer);
+}
+
+void BusLink::performCommand(Command command) {
+  if (isAttached()) {
+    send(command);
+  } else if (_registering) {
+    _waiting.push_back(std::move(command));
+  } else {
+    command.answer(unreachable(_why.value_or(std::string(kNotThere))), {});
   }
 }
 
-CommandResult BusLink::performCommand(std::string_view command, const Message& request,
-                                      Message& reply) {
-  if (!attach()) return {kServiceUnreachable, _why};
+void BusLink::send(const Command& command) {
+  if (command.isAbandoned()) return;
+  const std::uint64_t number = ++_lastNumber;
   try {
-    auto [code, message, entries] =
-        _proxy->PerformCommand(std::string(command), toVariants(request));
-    reply = fromVariants(entries);
-    return {code, std::move(message)};
+    _proxy->callMethodAsync("PerformCommand")
+        .onInterface(kInterface)
+        .withTimeout(kNoTimeout)
+        .withArguments(command.name, toVariants(command.request))
+        .uponReplyInvoke([this, number](const sdbus::Error* error, std::int32_t code,
+                                        std::string message, VariantMap entries) {
+          answered(number, error, {code, std::move(message), std::move(entries)});
+        });
+    _sent.emplace(number, Sent{Clock::now(), command.answer});
   } catch (const sdbus::Error& error) {
-    return {kServiceUnreachable, reasonOf(error)};
+    command.answer(unreachable(reasonOf(error)), {});
   }
+}
+
+void BusLink::answered(std::uint64_t number, const sdbus::Error* error, CommandReply reply) {
+  auto sent = _sent.extract(number);
+  if (sent.empty()) return;
+  if (!error) {
+    auto& [code, message, entries] = reply;
+    return sent.mapped().answer({code, std::move(message)}, fromVariants(entries));
+  }
+  sent.mapped().answer(unreachable(reasonOf(*error)), {});
+  if (isNotRegistered(*error)) failed(*error);
+}
+
+void BusLink::detach(std::string_view why) {
+  if (isAttached() && Clock::now() - _attachedAt > kLongestPause) _pause = kFirstPause;
+  _stream.reset();
+  _registering = false;
+  ++_registration;
+  _why = why;
+  for (const auto& [number, sent] : std::exchange(_sent, {})) sent.answer(unreachable(why), {});
+  for (const Command& command : std::exchange(_waiting, {})) command.answer(unreachable(why), {});
+}
+
+void BusLink::tryAgainLater(std::chrono::milliseconds longestPause) {
+  _tryAgainAt = Clock::now() + _pause;
+  _pause = std::min(_pause * 2, longestPause);
+}
+
+bool BusLink::isOverdue(Clock::time_point now) const {
+  return !_sent.empty() && now - _sent.begin()->second.at >= kAnswerTimeout;
 }
 
 int BusLink::pollTimeout(const sdbus::IConnection::PollData& bus) const {
-  int timeout = bus.getPollTimeout();
-  if (_tryAgainAt) {
-    const auto left = std::chrono::ceil<std::chrono::milliseconds>(*_tryAgainAt - Clock::now());
-    const int wait = std::max(0, static_cast<int>(left.count()));
-    timeout = timeout < 0 ? wait : std::min(timeout, wait);
+  const auto now = Clock::now();
+  std::optional<Clock::time_point> next = _tryAgainAt;
+  if (!_sent.empty() && !isOverdue(now)) {
+    const auto overdueAt = _sent.begin()->second.at + kAnswerTimeout;
+    next = next ? std::min(*next, overdueAt) : overdueAt;
   }
-  return timeout;
+  const int timeout = bus.getPollTimeout();
+  if (!next) return timeout;
+  const auto left = std::chrono::ceil<std::chrono::milliseconds>(*next - now);
+  const int wait = std::max(0, static_cast<int>(left.count()));
+  return timeout < 0 ? wait : std::min(timeout, wait);
 }
 
 void BusLink::waitAndProcess(int wakeDescriptor) {
@@ -113,7 +186,7 @@ void BusLink::waitAndProcess(int wakeDescriptor) {
   ::poll(waited.data(), waited.size(), pollTimeout(bus));
   if (waited[2].revents != 0) processStream();
   processBus();
-  if (_tryAgainAt && Clock::now() >= *_tryAgainAt) attach();
+  if (_tryAgainAt && Clock::now() >= *_tryAgainAt) beginToRegister();
 }
 
 void BusLink::processBus() {
@@ -121,8 +194,11 @@ void BusLink::processBus() {
   }
   if (!std::exchange(_ownerChanged, false)) return;
   // Whoever owns the name now knows nothing of us, and the old stream was the old owner's.
-  detach("baseband manager service not reachable");
-  attach();
+  _pause = kFirstPause;
+  auto waiting = std::exchange(_waiting, {});
+  detach(kNotThere);
+  _waiting = std::move(waiting);
+  beginToRegister();
 }
 
 void BusLink::processStream() {
@@ -131,9 +207,8 @@ void BusLink::processStream() {
     const ssize_t size = ::recv(_stream.get(), packet.data(), packet.size(), MSG_DONTWAIT);
     if (size < 0 && (errno == EAGAIN || errno == EINTR)) return;
     if (size <= 0) {
-      detach("baseband manager service not reachable");
-      _tryAgainAt = Clock::now() + kTryAgainAfter;
-      return;
+      detach(kNotThere);
+      return tryAgainLater(kLongestPause);
     }
     if (auto event = decodeEvent({packet.data(), static_cast<std::size_t>(size)})) {
       _sink(event->name, std::move(event->message));

@@ -3,6 +3,10 @@
 
 #include <sdbus-c++/sdbus-c++.h>
 #include <chrono>
+#include <cstdint>
+#include <deque>
+#include <functional>
+#include <map>
 #include <memory>
 #include <optional>
 #include <string>
@@ -12,45 +16,86 @@
 
 namespace tesk::bus {
 
-class ManagerProxy;
-
-// Belongs to one thread. Lives as long as the bus connection; every call may throw sdbus::Error
-// when that is lost, and the link is then of no more use.
+// Belongs to one thread and never waits for the service: what it asks is answered in
+// waitAndProcess. Lives as long as the bus connection; waitAndProcess throws sdbus::Error when that
+// is lost, and the link is then of no more use.
 class BusLink {
  public:
   using Clock = std::chrono::steady_clock;
 
-  BusLink(const BusAddress& address, std::string clientName, EventSink sink);
-  ~BusLink();
+  // A command on its way. It is answered exactly once, at the latest by the link's end, unless it
+  // was abandoned before it was sent: then it never is.
+  struct Command {
+    std::string name;
+    Message request;
+    std::function<void(CommandResult result, Message reply)> answer;
+    std::function<bool()> isAbandoned;
+  };
 
-  // Registers with the service, unless that is done. False when it cannot be had now; why() tells.
-  bool attach();
-  bool isAttached() const { return _stream.isValid(); }
-  const std::string& why() const { return _why; }
+  struct Reachability {
+    bool reachable;
+    std::string why;  // when not
+  };
+
+  // Connects, which may take as long as the bus pleases, and begins to register.
+  BusLink(const BusAddress& address, std::string clientName, EventSink sink, bool deliver);
+  ~BusLink();
+  BusLink(const BusLink&) = delete;
+  BusLink& operator=(const BusLink&) = delete;
+
+  // Nothing while the first answer is still awaited.
+  std::optional<Reachability> reachability() const;
 
   void setDelivery(bool on);
-  CommandResult performCommand(std::string_view command, const Message& request, Message& reply);
+  // Waits for a registration that is under way. A command that the service has takes as long as the
+  // service does: its answer is what it came to.
+  void performCommand(Command command);
 
   // Waits for the bus, the stream or `wakeDescriptor`, and takes what came.
   void waitAndProcess(int wakeDescriptor);
 
  private:
+  struct Sent {
+    Clock::time_point at;
+    std::function<void(CommandResult, Message)> answer;
+  };
+  using CommandReply = std::tuple<std::int32_t, std::string, std::map<std::string, sdbus::Variant>>;
+
+  bool isAttached() const { return _stream.isValid(); }
+  bool isOverdue(Clock::time_point now) const;
   void watchOwner();
+  void beginToRegister();
+  void registered(const sdbus::Error* error, const sdbus::UnixFd& stream);
+  void failed(const sdbus::Error& error);
+  void askForDelivery();
+  void send(const Command& command);
+  void answered(std::uint64_t number, const sdbus::Error* error, CommandReply reply);
   void processBus();
   void processStream();
-  void detach(std::string why);
+  // The registration is over, and what was sent under it comes to nothing.
+  void detach(std::string_view why);
+  void tryAgainLater(std::chrono::milliseconds longestPause);
   int pollTimeout(const sdbus::IConnection::PollData& bus) const;
 
   const std::string _clientName;
   const EventSink _sink;
   const std::unique_ptr<sdbus::IConnection> _connection;
   sdbus::Slot _ownerMatch;
-  std::unique_ptr<ManagerProxy> _proxy;
+  std::unique_ptr<sdbus::IProxy> _proxy;
   sdbus::UnixFd _stream;
-  bool _deliver = false;
+  bool _deliver;
   bool _ownerChanged = false;
+
+  bool _registering = false;
+  std::uint64_t _registration = 0;  // its number: answers under an earlier one are void
+  Clock::time_point _attachedAt;
   std::optional<Clock::time_point> _tryAgainAt;
-  std::string _why = "baseband manager service not reachable";
+  std::chrono::milliseconds _pause;
+  std::optional<std::string> _why;  // none before the first answer
+
+  std::deque<Command> _waiting;         // for the registration
+  std::map<std::uint64_t, Sent> _sent;  // not answered yet, by number
+  std::uint64_t _lastNumber = 0;
 };
 
 }  // namespace tesk::bus

@@ -3,12 +3,15 @@
 #include <poll.h>
 
 #include <algorithm>
+#include <condition_variable>
 #include <deque>
 #include <future>
 #include <mutex>
 #include <optional>
+#include <utility>
 
 #include "tesk/bus/BusLink.h"
+#include "tesk/bus/Reasons.h"
 #include "tesk/bus/WakeUp.h"
 
 namespace tesk::bus {
@@ -17,7 +20,54 @@ namespace {
 using namespace std::chrono_literals;
 
 constexpr std::chrono::milliseconds kFirstPause = 250ms;
-constexpr std::chrono::milliseconds kLongestPause = 5s;
+constexpr std::chrono::milliseconds kLongestPause = 2s;
+constexpr std::chrono::milliseconds kConnectingTakes = 500ms;
+
+// Waits and does nothing else.
+class PlainWait final : public AnswerWait {
+ public:
+  void wait() override { _woken.get_future().wait(); }
+  void wake() override { _woken.set_value(); }
+
+ private:
+  std::promise<void> _woken;
+};
+
+// What a command came to, between the two threads.
+class Outcome {
+ public:
+  explicit Outcome(std::shared_ptr<AnswerWait> wait) : _wait(std::move(wait)) {}
+
+  void answer(CommandResult result, Message reply) {
+    {
+      const std::lock_guard lock(_mutex);
+      _result = std::move(result);
+      _reply = std::move(reply);
+    }
+    _wait->wake();
+  }
+
+  bool isAbandoned() {
+    const std::lock_guard lock(_mutex);
+    return _abandoned;
+  }
+
+  CommandResult waitFor(Message& reply) {
+    _wait->wait();
+    const std::lock_guard lock(_mutex);
+    _abandoned = true;
+    if (!_result) return {kServiceUnreachable, std::string(kNoAnswer)};
+    reply = std::move(_reply);
+    return std::move(*_result);
+  }
+
+ private:
+  const std::shared_ptr<AnswerWait> _wait;
+  std::mutex _mutex;
+  std::optional<CommandResult> _result;
+  Message _reply;
+  bool _abandoned = false;
+};
 
 }  // namespace
 
@@ -37,32 +87,39 @@ class BusTransport::Worker {
     auto pause = kFirstPause;
     while (!isStopping()) {
       try {
-        BusLink link(_address, _clientName, _sink);
+        setConnecting(true);
+        BusLink link(_address, _clientName, _sink, _deliver);
+        setConnecting(false);
         pause = kFirstPause;
         live(link);
       } catch (const sdbus::Error&) {
         // No bus, or it is gone: again after a pause. A failed attempt costs some memory inside the
         // bus library, so the pauses grow.
       }
-      tell(false, "no message bus");
+      setConnecting(false);
+      if (isStopping()) break;
+      tell(false, std::string(kNoBus));
       waitWithoutBus(pause);
       pause = std::min(pause * 2, kLongestPause);
     }
     runTasks(nullptr);
+    const std::lock_guard lock(_mutex);
+    _ended = true;
+    _changed.notify_all();
   }
 
-  // Waits until the thread has run it.
-  void perform(const Task& task) {
-    std::promise<void> done;
+  void post(Task task) {
     {
       const std::lock_guard lock(_mutex);
-      _tasks.push_back([&](BusLink* link) {
-        task(link);
-        done.set_value();
-      });
+      _tasks.push_back(std::move(task));
     }
     _wakeUp.signal();
-    done.get_future().wait();
+  }
+
+  // The thread only.
+  void setDelivery(BusLink* link, bool on) {
+    _deliver = on;
+    if (link) link->setDelivery(on);
   }
 
   void stop() {
@@ -73,8 +130,14 @@ class BusTransport::Worker {
     _wakeUp.signal();
   }
 
-  // What delivery is to be whenever there is a link. The thread only.
-  bool deliver = false;
+  // After stop(). False when the thread may still be a long time: a bus that takes a connection and
+  // says nothing holds it up, where it does nothing that anybody could notice.
+  bool endsSoon() {
+    std::unique_lock lock(_mutex);
+    _changed.wait_for(lock, kConnectingTakes, [this] { return _ended; });
+    _changed.wait(lock, [this] { return _ended || _connecting; });
+    return _ended;
+  }
 
  private:
   bool isStopping() {
@@ -82,12 +145,16 @@ class BusTransport::Worker {
     return _stopping;
   }
 
+  void setConnecting(bool connecting) {
+    const std::lock_guard lock(_mutex);
+    _connecting = connecting;
+    _changed.notify_all();
+  }
+
   void live(BusLink& link) {
-    link.setDelivery(deliver);
-    link.attach();
     while (!isStopping()) {
       runTasks(&link);
-      tell(link.isAttached(), link.why());
+      if (const auto now = link.reachability()) tell(now->reachable, now->why);
       link.waitAndProcess(_wakeUp.descriptor());
       _wakeUp.clear();
     }
@@ -116,9 +183,9 @@ class BusTransport::Worker {
   }
 
   void tell(bool reachable, const std::string& why) {
-    if (_told == reachable) return;
-    _told = reachable;
-    if (_observer) _observer(reachable, reachable ? std::string() : why);
+    if (_told && _told->first == reachable && _told->second == why) return;
+    _told.emplace(reachable, why);
+    if (_observer) _observer(reachable, why);
   }
 
   const BusAddress _address;
@@ -127,21 +194,28 @@ class BusTransport::Worker {
   const ReachabilityObserver _observer;
   const WakeUp _wakeUp;
   std::mutex _mutex;
+  std::condition_variable _changed;
   std::deque<Task> _tasks;
   bool _stopping = false;
-  std::optional<bool> _told;
+  bool _connecting = false;
+  bool _ended = false;
+  // The thread only.
+  bool _deliver = false;  // whenever there is a link
+  std::optional<std::pair<bool, std::string>> _told;
 };
 
 BusTransport::BusTransport(BusAddress address, std::string clientName, EventSink sink,
-                           ReachabilityObserver observer)
-    : _worker(std::make_shared<Worker>(std::move(address), std::move(clientName), std::move(sink),
+                           ReachabilityObserver observer, AnswerWaitMaker makeWait)
+    : _makeWait(std::move(makeWait)),
+      _worker(std::make_shared<Worker>(std::move(address), std::move(clientName), std::move(sink),
                                        std::move(observer))),
       _thread([worker = _worker] { worker->run(); }) {}
 
 BusTransport::~BusTransport() {
   _worker->stop();
-  if (_thread.get_id() == std::this_thread::get_id()) {
-    _thread.detach();  // let go from within an event
+  const bool withinEvent = _thread.get_id() == std::this_thread::get_id();
+  if (withinEvent || !_worker->endsSoon()) {
+    _thread.detach();
   } else {
     _thread.join();
   }
@@ -149,25 +223,26 @@ BusTransport::~BusTransport() {
 
 CommandResult BusTransport::performCommand(std::string_view command, const Message& request,
                                            Message& reply) {
-  CommandResult result{kServiceUnreachable, "no message bus"};
-  _worker->perform([&](BusLink* link) {
-    if (link) result = link->performCommand(command, request, reply);
+  const auto outcome =
+      std::make_shared<Outcome>(_makeWait ? _makeWait() : std::make_shared<PlainWait>());
+  BusLink::Command order{std::string(command), request,
+                         [outcome](CommandResult result, Message answer) {
+                           outcome->answer(std::move(result), std::move(answer));
+                         },
+                         [outcome] { return outcome->isAbandoned(); }};
+  _worker->post([order = std::move(order)](BusLink* link) {
+    if (!link) return order.answer({kServiceUnreachable, std::string(kNoBus)}, {});
+    link->performCommand(order);
   });
-  return result;
+  return outcome->waitFor(reply);
 }
 
 void BusTransport::eventsOn() {
-  _worker->perform([this](BusLink* link) {
-    _worker->deliver = true;
-    if (link) link->setDelivery(true);
-  });
+  _worker->post([worker = _worker.get()](BusLink* link) { worker->setDelivery(link, true); });
 }
 
 void BusTransport::eventsOff() {
-  _worker->perform([this](BusLink* link) {
-    _worker->deliver = false;
-    if (link) link->setDelivery(false);
-  });
+  _worker->post([worker = _worker.get()](BusLink* link) { worker->setDelivery(link, false); });
 }
 
 }  // namespace tesk::bus

@@ -9,11 +9,12 @@
 
 namespace tesk::bus {
 
-// A thread of its own does all that touches the bus; calls hand it work and wait for it.
+// A thread of its own does all that touches the bus; calls hand it work, and only a command waits
+// for what came of it. The end waits for nobody but a sink that is at work.
 class BusTransport final : public Transport {
  public:
   BusTransport(BusAddress address, std::string clientName, EventSink sink,
-               ReachabilityObserver observer);
+               ReachabilityObserver observer, AnswerWaitMaker makeWait);
   ~BusTransport() override;
 
   CommandResult performCommand(std::string_view command, const Message& request,
@@ -24,6 +25,7 @@ class BusTransport final : public Transport {
  private:
   class Worker;
 
+  const AnswerWaitMaker _makeWait;
   const std::shared_ptr<Worker> _worker;  // the thread's too
   std::thread _thread;
 };

@@ -6,6 +6,7 @@
 #include <tuple>
 
 #include "tesk/bus/BasebandManager1Proxy.h"
+#include "tesk/bus/Reasons.h"
 
 namespace tesk::bus {
 namespace {
@@ -59,11 +60,12 @@ ServiceStatus statusOf(const Properties& properties) {
   return status;
 }
 
-std::string reasonOf(const sdbus::Error& error) {
+std::string wordsFor(const sdbus::Error& error) {
   if (error.getName() == "org.freedesktop.DBus.Error.AccessDenied") {
     return "no permission to use it (is the user in group baseband?)";
   }
-  return "not reachable";
+  const auto reason = reasonOf(error);
+  return std::string(reason.substr(reason.starts_with(kTheService) ? kTheService.size() : 0));
 }
 
 }  // namespace
@@ -81,7 +83,7 @@ std::optional<ServiceStatus> readServiceStatus(const BusAddress& address, std::s
     StatusProxy proxy(*connection);
     return statusOf(proxy.GetAll(tesk::BasebandManager1_proxy::INTERFACE_NAME));
   } catch (const sdbus::Error& error) {
-    why = reasonOf(error);
+    why = wordsFor(error);
     return std::nullopt;
   }
 }

@@ -19,8 +19,10 @@ void Navigation::componentComplete() {
   first->setTitle(_storyboard->initialTitle.toStdString());
   _controller = std::make_shared<RootNavigationController>(first);
   _controller->setObserver([this] { stackChanged(); });
-  _controller->loadViewIfNeeded();
   stackChanged();
+  // Its commands wait for the service, and the window has yet to be shown.
+  QMetaObject::invokeMethod(
+      this, [this] { _controller->loadViewIfNeeded(); }, Qt::QueuedConnection);
 }
 
 int Navigation::rowCount(const QModelIndex& parent) const {

@@ -25,25 +25,40 @@ void RootNavigationController::viewDidLoad() {
 }
 
 void RootNavigationController::comeIntoService() {
-  if (!_inService) bringIntoService();
+  if (_start == Start::foundNoService) bringIntoService();
+  _again = _start == Start::underWay;
 }
 
+// Its commands may let the event loop run while they wait.
 void RootNavigationController::bringIntoService() {
+  Start came = Start::foundNoService;
+  do {
+    _again = false;
+    _start = Start::underWay;
+    came = start();
+  } while (came == Start::foundNoService && _again);
+  _start = came;
+}
+
+RootNavigationController::Start RootNavigationController::start() {
   if (myTeskWrapper) myTeskWrapper->removeQuixConfigForAppid(myAppID);
   const auto path = ResourceBundle::main().pathForResource(metricFileName, metricFileType);
   if (!path) {
     standardOutput().write("Metric Log File path doesnt exist");
-    return;
+    return Start::made;
   }
   standardOutput().write("pushing metric file");
   if (!myTeskWrapper) fatalError("no connection to install the metric configuration with");
-  if (!myTeskWrapper->addQuixConfigForAppId(myAppID, *path)) return;
-  _inService = true;
+  if (!myTeskWrapper->addQuixConfigForAppId(myAppID, *path)) {
+    return myTeskWrapper->foundNoService() ? Start::foundNoService : Start::made;
+  }
   if (myMetricValidator->mySharedTeskInstance) myMetricValidator->mySharedTeskInstance->listen();
   standardOutput().write("Querying SIM files");
-  if (!myTeskWrapper) return;
-  myTeskWrapper->querySpecificMetric(kQueryAppID, kQueryTriggerRef, kQueryTriggerType,
-                                     kSIMFilesTriggerID, kQueryProfileID, kQueryMetricID);
+  if (myTeskWrapper) {
+    myTeskWrapper->querySpecificMetric(kQueryAppID, kQueryTriggerRef, kQueryTriggerType,
+                                       kSIMFilesTriggerID, kQueryProfileID, kQueryMetricID);
+  }
+  return Start::made;
 }
 
 }  // namespace qel

@@ -1,6 +1,7 @@
 // The navigation stack of the viewer; its start brings the connection into service.
 #pragma once
 
+#include <cstdint>
 #include <memory>
 #include <string>
 
@@ -25,14 +26,18 @@ class RootNavigationController final : public NavigationController {
 
   void viewDidLoad() override;
 
-  // The same again, unless a configuration was installed already: for a service that was not there
-  // when the view was loaded.
+  // The same again when it found no service. A refused installation is not made again, nor one
+  // without a file.
   void comeIntoService();
 
  private:
-  void bringIntoService();
+  enum class Start : std::uint8_t { notMade, underWay, made, foundNoService };
 
-  bool _inService = false;
+  void bringIntoService();
+  Start start();
+
+  Start _start = Start::notMade;
+  bool _again = false;  // the service came while the start was under way
 };
 
 }  // namespace qel

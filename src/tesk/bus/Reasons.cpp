@@ -1,0 +1,43 @@
+#include "tesk/bus/Reasons.h"
+
+#include <algorithm>
+#include <array>
+
+namespace tesk::bus {
+namespace {
+
+struct Reason {
+  std::string_view errorName;
+  std::string_view words;
+};
+
+constexpr std::array kReasons = {
+    Reason{"org.freedesktop.DBus.Error.AccessDenied", kNoPermission},
+    Reason{"tesk.BasebandManager1.Error.TooManyClients", kTooManyClients},
+    Reason{"tesk.BasebandManager1.Error.InvalidName", kRefused},
+    Reason{"org.freedesktop.DBus.Error.Timeout", kNoAnswer},
+    Reason{"org.freedesktop.DBus.Error.TimedOut", kNoAnswer},
+    Reason{"org.freedesktop.DBus.Error.NoReply", kNoAnswer},
+    Reason{"System.Error.ETIMEDOUT", kNoAnswer},
+    Reason{"org.freedesktop.DBus.Error.UnknownMethod", kRefused},
+    Reason{"org.freedesktop.DBus.Error.UnknownInterface", kRefused},
+    Reason{"org.freedesktop.DBus.Error.UnknownObject", kRefused},
+};
+
+}  // namespace
+
+std::string_view reasonOf(const sdbus::Error& error) {
+  const auto found = std::ranges::find(kReasons, error.getName(), &Reason::errorName);
+  return found == kReasons.end() ? kNotThere : found->words;
+}
+
+bool isNotRegistered(const sdbus::Error& error) {
+  return error.getName() == "tesk.BasebandManager1.Error.NotRegistered";
+}
+
+bool isAbsence(const sdbus::Error& error) {
+  return error.getName() == "org.freedesktop.DBus.Error.ServiceUnknown" ||
+         error.getName() == "org.freedesktop.DBus.Error.NameHasNoOwner";
+}
+
+}  // namespace tesk::bus
