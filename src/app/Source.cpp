@@ -1,6 +1,8 @@
 #include "app/Source.h"
 
 #include <QtCore/QFileInfo>
+#include <QtCore/QLocale>
+#include <QtCore/QPointer>
 #include <chrono>
 #include <iostream>
 
@@ -14,6 +16,11 @@ namespace {
 const QString kRecording = QStringLiteral("recording:");
 constexpr std::chrono::milliseconds kPatienceOfASelfTest{5000};
 const QString kModemManager = QStringLiteral("modem-manager");
+
+QString lossInWords(std::uint64_t dropped) {
+  return QLocale::c().toString(static_cast<qulonglong>(dropped)) +
+         QStringLiteral(" reports left out, which came faster than they could be shown");
+}
 
 }  // namespace
 
@@ -35,6 +42,10 @@ int Source::open(const Options& options) {
 
 void Source::showIn(Navigation& navigation) {
   if (_watch) _watch->showIn(navigation);
+  const auto& wrapper = navigation.controller().myTeskWrapper;
+  wrapper->setLossObserver([window = QPointer(&navigation)](std::uint64_t dropped) {
+    if (window) window->setLoss(lossInWords(dropped));
+  });
 }
 
 int Source::openWithin(const std::string& source) {

@@ -24,7 +24,7 @@ class Source {
   // standard error and the answer is the exit code; else 0.
   int open(const Options& options);
 
-  // Shows in the window whether the service can be reached.
+  // Shows in the window whether the service can be reached, and how much came too fast.
   void showIn(Navigation& navigation);
 
  private:

@@ -1,5 +1,6 @@
 #include "connection/TeskWrapper.h"
 
+#include <algorithm>
 #include <array>
 #include <mutex>
 #include <utility>
@@ -14,6 +15,9 @@ namespace {
 
 constexpr std::string_view kClientName = "qelwatch";
 constexpr std::string_view kQueueLabel = "tesk.qelwatch.serialQ.queue";
+constexpr std::string_view kHandler = "-[TeskWrapper listen]_block_invoke";
+constexpr std::chrono::seconds kLossPause{1};
+constexpr std::chrono::seconds kLossLogPause{10};
 constexpr std::int64_t kAppID = 2;
 constexpr std::int64_t kPayloadType = 0;
 constexpr std::size_t kLargestConfiguration = 1024 * 1024;  // bytes; a larger file reads as empty
@@ -35,17 +39,6 @@ void logOperation(std::string_view operation, std::string_view text) {
   line += ": ";
   line += text;
   systemLog().write(line);
-}
-
-void handOver(const std::shared_ptr<TeskWrapper>& wrapper, const Stream& stream,
-              const tesk::Message& event) {
-  Dictionary dictionary = tesk::createDictionaryFromMessage(event);
-  logOperation("-[TeskWrapper listen]_block_invoke",
-               std::string(stream.logText) + jsonText(dictionary));
-  if (!wrapper->delegate()) return;
-  MainQueue::shared().async([wrapper, &stream, held = std::optional(std::move(dictionary))] {
-    if (const auto delegate = wrapper->delegate()) ((*delegate).*stream.deliver)(held);
-  });
 }
 
 }  // namespace
@@ -79,13 +72,52 @@ void TeskWrapper::setDelegate(const std::shared_ptr<TeskWrapperDelegate>& delega
   _delegate = delegate;
 }
 
+void TeskWrapper::handOver(const tesk::Message& event, std::string_view eventName,
+                           std::string_view logText) {
+  Dictionary dictionary = tesk::createDictionaryFromMessage(event);
+  logOperation(kHandler, std::string(logText) + jsonText(dictionary));
+  if (!delegate()) return;
+  if (!_backlog.add({std::string(eventName), std::move(dictionary)})) return;
+  MainQueue::shared().async([wrapper = shared_from_this()] { wrapper->deliverOne(); });
+}
+
+void TeskWrapper::deliverOne() {
+  if (auto event = _backlog.take()) {
+    const auto* stream = std::ranges::find(kStreams, event->name, &Stream::eventName);
+    const auto receiver = delegate();
+    const std::optional<Dictionary> held = std::move(event->entries);
+    if (receiver) ((*receiver).*stream->deliver)(held);
+  }
+  tellLoss();
+}
+
+std::uint64_t TeskWrapper::droppedEvents() const {
+  return _backlog.dropped() + tesk::client::DroppedEvents(_teskManager);
+}
+
+void TeskWrapper::tellLoss() {
+  const std::uint64_t dropped = droppedEvents();
+  if (dropped == _lossTold) return;
+  const auto now = std::chrono::steady_clock::now();
+  if (_lossToldAt && now - *_lossToldAt < kLossPause && !_backlog.isEmpty()) return;
+  _lossTold = dropped;
+  _lossToldAt = now;
+  if (_lossObserver) _lossObserver(dropped);
+  if (_lossLoggedAt && now - *_lossLoggedAt < kLossLogPause) return;
+  _lossLoggedAt = now;
+  logOperation(kHandler, std::to_string(dropped) +
+                             " events dropped so far, which came faster than they were taken");
+}
+
 void TeskWrapper::listen() {
   for (const Stream& stream : kStreams) {
     tesk::client::RegisterEventHandler(
         _teskManager, stream.eventName,
         [weak = weak_from_this(), &stream](const tesk::Message& event,
                                            tesk::client::DispatchGroup&) {
-          if (const auto wrapper = weak.lock()) handOver(wrapper, stream, event);
+          if (const auto wrapper = weak.lock()) {
+            wrapper->handOver(event, stream.eventName, stream.logText);
+          }
         });
   }
   tesk::client::EventsOff(_teskManager);

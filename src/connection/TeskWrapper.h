@@ -1,14 +1,19 @@
 // The one object through which the viewer talks to the baseband manager service.
 #pragma once
 
+#include <chrono>
 #include <cstdint>
+#include <functional>
 #include <memory>
 #include <mutex>
+#include <optional>
 #include <string>
 #include <string_view>
+#include <utility>
 
 #include "base/DispatchQueue.h"
 #include "connection/TeskWrapperDelegate.h"
+#include "tesk/EventBacklog.h"
 #include "tesk/Manager.h"
 
 namespace qel {
@@ -43,11 +48,23 @@ class TeskWrapper final : public std::enable_shared_from_this<TeskWrapper> {
                            std::int32_t triggerType, std::int32_t triggerID, std::int32_t profileID,
                            std::int32_t metricID);
 
+  // Events that came faster than they were taken and were dropped, so far. The observer is told on
+  // the main queue, once a second at most while events wait and whenever none waits any more. The
+  // system log has a line every ten seconds at most.
+  using LossObserver = std::function<void(std::uint64_t dropped)>;
+  std::uint64_t droppedEvents() const;
+  void setLossObserver(LossObserver observer) { _lossObserver = std::move(observer); }
+
   // Whether the last command that was sent had no answer for want of a service.
   bool foundNoService() const { return _foundNoService; }
 
  private:
   TeskWrapper() = default;
+
+  // On the queue, then on the main queue.
+  void handOver(const tesk::Message& event, std::string_view eventName, std::string_view logText);
+  void deliverOne();
+  void tellLoss();
 
   // Sends the request; its result is logged and judged.
   bool perform(std::string_view operation, std::string_view command, const tesk::Message& request);
@@ -57,6 +74,12 @@ class TeskWrapper final : public std::enable_shared_from_this<TeskWrapper> {
   bool _foundNoService = false;
   mutable std::mutex _delegateMutex;
   std::weak_ptr<TeskWrapperDelegate> _delegate;
+  tesk::EventBacklog _backlog;  // before the main queue
+
+  LossObserver _lossObserver;
+  std::uint64_t _lossTold = 0;
+  std::optional<std::chrono::steady_clock::time_point> _lossToldAt;
+  std::optional<std::chrono::steady_clock::time_point> _lossLoggedAt;
 };
 
 }  // namespace qel

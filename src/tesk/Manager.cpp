@@ -2,6 +2,9 @@
 
 #include <map>
 #include <mutex>
+#include <utility>
+
+#include "tesk/EventBacklog.h"
 
 namespace tesk::client {
 
@@ -23,6 +26,7 @@ class Manager : public std::enable_shared_from_this<Manager> {
   }
 
   Transport& transport() { return *_transport; }
+  std::uint64_t dropped() const { return _backlog.dropped(); }
 
   void registerHandler(std::string_view eventName, EventHandler handler) {
     const std::lock_guard lock(_mutex);
@@ -31,16 +35,20 @@ class Manager : public std::enable_shared_from_this<Manager> {
   }
 
  private:
-  // The handler is looked up on the queue, so that one registered meanwhile gets the event.
   void take(std::string_view eventName, Message event) {
-    _queue->async(
-        [weak = weak_from_this(), name = std::string(eventName), taken = std::move(event)] {
-          const auto manager = weak.lock();
-          const auto handler = manager ? manager->handlerOf(name) : nullptr;
-          if (!handler) return;
-          DispatchGroup group;
-          (*handler)(taken, group);
-        });
+    if (!_backlog.add({std::string(eventName), std::move(event).entries()})) return;
+    _queue->async([weak = weak_from_this()] {
+      if (const auto manager = weak.lock()) manager->deliverOne();
+    });
+  }
+
+  // The handler is looked up on the queue, so that one registered meanwhile gets the event.
+  void deliverOne() {
+    auto event = _backlog.take();
+    const auto handler = event ? handlerOf(event->name) : nullptr;
+    if (!handler) return;
+    DispatchGroup group;
+    (*handler)(Message(std::move(event->entries)), group);
   }
 
   std::shared_ptr<EventHandler> handlerOf(const std::string& eventName) {
@@ -50,6 +58,7 @@ class Manager : public std::enable_shared_from_this<Manager> {
   }
 
   const std::shared_ptr<qel::DispatchQueue> _queue;
+  EventBacklog _backlog;
   std::mutex _mutex;
   std::map<std::string, std::shared_ptr<EventHandler>> _handlers;
   std::unique_ptr<Transport> _transport;
@@ -73,6 +82,10 @@ void EventsOn(std::shared_ptr<Manager> manager) {
 
 void EventsOff(std::shared_ptr<Manager> manager) {
   if (manager) manager->transport().eventsOff();
+}
+
+std::uint64_t DroppedEvents(const std::shared_ptr<Manager>& manager) {
+  return manager ? manager->dropped() : 0;
 }
 
 CommandResult PerformCommand(std::shared_ptr<Manager> manager, std::string_view command,

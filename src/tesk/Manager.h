@@ -1,6 +1,7 @@
 // Client library of the baseband manager service.
 #pragma once
 
+#include <cstdint>
 #include <functional>
 #include <memory>
 #include <string>
@@ -21,8 +22,9 @@ class DispatchGroup {};
 // Runs on the manager's queue.
 using EventHandler = std::function<void(const Message& event, DispatchGroup& group)>;
 
-// Opens a connection under the client name; events arrive on the queue, which the manager shares.
-// An empty handle when there is no way to the service; every call below takes an empty handle too.
+// Opens a connection under the client name; events arrive on the queue, which the manager shares,
+// and wait there within the limits of an EventBacklog. An empty handle when there is no way to the
+// service; every call below takes an empty handle too.
 std::shared_ptr<Manager> CreateManager(std::string_view clientName,
                                        std::shared_ptr<qel::DispatchQueue> queue);
 
@@ -34,6 +36,9 @@ void RegisterEventHandler(std::shared_ptr<Manager> manager, std::string_view eve
 // registered for is dropped.
 void EventsOn(std::shared_ptr<Manager> manager);
 void EventsOff(std::shared_ptr<Manager> manager);
+
+// How many events were dropped because they came faster than the handlers took them.
+std::uint64_t DroppedEvents(const std::shared_ptr<Manager>& manager);
 
 // Sends a request and waits for its answer. Service out of reach: a code that is not 0.
 CommandResult PerformCommand(std::shared_ptr<Manager> manager, std::string_view command,

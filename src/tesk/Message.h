@@ -3,6 +3,7 @@
 
 #include <cstdint>
 #include <string_view>
+#include <utility>
 
 #include "base/Bytes.h"
 #include "base/Value.h"
@@ -20,7 +21,8 @@ class Message {
   void setData(std::string_view key, qel::Bytes value) { _entries.set(key, std::move(value)); }
   void setNull(std::string_view key) { _entries.set(key, qel::Value()); }
 
-  const qel::Dictionary& entries() const { return _entries; }
+  const qel::Dictionary& entries() const& { return _entries; }
+  qel::Dictionary entries() && { return std::move(_entries); }
 
  private:
   qel::Dictionary _entries;

@@ -13,6 +13,7 @@
 
 #include "base/LogSink.h"
 #include "tools/Commands.h"
+#include "tools/LossReport.h"
 #include "tools/MainLoop.h"
 #include "tools/ScreenDrawing.h"
 #include "tools/Service.h"
@@ -106,6 +107,10 @@ void run(const Options& options, Output& output) {
   };
   tesk::setConnector(tesk::bus::makeBusConnector(
       {options.bus}, serviceObserver(say, startAsTheViewerDoes), loop.answerWaits()));
+  const auto& wrapper = TeskWrapper::sharedInstance();
+  LossReport loss(say);
+  wrapper->setLossObserver(
+      [&loss](std::uint64_t dropped) { loss.note(dropped, LossReport::Clock::now()); });
   startAsTheViewerDoes();
   if (options.screen.empty()) {
     showLines(loop, output);
@@ -113,6 +118,7 @@ void run(const Options& options, Output& output) {
     showTable(loop, output, options.screen);
   }
   output.flush();
+  loss.end(wrapper->droppedEvents());
   // The viewer's connection is never released; its threads must not see the process taken apart.
   std::_Exit(EX_OK);
 }

@@ -75,7 +75,8 @@ std::unique_ptr<IdentityHider> hiderOf(const Options& options) {
   return std::make_unique<IdentityHider>(Pseudonyms::random());
 }
 
-std::string summary(const Options& options, const Recorder& recorder, Clock::duration duration) {
+std::string summary(const Options& options, const Recorder& recorder, Clock::duration duration,
+                    std::uint64_t lost) {
   const Recorder::Progress progress = recorder.progress();
   std::string text = nameOf(options) + ": " +
                      progressText(progress, std::chrono::floor<std::chrono::seconds>(duration));
@@ -87,6 +88,9 @@ std::string summary(const Options& options, const Recorder& recorder, Clock::dur
   }
   if (progress.stripped > 0) {
     text += ", " + std::to_string(progress.stripped) + " events without their unknown content";
+  }
+  if (lost > 0) {
+    text += ", " + std::to_string(lost) + " events lost, which came faster than they were written";
   }
   return text + (options.keepIdentities ? ", identities kept" : ", identities hidden");
 }
@@ -131,10 +135,11 @@ void run(const Options& options) {
   const auto begun = connection->begin();
   if (begun.code != 0) failWithoutService(begun.message);
   recordOn(options, loop, recorder, progress, start);
+  const std::uint64_t lost = connection->end();
   connection.reset();
   const bool isWhole = recorder.close() && recorder.error().empty();
   if (recorder.errorNumber() == EPIPE) return;
-  progress.say(summary(options, recorder, Clock::now() - start));
+  progress.say(summary(options, recorder, Clock::now() - start, lost));
   if (!isWhole) throw ToolError(EX_IOERR, recorder.error());
 }
 

@@ -26,20 +26,22 @@ RecordConnection::RecordConnection(std::string bus, Bytes configuration, tesk::E
       _transport(tesk::bus::makeBusConnector({_bus}, std::move(observer), std::move(makeWait))
                      ->connect(kClientName, std::move(sink))) {}
 
-RecordConnection::~RecordConnection() {
+RecordConnection::~RecordConnection() { end(); }
+
+std::uint64_t RecordConnection::end() {
+  if (std::exchange(_ended, true)) return 0;
   _transport->eventsOff();
-  if (!isOnlyRecorder()) return;
+  std::string why;
+  const auto status = tesk::bus::readServiceStatus({_bus}, why);
+  if (!status) return 0;
+  const auto isRecorder = [](const auto& client) { return client.name == kClientName; };
+  if (std::ranges::count_if(status->clients, isRecorder) > 1) return 0;
   tesk::Message request;
   request.setInt64(tesk::kKeyAppID, kApplication);
   tesk::Message reply;
   _transport->performCommand(tesk::kCommandClearConfiguration, request, reply);
-}
-
-bool RecordConnection::isOnlyRecorder() const {
-  std::string why;
-  const auto status = tesk::bus::readServiceStatus({_bus}, why);
-  return status &&
-         std::ranges::count(status->clients, kClientName, &tesk::bus::ClientStatus::name) <= 1;
+  const auto own = std::ranges::find_if(status->clients, isRecorder);
+  return own == status->clients.end() ? 0 : own->dropped;
 }
 
 tesk::CommandResult RecordConnection::install() {

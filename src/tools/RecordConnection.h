@@ -1,6 +1,7 @@
 // The recorder's connection to the service: a client of its own, beside any viewer.
 #pragma once
 
+#include <cstdint>
 #include <memory>
 #include <string>
 
@@ -24,14 +25,18 @@ class RecordConnection {
   // does; again, too, at a service that came back. Code 0 when events will come.
   tesk::CommandResult begin();
 
+  // Ends the delivery now. How many events the service dropped because they were not recorded as
+  // fast as they came; 0 also when it does not tell: it is away, or another recorder is at work.
+  std::uint64_t end();
+
  private:
   tesk::CommandResult install();
   void querySimFiles();
-  bool isOnlyRecorder() const;
 
   const std::string _bus;
   const Bytes _configuration;
   const std::unique_ptr<tesk::Transport> _transport;
+  bool _ended = false;
 };
 
 }  // namespace qel::tools

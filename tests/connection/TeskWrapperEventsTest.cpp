@@ -1,5 +1,6 @@
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <atomic>
 #include <future>
 #include <thread>
@@ -124,6 +125,32 @@ TEST_F(TeskWrapperEvents, aDelegateThatGoesAwayBeforeItsTurnIsNotCalled) {
   EXPECT_TRUE(watched.expired());
   finishQueue(wrapper);
   EXPECT_EQ(wrapper->delegate(), nullptr);
+}
+
+// A main thread that was busy let every event wait in memory.
+TEST_F(TeskWrapperEvents, eventsThatComeTooFastAreLeftOutAndCounted) {
+  constexpr std::uint64_t kSent = 30'000;
+  std::uint64_t told = 0;
+  wrapper->setLossObserver([&told](std::uint64_t dropped) { told = dropped; });
+  wrapper->setDelegate(delegate);
+  wrapper->listen();
+  log.clear();
+  service->send(tesk::kEventMetric, {{"kKeyMetricID", 7}, {"number", -1}});
+  for (std::uint64_t i = 0; i < kSent; ++i) {
+    service->send(tesk::kEventMetric, {{"kKeyMetricID", 1}, {"number", i}});
+  }
+  finishQueue(wrapper);
+  EXPECT_LE(delegate->metrics.size(), 2 * 4096U) << "before either queue";
+  EXPECT_EQ(*delegate->metrics.front().find("number"), -1) << "the newest of its metric";
+  EXPECT_EQ(*delegate->metrics.back().find("number"), kSent - 1);
+  EXPECT_EQ(delegate->metrics.size() + wrapper->droppedEvents(), kSent + 1);
+  EXPECT_EQ(told, wrapper->droppedEvents());
+  const auto lines = log.lines();
+  const auto isLoss = [](const std::string& line) {
+    return line.find("events dropped so far") != std::string::npos;
+  };
+  EXPECT_EQ(std::ranges::count_if(lines, isLoss), 1) << "one line for all of them";
+  wrapper->setLossObserver({});
 }
 
 // The queue read the weak pointer while the main thread wrote it, and took a delegate that was

@@ -70,6 +70,21 @@ TEST_F(ManagerTest, dropsEventsOfAConnectionThatIsGone) {
   EXPECT_TRUE(events.empty());
 }
 
+// A queue that stood still took every event there was.
+TEST_F(ManagerTest, letsNoMoreEventsWaitThanABacklogHolds) {
+  RegisterEventHandler(manager, kEventMetric, keep("m"));
+  constexpr int kSent = 20'000;
+  service->send(kEventMetric, {{"kKeyMetricID", 7}, {"number", -1}});
+  for (int i = 0; i < kSent; ++i) {
+    service->send(kEventMetric, {{"kKeyMetricID", 1}, {"number", i}});
+  }
+  queue->drain();
+  EXPECT_EQ(events.size(), 4096U);
+  EXPECT_EQ(events.size() + DroppedEvents(manager), kSent + 1U);
+  EXPECT_EQ(*events.front().second.find("number"), -1) << "the newest of its metric";
+  EXPECT_EQ(*events.back().second.find("number"), kSent - 1);
+}
+
 TEST_F(ManagerTest, passesSwitchesAndCommandsOn) {
   EventsOff(manager);
   EventsOn(manager);

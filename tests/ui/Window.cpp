@@ -4,6 +4,7 @@
 #include <QtTest/QTest>
 #include <algorithm>
 #include <set>
+#include <utility>
 
 #include "base/DispatchQueue.h"
 #include "ui/kit/RunLoop.h"
@@ -45,7 +46,8 @@ std::vector<QQuickItem*> itemsInSight(const QQuickWindow& window) {
 
 }  // namespace
 
-Window::Window(bool animated) {
+Window::Window(bool animated, std::shared_ptr<FakeService> service)
+    : _service(service ? std::move(service) : installFakeService()) {
   warningCount = 0;
   qInstallMessageHandler(countWarnings);
   _engine->addImportPath(QStringLiteral("qrc:/qt/qml"));

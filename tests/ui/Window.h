@@ -20,7 +20,7 @@ namespace qel::testing {
 class Window {
  public:
   // Shown and drawn, without animations unless asked for.
-  explicit Window(bool animated = false);
+  explicit Window(bool animated = false, std::shared_ptr<FakeService> service = nullptr);
 
   QQuickWindow& window() const { return *_window; }
   Navigation& navigation() const { return *_navigation; }
@@ -56,7 +56,7 @@ class Window {
  private:
   CapturedSystemLog _log;
   CapturedStandardOutput _out;
-  std::shared_ptr<FakeService> _service = installFakeService();
+  std::shared_ptr<FakeService> _service;
   QuickRunLoop _runLoop;
   std::unique_ptr<QQmlApplicationEngine> _engine = std::make_unique<QQmlApplicationEngine>();
   QQuickWindow* _window = nullptr;

@@ -1,11 +1,12 @@
 import QtQuick
 import Qelwatch.Ui
 
-// Where the values come from, and the choice between light and dark.
+// Where the values come from, what is not shown of them, and the choice between light and dark.
 Item {
     id: footer
 
     property string source
+    property string loss
 
     readonly property var choices: [
         {
@@ -47,6 +48,18 @@ Item {
             bottomPadding: 4
             visible: text !== ""
             text: footer.source
+            textFormat: Text.PlainText
+            color: Theme.secondary
+            font.pointSize: Theme.headerSize
+            horizontalAlignment: Text.AlignHCenter
+            wrapMode: Text.Wrap
+        }
+        Text {
+            x: Theme.margin
+            width: parent.width - 2 * Theme.margin
+            bottomPadding: 4
+            visible: text !== ""
+            text: footer.loss
             textFormat: Text.PlainText
             color: Theme.secondary
             font.pointSize: Theme.headerSize

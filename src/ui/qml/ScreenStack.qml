@@ -65,6 +65,7 @@ FocusScope {
             enabled: focus && !edge.active
             notice: stack.navigation.notice
             source: stack.source
+            loss: stack.navigation.loss
             storyboard: stack.navigation.storyboard
             isFirst: index === 0
             onBack: stack.navigation.back()

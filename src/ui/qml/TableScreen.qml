@@ -8,6 +8,7 @@ FocusScope {
     required property TableModel table
     property string notice
     property string source
+    property string loss
     required property InterfaceDescription storyboard
     property bool isFirst
 
@@ -91,5 +92,6 @@ FocusScope {
         height: screen.isFirst ? implicitHeight : 0
         visible: screen.isFirst
         source: screen.source
+        loss: screen.loss
     }
 }

@@ -44,6 +44,10 @@ void Navigation::setNotice(const QString& notice) {
   if (std::exchange(_notice, notice) != notice) emit noticeChanged();
 }
 
+void Navigation::setLoss(const QString& loss) {
+  if (std::exchange(_loss, loss) != loss) emit lossChanged();
+}
+
 void Navigation::back() { _controller->popViewController(); }
 
 void Navigation::settle() {

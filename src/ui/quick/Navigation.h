@@ -24,6 +24,7 @@ class Navigation : public QAbstractListModel, public QQmlParserStatus {
   Q_PROPERTY(int depth READ depth NOTIFY depthChanged)
   Q_PROPERTY(qel::TableModel* top READ top NOTIFY depthChanged)
   Q_PROPERTY(QString notice READ notice WRITE setNotice NOTIFY noticeChanged)
+  Q_PROPERTY(QString loss READ loss WRITE setLoss NOTIFY lossChanged)
 
  public:
   enum Role { tableRole = Qt::UserRole + 1 };
@@ -49,6 +50,10 @@ class Navigation : public QAbstractListModel, public QQmlParserStatus {
   QString notice() const { return _notice; }
   void setNotice(const QString& notice);
 
+  // What the reader does not get to see, at the foot of the first screen; empty: all is shown.
+  QString loss() const { return _loss; }
+  void setLoss(const QString& loss);
+
   Q_INVOKABLE void back();
   Q_INVOKABLE void settle();
 
@@ -56,6 +61,7 @@ class Navigation : public QAbstractListModel, public QQmlParserStatus {
   void storyboardChanged();
   void depthChanged();
   void noticeChanged();
+  void lossChanged();
 
  private:
   void follow(const TableModel* table, IndexPath indexPath);
@@ -67,6 +73,7 @@ class Navigation : public QAbstractListModel, public QQmlParserStatus {
   std::vector<TableModel*> _screens;  // children
   int _depth = 0;
   QString _notice;
+  QString _loss;
 };
 
 }  // namespace qel

@@ -1,0 +1,91 @@
+#include "bus/MoodyService.h"
+
+#include <sys/socket.h>
+
+#include <array>
+#include <stdexcept>
+#include <utility>
+
+#include "tesk/bus/BusAddress.h"
+
+namespace qel::testing {
+namespace {
+
+constexpr const char* kInterface = "tesk.BasebandManager1";
+
+}  // namespace
+
+MoodyService::MoodyService(const PrivateBus& bus, Mood atRegistration, Mood atCommands)
+    : _connection(tesk::bus::connectTo({bus.address()})),
+      _object(sdbus::createObject(*_connection, tesk::bus::kObjectPath)),
+      _atRegistration(atRegistration),
+      _atCommands(atCommands) {
+  _object->registerMethod("Register")
+      .onInterface(kInterface)
+      .implementedAs([this](Registration&& registration, const std::string&) {
+        const std::lock_guard lock(_mutex);
+        ++_registrations;
+        take(std::move(registration));
+      });
+  _object->registerMethod("SetDelivery").onInterface(kInterface).implementedAs([](const bool&) {});
+  _object->registerMethod("PerformCommand")
+      .onInterface(kInterface)
+      .implementedAs([this](Command&& command, const std::string& name, const Entries&) {
+        const std::lock_guard lock(_mutex);
+        _commands.push_back(name);
+        take(std::move(command));
+      });
+  _object->finishRegistration();
+  _connection->requestName(tesk::bus::kServiceName);
+  _connection->enterEventLoopAsync();
+}
+
+MoodyService::~MoodyService() { _connection->leaveEventLoop(); }
+
+void MoodyService::take(Registration registration) {
+  if (_atRegistration == Mood::answers) {
+    registration.returnResults(streamTo(_streams));
+  } else if (_atRegistration == Mood::refuses) {
+    registration.returnError(
+        sdbus::Error("tesk.BasebandManager1.Error.TooManyClients", "too many clients"));
+  } else {
+    _unregistered.push_back(std::move(registration));
+  }
+}
+
+void MoodyService::take(Command command) {
+  if (_atCommands == Mood::saysNothing) {
+    _unanswered.push_back(std::move(command));
+  } else {
+    command.returnResults(_atCommands == Mood::answers ? 0 : 7, "as told", {});
+  }
+}
+
+sdbus::UnixFd MoodyService::streamTo(std::vector<sdbus::UnixFd>& kept) {
+  std::array<int, 2> ends{};
+  if (::socketpair(AF_UNIX, SOCK_SEQPACKET | SOCK_CLOEXEC, 0, ends.data()) != 0) {
+    throw std::runtime_error("no socket pair");
+  }
+  kept.emplace_back(ends[0], sdbus::adopt_fd);
+  return sdbus::UnixFd(ends[1], sdbus::adopt_fd);
+}
+
+void MoodyService::setMoods(Mood atRegistration, Mood atCommands) {
+  const std::lock_guard lock(_mutex);
+  _atRegistration = atRegistration;
+  _atCommands = atCommands;
+  for (auto& registration : std::exchange(_unregistered, {})) take(std::move(registration));
+  for (auto& command : std::exchange(_unanswered, {})) take(std::move(command));
+}
+
+std::vector<std::string> MoodyService::commands() const {
+  const std::lock_guard lock(_mutex);
+  return _commands;
+}
+
+int MoodyService::registrations() const {
+  const std::lock_guard lock(_mutex);
+  return _registrations;
+}
+
+}  // namespace qel::testing
