@@ -19,8 +19,8 @@ void addBusOption(CLI::App& command, std::string& bus);
 void requireService(const std::string& bus);
 [[noreturn]] void failWithoutService(const std::string& why);
 
-// Says on the main queue that the service was lost, through `say`, and that it came back; then
-// calls `back`.
+// Says on the main queue, through `say`, that the service was lost or cannot be had, each time with
+// the reason, and that it is there; then calls `back`.
 tesk::bus::ReachabilityObserver serviceObserver(std::function<void(const std::string&)> say,
                                                 std::function<void()> back);
 
