@@ -16,10 +16,37 @@ milliseconds since(Clock::time_point time) {
   return std::chrono::ceil<milliseconds>(Clock::now() - time);
 }
 
+// Calls of a proxy of the bus itself or of the service.
+class Question {
+ public:
+  Question(sdbus::IConnection& connection, Caller::Asked asked) {
+    if (asked == Caller::Asked::bus) {
+      _bus = sdbus::createProxy(connection, "org.freedesktop.DBus", "/org/freedesktop/DBus");
+      return;
+    }
+    _service = std::make_unique<Proxy>(connection);
+    _events = _service->Register("trial-caller");
+  }
+
+  void ask() {
+    if (_bus) {
+      std::string identity;
+      _bus->callMethod("GetId").onInterface("org.freedesktop.DBus").storeResultsTo(identity);
+    } else {
+      _service->PerformCommand("kCommandQueryMetric", {});
+    }
+  }
+
+ private:
+  std::unique_ptr<sdbus::IProxy> _bus;
+  std::unique_ptr<Proxy> _service;
+  sdbus::UnixFd _events;
+};
+
 }  // namespace
 
-Caller::Caller(std::string busAddress)
-    : _busAddress(std::move(busAddress)), _thread([this] { run(); }) {}
+Caller::Caller(std::string busAddress, Asked asked)
+    : _busAddress(std::move(busAddress)), _asked(asked), _thread([this] { run(); }) {}
 
 Caller::~Caller() {
   _stopping = true;
@@ -48,24 +75,25 @@ void Caller::run() {
 void Caller::ask() {
   const auto connection = tesk::bus::connectTo({_busAddress});
   connection->setMethodCallTimeout(kPatience);
-  Proxy proxy(*connection);
-  const auto events = proxy.Register("trial-caller");
-  const std::map<std::string, sdbus::Variant> request;
+  Question question(*connection, _asked);
   while (!_stopping) {
+    const auto askedAt = Clock::now();
     {
       const std::lock_guard lock(_mutex);
-      _askedAt = Clock::now();
+      _askedAt = askedAt;
       _asking = true;
     }
-    proxy.PerformCommand("kCommandQueryMetric", request);
-    ++_answers;
-    {
-      const std::lock_guard lock(_mutex);
-      _longest = std::max(_longest, since(_askedAt));
-      _asking = false;
-    }
+    question.ask();
+    note(askedAt);
     std::this_thread::sleep_for(kPause);
   }
+}
+
+void Caller::note(Clock::time_point askedAt) {
+  ++_answers;
+  const std::lock_guard lock(_mutex);
+  _longest = std::max(_longest, since(askedAt));
+  _asking = false;
 }
 
 }  // namespace qel::trials

@@ -1,4 +1,4 @@
-// Another client of the service, who wants short answers.
+// Another client of the service, or of the bus alone, who wants short answers.
 #pragma once
 
 #include <atomic>
@@ -14,7 +14,10 @@ namespace qel::trials {
 // Asks on a thread of its own, a hundred times a second, until the end of this object.
 class Caller {
  public:
-  explicit Caller(std::string busAddress);
+  // The bus answers by itself: so long a call takes without the service.
+  enum class Asked { service, bus };
+
+  explicit Caller(std::string busAddress, Asked asked = Asked::service);
   ~Caller();
   Caller(const Caller&) = delete;
   Caller& operator=(const Caller&) = delete;
@@ -26,8 +29,10 @@ class Caller {
  private:
   void run();
   void ask();
+  void note(Clock::time_point askedAt);
 
   const std::string _busAddress;
+  const Asked _asked;
   std::atomic<bool> _stopping = false;
   std::atomic<std::uint64_t> _answers = 0;
   std::mutex _mutex;

@@ -16,6 +16,12 @@ std::string millisecondsOf(const std::optional<milliseconds>& time) {
   return time ? std::to_string(time->count()) + " ms" : "";
 }
 
+std::string waitOf(const Figures& seen) {
+  std::string text = millisecondsOf(seen.wait);
+  if (seen.busWait) text += " (the bus alone " + millisecondsOf(seen.busWait) + ")";
+  return text;
+}
+
 std::string mebibytes(std::uint64_t kb) {
   if (kb == 0) return "";
   char text[32];
@@ -40,7 +46,7 @@ std::string lineOf(const Result& result) {
   const Figures& seen = result.figures;
   std::string text = std::string(result.scenario->name) + ": " + std::to_string(seen.tried);
   if (seen.back) text += ", values back in " + seconds(seen.back) + " at most";
-  if (seen.wait) text += ", others waited " + millisecondsOf(seen.wait) + " at most";
+  if (seen.wait) text += ", others waited " + waitOf(seen) + " at most";
   if (seen.memoryKb > 0) text += ", service had " + mebibytes(seen.memoryKb) + " at most";
   return text + remarksOf(result) + ": " + outcomeOf(result);
 }
@@ -52,8 +58,8 @@ std::string tableOf(const std::vector<Result>& results) {
   for (const Result& result : results) {
     const Figures& seen = result.figures;
     text += std::string("| ") + result.scenario->what + " | " + std::to_string(seen.tried) + " | " +
-            seconds(seen.back) + " | " + millisecondsOf(seen.wait) + " | " +
-            mebibytes(seen.memoryKb) + " | " + outcomeOf(result) + remarksOf(result) + " |\n";
+            seconds(seen.back) + " | " + waitOf(seen) + " | " + mebibytes(seen.memoryKb) + " | " +
+            outcomeOf(result) + remarksOf(result) + " |\n";
   }
   return text;
 }

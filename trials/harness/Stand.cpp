@@ -124,15 +124,26 @@ void Stand::expectAllAlive(const std::string& after) {
   }
 }
 
+// One that comes into service again takes its configuration away and installs it anew.
 void Stand::expectConfigurationsKept(const std::string& after) {
+  const auto deadline = Clock::now() + _trial.stretched(kBackWithin);
+  for (std::string missing = missingConfiguration(); !missing.empty();
+       missing = missingConfiguration()) {
+    promise(Clock::now() < deadline, missing + " is kept " + after);
+    std::this_thread::sleep_for(kLook);
+  }
+}
+
+std::string Stand::missingConfiguration() const {
   const auto told = status();
-  promise(told.has_value(), "the service tells its status " + after);
+  if (!told) return "the service's status";
   for (const auto& [application, metrics] : _configurations) {
     const auto kept = told->configurations.find(application);
-    promise(
-        kept != told->configurations.end() && kept->second == metrics,
-        "the configuration of application " + std::to_string(application) + " is kept " + after);
+    if (kept == told->configurations.end() || kept->second != metrics) {
+      return "the configuration of application " + std::to_string(application);
+    }
   }
+  return "";
 }
 
 void Stand::expectToEnd(Program& program, const std::string& when) {

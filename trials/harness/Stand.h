@@ -77,6 +77,7 @@ class Stand {
 
   void waitForService();
   void addWitnesses();
+  std::string missingConfiguration() const;
   bool seesValues(const Witness& witness) const;
   std::vector<Program*> programs() const;
 

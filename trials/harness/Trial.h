@@ -31,14 +31,16 @@ inline void promise(bool kept, const std::string& what) {
 }
 
 struct Figures {
-  std::uint64_t tried = 0;           // faults done
-  std::optional<milliseconds> back;  // longest until values were seen again
-  std::optional<milliseconds> wait;  // longest that another client waited for its answer
-  std::uint64_t memoryKb = 0;        // most that a service has had resident
+  std::uint64_t tried = 0;                   // faults done
+  std::optional<milliseconds> back;          // longest until values were seen again
+  std::optional<milliseconds> wait;          // longest that another client waited for its answer
+  std::optional<milliseconds> busWait = {};  // of that, when only the bus was asked
+  std::uint64_t memoryKb = 0;                // most that a service has had resident
   std::vector<std::string> remarks;
 
   void sawBack(milliseconds time) { back = std::max(back.value_or(time), time); }
   void sawWait(milliseconds time) { wait = std::max(wait.value_or(time), time); }
+  void sawBusWait(milliseconds time) { busWait = std::max(busWait.value_or(time), time); }
   void sawMemory(std::uint64_t kb) { memoryKb = std::max(memoryKb, kb); }
 };
 

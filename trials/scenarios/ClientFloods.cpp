@@ -23,8 +23,10 @@ constexpr std::int64_t kAttackersApplication = 1000;
 void attack(Trial& trial, std::size_t attackers, const Attack::Deed& deed) {
   Stand stand(trial, {});
   Caller caller(stand.bus().address());
+  Caller withoutService(stand.bus().address(), Caller::Asked::bus);
   std::this_thread::sleep_for(500ms);
   caller.longestWait();
+  withoutService.longestWait();
   std::list<Attack> attacks;
   for (std::size_t i = 0; i < attackers; ++i) attacks.emplace_back(stand.bus().address(), deed);
   for (int i = 0; i < trial.times; ++i) {
@@ -32,6 +34,7 @@ void attack(Trial& trial, std::size_t attackers, const Attack::Deed& deed) {
     ++trial.figures.tried;
     const auto waited = caller.longestWait();
     trial.figures.sawWait(waited);
+    trial.figures.sawBusWait(withoutService.longestWait());
     stand.expectAllAlive("during the flood");
     stand.lookAtMemory("during the flood");
     promise(
