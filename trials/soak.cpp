@@ -44,6 +44,7 @@ struct Account {
   std::uint64_t delivered = 0;  // as the service counts
   std::uint64_t unread = 0;     // dropped by the service, as it counts
   std::uint64_t taken = 0;      // as the client counts
+  std::uint64_t tooFast = 0;    // dropped by the client, as it counts
 };
 
 class Soak {
@@ -169,11 +170,12 @@ class Soak {
     }
     std::cout
         << "\n| client | sent by the source | delivered by the service | of that dropped: not "
-           "read | taken by the client | lost without a reason |\n|---|---|---|---|---|---|\n";
+           "read | taken by the client | dropped by it: too fast | lost without a reason "
+           "|\n|---|---|---|---|---|---|---|\n";
     for (const Account& account : accounts) {
       std::cout << "| " << account.client << " | " << account.sent << " | " << account.delivered
-                << " | " << account.unread << " | " << account.taken << " | " << lost(account)
-                << " |\n";
+                << " | " << account.unread << " | " << account.taken << " | " << account.tooFast
+                << " | " << lost(account) << " |\n";
     }
     std::cout << "\n"
               << told.eventsReceived << " of " << _day.all() << " events came from the source, "
@@ -186,7 +188,8 @@ class Soak {
   // On the way from the service to the client, or because it was never delivered.
   std::int64_t lost(const Account& account) const {
     const auto number = [](std::uint64_t value) { return static_cast<std::int64_t>(value); };
-    return number(account.sent) - number(account.taken) - number(account.unread);
+    return number(account.sent) - number(account.taken) - number(account.unread) -
+           number(account.tooFast);
   }
 
   bool judge(const ServiceStatus& told, const std::vector<Account>& accounts) const {
@@ -199,7 +202,7 @@ class Soak {
     look(_screensOpened == static_cast<std::uint64_t>(_options.screens), "every screen was opened");
     for (const Account& account : accounts) {
       look(lost(account) == 0, account.client + " has lost no event without a reason");
-      look(account.delivered == account.taken + account.unread,
+      look(account.delivered == account.taken + account.unread + account.tooFast,
            "service and " + account.client + " count the same");
     }
     for (const Samples& samples : _samples) {

@@ -15,6 +15,7 @@
 #include "app/SignalQuit.h"
 #include "app/Source.h"
 #include "base/LogSink.h"
+#include "connection/TeskWrapper.h"
 #include "ui/kit/ResourceBundle.h"
 #include "ui/quick/Navigation.h"
 #include "ui/quick/QuickRunLoop.h"
@@ -100,7 +101,8 @@ int run(int argc, char** argv) {
   const Reader reader(navigation, std::stoi(argv[3]), std::stoi(argv[4]));
   QGuiApplication::exec();
   std::cout << "screens " << reader.opened() << "\nmetrics " << output->metrics() << "\ntriggers "
-            << output->triggers() << std::endl;
+            << output->triggers() << "\ndropped " << TeskWrapper::sharedInstance()->droppedEvents()
+            << std::endl;
   return EXIT_SUCCESS;
 }
 
