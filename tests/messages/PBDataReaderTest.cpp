@@ -6,6 +6,7 @@
 #include <limits>
 
 #include "Wire.h"
+#include "messages/lte_rrc.h"
 
 namespace qel {
 namespace {
@@ -202,6 +203,90 @@ TEST(SkipValue, refusesDelimitedLengthsNear64Bits) {
   const ExactBuffer input(joined(varint(kMax64), Bytes(8, 0)));
   PBDataReader reader(input.view());
   EXPECT_FALSE(PBReaderSkipValueWithTag(reader, 7, 2));
+}
+
+constexpr std::uint64_t kFar = ~std::uint64_t{0};
+
+// Went on reading behind the input.
+TEST(PBDataReader, aMarkThatCouldNotBePlacedIsRecalledWithoutHarm) {
+  const ExactBuffer input(hex("0801057f"));
+  PBDataReader reader(input.view());
+  reader._pos = 2;
+  PBReaderMark mark;
+  EXPECT_FALSE(PBReaderPlaceMark(reader, mark));
+  PBReaderRecallMark(reader, mark);
+  EXPECT_EQ(reader._length, 4U);
+  EXPECT_EQ(PBReaderReadVarint(reader), 0x7FU);
+  EXPECT_EQ(PBReaderReadVarint(reader), 0U);
+  EXPECT_TRUE(reader._error);
+}
+
+// A position behind the length counted as nearly endless room.
+TEST(PBDataReader, readsNothingWhereThePositionIsBehindTheLength) {
+  const ExactBuffer input(hex("01610801"));
+  for (const std::uint64_t position :
+       {std::uint64_t{3}, std::uint64_t{4}, std::uint64_t{5}, kFar}) {
+    for (const std::uint64_t length : {std::uint64_t{0}, std::uint64_t{2}, std::uint64_t{3}}) {
+      const auto reader = [&] {
+        PBDataReader made(input.view());
+        made._pos = position;
+        made._length = length;
+        return made;
+      };
+      auto varint = reader();
+      EXPECT_EQ(PBReaderReadVarint(varint), 0U);
+      EXPECT_TRUE(varint._error);
+      auto data = reader();
+      EXPECT_FALSE(PBReaderReadData(data));
+      auto text = reader();
+      EXPECT_FALSE(PBReaderReadString(text));
+      for (const std::uint8_t wireType : std::initializer_list<std::uint8_t>{0, 1, 2, 3, 5}) {
+        auto skipped = reader();
+        EXPECT_FALSE(PBReaderSkipValueWithTag(skipped, 1, wireType));
+      }
+    }
+  }
+}
+
+// Every primitive in every state that the members can be put in: what it reads is in the input.
+TEST(PBDataReader, readsNothingOutsideTheInputInAnyState) {
+  const ExactBuffer input(hex("0203616263ff010b0802030c"));
+  const std::uint64_t size = input.view().size();
+  const std::uint64_t places[] = {0,        1,        2,        size - 1, size,
+                                  size + 1, size + 9, kFar / 2, kFar - 1, kFar};
+  for (const std::uint64_t position : places) {
+    for (const std::uint64_t length : places) {
+      for (const bool error : {false, true}) {
+        const auto inState = [&](const auto& work) {
+          PBDataReader reader(input.view());
+          reader._pos = position;
+          reader._length = length;
+          reader._error = error;
+          EXPECT_LE(reader.left().size(), size);
+          work(reader);
+          EXPECT_LE(reader.left().size(), size);
+          EXPECT_TRUE(reader._error || !error) << "once set, it stays set";
+        };
+        inState([](PBDataReader& reader) { PBReaderReadVarint(reader); });
+        inState([&](PBDataReader& reader) {
+          const auto data = PBReaderReadData(reader);
+          EXPECT_TRUE(!data || data->size() < size);
+        });
+        inState([&](PBDataReader& reader) {
+          PBReaderMark mark;
+          PBReaderPlaceMark(reader, mark);
+          PBReaderReadVarint(reader);
+          PBReaderRecallMark(reader, mark);
+          PBReaderReadString(reader);
+        });
+        inState([&](PBDataReader& reader) { PBReaderRecallMark(reader, {length}); });
+        for (std::uint8_t wireType = 0; wireType < 8; ++wireType) {
+          inState([&](PBDataReader& reader) { PBReaderSkipValueWithTag(reader, 1, wireType); });
+        }
+        inState([](PBDataReader& reader) { KCellularLteRrcState().readFrom(reader); });
+      }
+    }
+  }
 }
 
 }  // namespace

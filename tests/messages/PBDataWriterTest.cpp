@@ -144,5 +144,23 @@ TEST(Writer, handsItsBytesOver) {
   EXPECT_TRUE(writer.data().empty());
 }
 
+// Wrote in front of its buffer, and read behind it.
+TEST(PBDataWriter, recallsNoMarkThatIsNotItsOwn) {
+  PBDataWriter writer;
+  PBDataWriterRecallMark(writer, {});
+  EXPECT_EQ(writer.size(), 0U);
+  PBDataWriterMark mark;
+  PBDataWriterPlaceMark(writer, mark, 1);
+  PBDataWriterWriteUint32Field(writer, 300, 2);
+  PBDataWriterRecallMark(writer, {});
+  PBDataWriterRecallMark(writer, {writer.size() + 1});
+  PBDataWriterRecallMark(writer, {~std::size_t{0}});
+  PBDataWriterRecallMark(writer, mark);
+  EXPECT_EQ(hexText(writer.data()), "0a0310ac02");
+  writer.clear();
+  PBDataWriterRecallMark(writer, mark);
+  EXPECT_EQ(writer.size(), 0U);
+}
+
 }  // namespace
 }  // namespace qel

@@ -34,8 +34,8 @@ Varint readLongVarint(const std::uint8_t* at, const std::uint8_t* end) {
 }
 
 std::uint64_t PBReaderReadVarint(PBDataReader& reader) {
-  const std::uint8_t* end = reader._bytes + reader._length;
-  const auto [value, next] = readLongVarint(reader._bytes + reader._pos, end);
+  const ByteView left = reader.left();
+  const auto [value, next] = readLongVarint(left.data(), left.data() + left.size());
   const bool damaged = next == kDamaged;
   reader._error = reader._error || damaged;
   reader._pos = damaged ? reader._length : static_cast<std::uint64_t>(next - reader._bytes);
@@ -46,13 +46,13 @@ namespace {
 
 // The next `count` bytes, or nothing with the error flag set when there are fewer.
 std::optional<ByteView> take(PBDataReader& reader, std::uint64_t count) {
-  if (reader._error || count > reader._length - reader._pos) {
+  const ByteView left = reader.left();
+  if (reader._error || count > left.size()) {
     reader._error = true;
     return std::nullopt;
   }
-  const ByteView taken(reader._bytes + reader._pos, count);
   reader._pos += count;
-  return taken;
+  return left.first(count);
 }
 
 std::optional<ByteView> takeDelimited(PBDataReader& reader) {
@@ -113,9 +113,9 @@ std::optional<std::string> PBReaderReadString(PBDataReader& reader) {
 }
 
 bool PBReaderPlaceMark(PBDataReader& reader, PBReaderMark& mark) {
-  const std::uint64_t length = PBReaderReadVarint(reader);
-  if (length > reader._length - reader._pos) return false;
   mark.length = reader._length;
+  const std::uint64_t length = PBReaderReadVarint(reader);
+  if (length > reader.left().size()) return false;
   reader._length = reader._pos + length;
   return true;
 }

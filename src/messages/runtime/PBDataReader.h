@@ -1,6 +1,7 @@
 // Reads protocol-buffer wire format from a run of bytes.
 #pragma once
 
+#include <algorithm>
 #include <cstdint>
 #include <optional>
 #include <string>
@@ -10,17 +11,28 @@
 namespace qel {
 
 // The input stays the caller's and must outlive the reader. Once set, the error flag stays set.
+// Whatever position and length are set to, nothing outside the input is read.
 class PBDataReader {
  public:
-  explicit PBDataReader(ByteView bytes) : _bytes(bytes.data()), _length(bytes.size()) {}
+  explicit PBDataReader(ByteView bytes)
+      : _bytes(bytes.data()), _length(bytes.size()), _size(bytes.size()) {}
 
-  const std::uint8_t* _bytes;
+  // What may be read now. Nothing when the position is beyond the end.
+  ByteView left() const {
+    const std::uint64_t end = std::min(_length, _size);
+    return _pos < end ? ByteView(_bytes + _pos, end - _pos) : ByteView();
+  }
+
+  const std::uint8_t* const _bytes;
   std::uint64_t _length;  // end of what may be read now: the input, or the marked part of it
   std::uint64_t _pos = 0;
   bool _error = false;
+
+ private:
+  const std::uint64_t _size;  // of the input
 };
 
-// What PBReaderPlaceMark remembers: the end to go back to.
+// What PBReaderPlaceMark remembers, also when it fails: the end to go back to.
 struct PBReaderMark {
   std::uint64_t length = 0;
 };

@@ -54,6 +54,8 @@ void PBDataWriterPlaceMark(PBDataWriter& writer, PBDataWriterMark& mark, std::ui
 }
 
 void PBDataWriterRecallMark(PBDataWriter& writer, const PBDataWriterMark& mark) {
+  // No mark of this writer: there is a length in front of every one.
+  if (mark.start == 0 || mark.start > writer.size()) return;
   const std::size_t size = writer.size() - mark.start;
   std::array<std::uint8_t, kLongestVarint> length;
   const auto lengthSize =

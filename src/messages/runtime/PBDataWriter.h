@@ -111,7 +111,8 @@ void PBDataWriterWriteSubmessage(PBDataWriter& writer, const PBCodable& message,
                                  std::uint32_t field);
 
 // Opens a length-delimited field; the matching recall fills in the length of all that was written
-// in between, in as few bytes as it needs. Marks nest.
+// in between, in as few bytes as it needs. Marks nest. Recalling a mark that was never placed, or
+// one behind what is written, does nothing.
 void PBDataWriterPlaceMark(PBDataWriter& writer, PBDataWriterMark& mark, std::uint32_t field);
 void PBDataWriterRecallMark(PBDataWriter& writer, const PBDataWriterMark& mark);
 
