@@ -101,6 +101,28 @@ TEST_F(RecordingSequenceTest, AnswersBeforehandWithTheFirstInTheFile) {
   EXPECT_EQ(payloadOf(events.query(19972)), (Bytes{8, 1})) << "read ahead, but not yet passed";
 }
 
+std::string metricLine(int metric, std::size_t payloadDigits) {
+  return R"({"time_ms": 1, "event": "metric", "kKeyMetricID": )" +
+         std::to_string(3932160 + metric) + R"(, "kKeyPayload": ")" +
+         std::string(payloadDigits, 'A') + "\"}\n";
+}
+
+// A small compressed file could ask for any amount of memory.
+TEST_F(RecordingSequenceTest, KeepsNoMoreToAnswerQueriesThanItsLimit) {
+  std::string lines = metricLine(9000, 400'000) + metricLine(9001, 80'000);
+  for (int metric = 0; metric < 300; ++metric) lines += metricLine(metric, 4);
+  file.write(lines);
+  auto events = sequence(false);
+  while (const auto event = events.next()) events.passed(*event);
+  int answered = 0;
+  for (std::uint32_t metric = 0; metric < 10'000; ++metric) {
+    if (events.query(metric).code == CommandCode::done) ++answered;
+  }
+  EXPECT_EQ(answered, 256);
+  EXPECT_EQ(events.query(9000).code, CommandCode::metricNotAvailable);
+  EXPECT_EQ(events.query(9001).code, CommandCode::done);
+}
+
 TEST_F(RecordingSequenceTest, HasNoAnswerForWhatItDoesNotHold) {
   auto events = sequence(false);
   const SourceAnswer answer = events.query(20005);

@@ -28,6 +28,36 @@ std::optional<std::uint32_t> metricOf(const ServiceEvent& event) {
   return static_cast<std::uint32_t>(*identifier - kMetricEventBase);
 }
 
+// Of what answers queries, in bytes, roughly; a file may hold as much as it likes.
+constexpr std::size_t kMostMetricsKept = 256;
+constexpr std::size_t kLargestEventKept = 64 * 1024;
+
+std::size_t weightOf(const Dictionary& dictionary);
+
+std::size_t weightOf(const Value& value) {
+  std::size_t weight = sizeof value;
+  if (const auto text = value.asText()) weight += text->size();
+  if (const Bytes* bytes = value.asBytes()) weight += bytes->size();
+  if (const Dictionary* nested = value.asDictionary()) weight += weightOf(*nested);
+  if (const List* list = value.asList()) {
+    for (const Value& element : *list) weight += weightOf(element);
+  }
+  return weight;
+}
+
+std::size_t weightOf(const Dictionary& dictionary) {
+  std::size_t weight = 0;
+  for (const auto& [key, value] : dictionary) {
+    weight += sizeof key + key.view().size() + weightOf(value);
+  }
+  return weight;
+}
+
+bool mayKeep(const EventOfMetric& kept, std::uint32_t metric, const ServiceEvent& event) {
+  return (kept.size() < kMostMetricsKept || kept.contains(metric)) &&
+         weightOf(event.entries) <= kLargestEventKept;
+}
+
 SourceError errorOf(const RecordingFault& fault) {
   switch (fault.kind) {
     case RecordingFault::Kind::notOpened:
@@ -59,7 +89,8 @@ bool checkRecording(const std::string& path, EventOfMetric& firsts, SourceError&
   while (auto recorded = reader->next()) {
     any = true;
     ServiceEvent event = serviceEvent(std::move(*recorded));
-    if (const auto metric = metricOf(event)) firsts.try_emplace(*metric, std::move(event));
+    const auto metric = metricOf(event);
+    if (metric && mayKeep(firsts, *metric, event)) firsts.try_emplace(*metric, std::move(event));
   }
   if (reader->fault()) {
     error = errorOf(*reader->fault());
@@ -105,7 +136,8 @@ std::optional<ServiceEvent> RecordingSequence::next() {
 }
 
 void RecordingSequence::passed(const ServiceEvent& event) {
-  if (const auto metric = metricOf(event)) _newest.insert_or_assign(*metric, event);
+  const auto metric = metricOf(event);
+  if (metric && mayKeep(_newest, *metric, event)) _newest.insert_or_assign(*metric, event);
 }
 
 SourceAnswer RecordingSequence::query(std::uint32_t metric) {

@@ -15,7 +15,8 @@ namespace qel::service {
 using EventOfMetric = std::map<std::uint32_t, ServiceEvent>;
 
 // Reads the whole recording once. Nothing when it is not whole and sound, or holds no event: then
-// `error` says why. `firsts` gets the first event of every metric.
+// `error` says why. `firsts` gets the first event of every metric, but for very large events and
+// for more metrics than any modem has.
 bool checkRecording(const std::string& path, EventOfMetric& firsts, SourceError& error);
 
 // Plays the file from its beginning, again and again when it loops. A query is answered with the
