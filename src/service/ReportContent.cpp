@@ -34,7 +34,7 @@ bool hasFirst(const FirstRow& row, const Dictionary& record) {
 ReportContent reportContent(const MetricMessage& message, ByteView payload) {
   const auto row = std::ranges::find(kFirstRows, message.identifier, &FirstRow::metric);
   if (row == kFirstRows.end()) {
-    return message.decode(payload) ? ReportContent::drawable : ReportContent::undecodable;
+    return message.isReadable(payload) ? ReportContent::drawable : ReportContent::undecodable;
   }
   const auto record = message.describe(payload);
   if (!record) return ReportContent::undecodable;

@@ -25,10 +25,15 @@ struct Options {
   bool reencode = false;
 };
 
-// The message as the command prints it.
-std::string rendered(const PBCodable& message, const Options& options, const char* quote) {
-  if (options.reencode) return quote + hexText(message.data()) + quote;
-  return jsonText(message.dictionaryRepresentation());
+// The message as the command prints it, or nothing when the bytes are damaged.
+std::optional<std::string> rendered(const MetricMessage& row, ByteView payload,
+                                    const Options& options, const char* quote) {
+  if (options.reencode) {
+    const auto message = row.decode(payload);
+    return message ? std::optional(quote + hexText(message->data()) + quote) : std::nullopt;
+  }
+  const auto dictionary = row.describe(payload);
+  return dictionary ? std::optional(jsonText(*dictionary)) : std::nullopt;
 }
 
 // Of a line of a batch, and of a payload on standard input.
@@ -62,11 +67,11 @@ void decodeOne(const Options& options, Output& output) {
   if (!row) throw ToolError(EX_USAGE, options.metric, "no message class decodes this metric");
   const auto payload = options.hex ? bytesFromHex(*options.hex) : std::optional(standardInput());
   if (!payload) throw ToolError(EX_DATAERR, *options.hex, "not hexadecimal bytes");
-  const auto message = row->decode(*payload);
-  if (!message) {
+  const auto text = rendered(*row, *payload, options, "");
+  if (!text) {
     throw ToolError(EX_DATAERR, std::string(row->className), "the payload cannot be decoded");
   }
-  output.line(rendered(*message, options, ""));
+  output.line(*text);
 }
 
 // One line of a batch: {"metric": N, "payload": "HEX"}.
@@ -100,10 +105,11 @@ Request parseRequest(const std::string& line) {
   return {metricOf(*metric), std::move(*bytes)};
 }
 
-std::shared_ptr<PBCodable> decoded(const Request& request) {
+std::string answer(const Request& request, const Options& options) {
   const auto identifier = catalogueIdentifier(request.metric);
   const MetricMessage* row = identifier ? findMetricMessage(*identifier) : nullptr;
-  return row ? row->decode(request.payload) : nullptr;
+  const auto text = row ? rendered(*row, request.payload, options, "\"") : std::nullopt;
+  return text.value_or("null");
 }
 
 void decodeBatch(const Options& options, Output& output) {
@@ -113,8 +119,7 @@ void decodeBatch(const Options& options, Output& output) {
     try {
       line.clear();
       if (!takeInput(line, '\n')) throw std::invalid_argument("longer than 16 MB");
-      const auto message = decoded(parseRequest(line));
-      output.line(message ? rendered(*message, options, "\"") : "null");
+      output.line(answer(parseRequest(line), options));
     } catch (const std::invalid_argument& error) {
       output.flush();
       throw ToolError(EX_DATAERR, "standard input, line " + std::to_string(number), error.what());

@@ -1,6 +1,8 @@
 // The shorter way from the bytes to the dictionary form says what the message would.
 #include <gtest/gtest.h>
 
+#include <algorithm>
+
 #include "Damage.h"
 #include "ForAllClasses.h"
 #include "Wire.h"
@@ -8,6 +10,7 @@
 #include "messages/lte_neighbours.h"
 #include "messages/lte_serving.h"
 #include "messages/nas.h"
+#include "support/RecordingSink.h"
 
 namespace qel {
 namespace {
@@ -46,6 +49,35 @@ TEST(DictionaryReading, saysTheSameOfDamagedBytes) {
       EXPECT_EQ(straight<Message>(bytes), byMessage<Message>(bytes)) << hexText(bytes);
     }
   });
+}
+
+TEST(DictionaryReading, ofAnyBytesTheCheckSaysWhetherThereIsAMessage) {
+  testing::forAllClasses([]<class Message>(std::uint64_t number) {
+    testing::RandomMessages random(number);
+    const Bytes whole = random.encoded(Message::kClassName);
+    EXPECT_TRUE(Message::isReadable(whole));
+    for (int i = 0; i < 20; ++i) {
+      const Bytes bytes = testing::damaged(random, whole);
+      const testing::ExactBuffer exact(bytes);
+      EXPECT_EQ(Message::isReadable(exact.view()), Message::initWithData(bytes) != nullptr)
+          << hexText(bytes);
+    }
+  });
+}
+
+TEST(DictionaryReading, logsAnUnknownTagOnce) {
+  testing::CapturedSystemLog systemLog;
+  // Twice what comes once, behind a metric's number in a nested message.
+  const Bytes bytes = testing::joined(
+      testing::delimitedField(
+          3, testing::joined(testing::varintField(19972, 7), testing::varintField(2, 1))),
+      testing::varintField(1, 1), testing::varintField(1, 2));
+  EXPECT_EQ(straight<KCellularLteServingCellMeasurement>(bytes),
+            R"({"timestamp": 2, "rx_info": [{"rsrp_range": 1}]})");
+  EXPECT_EQ(std::ranges::count(systemLog.lines(), "Unknown tag: 4e04:7"), 1);
+  systemLog.clear();
+  EXPECT_TRUE(KCellularLteServingCellMeasurement::isReadable(bytes));
+  EXPECT_EQ(std::ranges::count(systemLog.lines(), "Unknown tag: 4e04:7"), 1);
 }
 
 TEST(DictionaryReading, knowsThePackedListThatIsNotThere) {

@@ -15,7 +15,8 @@ namespace {
 
 template <class Message>
 constexpr MetricMessage row(std::uint32_t identifier) {
-  return {identifier, Message::kClassName, decodeMessage<Message>, Message::dictionaryWithData};
+  return {identifier, Message::kClassName, decodeMessage<Message>, Message::dictionaryWithData,
+          Message::isReadable};
 }
 
 constexpr std::array<MetricMessage, 30> kMetricMessages = {

@@ -23,11 +23,15 @@ std::shared_ptr<PBCodable> decodeMessage(ByteView payload) {
   return Message::initWithData(payload);
 }
 
+// Whether the bytes can be decoded. Takes no memory, whatever they are.
+using CheckPayload = bool (*)(ByteView payload);
+
 struct MetricMessage {
   std::uint32_t identifier;  // as in the catalogue, 16 bits
   std::string_view className;
   DecodeMessage decode;
   DescribePayload describe;
+  CheckPayload isReadable;
 };
 
 // The 30 metrics whose payload has a message class.

@@ -10,21 +10,48 @@ namespace qel {
 
 // The dictionary form of the message that the part holds. Damaged when it is not as it would be
 // written (fields out of order or several times, unknown ones, damaged bytes): what that means is
-// for the message reader to say.
+// for the reader of any order to say.
 template <class Message>
 Cursor readDictionary(Dictionary& dictionary, Cursor part);
 
-template <class Message>
-inline constexpr bool kHasPackedField = false;
+template <class Fields>
+inline constexpr std::size_t kPackedFields = 0;
 template <class... Field>
-inline constexpr bool kHasPackedField<std::tuple<Field...>> = (kIsPacked<Field> || ...);
+inline constexpr std::size_t kPackedFields<std::tuple<Field...>> = (std::size_t{kIsPacked<Field>} +
+                                                                    ... + 0);
+template <class Message>
+inline constexpr std::size_t kPackedFieldsOf =
+    kPackedFields<std::remove_cv_t<decltype(Message::kFields)>>;
+
+// Makes room for the entries of a part. Each takes a tag and a value, but for a last one whose
+// value is not there, and for packed fields: where the part is short there is room for no more than
+// that, which keeps memory in proportion to the input.
+template <class Message>
+[[gnu::always_inline]] inline void reserveEntries(Dictionary::Entries& entries, Cursor part) {
+  constexpr std::size_t kFieldCount = std::tuple_size_v<decltype(Message::kFields)>;
+  if (part.left() >= kFieldCount) [[likely]] {
+    entries.reserve(kFieldCount);
+  } else {
+    entries.reserve(part.left() / 2 + 1 + kPackedFieldsOf<Message>);
+  }
+}
+
+template <Encoding encoding>
+Cursor readPacked(List& list, Cursor cursor) {
+  Cursor run = readDelimited(cursor);
+  while (!run.isAtEnd()) {
+    const auto [value, next] = readVarint(run);
+    list.emplace_back(decodedScalar<encoding>(value));
+    run.at = next;
+  }
+  return {run.at, cursor.end};
+}
 
 // Takes fields in order as entries of a dictionary.
-template <class Message>
+template <class Message, class Sink = Entries>
 struct EntriesTarget {
   // An absent packed field has an empty list.
-  static constexpr bool kStopsAtEnd =
-      !kHasPackedField<std::remove_cv_t<decltype(Message::kFields)>>;
+  static constexpr bool kStopsAtEnd = kPackedFieldsOf<Message> == 0;
 
   template <class Tag, class T, Encoding encoding>
   [[gnu::always_inline]] Cursor read(Cursor cursor,
@@ -69,7 +96,7 @@ struct EntriesTarget {
   template <class Tag, class Nested>
   Cursor read(Cursor cursor, const RepeatedMessageField<Message, Nested>& field) {
     List list;
-    list.reserve(kUsualCount);
+    reserveUsual(list, cursor);
     cursor = readNestedDictionary<Nested>(list, cursor);
     while (!cursor.isAtEnd() && Tag::standsAt(cursor)) {
       cursor = readNestedDictionary<Nested>(list, Tag::behind(cursor));
@@ -81,14 +108,9 @@ struct EntriesTarget {
   template <class Tag, class T, Encoding encoding>
   Cursor read(Cursor cursor, const PackedField<Message, T, encoding>& field) {
     List list;
-    Cursor run = readDelimited(cursor);
-    while (!run.isAtEnd()) {
-      const auto [value, next] = readVarint(run);
-      list.emplace_back(decodedScalar<encoding>(value));
-      run.at = next;
-    }
+    cursor = readPacked<encoding>(list, cursor);
     entries.append(field.key, std::move(list));
-    return {run.at, cursor.end};
+    return cursor;
   }
 
   template <class Field>
@@ -110,12 +132,14 @@ struct EntriesTarget {
     return cursor;
   }
 
-  Entries& entries;
+  Sink& entries;
 };
 
 template <class Message>
 Cursor readDictionary(Dictionary& dictionary, Cursor part) {
-  Entries entries(dictionary.entries(), std::tuple_size_v<decltype(Message::kFields)>);
+  if (EntriesTarget<Message>::kStopsAtEnd && part.isAtEnd()) return part;
+  reserveEntries<Message>(dictionary.entries(), part);
+  Entries entries(dictionary.entries(), 0);
   EntriesTarget<Message> target{entries};
   const Cursor stopped = readInOrder<Message>(target, part);
   return stopped.at == part.end ? stopped : Cursor::damaged();

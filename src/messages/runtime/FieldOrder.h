@@ -35,8 +35,18 @@ auto decodedScalar(std::uint64_t varint) {
   return {next, next + length};
 }
 
-// Room for the elements of a repeated message field, which seldom has more.
-inline constexpr std::size_t kUsualCount = 8;
+// Makes room for the elements of a repeated message field, which seldom has more; the first of them
+// stands here. A few bytes cannot hold as many: room for no more than they can is what keeps memory
+// in proportion to the input.
+template <class Elements>
+[[gnu::always_inline]] inline void reserveUsual(Elements& elements, Cursor cursor) {
+  constexpr std::size_t kUsualCount = 8;
+  if (cursor.left() >= kUsualCount) [[likely]] {
+    elements.reserve(kUsualCount);
+  } else {
+    elements.reserve(cursor.left() / 2 + 1);
+  }
+}
 
 // The wire type with which a field is written.
 template <class Field>

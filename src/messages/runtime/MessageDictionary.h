@@ -76,11 +76,27 @@ void addField(Entries& entries, const Message& message,
   entries.append(field.key, List(values.begin(), values.end()));
 }
 
+// Whether the field has an entry: see addField.
+template <class Message, class Field>
+bool hasEntry(const Message& message, const Field& field) {
+  if constexpr (requires { field.presenceBit; }) {
+    return Presence::get(message, field.presenceBit);
+  } else if constexpr (kIsPacked<Field>) {
+    return true;
+  } else if constexpr (requires { (message.*field.member).empty(); }) {
+    return !(message.*field.member).empty();
+  } else {
+    return static_cast<bool>(message.*field.member);
+  }
+}
+
 template <class Message>
 Dictionary messageDictionary(const Message& message) {
   Dictionary dictionary;
-  {
-    Entries entries(dictionary.entries(), std::tuple_size_v<decltype(Message::kFields)>);
+  std::size_t count = 0;
+  forEachField<Message>([&](const auto& field) { count += std::size_t{hasEntry(message, field)}; });
+  if (count > 0) {
+    Entries entries(dictionary.entries(), count);
     forEachField<Message>([&](const auto& field) { addField(entries, message, field); });
   }
   return dictionary;

@@ -6,17 +6,11 @@
 #include <string>
 #include <tuple>
 
-#include "messages/catalogue/KBBMetricUtility.h"
+#include "messages/runtime/AnyOrderReader.h"
 #include "messages/runtime/FieldOrder.h"
 #include "messages/runtime/Presence.h"
 
 namespace qel {
-
-// Logs "Unknown tag: %x:%u".
-void logUnknownTag(std::uint32_t fieldNumber, std::uint32_t value);
-
-// Skips the value of a field that the message does not have.
-Cursor skipUnknown(Cursor cursor, std::uint32_t fieldNumber, std::uint8_t wireType);
 
 // Reads the message from the cursor to its end; where reading stopped, damaged if the bytes are.
 template <class Message>
@@ -81,7 +75,7 @@ template <class Message, class Nested>
 Cursor readField(Message& message, Cursor cursor,
                  const RepeatedMessageField<Message, Nested>& field) {
   auto& elements = message.*field.member;
-  if (elements.empty()) elements.reserve(kUsualCount);
+  if (elements.empty()) reserveUsual(elements, cursor);
   return readNested(*elements.emplace_back(makeMessage<Nested>()), cursor);
 }
 
@@ -96,7 +90,7 @@ Cursor readField(Message& message, Cursor cursor, const PackedField<Message, T, 
   return {run.at, cursor.end};
 }
 
-// Takes fields in order into a message.
+// Takes fields into a message.
 template <class Message>
 struct MessageTarget {
   static constexpr bool kStopsAtEnd = true;
@@ -115,44 +109,13 @@ struct MessageTarget {
   }
   template <class Field>
   void leaveOut(const Field&) {}
+  template <std::size_t index, class Field>
+  Cursor take(Cursor cursor, const Field& field) {
+    return readField(message, cursor, field);
+  }
 
   Message& message;
 };
-
-// Reads the value of the field with this number, or skips it when the message has no such field.
-template <class Message>
-Cursor readNumbered(Message& message, Cursor cursor, std::uint32_t number, std::uint8_t wireType) {
-  Cursor next = cursor;
-  const bool known = std::apply(
-      [&](const auto&... field) {
-        return ((number == field.number && (next = readField(message, cursor, field), true)) ||
-                ...);
-      },
-      Message::kFields);
-  return known ? next : skipUnknown(cursor, number, wireType);
-}
-
-// Reads whatever comes, in whatever order.
-template <class Message>
-[[gnu::noinline]] Cursor readInAnyOrder(Message& message, Cursor cursor) {
-  constexpr std::uint8_t kEndOfGroup = 4;
-  while (!cursor.isAtEnd()) {
-    const auto [tag, next] = readVarint(cursor);
-    cursor.at = next;
-    const auto wireType = static_cast<std::uint8_t>(tag & 7);
-    if (cursor.isDamaged() || wireType == kEndOfGroup) break;
-    const auto number = static_cast<std::uint32_t>(tag >> 3 & 0xFFFF);
-    if (KBBMetricUtility::isValidMetricIdTag(number, Message::kClassName)) {
-      // A metric identifier in place of a field: its varint is taken and logged, never stored.
-      const auto [value, behind] = readVarint(cursor);
-      logUnknownTag(number, decodedScalar<Encoding::uint32>(value));
-      cursor.at = behind;
-    } else {
-      cursor = readNumbered(message, cursor, number, wireType);
-    }
-  }
-  return cursor;
-}
 
 // The order in which fields are written is the one in which nearly all arrive: it is tried first,
 // at the cost of a comparison a field, and says the same as any order does.
@@ -161,7 +124,9 @@ Cursor readMessage(Message& message, Cursor cursor) {
   MessageTarget<Message> target{message};
   cursor = readInOrder<Message>(target, cursor);
   if (cursor.isAtEnd()) return cursor;
-  return readInAnyOrder(message, cursor);
+  // Another target, so that the first one is not in memory.
+  MessageTarget<Message> rest{message};
+  return readInAnyOrder<Message>(rest, cursor);
 }
 
 }  // namespace qel

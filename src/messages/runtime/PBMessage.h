@@ -21,6 +21,8 @@ class PBMessage : public PBCodable {
   static std::shared_ptr<Message> initWithData(ByteView bytes);
   // The dictionary form of that message, or nothing, by a shorter way.
   static std::optional<Dictionary> dictionaryWithData(ByteView bytes);
+  // Whether there would be a message. Takes no memory.
+  static bool isReadable(ByteView bytes);
 
   std::string_view className() const final { return Message::kClassName; }
   Dictionary dictionaryRepresentation() const final;

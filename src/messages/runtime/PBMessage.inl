@@ -4,7 +4,8 @@
 #include <string>
 
 #include "base/FatalError.h"
-#include "messages/runtime/DictionaryReader.h"
+#include "messages/runtime/AnyOrderDictionary.h"
+#include "messages/runtime/MessageCheck.h"
 #include "messages/runtime/MessageReader.h"
 #include "messages/runtime/MessageRelations.h"
 #include "messages/runtime/MessageWriter.h"
@@ -39,9 +40,14 @@ std::optional<Dictionary> PBMessage<Message>::dictionaryWithData(ByteView bytes)
   std::optional<Dictionary> dictionary(std::in_place);
   const Cursor whole{bytes.data(), bytes.data() + bytes.size()};
   if (!readDictionary<Message>(*dictionary, whole).isDamaged()) return dictionary;
-  const auto message = initWithData(bytes);
-  if (!message) return std::nullopt;
-  return messageDictionary(*message);
+  dictionary.emplace();
+  if (readDictionaryInAnyOrder<Message>(*dictionary, whole).isDamaged()) dictionary.reset();
+  return dictionary;
+}
+
+template <class Message>
+bool PBMessage<Message>::isReadable(ByteView bytes) {
+  return !checkMessage<Message>({bytes.data(), bytes.data() + bytes.size()}).isDamaged();
 }
 
 template <class Message>
@@ -51,8 +57,9 @@ Dictionary PBMessage<Message>::dictionaryRepresentation() const {
 
 template <class Message>
 bool PBMessage<Message>::readFrom(PBDataReader& reader) {
-  if (reader._pos >= reader._length || reader._error) return !reader._error;
-  const Cursor part{reader._bytes + reader._pos, reader._bytes + reader._length};
+  const ByteView left = reader.left();
+  if (left.empty() || reader._error) return !reader._error;
+  const Cursor part{left.data(), left.data() + left.size()};
   const Cursor stopped = readMessage(self(), part);
   reader._error = stopped.isDamaged();
   reader._pos = reader._error ? reader._length : reader._pos + (part.left() - stopped.left());
