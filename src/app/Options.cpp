@@ -6,8 +6,9 @@
 #include <CLI/Config.hpp>
 #include <CLI/Formatter.hpp>
 #include <CLI/Validators.hpp>
-#include <iostream>
 #include <map>
+
+#include "base/TerminalText.h"
 
 namespace qel {
 namespace {
@@ -50,7 +51,8 @@ std::optional<Options> parseOptions(int argc, const char* const* argv, int& exit
     exitCode = line.exit(answered);
     return std::nullopt;
   } catch (const CLI::ParseError& error) {
-    std::cerr << "qelwatch: " << error.what() << '\n';
+    const std::string text = error.what();
+    complain("qelwatch", text.substr(0, text.find('\n')));
     exitCode = EX_USAGE;
     return std::nullopt;
   }

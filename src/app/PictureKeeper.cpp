@@ -2,8 +2,9 @@
 
 #include <QtCore/QSaveFile>
 #include <chrono>
-#include <iostream>
 #include <utility>
+
+#include "base/TerminalText.h"
 
 namespace qel {
 namespace {
@@ -34,8 +35,7 @@ void PictureKeeper::keep() {
   const bool written =
       file.open(QIODevice::WriteOnly) && picture.save(&file, "PNG") && file.commit();
   if (!written && !std::exchange(_complained, true)) {
-    std::cerr << "qelwatch: " << _file.toStdString() << ": " << file.errorString().toStdString()
-              << '\n';
+    complain("qelwatch", (_file + ": " + file.errorString()).toStdString());
   }
   _kept = std::move(picture);
 }

@@ -7,6 +7,8 @@
 #include <chrono>
 #include <iostream>
 
+#include "base/TerminalText.h"
+
 namespace qel {
 namespace {
 
@@ -94,7 +96,7 @@ bool SelfTest::waitForFrame() {
 void SelfTest::fail(const QString& what) {
   ++_failures;
   const QString screen = _path.isEmpty() ? QStringLiteral("first screen") : _path.join(u" / ");
-  std::cerr << "qelwatch: self-test: " << screen.toStdString() << " " << what.toStdString() << '\n';
+  complain("qelwatch", ("self-test: " + screen + " " + what).toStdString());
 }
 
 }  // namespace qel

@@ -4,9 +4,9 @@
 #include <QtCore/QLocale>
 #include <QtCore/QPointer>
 #include <chrono>
-#include <iostream>
 
 #include "app/EventLoopWait.h"
+#include "base/TerminalText.h"
 #include "service/InProcessConnector.h"
 #include "tesk/Transport.h"
 
@@ -52,7 +52,7 @@ int Source::openWithin(const std::string& source) {
   service::SourceError error;
   auto connector = service::makeInProcessConnector(source, error);
   if (!connector) {
-    std::cerr << "qelwatch: " << error.message << '\n';
+    complain("qelwatch", error.message);
     return error.exitCode;
   }
   _connector = std::make_shared<ClosingConnector>(std::move(connector));

@@ -5,7 +5,6 @@
 #include <QtQuick/QQuickWindow>
 #include <csignal>
 #include <cstdlib>
-#include <iostream>
 #include <memory>
 
 #include "app/BatchedOutput.h"
@@ -18,6 +17,7 @@
 #include "base/CoreDumps.h"
 #include "base/LogSink.h"
 #include "base/SystemLogSink.h"
+#include "base/TerminalText.h"
 #include "ui/kit/ResourceBundle.h"
 #include "ui/quick/Appearance.h"
 #include "ui/quick/Navigation.h"
@@ -35,9 +35,9 @@ void logOnStandardErrorToo() {
 
 void chooseDisplay(const qel::Options& options) {
   if (qel::hasDisplay()) return;
-  std::cerr << "qelwatch: no display, drawing off screen";
-  if (!options.picture.empty()) std::cerr << "; the picture is kept in " << options.picture;
-  std::cerr << '\n';
+  const std::string kept =
+      options.picture.empty() ? "" : "; the picture is kept in " + options.picture;
+  qel::complain("qelwatch", "no display, drawing off screen" + kept);
   qel::useMemoryAsDisplay();
 }
 

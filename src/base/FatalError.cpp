@@ -1,10 +1,10 @@
 #include "base/FatalError.h"
 
-#include <unistd.h>
-
 #include <cstdlib>
 #include <string>
 #include <vector>
+
+#include "base/TerminalText.h"
 
 namespace qel {
 namespace {
@@ -20,11 +20,7 @@ void atFatalError(std::function<void()> handler) { handlers().push_back(std::mov
 
 void fatalError(std::string_view reason) {
   for (const auto& handler : handlers()) handler();
-  std::string line = "fatal error: ";
-  line += reason;
-  line += '\n';
-  const ssize_t written = ::write(STDERR_FILENO, line.data(), line.size());
-  static_cast<void>(written);
+  complain("fatal error", reason);
   std::abort();
 }
 

@@ -4,6 +4,7 @@
 #include <unistd.h>
 
 #include "base/DescriptorSink.h"
+#include "base/TerminalText.h"
 
 namespace qel {
 
@@ -16,7 +17,7 @@ SystemLogSink::~SystemLogSink() { ::closelog(); }
 
 void SystemLogSink::write(std::string_view line) {
   ::syslog(LOG_INFO, "%.*s", static_cast<int>(line.size()), line.data());
-  if (_echo == Echo::standardError) writeAll(STDERR_FILENO, std::string(line) + '\n');
+  if (_echo == Echo::standardError) writeAll(STDERR_FILENO, forTerminal(line) + '\n');
 }
 
 }  // namespace qel

@@ -4,7 +4,6 @@
 #include <unistd.h>
 
 #include <CLI/CLI.hpp>
-#include <cstdio>
 #include <cstdlib>
 #include <memory>
 #include <string>
@@ -12,6 +11,7 @@
 #include <vector>
 
 #include "base/LogSink.h"
+#include "base/TerminalText.h"
 #include "tools/Commands.h"
 #include "tools/LossReport.h"
 #include "tools/MainLoop.h"
@@ -102,9 +102,7 @@ void run(const Options& options, Output& output) {
   configurationFile();
   requireService(options.bus);
   setStandardOutput(options.screen.empty() ? std::shared_ptr<LogSink>(output.sink()) : nullptr);
-  const auto say = [](const std::string& text) {
-    std::fprintf(stderr, "qelctl: %s\n", text.c_str());
-  };
+  const auto say = [](const std::string& text) { complain("qelctl", text); };
   tesk::setConnector(tesk::bus::makeBusConnector(
       {options.bus}, serviceObserver(say, startAsTheViewerDoes), loop.answerWaits()));
   const auto& wrapper = TeskWrapper::sharedInstance();

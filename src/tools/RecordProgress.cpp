@@ -6,6 +6,8 @@
 #include <cstdio>
 #include <utility>
 
+#include "base/TerminalText.h"
+
 namespace qel::tools {
 namespace {
 
@@ -44,13 +46,14 @@ void RecordProgress::clear() {
 void RecordProgress::show(const std::string& text) {
   if (!_isTerminal) return;
   clear();
-  std::fputs(text.c_str(), stderr);
+  std::fputs(forTerminal(text).c_str(), stderr);
   _shown = true;
 }
 
 void RecordProgress::say(const std::string& text) {
   clear();
-  std::fprintf(stderr, "qelctl: %s\n", text.c_str());
+  std::fflush(stderr);
+  complain("qelctl", text);
 }
 
 }  // namespace qel::tools

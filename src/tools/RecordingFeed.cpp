@@ -1,8 +1,8 @@
 #include "tools/RecordingFeed.h"
 
 #include <CLI/CLI.hpp>
-#include <cstdio>
 
+#include "base/TerminalText.h"
 #include "metrics/MetricValidator.h"
 #include "recording/RecordingReader.h"
 #include "tools/ToolError.h"
@@ -21,8 +21,6 @@ ToolError asError(const RecordingFault& fault) {
   }
   return {EX_SOFTWARE, fault.message};
 }
-
-void warn(const std::string& text) { std::fprintf(stderr, "qelctl: %s\n", text.c_str()); }
 
 }  // namespace
 
@@ -48,9 +46,10 @@ void feedRecording(const RecordingOptions& options, const std::function<void()>&
     if (afterEach) afterEach();
   }
   if (reader->fault()) throw asError(*reader->fault());
-  if (reader->cutOff()) warn(*reader->cutOff());
+  if (reader->cutOff()) complain("qelctl", *reader->cutOff());
   if (reader->skippedLines() > 0) {
-    warn(options.file + ": bad lines skipped: " + std::to_string(reader->skippedLines()));
+    complain("qelctl",
+             options.file + ": bad lines skipped: " + std::to_string(reader->skippedLines()));
   }
 }
 

@@ -1,8 +1,9 @@
 #include "tools/ScreenDrawing.h"
 
 #include <algorithm>
+#include <optional>
 
-#include "base/Utf8.h"
+#include "base/TerminalText.h"
 #include "ui/screens/SecondLevelViewController.h"
 #include "ui/screens/StandardScreens.h"
 
@@ -15,21 +16,8 @@ std::size_t widthOf(const std::string& text) {
       text, [](char c) { return (static_cast<unsigned char>(c) & 0xC0) != 0x80; }));
 }
 
-bool isControl(unsigned char c, unsigned char next) {
-  constexpr unsigned char kDelete = 0x7F;
-  // U+0080 to U+009F are controls too.
-  return c < ' ' || c == kDelete || (c == 0xC2 && next >= 0x80 && next < 0xA0);
-}
-
-// Text that a terminal shows and does not obey: controls become spaces.
-std::string visible(const std::string& text) {
-  std::string shown = withReplacements(text);
-  for (std::size_t i = 0; i < shown.size(); ++i) {
-    const auto next = static_cast<unsigned char>(i + 1 < shown.size() ? shown[i + 1] : 0);
-    const auto c = static_cast<unsigned char>(shown[i]);
-    if (isControl(c, next)) shown.replace(i, c == 0xC2 ? 2 : 1, " ");
-  }
-  return shown;
+std::string visible(const std::optional<std::string>& text) {
+  return forTerminal(text.value_or(""), Instead::blank);
 }
 
 }  // namespace
@@ -47,17 +35,17 @@ std::vector<std::string> tableLines(const std::string& key, const TableSnapshot&
   std::size_t width = 0;
   for (const SectionSnapshot& section : table.sections) {
     for (const RowSnapshot& row : section.rows) {
-      width = std::max(width, widthOf(visible(row.text.value_or(""))));
+      width = std::max(width, widthOf(visible(row.text)));
     }
   }
-  std::vector<std::string> lines = {key};
+  std::vector<std::string> lines = {visible(key)};
   for (const SectionSnapshot& section : table.sections) {
     lines.emplace_back();
-    if (section.title) lines.push_back(*section.title);
+    if (section.title) lines.push_back(visible(section.title));
     for (const RowSnapshot& row : section.rows) {
-      const std::string name = visible(row.text.value_or(""));
+      const std::string name = visible(row.text);
       lines.push_back("  " + name + std::string(width - widthOf(name) + 2, ' ') +
-                      visible(row.detail.value_or("")));
+                      visible(row.detail));
     }
   }
   return lines;

@@ -5,6 +5,7 @@
 #include <string>
 
 #include "base/Rendering.h"
+#include "base/TerminalText.h"
 #include "tesk/bus/ServiceStatus.h"
 #include "tools/Commands.h"
 #include "tools/Service.h"
@@ -31,21 +32,23 @@ void printJson(const ServiceStatus& status, Output& output) {
                                     {"delivered", client.delivered},
                                     {"dropped", client.dropped}});
   }
-  output.line(jsonText(
-      Dictionary{{"version", status.version},
-                 {"source", status.source},
-                 {"source_running", status.sourceRunning},
-                 {"configurations", std::move(configurations)},
-                 {"clients", std::move(clients)},
-                 {"events", Dictionary{{"received", status.eventsReceived},
-                                       {"delivered", status.eventsDelivered},
-                                       {"dropped", status.eventsDropped},
-                                       {"undecodable", status.eventsUndecodable},
-                                       {"without_content", status.eventsWithoutContent}}}}));
+  const Dictionary told = {
+      {"version", status.version},
+      {"source", status.source},
+      {"source_running", status.sourceRunning},
+      {"configurations", std::move(configurations)},
+      {"clients", std::move(clients)},
+      {"events", Dictionary{{"received", status.eventsReceived},
+                            {"delivered", status.eventsDelivered},
+                            {"dropped", status.eventsDropped},
+                            {"undecodable", status.eventsUndecodable},
+                            {"without_content", status.eventsWithoutContent}}}};
+  output.line(forTerminal(jsonText(told)));
 }
 
-// Names come from other programs: as JSON strings they cannot play tricks on a terminal.
-std::string quoted(const std::string& text) { return jsonText(Value(text)); }
+// Names come from other programs. As JSON strings they have an end that they cannot fake, and for a
+// terminal they are nothing but text.
+std::string quoted(const std::string& text) { return forTerminal(jsonText(Value(text))); }
 
 void printText(const ServiceStatus& status, Output& output) {
   const auto number = [](std::uint64_t value) { return std::to_string(value); };

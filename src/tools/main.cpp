@@ -4,20 +4,22 @@
 
 #include <CLI/CLI.hpp>
 #include <csignal>
-#include <cstdio>
 #include <exception>
 #include <memory>
+#include <string>
+#include <string_view>
 
 #include "base/CoreDumps.h"
 #include "base/DescriptorSink.h"
 #include "base/LogSink.h"
+#include "base/TerminalText.h"
 #include "tools/Commands.h"
 #include "tools/ToolError.h"
 
 namespace {
 
-int report(int code, const char* why) {
-  std::fprintf(stderr, "qelctl: %s\n", why);
+int report(int code, std::string_view why) {
+  qel::complain("qelctl", why);
   return code;
 }
 
@@ -25,10 +27,10 @@ int report(int code, const char* why) {
 int reportUsage(const CLI::App& app, const CLI::ParseError& error) {
   const auto unknown = app.remaining();
   if (!unknown.empty() && app.get_subcommands().empty()) {
-    return report(EX_USAGE, ("usage: no such subcommand: " + unknown.front()).c_str());
+    return report(EX_USAGE, "usage: no such subcommand: " + unknown.front());
   }
   const std::string text = error.what();
-  return report(EX_USAGE, ("usage: " + text.substr(0, text.find('\n'))).c_str());
+  return report(EX_USAGE, "usage: " + text.substr(0, text.find('\n')));
 }
 
 }  // namespace

@@ -120,5 +120,13 @@ TEST(QelctlMetrics, listsTheCatalogueInItsOrder) {
   EXPECT_EQ(linesOf(qelctl({"metrics"}).out).size(), catalogue.size() + 1);
 }
 
+// It went to the terminal as it was.
+TEST(QelctlErrors, areOneLineThatNoFileNameCanBreakOut) {
+  const Outcome outcome = qelctl({"replay", "no\nsuch\xC2\x9B\xE2\x80\xAE.jsonl"});
+  EXPECT_EQ(outcome.exitCode, 66);
+  EXPECT_EQ(outcome.err.find("qelctl: no\\u000asuch\\u009b\\u202e.jsonl: "), 0U) << outcome.err;
+  EXPECT_EQ(linesOf(outcome.err).size(), 1U);
+}
+
 }  // namespace
 }  // namespace qel::testing

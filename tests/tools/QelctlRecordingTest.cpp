@@ -145,6 +145,17 @@ TEST(QelctlScreen, letsNoTextCommandTheTerminal) {
             "LTE Active Bearers\n\nPDP 0\n  apn  a [2J z\n");
 }
 
+// Text that runs from right to left hid what stood beside it.
+TEST(QelctlScreen, letsNoTextTurnTheLine) {
+  BearerContext bearer;
+  bearer.setApn("a\xE2\x80\xAE\xE2\x81\xA7z");
+  KCellularActivatedBearerContexts contexts;
+  contexts.addBearerContexts(std::make_shared<BearerContext>(bearer));
+  const TemporaryRecording recording(metricLine(V::K_CELLULAR_ACTIVE_BEARER, contexts));
+  EXPECT_EQ(qelctl({"screen", recording.path(), "LTE", "Active Bearers"}).out,
+            "LTE Active Bearers\n\nPDP 0\n  apn  a  z\n");
+}
+
 TEST(QelctlScreen, asksToComeBackLaterForAKeyThatNoRoutineKnows) {
   const TemporaryRecording recording("");
   EXPECT_EQ(qelctl({"screen", "--json", recording.path(), "Device Info", "IMSI"}).out,

@@ -48,6 +48,17 @@ TEST_F(QelctlStatus, tellsItToPeople) {
   EXPECT_EQ(outcome.out.find('\x1B'), std::string::npos);
 }
 
+// Of these only the first was escaped: a client could turn and hide what stood beside its name.
+TEST_F(QelctlStatus, letsNoNameCommandTheTerminal) {
+  const std::string name = "a\x1B\x7F\xC2\x9B\xD8\x9C\xE2\x80\xAE\xE2\x81\xA6z";
+  Client client(bus, name);
+  ASSERT_TRUE(client.waitForReachable(true));
+  const std::string escaped = R"("a\u001b\u007f\u009b\u061c\u202e\u2066z")";
+  EXPECT_NE(ask({"status"}).out.find("client          " + escaped), std::string::npos);
+  EXPECT_NE(ask({"status", "--json"}).out.find(escaped), std::string::npos);
+  EXPECT_EQ(status()["clients"][0]["name"], name);
+}
+
 // Reports without content went to every viewer and ended it.
 TEST(QelctlStatusOfARecording, countsReportsThatNoTableCouldDraw) {
   const TemporaryRecording recording(metricLine(0x3C0000 + 11788, Bytes{}) +
