@@ -7,8 +7,6 @@
 #include <cerrno>
 #include <cstdio>
 #include <cstring>
-#include <fstream>
-#include <iterator>
 #include <memory>
 #include <optional>
 
@@ -69,13 +67,57 @@ struct File {
   const int descriptor;
 };
 
-void logFailure(const std::string& path, const char* what, int error) {
-  systemLog().write("basebandd: " + path + ": " + what + ": " + std::strerror(error));
+void log(const std::string& path, const std::string& what) {
+  systemLog().write("basebandd: " + path + ": " + what);
 }
 
-// The whole content on the disk under this name; 0 or the error number.
+std::string unreadable(int error) { return std::string("cannot be read: ") + std::strerror(error); }
+
+// All of the descriptor, up to one byte more than a state may have; 0 or the error number.
+int readState(int descriptor, Bytes& content) {
+  Bytes part(std::size_t{1} << 16);
+  while (content.size() <= StateFile::kLargest) {
+    const ssize_t count = ::read(descriptor, part.data(), part.size());
+    if (count < 0 && errno == EINTR) continue;
+    if (count < 0) return errno;
+    if (count == 0) break;
+    content.insert(content.end(), part.begin(), part.begin() + count);
+  }
+  return 0;
+}
+
+// What the file says, or nothing; `fault` then holds why, unless there is no file.
+std::optional<KeptState> stateIn(const std::string& path, std::string& fault) {
+  // Not blocking: opening a FIFO would wait for its other end.
+  const File file(::open(path.c_str(), O_RDONLY | O_NONBLOCK | O_NOCTTY | O_CLOEXEC));
+  if (file.descriptor < 0) {
+    if (errno != ENOENT) fault = unreadable(errno);
+    return std::nullopt;
+  }
+  struct stat status {};
+  if (::fstat(file.descriptor, &status) != 0 || !S_ISREG(status.st_mode)) {
+    fault = "not a regular file, ignored";
+    return std::nullopt;
+  }
+  Bytes content;
+  if (const int error = readState(file.descriptor, content)) {
+    fault = unreadable(error);
+    return std::nullopt;
+  }
+  if (content.size() > StateFile::kLargest) {
+    fault = "larger than any state of this service, ignored";
+    return std::nullopt;
+  }
+  auto state = decoded(content);
+  if (!state) fault = "not a state of this service, ignored";
+  return state;
+}
+
+// The whole content on the disk under this name; 0 or the error number. Whatever bears the name
+// from before, such as a write that was cut off, goes.
 int writeDurably(const std::string& path, const Bytes& content) {
-  const File file(::open(path.c_str(), O_WRONLY | O_CREAT | O_TRUNC | O_CLOEXEC, 0600));
+  ::unlink(path.c_str());
+  const File file(::open(path.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, 0600));
   if (file.descriptor < 0) return errno;
   const std::string_view text(reinterpret_cast<const char*>(content.data()), content.size());
   if (const int error = writeAll(file.descriptor, text)) return error;
@@ -88,32 +130,36 @@ StateFile::StateFile(std::string directory) : _directory(std::move(directory)) {
 
 KeptState StateFile::load() {
   const std::string path = _directory + "/state";
-  std::ifstream file(path, std::ios::binary);
-  if (!file) return {};
-  const Bytes content{std::istreambuf_iterator<char>(file), std::istreambuf_iterator<char>()};
-  auto state = decoded(content);
-  if (!state) {
-    systemLog().write("basebandd: " + path + ": not a state of this service, ignored");
-    return {};
-  }
-  return std::move(*state);
+  std::string fault;
+  auto state = stateIn(path, fault);
+  if (!fault.empty()) log(path, fault);
+  return state ? std::move(*state) : KeptState{};
 }
 
 void StateFile::save(const KeptState& state) {
+  std::string failure = replaceBy(encoded(state));
+  if (!failure.empty() && failure != _failure) systemLog().write("basebandd: " + failure);
+  _failure = std::move(failure);
+}
+
+std::string StateFile::replaceBy(const Bytes& content) const {
   const std::string path = _directory + "/state";
   const std::string written = path + ".new";
-  if (const int error = writeDurably(written, encoded(state))) {
-    logFailure(written, "cannot be written", error);
-    return;
+  const auto failed = [](const std::string& name, const char* what, int error) {
+    return name + ": " + what + ": " + std::strerror(error);
+  };
+  if (content.size() > kLargest) return failed(path, "cannot be written", EFBIG);
+  if (const int error = writeDurably(written, content)) {
+    return failed(written, "cannot be written", error);
   }
   if (::rename(written.c_str(), path.c_str()) != 0) {
-    logFailure(path, "cannot be replaced", errno);
-    return;
+    return failed(path, "cannot be replaced", errno);
   }
   const File directory(::open(_directory.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC));
   if (directory.descriptor < 0 || ::fsync(directory.descriptor) != 0) {
-    logFailure(_directory, "cannot be synchronised", errno);
+    return failed(_directory, "cannot be synchronised", errno);
   }
+  return "";
 }
 
 }  // namespace qel::service

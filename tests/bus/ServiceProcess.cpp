@@ -6,21 +6,25 @@
 #include "tesk/Constants.h"
 
 namespace qel::testing {
-
 namespace {
 
-std::vector<std::string> wordsOf(const PrivateBus& bus, const std::string& source,
-                                 const std::string& stateDirectory) {
-  std::vector<std::string> words{QEL_BASEBANDD, "--bus", bus.address(), "--source", source};
-  if (!stateDirectory.empty()) words.insert(words.end(), {"--state", stateDirectory});
+using Words = std::vector<std::string>;
+
+Words wordsOf(const PrivateBus& bus, const std::string& source, const Words& state) {
+  Words words{QEL_BASEBANDD, "--bus", bus.address(), "--source", source};
+  words.insert(words.end(), state.begin(), state.end());
   return words;
 }
 
 }  // namespace
 
+ServiceProcess::ServiceProcess(const PrivateBus& bus, const std::string& source, State state)
+    : ChildProcess(
+          {.words = wordsOf(bus, source, state == State::none ? Words{"--no-state"} : Words{})}) {}
+
 ServiceProcess::ServiceProcess(const PrivateBus& bus, const std::string& source,
                                const std::string& stateDirectory)
-    : ChildProcess({.words = wordsOf(bus, source, stateDirectory)}) {}
+    : ChildProcess({.words = wordsOf(bus, source, {"--state", stateDirectory})}) {}
 
 Client::Client(const PrivateBus& bus, const std::string& name) {
   const auto connector =

@@ -17,8 +17,11 @@ namespace qel::testing {
 
 class ServiceProcess : public ChildProcess {
  public:
+  enum class State { none, whereTheEnvironmentSays };
+
+  ServiceProcess(const PrivateBus& bus, const std::string& source, State state = State::none);
   ServiceProcess(const PrivateBus& bus, const std::string& source,
-                 const std::string& stateDirectory = "");
+                 const std::string& stateDirectory);
 };
 
 // A client over the bus that keeps its events.

@@ -3,7 +3,8 @@
 #include <sysexits.h>
 
 #include <CLI/CLI.hpp>
-#include <iostream>
+
+#include "base/TerminalText.h"
 
 namespace qel::service {
 
@@ -17,9 +18,15 @@ std::optional<Options> parseOptions(int argc, const char* const* argv, int& exit
                  "modem-manager[:IMEI|:PATH][,bus=ADDRESS]")
       ->capture_default_str();
   app.add_option("--bus", options.bus, "system, session or a bus address")->capture_default_str();
-  app.add_option("--state", options.stateDirectory,
-                 "Directory in which configurations outlive the service")
-      ->check(CLI::ExistingDirectory);
+  auto* state =
+      app.add_option("--state", options.stateDirectory,
+                     "Directory in which configurations outlive the service; unless given, "
+                     "$STATE_DIRECTORY, else basebandd in $XDG_STATE_HOME, else "
+                     "~/.local/state/basebandd")
+          ->check(CLI::ExistingDirectory);
+  bool forgets = false;
+  app.add_flag("--no-state", forgets, "Keep nothing: configurations end with the service")
+      ->excludes(state);
   app.add_flag("-v,--verbose", options.verbose, "Log on standard error too");
   try {
     app.parse(argc, argv);
@@ -28,10 +35,11 @@ std::optional<Options> parseOptions(int argc, const char* const* argv, int& exit
     return std::nullopt;
   } catch (const CLI::ParseError& error) {
     const std::string text = error.what();
-    std::cerr << "basebandd: usage: " << text.substr(0, text.find('\n')) << '\n';
+    complain("basebandd", "usage: " + text.substr(0, text.find('\n')));
     exitCode = EX_USAGE;
     return std::nullopt;
   }
+  options.keepsState = !forgets;
   return options;
 }
 

@@ -9,7 +9,8 @@ namespace qel::service {
 struct Options {
   std::string source = "simulated";
   std::string bus = "system";
-  std::string stateDirectory;  // empty: nothing outlives the process
+  std::string stateDirectory;  // empty: where the environment says
+  bool keepsState = true;
   bool verbose = false;
 };
 

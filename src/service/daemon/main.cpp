@@ -9,16 +9,18 @@
 #include <chrono>
 #include <csignal>
 #include <cstdlib>
-#include <iostream>
+#include <cstring>
 #include <memory>
 
 #include "base/CoreDumps.h"
 #include "base/LogSink.h"
 #include "base/SystemLogSink.h"
+#include "base/TerminalText.h"
 #include "service/InProcessConnector.h"
 #include "service/StateFile.h"
 #include "service/bus/BusFront.h"
 #include "service/daemon/Options.h"
+#include "service/daemon/StateDirectory.h"
 
 namespace {
 
@@ -45,8 +47,27 @@ void serve(BusFront& front, int stop) {
   while (!isReadable(stop, 0ms)) front.waitAndProcess(stop);
 }
 
+// A failed write is noticed where it is made: no full disk and no closed pipe ends the service.
+void ignoreWriteSignals() {
+  std::signal(SIGXFSZ, SIG_IGN);
+  std::signal(SIGPIPE, SIG_IGN);
+}
+
+// Nothing when the service is to forget, or cannot help it (one log line).
+std::unique_ptr<StateKeeper> makeKeeper(const Options& options) {
+  if (!options.keepsState) return nullptr;
+  if (!options.stateDirectory.empty()) return std::make_unique<StateFile>(options.stateDirectory);
+  const std::string directory = defaultStateDirectory();
+  const int error = directory.empty() ? 0 : makeStateDirectory(directory);
+  if (!directory.empty() && error == 0) return std::make_unique<StateFile>(directory);
+  qel::systemLog().write("basebandd: configurations are forgotten at its end: " +
+                         (directory.empty() ? "the environment names no directory for them"
+                                            : directory + ": " + std::strerror(error)));
+  return nullptr;
+}
+
 int fail(int code, const std::string& why) {
-  std::cerr << "basebandd: " << why << '\n';
+  qel::complain("basebandd", why);
   return code;
 }
 
@@ -81,16 +102,12 @@ int main(int argc, char** argv) {
   if (!options) return exitCode;
   qel::leaveNoCore();
   const int stop = stopSignals();
-  std::signal(SIGXFSZ, SIG_IGN);  // a file at its limit shows as a failed write
+  ignoreWriteSignals();
   using Echo = qel::SystemLogSink::Echo;
   qel::setSystemLog(std::make_shared<qel::SystemLogSink>(
       "basebandd", options->verbose ? Echo::standardError : Echo::none));
-  std::unique_ptr<StateKeeper> keeper;
-  if (!options->stateDirectory.empty()) {
-    keeper = std::make_unique<StateFile>(options->stateDirectory);
-  }
   SourceError error;
-  const auto core = makeServiceCore(options->source, error, std::move(keeper));
+  const auto core = makeServiceCore(options->source, error, makeKeeper(*options));
   if (!core) return fail(error.exitCode, error.message);
   return run(core, {options->bus}, stop);
 }
