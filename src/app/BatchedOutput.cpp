@@ -11,11 +11,13 @@ namespace qel {
 BatchedOutput::BatchedOutput() : _self(std::make_shared<BatchedOutput*>(this)) {
   _timer.setSingleShot(true);
   QObject::connect(&_timer, &QTimer::timeout, &_timer, [this] { flushWhenDue(); });
-  _sink = std::make_shared<BatchingSink>(STDOUT_FILENO, [weak = std::weak_ptr(_self)] {
+  const auto lineWaits = [weak = std::weak_ptr(_self)] {
     MainQueue::shared().async([weak] {
       if (const auto output = weak.lock()) (*output)->flushWhenDue();
     });
-  });
+  };
+  _sink = std::make_shared<BatchingSink>(STDOUT_FILENO, lineWaits,
+                                         BatchingSink::SlowReader::losesLines);
   setStandardOutput(_sink);
 }
 

@@ -9,7 +9,8 @@
 namespace qel {
 
 // One, in the GUI thread, made after the application object. Lines to a file or a pipe are written
-// together, the first after a rest at once; lines to a terminal one by one.
+// together, the first after a rest at once; lines to a terminal one by one. A reader who takes
+// nothing loses lines and holds nothing up.
 class BatchedOutput {
  public:
   BatchedOutput();

@@ -1,10 +1,6 @@
 #include "base/SystemLogSink.h"
 
 #include <syslog.h>
-#include <unistd.h>
-
-#include "base/DescriptorSink.h"
-#include "base/TerminalText.h"
 
 namespace qel {
 
@@ -17,7 +13,7 @@ SystemLogSink::~SystemLogSink() { ::closelog(); }
 
 void SystemLogSink::write(std::string_view line) {
   ::syslog(LOG_INFO, "%.*s", static_cast<int>(line.size()), line.data());
-  if (_echo == Echo::standardError) writeAll(STDERR_FILENO, forTerminal(line) + '\n');
+  if (_echo == Echo::standardError) _standardError.write(line);
 }
 
 }  // namespace qel

@@ -5,6 +5,7 @@
 #include <string>
 #include <string_view>
 
+#include "base/DescriptorSink.h"
 #include "base/LogSink.h"
 
 namespace qel {
@@ -22,6 +23,7 @@ class SystemLogSink final : public LogSink {
  private:
   std::string _program;  // openlog keeps the pointer
   Echo _echo;
+  StandardErrorSink _standardError;
 };
 
 }  // namespace qel

@@ -6,7 +6,7 @@
 #include <array>
 #include <cstdint>
 
-#include "base/DescriptorSink.h"
+#include "base/NonBlockingWriter.h"
 #include "base/Utf8.h"
 
 namespace qel {
@@ -78,11 +78,12 @@ std::string forTerminal(std::string_view text, Instead instead) {
 }
 
 void complain(std::string_view program, std::string_view text) {
+  constexpr auto kMoment = std::chrono::seconds(1);
   std::string line(program);
   line += ": ";
   line += forTerminal(text);
   line += '\n';
-  writeAll(STDERR_FILENO, line);
+  writeBriefly(STDERR_FILENO, line, kMoment);
 }
 
 }  // namespace qel

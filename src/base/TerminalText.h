@@ -18,7 +18,8 @@ enum class Instead : std::uint8_t {
 // U+FFFD.
 std::string forTerminal(std::string_view text, Instead instead = Instead::escape);
 
-// "program: text" for a terminal, as one line on standard error.
+// "program: text" for a terminal, as one line on standard error. A reader who takes nothing for a
+// second loses it.
 void complain(std::string_view program, std::string_view text);
 
 }  // namespace qel

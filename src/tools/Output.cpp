@@ -20,6 +20,12 @@ void Output::line(std::string_view text) {
   check();
 }
 
+void Output::draw(std::string_view text) {
+  _sink->draw(text);
+  _sink->flushWhatGoes();
+  check();
+}
+
 void Output::flush() {
   _sink->flush();
   check();

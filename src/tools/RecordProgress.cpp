@@ -6,6 +6,7 @@
 #include <cstdio>
 #include <utility>
 
+#include "base/NonBlockingWriter.h"
 #include "base/TerminalText.h"
 
 namespace qel::tools {
@@ -30,6 +31,11 @@ std::string durationText(std::chrono::seconds duration) {
   return text.data();
 }
 
+// What goes at once: a terminal that was stopped must not stop the recording.
+void put(const std::string& text) {
+  writeBriefly(STDERR_FILENO, text, std::chrono::milliseconds(0));
+}
+
 }  // namespace
 
 std::string progressText(const Recorder::Progress& progress, std::chrono::seconds duration) {
@@ -40,19 +46,18 @@ std::string progressText(const Recorder::Progress& progress, std::chrono::second
 RecordProgress::RecordProgress() : _isTerminal(::isatty(STDERR_FILENO) == 1) {}
 
 void RecordProgress::clear() {
-  if (std::exchange(_shown, false)) std::fputs("\r\x1B[K", stderr);
+  if (std::exchange(_shown, false)) put("\r\x1B[K");
 }
 
 void RecordProgress::show(const std::string& text) {
   if (!_isTerminal) return;
   clear();
-  std::fputs(forTerminal(text).c_str(), stderr);
+  put(forTerminal(text));
   _shown = true;
 }
 
 void RecordProgress::say(const std::string& text) {
   clear();
-  std::fflush(stderr);
   complain("qelctl", text);
 }
 

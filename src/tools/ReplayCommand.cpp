@@ -30,6 +30,7 @@ void addReplayCommand(CLI::App& app, Action& chosen) {
     chosen = [options](Output& output) {
       setStandardOutput(output.sink());
       const StopSignals signals(StopSignals::Waiting::fails);
+      output.setGivesUp([&signals] { return signals.arrived() != 0; });
       const auto lookForSignal = [&] {
         if (signals.arrived() != 0) endBySignal(signals.arrived(), output);
       };
