@@ -24,6 +24,7 @@ const std::map<std::string, Appearance::Theme>& themes() {
 std::optional<Options> parseOptions(int argc, const char* const* argv, int& exitCode) {
   Options options;
   std::string theme;
+  std::string events = "full";
   CLI::App line("Shows what the phone's baseband reports about its cells.", "qelwatch");
   line.set_version_flag("--version", "qelwatch " QELWATCH_VERSION);
   auto* source = line.add_option("--source", options.source,
@@ -42,6 +43,12 @@ std::optional<Options> parseOptions(int argc, const char* const* argv, int& exit
   line.add_option("--picture", options.picture,
                   "keep a PNG picture of the current screen in this file")
       ->type_name("FILE");
+  line.add_option("--event-log", events,
+                  "events in the system log: full (with the identities in them), hidden (with "
+                  "pseudonyms) or none")
+      ->type_name("EVENTS")
+      ->check(CLI::IsMember(loggedEventsNames()).description(""))
+      ->capture_default_str();
   line.add_flag("--self-test", options.selfTest, "open and draw every screen once, then end");
   line.add_flag("-v,--verbose", options.verbose,
                 "what goes to the system log goes to standard error too");
@@ -56,6 +63,7 @@ std::optional<Options> parseOptions(int argc, const char* const* argv, int& exit
     exitCode = EX_USAGE;
     return std::nullopt;
   }
+  options.loggedEvents = *loggedEventsNamed(events);
   if (!theme.empty()) options.theme = themes().at(theme);
   return options;
 }

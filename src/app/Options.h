@@ -4,6 +4,7 @@
 #include <optional>
 #include <string>
 
+#include "recording/privacy/EventLog.h"
 #include "ui/quick/Appearance.h"
 
 namespace qel {
@@ -13,6 +14,7 @@ struct Options {
   std::string bus = "system";
   std::string picture;  // file name; empty: keep none
   std::optional<Appearance::Theme> theme;
+  LoggedEvents loggedEvents = LoggedEvents::full;  // in the system log
   bool selfTest = false;
   bool verbose = false;  // what goes to the system log goes to standard error too
 };

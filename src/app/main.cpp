@@ -6,6 +6,7 @@
 #include <csignal>
 #include <cstdlib>
 #include <memory>
+#include <utility>
 
 #include "app/BatchedOutput.h"
 #include "app/Display.h"
@@ -28,9 +29,11 @@ namespace {
 
 const QString kName = QStringLiteral("qelwatch");
 
-void logOnStandardErrorToo() {
+void chooseLog(const qel::Options& options) {
   using Sink = qel::SystemLogSink;
-  qel::setSystemLog(std::make_shared<Sink>("qelwatch", Sink::Echo::standardError));
+  const auto echo = options.verbose ? Sink::Echo::standardError : Sink::Echo::none;
+  auto log = std::make_shared<Sink>("qelwatch", echo);
+  qel::setSystemLog(std::make_shared<qel::EventLog>(std::move(log), options.loggedEvents));
 }
 
 void chooseDisplay(const qel::Options& options) {
@@ -92,7 +95,7 @@ int main(int argc, char** argv) {
   if (!options) return exitCode;
   qel::leaveNoCore();
   std::signal(SIGXFSZ, SIG_IGN);  // a file at its limit shows as a failed write
-  if (options->verbose) logOnStandardErrorToo();
+  chooseLog(*options);
   const qel::SessionFolder sessionFolder;
   qel::Source source;
   exitCode = source.open(*options);

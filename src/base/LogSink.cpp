@@ -3,9 +3,11 @@
 #include <unistd.h>
 
 #include <cstdlib>
+#include <string>
 
 #include "base/DescriptorSink.h"
 #include "base/FatalError.h"
+#include "base/Rendering.h"
 #include "base/SystemLogSink.h"
 
 namespace qel {
@@ -36,6 +38,12 @@ Sink& systemLogSlot() {
 Sink orNull(Sink sink) { return sink ? std::move(sink) : std::make_shared<NullSink>(); }
 
 }  // namespace
+
+void LogSink::writeEvent(std::string_view text, const Dictionary& event) {
+  std::string line(text);
+  appendJson(line, event);
+  write(line);
+}
 
 LogSink& standardOutput() { return *standardOutputSlot(); }
 LogSink& systemLog() { return *systemLogSlot(); }

@@ -6,11 +6,15 @@
 
 namespace qel {
 
+class Dictionary;
+
 // Takes whole lines without their newline. Any thread.
 class LogSink {
  public:
   virtual ~LogSink() = default;
   virtual void write(std::string_view line) = 0;
+  // A line about an event: `text` and the event as JSON. A sink may want to know that it is one.
+  virtual void writeEvent(std::string_view text, const Dictionary& event);
   // Hands on what the sink still holds.
   virtual void flush() {}
 };
@@ -19,6 +23,7 @@ class LogSink {
 class NullSink final : public LogSink {
  public:
   void write(std::string_view) override {}
+  void writeEvent(std::string_view, const Dictionary&) override {}
 };
 
 // The two sinks of the process. At first standard output is the real one, line by line, and the

@@ -7,7 +7,6 @@
 
 #include "base/FileContent.h"
 #include "base/LogSink.h"
-#include "base/Rendering.h"
 #include "tesk/Constants.h"
 
 namespace qel {
@@ -30,8 +29,10 @@ struct Stream {
 };
 
 constexpr std::array kStreams = {
-    Stream{tesk::kEventTrigger, "EventTrigger dict=", &TeskWrapperDelegate::eventsDidUpdate},
-    Stream{tesk::kEventMetric, "MetricsTrigger dict=", &TeskWrapperDelegate::metricsDidUpdate},
+    Stream{tesk::kEventTrigger, "-[TeskWrapper listen]_block_invoke: EventTrigger dict=",
+           &TeskWrapperDelegate::eventsDidUpdate},
+    Stream{tesk::kEventMetric, "-[TeskWrapper listen]_block_invoke: MetricsTrigger dict=",
+           &TeskWrapperDelegate::metricsDidUpdate},
 };
 
 void logOperation(std::string_view operation, std::string_view text) {
@@ -75,7 +76,7 @@ void TeskWrapper::setDelegate(const std::shared_ptr<TeskWrapperDelegate>& delega
 void TeskWrapper::handOver(const tesk::Message& event, std::string_view eventName,
                            std::string_view logText) {
   Dictionary dictionary = tesk::createDictionaryFromMessage(event);
-  logOperation(kHandler, std::string(logText) + jsonText(dictionary));
+  systemLog().writeEvent(logText, dictionary);
   if (!delegate()) return;
   if (!_backlog.add({std::string(eventName), std::move(dictionary)})) return;
   MainQueue::shared().async([wrapper = shared_from_this()] { wrapper->deliverOne(); });

@@ -21,7 +21,8 @@ void addStoreCommand(CLI::App& app, Action& chosen);
 void addScreenCommands(CLI::App& app, Action& chosen);
 void addMetricsCommand(CLI::App& app, Action& chosen);
 void addStatusCommand(CLI::App& app, Action& chosen);
-void addLiveCommand(CLI::App& app, Action& chosen);
+// `verbose` is read when the subcommand runs.
+void addLiveCommand(CLI::App& app, Action& chosen, const bool& verbose);
 void addRecordCommand(CLI::App& app, Action& chosen);
 
 }  // namespace qel::tools

@@ -4,14 +4,17 @@
 #include <unistd.h>
 
 #include <CLI/CLI.hpp>
+#include <algorithm>
 #include <cstdlib>
 #include <memory>
 #include <string>
 #include <utility>
 #include <vector>
 
-#include "base/LogSink.h"
+#include "base/DescriptorSink.h"
+#include "base/SystemLogSink.h"
 #include "base/TerminalText.h"
+#include "recording/privacy/EventLog.h"
 #include "tools/Commands.h"
 #include "tools/LossReport.h"
 #include "tools/MainLoop.h"
@@ -27,6 +30,7 @@ using namespace std::chrono_literals;
 
 struct Options {
   std::string bus = "system";
+  std::string loggedEvents = "none";
   std::vector<std::string> screen;  // technology and category, or empty
 };
 
@@ -39,16 +43,17 @@ class LiveTable {
   explicit LiveTable(const std::vector<std::string>& screen)
       : _key(screen.at(0) + " " + screen.at(1)), _screen(makeScreen(screen.at(0), screen.at(1))) {}
 
-  // When draw() may next have something to do.
-  std::optional<MainLoop::Clock::time_point> due() const {
-    return _touched ? std::optional(_next) : std::nullopt;
+  // When draw() may next have something to do. A table that nobody has read yet is not drawn over.
+  std::optional<MainLoop::Clock::time_point> due(Output& output) const {
+    const auto written = output.flushWhenDue();
+    return written || !_touched ? written : std::optional(_next);
   }
 
   void touch() { _touched = true; }
 
   void draw(Output& output) {
     const auto now = MainLoop::Clock::now();
-    if (!_touched || now < _next) return;
+    if (!_touched || now < _next || output.isBehind()) return;
     _touched = false;
     TableSnapshot table = snapshotOf(*_screen);
     if (_drawn && table == *_drawn) return;
@@ -68,8 +73,7 @@ class LiveTable {
     if (!inPlace && _drawn) output.line("");
     std::string text = inPlace ? kClear : "";  // in one piece, so that it does not flicker
     for (std::size_t i = 0; i < most; ++i) text += (i == 0 ? "" : "\n") + lines[i];
-    output.line(text);
-    output.flush();
+    output.draw(text);
   }
 
   inline static const std::string kClear = "\x1B[H\x1B[2J";
@@ -89,18 +93,32 @@ void showLines(MainLoop& loop, Output& output) {
 void showTable(MainLoop& loop, Output& output, const std::vector<std::string>& screen) {
   LiveTable table(screen);
   table.draw(output);
-  while (loop.runOnce(table.due())) {
+  while (loop.runOnce(table.due(output))) {
     table.touch();
     table.draw(output);
   }
 }
 
-void run(const Options& options, Output& output) {
+void chooseLog(const Options& options, bool verbose) {
+  const LoggedEvents events = *loggedEventsNamed(options.loggedEvents);
+  std::shared_ptr<LogSink> log = std::make_shared<NullSink>();
+  using Sink = SystemLogSink;
+  if (events != LoggedEvents::none) {
+    log = std::make_shared<Sink>("qelctl", verbose ? Sink::Echo::standardError : Sink::Echo::none);
+  } else if (verbose) {
+    log = std::make_shared<StandardErrorSink>();
+  }
+  setSystemLog(std::make_shared<EventLog>(std::move(log), events));
+}
+
+void run(const Options& options, bool verbose, Output& output) {
+  chooseLog(options, verbose);
   MainLoop loop;
   loop.watchStandardOutput();
   findResources();
   configurationFile();
   requireService(options.bus);
+  output.goOnWithoutReader();
   setStandardOutput(options.screen.empty() ? std::shared_ptr<LogSink>(output.sink()) : nullptr);
   const auto say = [](const std::string& text) { complain("qelctl", text); };
   tesk::setConnector(tesk::bus::makeBusConnector(
@@ -123,7 +141,7 @@ void run(const Options& options, Output& output) {
 
 }  // namespace
 
-void addLiveCommand(CLI::App& app, Action& chosen) {
+void addLiveCommand(CLI::App& app, Action& chosen, const bool& verbose) {
   auto* command = app.add_subcommand(
       "live", "Connect as the viewer does; print the lines, or draw one category");
   command->footer("It runs until SIGINT or SIGTERM, and goes on when the service comes back.");
@@ -135,8 +153,16 @@ void addLiveCommand(CLI::App& app, Action& chosen) {
       ->type_name("TECHNOLOGY CATEGORY")
       ->type_size(2)
       ->expected(1);
-  command->callback(
-      [options, &chosen] { chosen = [options](Output& output) { run(*options, output); }; });
+  command
+      ->add_option("--event-log", options->loggedEvents,
+                   "Events in the system log: full (with the identities in them), hidden (with "
+                   "pseudonyms) or none")
+      ->type_name("EVENTS")
+      ->check(CLI::IsMember(loggedEventsNames()).description(""))
+      ->capture_default_str();
+  command->callback([options, &chosen, &verbose] {
+    chosen = [options, &verbose](Output& output) { run(*options, verbose, output); };
+  });
 }
 
 }  // namespace qel::tools

@@ -50,7 +50,7 @@ int main(int argc, char* argv[]) {
   tools::addScreenCommands(app, chosen);
   tools::addMetricsCommand(app, chosen);
   tools::addStatusCommand(app, chosen);
-  tools::addLiveCommand(app, chosen);
+  tools::addLiveCommand(app, chosen, verbose);
   tools::addRecordCommand(app, chosen);
 
   try {
@@ -64,7 +64,7 @@ int main(int argc, char* argv[]) {
   leaveNoCore();
   std::signal(SIGPIPE, SIG_IGN);  // a closed pipe shows as a failed write
   std::signal(SIGXFSZ, SIG_IGN);  // and so does a file that has reached its limit
-  setSystemLog(verbose ? std::make_shared<DescriptorSink>(STDERR_FILENO) : nullptr);
+  setSystemLog(verbose ? std::make_shared<StandardErrorSink>() : nullptr);
   tools::Output output;
   try {
     chosen(output);

@@ -23,7 +23,7 @@ const std::map<std::string, std::set<std::string>> kAllowed = {
     {"metrics", {"base", "connection", "messages"}},
     {"service", {"base", "messages", "recording", "tesk"}},
     {"ui", {"base", "connection", "metrics"}},
-    {"app", {"base", "metrics", "service", "tesk", "ui"}},
+    {"app", {"base", "metrics", "recording", "service", "tesk", "ui"}},
     {"tools", {"base", "messages", "metrics", "recording", "tesk", "ui"}},
 };
 

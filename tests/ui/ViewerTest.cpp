@@ -63,17 +63,18 @@ TEST_F(Viewer, tellsItsVersionAndItsOptions) {
   EXPECT_EQ(version.out.rfind("qelwatch ", 0), 0U) << version.out;
   const Outcome help = start({"--help"});
   EXPECT_EQ(help.exitCode, 0);
-  for (const char* option :
-       {"--source", "--bus", "--theme", "--picture", "--self-test", "--verbose", "--version"}) {
+  for (const char* option : {"--source", "--bus", "--theme", "--picture", "--event-log",
+                             "--self-test", "--verbose", "--version"}) {
     EXPECT_NE(help.out.find(option), std::string::npos) << option;
   }
 }
 
 TEST_F(Viewer, saysInOneLineWhatIsWrongWithItsCall) {
   const std::vector<std::vector<std::string>> wrongCalls = {
-      {"--nonsense"},        {"extra"},
-      {"--theme", "pink"},   {"--source"},
-      {"--source", "radio"}, {"--source", "simulated,seed=x"}};
+      {"--nonsense"},         {"extra"},
+      {"--theme", "pink"},    {"--source"},
+      {"--source", "radio"},  {"--source", "simulated,seed=x"},
+      {"--event-log", "some"}};
   for (const auto& wrong : wrongCalls) {
     const Outcome outcome = start(wrong);
     EXPECT_EQ(outcome.exitCode, 64) << wrong.back();
