@@ -36,11 +36,12 @@ SerialQueue::~SerialQueue() {
 }
 
 void SerialQueue::async(Work work) {
+  const auto state = _state;  // the work may let go of this queue before it is told of
   {
-    const std::lock_guard lock(_state->mutex);
-    _state->waiting.push_back(std::move(work));
+    const std::lock_guard lock(state->mutex);
+    state->waiting.push_back(std::move(work));
   }
-  _state->changed.notify_one();
+  state->changed.notify_one();
 }
 
 void SerialQueue::run(const std::shared_ptr<State>& state) {
