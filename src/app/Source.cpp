@@ -18,7 +18,7 @@ constexpr std::chrono::milliseconds kPatienceOfASelfTest{5000};
 const QString kModemManager = QStringLiteral("modem-manager");
 
 QString lossInWords(std::uint64_t dropped) {
-  return QLocale::c().toString(static_cast<qulonglong>(dropped)) +
+  return QLocale(QLocale::English).toString(static_cast<qulonglong>(dropped)) +
          QStringLiteral(" reports left out, which came faster than they could be shown");
 }
 
