@@ -24,7 +24,7 @@ constexpr std::uint32_t kOn5G = 1U << 15;
 TEST(Releases, TellWhatEachOfThemOffers) {
   for (const int minor : kReleases) {
     SCOPED_TRACE(minor);
-    ModemWorld world;
+    ModemWorld world({}, ModemWorld::kPatient);
     speakAs(minor, *world.manager, modemOfRelease(minor));
     world.start();
     ASSERT_TRUE(world.log->waitForCount(metric::kEmmContext, 3));
@@ -45,7 +45,7 @@ TEST(Releases, TellWhatEachOfThemOffers) {
 }
 
 TEST(Carriers, HaveTheirBandwidthsAndAreNoNeighbours) {
-  ModemWorld world;
+  ModemWorld world({}, ModemWorld::kPatient);
   speakAs(22, *world.manager, modemOfRelease(22));
   world.start();
   ASSERT_TRUE(world.log->waitForCount(metric::kLteCarrierAggregation, 1));
@@ -69,7 +69,7 @@ TEST(Carriers, HaveTheirBandwidthsAndAreNoNeighbours) {
 
 TEST(Carriers, HaveNoBandwidthThatLteDoesNotHave) {
   for (const std::uint32_t bandwidth : {0U, 1U, 50U, 1400U, 1400000U, 25000000U, 0xFFFFFFFFU}) {
-    ModemWorld world;
+    ModemWorld world({}, ModemWorld::kPatient);
     world.manager->setCells({{{"cell-type", number(5)},
                               {"serving", flag(true)},
                               {"earfcn", number(100)},
@@ -97,7 +97,7 @@ bool isRejectedFor(std::optional<std::int32_t> cause, const Message& message) {
 }
 
 TEST(Rejection, IsToldInTheDomainsOfItsTechnology) {
-  ModemWorld world;
+  ModemWorld world({}, ModemWorld::kPatient);
   auto modem = modemOfRelease(24, 0);
   modem.at(kModem3gpp).at("RegistrationState") = kDenied;
   modem.at(kModem3gpp).at("NetworkRejection") = rejection(11, kOnLte);
@@ -129,7 +129,7 @@ TEST(Rejection, IsToldInTheDomainsOfItsTechnology) {
 }
 
 TEST(Rejection, IsOverOnceThePhoneIsRegistered) {
-  ModemWorld world;
+  ModemWorld world({}, ModemWorld::kPatient);
   auto modem = modemOfRelease(24);
   modem.at(kModem3gpp).at("RegistrationState") = kDenied;
   modem.at(kModem3gpp).at("NetworkRejection") = rejection(22, 0);
@@ -165,7 +165,7 @@ bool waitForApns(const ModemWorld& world, const std::vector<std::string>& apns) 
 }
 
 TEST(FirstConnectionOfLte, IsToldAsTheNetworkGaveIt) {
-  ModemWorld world;
+  ModemWorld world({}, ModemWorld::kPatient);
   world.manager->add(kInitialBearerPath,
                      bearerWith({{"apn", text("given.test")}, {"ip-type", number(4)}}));
   world.manager->add(kModemPath, modemWithInitialBearer());
@@ -179,7 +179,7 @@ TEST(FirstConnectionOfLte, IsToldAsTheNetworkGaveIt) {
 }
 
 TEST(FirstConnectionOfLte, IsToldAsItWasAskedForWhereItSaysNothing) {
-  ModemWorld world;
+  ModemWorld world({}, ModemWorld::kPatient);
   world.manager->add(kInitialBearerPath, bearerWith({}));
   world.manager->add(kModemPath, modemWithInitialBearer());
   world.start();
@@ -190,7 +190,7 @@ TEST(FirstConnectionOfLte, IsToldAsItWasAskedForWhereItSaysNothing) {
 
 TEST(FirstConnectionOfLte, IsToldOnceWhereAProgramUsesItToo) {
   for (const char* apn : {"GIVEN.test", "other.test"}) {
-    ModemWorld world;
+    ModemWorld world({}, ModemWorld::kPatient);
     auto modem = modemWithInitialBearer();
     modem.at(kModem).at("Bearers") = std::vector<sdbus::ObjectPath>{sdbus::ObjectPath(kBearerPath)};
     world.manager->add(kInitialBearerPath, bearerWith({{"apn", text("given.test")}}));
@@ -219,7 +219,7 @@ std::map<std::uint32_t, Bytes> filesIn(const ModemWorld& world) {
 }
 
 TEST(Card, HasFilesForWhatIsKnownOfIt) {
-  ModemWorld world;
+  ModemWorld world({}, ModemWorld::kPatient);
   auto modem = modemOfRelease(20);
   modem.at(kModem).at("Sim") = sdbus::ObjectPath(kSimPath);
   world.manager->add(kSimPath, kFullSim);
@@ -236,7 +236,7 @@ TEST(Card, HasFilesForWhatIsKnownOfIt) {
 
 TEST(Card, HasNoFileWithANameThatItCannotHold) {
   for (const char* name : {"", "Seventeen letters", "Caf\xC3\xA9", "a_b", "$"}) {
-    ModemWorld world;
+    ModemWorld world({}, ModemWorld::kPatient);
     auto modem = modemOfRelease(20);
     modem.at(kModem).at("Sim") = sdbus::ObjectPath(kSimPath);
     auto sim = kFullSim;
@@ -253,7 +253,7 @@ TEST(Card, HasNoFileWithANameThatItCannotHold) {
 }
 
 TEST(Card, InThePrimarySlotIsReadWhereNoneIsNamed) {
-  ModemWorld world;
+  ModemWorld world({}, ModemWorld::kPatient);
   auto modem = modemOfRelease(18);
   modem.at(kModem).at("SimSlots") =
       std::vector<sdbus::ObjectPath>{sdbus::ObjectPath("/"), sdbus::ObjectPath(kSimPath)};
@@ -273,7 +273,7 @@ TEST(GsmBand, IsThatOfTheCountryWhereANumberStandsForTwo) {
   const std::pair<const char*, std::optional<std::int32_t>> countries[] = {
       {"26201", kGsmDcs1800}, {"310410", kGsmPcs1900}, {"72405", std::nullopt}};
   for (const auto& [network, band] : countries) {
-    ModemWorld world;
+    ModemWorld world({}, ModemWorld::kPatient);
     auto modem = modemOfRelease(20, kOnGsm);
     modem.at(kModem3gpp).at("OperatorCode") = std::string(network);
     world.manager->setCells(
@@ -295,7 +295,7 @@ FakeInterfaces modemThatReports(double rsrpDbm) {
 }
 
 TEST(SignalReports, TakeThePlaceOfMeasuringEveryFewSeconds) {
-  ModemWorld world;
+  ModemWorld world({}, ModemWorld::kPatient);
   world.manager->add(kModemPath, modemThatReports(-80));
   world.start();
   ASSERT_TRUE(world.log->waitForCount(metric::kLteRsrpRsrqSinr, 6));
@@ -309,7 +309,7 @@ TEST(SignalReports, ThatAreRefusedLeaveItMeasured) {
   CapturedSystemLog log;
   for (const char* error : {"org.freedesktop.ModemManager1.Error.Core.Unsupported",
                             "org.freedesktop.DBus.Error.AccessDenied"}) {
-    ModemWorld world;
+    ModemWorld world({}, ModemWorld::kPatient);
     world.manager->answer("SetupThresholds", {FakeAnswer::Kind::error, error});
     world.manager->add(kModemPath, modemThatReports(-80));
     world.start();
@@ -321,7 +321,7 @@ TEST(SignalReports, ThatAreRefusedLeaveItMeasured) {
 }
 
 TEST(SignalReports, ThatDoNotComeLeaveItMeasured) {
-  ModemWorld world;
+  ModemWorld world({}, ModemWorld::kPatient);
   world.manager->add(kModemPath, modemOfRelease(20));
   world.start();
   EXPECT_TRUE(becomesTrue([&] { return world.manager->ratesAskedFor().size() == 1; }));

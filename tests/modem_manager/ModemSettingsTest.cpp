@@ -149,7 +149,7 @@ TEST(PlaceOfCell, ThatAnotherProgramHasSwitchedSinceIsLeftAlone) {
 
 // The end of another service that had switched it on as well switched it off for this one too.
 TEST(PlaceOfCell, IsSwitchedOnAgainWhenItWasPutBackOnceAndNotASecondTime) {
-  ModemWorld world;
+  ModemWorld world({}, ModemWorld::kPatient);
   world.manager->answer("GetCellInfo", kUnsupported);
   world.manager->setPlace("001,01,0,D30156,3E9");
   world.manager->add(kModemPath, modemWithPlaces(kGps));

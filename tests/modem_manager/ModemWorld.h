@@ -146,6 +146,10 @@ class ModemWorld {
   static constexpr service::ModemTiming kShort{std::chrono::milliseconds(100),
                                                std::chrono::milliseconds(500)};
 
+  // For what no call that takes long may disturb, however busy the machine is.
+  static constexpr service::ModemTiming kPatient{std::chrono::milliseconds(100),
+                                                 std::chrono::seconds(30)};
+
   explicit ModemWorld(service::ModemWish wish = {}, service::ModemTiming timing = kShort)
       : manager(std::make_unique<FakeModemManager>(bus.address())),
         log(std::make_shared<MetricLog>()),

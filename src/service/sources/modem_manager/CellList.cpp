@@ -14,7 +14,7 @@ constexpr std::size_t kMostCells = 256;
 }  // namespace
 
 // Cell by cell: a dictionary as the bus library holds it is a hundred times what is kept of it.
-std::vector<CellReading> cellsIn(sdbus::MethodReply& reply) {
+std::vector<CellReading> cellsIn(sdbus::Message& reply) {
   std::vector<CellReading> serving;
   std::vector<CellReading> others;
   reply.enterContainer("a{sv}");

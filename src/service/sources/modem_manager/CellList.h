@@ -11,6 +11,6 @@ namespace qel::service {
 
 // The cells of technologies that metrics are for, the serving ones first; at most 256 of them.
 // Throws sdbus::Error when the reply is of another type.
-std::vector<CellReading> cellsIn(sdbus::MethodReply& reply);
+std::vector<CellReading> cellsIn(sdbus::Message& reply);
 
 }  // namespace qel::service
