@@ -76,6 +76,10 @@ void BusLink::beginToRegister() {
 void BusLink::registered(const sdbus::Error* error, const sdbus::UnixFd& stream) {
   _registering = false;
   if (error) return failed(*error);
+  if (!stream.isValid()) {
+    detach(kRefused);
+    return tryAgainLater(kLongestPause);
+  }
   _stream = stream;
   _attachedAt = Clock::now();
   if (_deliver) askForDelivery();
