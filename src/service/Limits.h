@@ -6,14 +6,14 @@
 
 namespace qel::service::limits {
 
-// One configuration. That of the viewer has 33 metrics in 400 bytes.
-inline constexpr std::size_t kPayloadBytes = 16 * 1024;
-inline constexpr std::size_t kConfigurationEntries = 1024;  // metrics and triggers together
+// One configuration. That of the viewer has 270 bytes.
+inline constexpr std::size_t kPayloadBytes = 4096;
+inline constexpr std::size_t kConfigurationEntries = 512;  // metrics and triggers together
 
 // All configurations that are installed.
 inline constexpr std::size_t kApplicationsOfOneClient = 8;
 inline constexpr std::size_t kApplications = 64;
-inline constexpr std::size_t kAllPayloadBytes = 256 * 1024;
+inline constexpr std::size_t kAllPayloadBytes = 128 * 1024;
 
 // Clients whose application is remembered, by name.
 inline constexpr std::size_t kRememberedClients = 256;

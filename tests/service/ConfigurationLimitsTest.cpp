@@ -74,7 +74,7 @@ class ConfigurationLimitsTest : public ::testing::Test {
 TEST_F(ConfigurationLimitsTest, ALargePayloadIsRefusedUnread) {
   expectRefused(install(*session, 2, Bytes(limits::kPayloadBytes + 1, 0xFF)),
                 CommandCode::configurationTooLarge,
-                "kKeyPayload has 16385 bytes, at most 16384 are taken");
+                "kKeyPayload has 4097 bytes, at most 4096 are taken");
   expectRefused(install(*session, 2, triggers(500'000)), CommandCode::configurationTooLarge,
                 "kKeyPayload has ");
   EXPECT_TRUE(core->configurationSizes().empty());
@@ -84,7 +84,7 @@ TEST_F(ConfigurationLimitsTest, AsManyEntriesAsAreStatedAreTakenAndNoMore) {
   EXPECT_EQ(install(*session, 2, triggers(limits::kConfigurationEntries)).code, 0);
   expectRefused(install(*session, 2, triggers(limits::kConfigurationEntries + 1)),
                 CommandCode::configurationTooLarge,
-                "kKeyPayload has 1025 entries, at most 1024 are taken");
+                "kKeyPayload has 513 entries, at most 512 are taken");
 }
 
 TEST_F(ConfigurationLimitsTest, ARefusedConfigurationLeavesTheOneBeforeInPlace) {
@@ -107,7 +107,7 @@ TEST_F(ConfigurationLimitsTest, AllClientsTogetherHaveSixtyFourApplications) {
   fill();
   expectRefused(install(*session, 2, small), CommandCode::tooManyConfigurations,
                 "kKeyAppID 2 finds no room: configurations of at most 64 applications and "
-                "262144 bytes are kept");
+                "131072 bytes are kept");
   EXPECT_EQ(core->configurationSizes().size(), limits::kApplications);
 }
 
@@ -115,14 +115,14 @@ TEST_F(ConfigurationLimitsTest, AllPayloadsTogetherAreBound) {
   std::size_t installed = 0;
   for (int number = 0; number < 8; ++number) {
     const auto one = open("client " + std::to_string(number));
-    for (int i = 0; i < 4; ++i) {
-      const Bytes payload = triggers(1024, 0xFFFFFFFF);  // 8 bytes each
-      if (install(*one, number * 4 + i, payload).code == 0) installed += payload.size();
+    for (int i = 0; i < 8; ++i) {
+      const Bytes payload = triggers(500, 0xFFFFFFFF);  // 8 bytes each
+      if (install(*one, number * 8 + i, payload).code == 0) installed += payload.size();
     }
   }
   EXPECT_LE(installed, limits::kAllPayloadBytes);
   EXPECT_GT(installed, limits::kAllPayloadBytes - limits::kPayloadBytes);
-  expectRefused(install(*session, 99, triggers(1024, 0xFFFFFFFF)),
+  expectRefused(install(*session, 99, triggers(500, 0xFFFFFFFF)),
                 CommandCode::tooManyConfigurations, "finds no room");
 }
 

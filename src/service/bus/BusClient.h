@@ -13,10 +13,10 @@ namespace qel::service {
 // Belongs to the thread of the bus front; its session's events come on others.
 class BusClient {
  public:
-  // Opens a session whose events go into a new socket. `backlogBegins` as for EventStream. Throws
-  // sdbus::Error when no socket can be made.
+  // Opens a session whose events go into a new socket. `backlogBegins` and `backlogs` as for
+  // EventStream. Throws sdbus::Error when no socket can be made.
   BusClient(std::shared_ptr<ServiceCore> core, const std::string& clientName,
-            std::function<void()> backlogBegins);
+            std::function<void()> backlogBegins, std::shared_ptr<Backlogs> backlogs);
   ~BusClient();
   BusClient(const BusClient&) = delete;
   BusClient& operator=(const BusClient&) = delete;
@@ -26,9 +26,6 @@ class BusClient {
 
   Session& session() { return *_session; }
   EventStream& stream() { return *_stream; }
-
-  // Held for as long as the caller's bus connection is watched.
-  sdbus::Slot vanishWatch;
 
  private:
   const std::shared_ptr<ServiceCore> _core;

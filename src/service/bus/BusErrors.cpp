@@ -1,18 +1,21 @@
 #include "service/bus/BusErrors.h"
 
-#include <string>
-
 namespace qel::service {
 namespace {
 
-sdbus::Error error(const char* name, const char* message) {
+sdbus::Error error(const char* name, const std::string& message) {
   return sdbus::Error(std::string("tesk.BasebandManager1.Error.") + name, message);
 }
 
 }  // namespace
 
 sdbus::Error notRegistered() { return error("NotRegistered", "call Register first"); }
-sdbus::Error invalidName() { return error("InvalidName", "the client name is empty"); }
+sdbus::Error invalidName(const std::string& fault) { return error("InvalidName", fault); }
 sdbus::Error tooManyClients() { return error("TooManyClients", "too many clients"); }
+
+sdbus::Error tooManyCalls() {
+  return sdbus::Error("org.freedesktop.DBus.Error.LimitsExceeded",
+                      "too many calls of this caller are waiting");
+}
 
 }  // namespace qel::service

@@ -3,8 +3,11 @@
 #include <poll.h>
 
 #include <algorithm>
+#include <utility>
 
 #include "service/bus/BusErrors.h"
+#include "service/bus/CallLimits.h"
+#include "tesk/Constants.h"
 #include "tesk/bus/MessageConversion.h"
 
 namespace qel::service {
@@ -14,59 +17,114 @@ using namespace std::chrono_literals;
 using SteadyClock = std::chrono::steady_clock;
 
 constexpr auto kCountersEvery = 5s;
+constexpr auto kTaking = 8ms;
+constexpr auto kAnswering = 4ms;
 constexpr std::size_t kMostClients = 64;
+
+constexpr const char* kOwnerLost =
+    "type='signal',sender='org.freedesktop.DBus',interface='org.freedesktop.DBus',"
+    "member='NameOwnerChanged',arg2=''";
+
+int millisecondsUntil(SteadyClock::time_point moment) {
+  const auto now = SteadyClock::now();
+  if (moment <= now) return 0;
+  return static_cast<int>(std::chrono::ceil<std::chrono::milliseconds>(moment - now).count());
+}
+
+// Nobody waits for an answer that cannot be sent.
+void answerWith(const sdbus::MethodCall& call, const sdbus::Error& error) {
+  try {
+    call.createErrorReply(error).send();
+  } catch (const sdbus::Error&) {
+  }
+}
+
+void answerWith(const sdbus::MethodCall& call, const tesk::CommandResult& result) {
+  auto reply = call.createReply();
+  reply << result.code << result.message << tesk::bus::VariantMap();
+  reply.send();
+}
 
 }  // namespace
 
 BusFront::BusFront(sdbus::IConnection& connection, std::shared_ptr<ServiceCore> core)
-    : AdaptorInterfaces(connection, tesk::bus::kObjectPath),
+    : FrontObject{{sdbus::createObject(connection, tesk::bus::kObjectPath),
+                   [this](const std::string& method, const sdbus::MethodCall& call,
+                          const sdbus::method_callback& answer) {
+                     arrived(method, call, answer);
+                   }}},
+      BasebandManager1_adaptor(FrontObject::object),
       _connection(connection),
       _core(std::move(core)) {
-  registerAdaptor();
+  // One watch for all clients: to ask for one would wait for the bus, and so would all callers.
+  _ownerWatch =
+      _connection.addMatch(kOwnerLost, [this](sdbus::Message& signal) { noteOwnerChange(signal); });
+  _filter.emplace(object, [this](std::string_view caller) {
+    _isRead = _reads.allows(caller);
+    return _isRead;
+  });
+  object.finishRegistration();
   _connection.requestName(tesk::bus::kServiceName);
 }
 
 BusFront::~BusFront() {
   _clients.clear();
-  unregisterAdaptor();
+  object.unregister();
 }
 
-std::string BusFront::caller() const {
-  return getObject().getCurrentlyProcessedMessage()->getSender();
+void BusFront::arrived(const std::string& method, const sdbus::MethodCall& call,
+                       const sdbus::method_callback& answer) {
+  const std::string caller = call.getSender();
+  if (_calls.isFullFor(caller)) throw tooManyCalls();
+  sdbus::MethodCall looked = call;
+  if (method == "Register") {
+    const std::string fault = faultOfRegister(looked);
+    if (!fault.empty()) throw invalidName(fault);
+  }
+  if (method == "PerformCommand") {
+    const auto refused = refusedRequest(looked);
+    if (refused) return answerWith(call, *refused);
+  }
+  _calls.add(caller, {[this, call, answer] { answerCall(call, answer); },
+                      [call] { answerWith(call, tooManyCalls()); }});
+}
+
+void BusFront::answerCall(const sdbus::MethodCall& call, const sdbus::method_callback& answer) {
+  _caller = call.getSender();
+  try {
+    answer(call);
+  } catch (const sdbus::Error& error) {
+    answerWith(call, error);
+  }
+  _status.reset();
 }
 
 BusClient& BusFront::callingClient() {
-  const auto found = _clients.find(caller());
+  const auto found = _clients.find(_caller);
   if (found == _clients.end()) throw notRegistered();
   return *found->second;
 }
 
 sdbus::UnixFd BusFront::Register(const std::string& clientName) {
-  const std::string busName = caller();
-  if (clientName.empty()) throw invalidName();
-  forget(busName);
+  forget(_caller);
   if (_clients.size() >= kMostClients) throw tooManyClients();
-  auto client =
-      std::make_unique<BusClient>(_core, clientName, [wakeUp = _wakeUp] { wakeUp->signal(); });
-  client->vanishWatch = _connection.addMatch(
-      "type='signal',sender='org.freedesktop.DBus',interface='org.freedesktop.DBus',"
-      "member='NameOwnerChanged',arg0='" +
-          busName + "'",
-      [this, busName](sdbus::Message&) { _vanished.push_back(busName); });
+  auto client = std::make_unique<BusClient>(
+      _core, clientName, [wakeUp = _wakeUp] { wakeUp->signal(); }, _backlogs);
   sdbus::UnixFd clientEnd = client->takeClientEnd();
-  _clients.emplace(busName, std::move(client));
-  changed({"Clients"});
+  _clients.emplace(_caller, std::move(client));
+  _changed.note({"Clients"});
   return clientEnd;
 }
 
 void BusFront::SetDelivery(const bool& on) {
   Session& session = callingClient().session();
+  if (session.status().eventsOn == on) return;
   if (on) {
     _core->eventsOn(session);
   } else {
     _core->eventsOff(session);
   }
-  changed({"Clients", "SourceRunning"});
+  _changed.note({"Clients", "SourceRunning"});
 }
 
 std::tuple<std::int32_t, std::string, std::map<std::string, sdbus::Variant>>
@@ -74,8 +132,16 @@ BusFront::PerformCommand(const std::string& command,
                          const std::map<std::string, sdbus::Variant>& request) {
   Session& session = callingClient().session();
   auto result = _core->performCommand(session, command, tesk::bus::fromVariants(request));
-  changed({"Configurations"});
+  if (result.code == 0 && command != tesk::kCommandQueryMetric) _changed.note({"Configurations"});
   return {result.code, std::move(result.message), {}};
+}
+
+void BusFront::noteOwnerChange(sdbus::Message& signal) {
+  std::string name;
+  signal >> name;
+  if (!name.starts_with(':')) return;
+  _calls.forget(name);
+  _vanished.push_back(std::move(name));
 }
 
 void BusFront::forget(const std::string& busName) {
@@ -83,22 +149,33 @@ void BusFront::forget(const std::string& busName) {
   if (found == _clients.end()) return;
   _droppedOfGone += found->second->stream().dropped();
   _clients.erase(found);
-  changed({"Clients", "SourceRunning"});
+  _changed.note({"Clients", "SourceRunning"});
+}
+
+bool BusFront::isBusBehind() const {
+  return (_connection.getEventLoopPollData().events & POLLOUT) != 0;
 }
 
 int BusFront::pollTimeout(const sdbus::IConnection::PollData& bus) const {
-  const int timeout = bus.getPollTimeout();
-  if (counted() == _signalled) return timeout;
-  const auto due = _signalledAt + kCountersEvery - SteadyClock::now();
-  const auto left = std::chrono::ceil<std::chrono::milliseconds>(due).count();
-  const int wait = std::max(0, static_cast<int>(left));
-  return timeout < 0 ? wait : std::min(timeout, wait);
+  const bool isBehind = (bus.events & POLLOUT) != 0;
+  int timeout = bus.getPollTimeout();
+  if (isBehind) return timeout;
+  if (!_calls.empty()) return 0;
+  const auto atMost = [&timeout](int wait) {
+    timeout = timeout < 0 ? wait : std::min(timeout, wait);
+  };
+  if (const auto due = _changed.due()) atMost(millisecondsUntil(*due));
+  if (counted() != _noted) atMost(millisecondsUntil(_notedAt + kCountersEvery));
+  return timeout;
 }
 
 void BusFront::waitAndProcess(int stopDescriptor) {
+  _status.reset();
   const auto bus = _connection.getEventLoopPollData();
+  const bool isBehind = (bus.events & POLLOUT) != 0;
+  const short busEvents = isBehind ? short{POLLOUT} : bus.events;
   std::vector<pollfd> waited = {
-      {bus.fd, bus.events, 0}, {stopDescriptor, POLLIN, 0}, {_wakeUp->descriptor(), POLLIN, 0}};
+      {bus.fd, busEvents, 0}, {stopDescriptor, POLLIN, 0}, {_wakeUp->descriptor(), POLLIN, 0}};
   const std::size_t fixed = waited.size();
   for (const auto& [busName, client] : _clients) {
     waited.push_back({client->stream().descriptor(), client->stream().pollEvents(), 0});
@@ -108,10 +185,26 @@ void BusFront::waitAndProcess(int stopDescriptor) {
   std::vector<short> happened;
   for (std::size_t i = fixed; i < waited.size(); ++i) happened.push_back(waited[i].revents);
   serveStreams(happened);
-  while (_connection.processPendingRequest()) {
-  }
+  if (!isBehind || waited.front().revents != 0) takeCalls();
   for (const std::string& busName : std::exchange(_vanished, {})) forget(busName);
-  if (SteadyClock::now() - _signalledAt >= kCountersEvery) signalCounters();
+  answerCalls();
+  signalChanges();
+}
+
+void BusFront::takeCalls() {
+  _reads.nextTurn();
+  auto now = SteadyClock::now();
+  const auto end = now + kTaking;
+  while (_connection.processPendingRequest()) {
+    const auto before = std::exchange(now, SteadyClock::now());
+    if (std::exchange(_isRead, false)) _reads.spend(now - before);
+    if (now >= end || isBusBehind()) return;
+  }
+}
+
+void BusFront::answerCalls() {
+  const auto end = SteadyClock::now() + kAnswering;
+  while (!_calls.empty() && !isBusBehind() && SteadyClock::now() < end) _calls.answerNext();
 }
 
 // In the order of the clients. A client never writes: what can be read is the end of its socket.
@@ -127,31 +220,12 @@ void BusFront::serveStreams(const std::vector<short>& happened) {
   }
 }
 
-void BusFront::changed(const std::vector<std::string>& properties) {
-  getObject().emitPropertiesChangedSignal(INTERFACE_NAME, properties);
-}
-
-BusFront::Counted BusFront::counted() const {
-  const CoreStatus status = _core->status();
-  std::uint64_t dropped = _droppedOfGone;
-  for (const auto& [busName, client] : _clients) dropped += client->stream().dropped();
-  return {status.received, status.delivered, dropped, status.undecodable, status.withoutContent};
-}
-
-void BusFront::signalCounters() {
-  const Counted now = counted();
-  if (now == _signalled) return;
-  std::vector<std::string> properties;
-  if (now.received != _signalled.received) properties.emplace_back("EventsReceived");
-  if (now.delivered != _signalled.delivered) properties.emplace_back("EventsDelivered");
-  if (now.dropped != _signalled.dropped) properties.emplace_back("EventsDropped");
-  if (now.undecodable != _signalled.undecodable) properties.emplace_back("EventsUndecodable");
-  if (now.withoutContent != _signalled.withoutContent) {
-    properties.emplace_back("EventsWithoutContent");
-  }
-  _signalled = now;
-  _signalledAt = SteadyClock::now();
-  changed(properties);
+// What the counters say changes all the time and is told now and then.
+void BusFront::signalChanges() {
+  if (SteadyClock::now() - _notedAt >= kCountersEvery) noteCounters();
+  if (isBusBehind()) return;
+  const auto names = _changed.take(SteadyClock::now());
+  if (!names.empty()) object.emitPropertiesChangedSignal(INTERFACE_NAME, names);
 }
 
 }  // namespace qel::service

@@ -6,31 +6,49 @@
 #include <cstdint>
 #include <map>
 #include <memory>
+#include <optional>
 #include <string>
 #include <vector>
 
 #include "service/ServiceCore.h"
 #include "service/bus/BusClient.h"
+#include "service/bus/CallFilter.h"
+#include "service/bus/CallQueue.h"
+#include "service/bus/ChangedProperties.h"
+#include "service/bus/QueuedObject.h"
+#include "service/bus/ReadBudget.h"
 #include "tesk/bus/BasebandManager1Adaptor.h"
 #include "tesk/bus/BusAddress.h"
 #include "tesk/bus/WakeUp.h"
 
 namespace qel::service {
 
+// The object on the bus, there before the adaptor that registers itself with it.
+struct FrontObject {
+  QueuedObject object;
+};
+
 // Belongs to one thread. Lives as long as the bus connection: every call may throw sdbus::Error
 // when that is lost, and with the front go all its clients.
-class BusFront final : public sdbus::AdaptorInterfaces<tesk::BasebandManager1_adaptor> {
+//
+// No caller can keep others waiting for long. Calls are taken off the bus quickly, looked at, and
+// wait here; then callers are answered in turn. Either goes on for a few milliseconds before
+// streams, signals and the stop descriptor have their turn. When the bus does not take the answers,
+// no more calls are taken.
+class BusFront final : private FrontObject, public tesk::BasebandManager1_adaptor {
  public:
   // Takes the service's name on the connection, which outlives the front. Throws sdbus::Error when
   // somebody else has it or may have it.
   BusFront(sdbus::IConnection& connection, std::shared_ptr<ServiceCore> core);
   ~BusFront();
+  BusFront(const BusFront&) = delete;
+  BusFront& operator=(const BusFront&) = delete;
 
   // Waits for the bus, the clients or `stopDescriptor`, and does what is due.
   void waitAndProcess(int stopDescriptor);
 
  private:
-  // What the counters were when their change was last signalled.
+  // What the counters were when their change was last noted.
   struct Counted {
     std::uint64_t received = 0;
     std::uint64_t delivered = 0;
@@ -56,23 +74,41 @@ class BusFront final : public sdbus::AdaptorInterfaces<tesk::BasebandManager1_ad
   std::uint64_t EventsUndecodable() override;
   std::uint64_t EventsWithoutContent() override;
 
-  std::string caller() const;
+  void arrived(const std::string& method, const sdbus::MethodCall& call,
+               const sdbus::method_callback& answer);
+  void answerCall(const sdbus::MethodCall& call, const sdbus::method_callback& answer);
+  void takeCalls();
+  void answerCalls();
+  bool isBusBehind() const;
+
   BusClient& callingClient();
+  void noteOwnerChange(sdbus::Message& signal);
   void forget(const std::string& busName);
-  void changed(const std::vector<std::string>& properties);
-  Counted counted() const;
-  void signalCounters();
   int pollTimeout(const sdbus::IConnection::PollData& bus) const;
   void serveStreams(const std::vector<short>& happened);
+
+  const CoreStatus& status() const;
+  Counted counted() const;
+  void noteCounters();
+  void signalChanges();
 
   sdbus::IConnection& _connection;
   const std::shared_ptr<ServiceCore> _core;
   const std::shared_ptr<tesk::bus::WakeUp> _wakeUp = std::make_shared<tesk::bus::WakeUp>();
+  const std::shared_ptr<Backlogs> _backlogs = std::make_shared<Backlogs>();
   std::map<std::string, std::unique_ptr<BusClient>> _clients;  // by the caller's bus name
   std::vector<std::string> _vanished;
+  sdbus::Slot _ownerWatch;
+  CallQueue _calls;
+  ReadBudget _reads;
+  bool _isRead = false;  // what is being taken off the bus now is answered at once
+  std::optional<CallFilter> _filter;
+  std::string _caller;  // of the call that is being answered
+  ChangedProperties _changed;
+  mutable std::optional<CoreStatus> _status;  // as of this turn
   std::uint64_t _droppedOfGone = 0;
-  Counted _signalled;
-  std::chrono::steady_clock::time_point _signalledAt;
+  Counted _noted;
+  std::chrono::steady_clock::time_point _notedAt;
 };
 
 }  // namespace qel::service

@@ -4,9 +4,33 @@
 
 namespace qel::service {
 
+const CoreStatus& BusFront::status() const {
+  if (!_status) _status = _core->status();
+  return *_status;
+}
+
+BusFront::Counted BusFront::counted() const {
+  std::uint64_t dropped = _droppedOfGone;
+  for (const auto& [busName, client] : _clients) dropped += client->stream().dropped();
+  const CoreStatus& now = status();
+  return {now.received, now.delivered, dropped, now.undecodable, now.withoutContent};
+}
+
+void BusFront::noteCounters() {
+  const Counted now = counted();
+  if (now == _noted) return;
+  if (now.received != _noted.received) _changed.note({"EventsReceived"});
+  if (now.delivered != _noted.delivered) _changed.note({"EventsDelivered"});
+  if (now.dropped != _noted.dropped) _changed.note({"EventsDropped"});
+  if (now.undecodable != _noted.undecodable) _changed.note({"EventsUndecodable"});
+  if (now.withoutContent != _noted.withoutContent) _changed.note({"EventsWithoutContent"});
+  _noted = now;
+  _notedAt = std::chrono::steady_clock::now();
+}
+
 std::string BusFront::Version() { return QEL_VERSION; }
-std::string BusFront::Source() { return _core->status().source; }
-bool BusFront::SourceRunning() { return _core->status().sourceRunning; }
+std::string BusFront::Source() { return status().source; }
+bool BusFront::SourceRunning() { return status().sourceRunning; }
 
 std::map<std::int64_t, std::uint32_t> BusFront::Configurations() {
   return _core->configurationSizes();

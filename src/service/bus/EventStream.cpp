@@ -5,23 +5,28 @@
 #include <unistd.h>
 
 #include <cerrno>
+#include <utility>
 
 #include "tesk/bus/EventPacket.h"
 
 namespace qel::service {
-namespace {
 
-// What a waiting packet costs beside its bytes.
-constexpr std::size_t kPacketOverhead = 64;
+EventStream::EventStream(int descriptor, std::function<void()> backlogBegins,
+                         std::shared_ptr<Backlogs> backlogs)
+    : _descriptor(descriptor),
+      _backlogBegins(std::move(backlogBegins)),
+      _backlogs(std::move(backlogs)) {
+  const std::lock_guard lock(_backlogs->mutex());
+  _backlogs->add(_backlog);
+}
 
-std::size_t costOf(const Bytes& packet) { return packet.size() + kPacketOverhead; }
-
-}  // namespace
-
-EventStream::EventStream(int descriptor, std::function<void()> backlogBegins)
-    : _descriptor(descriptor), _backlogBegins(std::move(backlogBegins)) {}
-
-EventStream::~EventStream() { ::close(_descriptor); }
+EventStream::~EventStream() {
+  {
+    const std::lock_guard lock(_backlogs->mutex());
+    _backlogs->remove(_backlog);
+  }
+  ::close(_descriptor);
+}
 
 EventStream::Written EventStream::write(ByteView packet) const {
   while (true) {
@@ -37,55 +42,44 @@ void EventStream::send(std::string_view eventName, const tesk::Message& event) {
   auto packet = tesk::bus::encodeEvent(eventName, event);
   bool begins = false;
   {
-    const std::lock_guard lock(_mutex);
+    const std::lock_guard lock(_backlogs->mutex());
     if (_broken) return;
     if (!packet) {
-      ++_dropped;
+      ++_backlog.dropped;
       return;
     }
-    const Written written = _backlog.empty() ? write(*packet) : Written::full;
+    const Written written = _backlog.packets.empty() ? write(*packet) : Written::full;
     if (written == Written::yes) return;
     _broken = written == Written::broken;
-    begins = _broken || _backlog.empty();
-    if (!_broken) keep(std::move(*packet));
+    begins = _broken || _backlog.packets.empty();
+    if (!_broken) _backlogs->push(_backlog, std::move(*packet));
   }
   if (begins) _backlogBegins();
 }
 
-void EventStream::keep(Bytes packet) {
-  _backlogBytes += costOf(packet);
-  _backlog.push_back(std::move(packet));
-  while (_backlogBytes > kLargestBacklog) {
-    _backlogBytes -= costOf(_backlog.front());
-    _backlog.pop_front();
-    ++_dropped;
-  }
-}
-
 short EventStream::pollEvents() const {
-  const std::lock_guard lock(_mutex);
-  return static_cast<short>(POLLIN | (_backlog.empty() ? 0 : POLLOUT));
+  const std::lock_guard lock(_backlogs->mutex());
+  return static_cast<short>(POLLIN | (_backlog.packets.empty() ? 0 : POLLOUT));
 }
 
 void EventStream::flush() {
-  const std::lock_guard lock(_mutex);
-  while (!_backlog.empty() && !_broken) {
-    const Written written = write(_backlog.front());
+  const std::lock_guard lock(_backlogs->mutex());
+  while (!_backlog.packets.empty() && !_broken) {
+    const Written written = write(_backlog.packets.front());
     if (written == Written::full) return;
     _broken = written == Written::broken;
-    _backlogBytes -= costOf(_backlog.front());
-    _backlog.pop_front();
+    _backlogs->pop(_backlog);
   }
 }
 
 bool EventStream::isBroken() const {
-  const std::lock_guard lock(_mutex);
+  const std::lock_guard lock(_backlogs->mutex());
   return _broken;
 }
 
 std::uint64_t EventStream::dropped() const {
-  const std::lock_guard lock(_mutex);
-  return _dropped;
+  const std::lock_guard lock(_backlogs->mutex());
+  return _backlog.dropped;
 }
 
 }  // namespace qel::service

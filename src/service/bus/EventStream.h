@@ -2,26 +2,28 @@
 #pragma once
 
 #include <cstdint>
-#include <deque>
 #include <functional>
-#include <mutex>
+#include <memory>
 #include <string_view>
 
 #include "base/Bytes.h"
+#include "service/bus/Backlogs.h"
 #include "tesk/Message.h"
 
 namespace qel::service {
 
 // Events go straight into the socket while it takes them. When the client does not read, they wait
-// here, at most kLargestBacklog bytes; beyond that the oldest are dropped and counted, never the
-// newest. send may be called from any thread; the rest belongs to the thread that polls.
+// here, at most kLargestBacklog bytes, and less when many clients do not read; beyond that the
+// oldest are dropped and counted. send may be called from any thread; the rest belongs to the
+// thread that polls.
 class EventStream {
  public:
-  static constexpr std::size_t kLargestBacklog = 1024 * 1024;
+  static constexpr std::size_t kLargestBacklog = Backlogs::kLargest;
 
   // Takes the descriptor, which must not block. `backlogBegins` is called, from any thread, when
-  // events begin to wait.
-  EventStream(int descriptor, std::function<void()> backlogBegins);
+  // events begin to wait. Their backlog is one of `backlogs`.
+  EventStream(int descriptor, std::function<void()> backlogBegins,
+              std::shared_ptr<Backlogs> backlogs = std::make_shared<Backlogs>());
   ~EventStream();
   EventStream(const EventStream&) = delete;
   EventStream& operator=(const EventStream&) = delete;
@@ -41,14 +43,11 @@ class EventStream {
  private:
   enum class Written { yes, full, broken };
   Written write(ByteView packet) const;
-  void keep(Bytes packet);
 
   const int _descriptor;
   const std::function<void()> _backlogBegins;
-  mutable std::mutex _mutex;
-  std::deque<Bytes> _backlog;
-  std::size_t _backlogBytes = 0;
-  std::uint64_t _dropped = 0;
+  const std::shared_ptr<Backlogs> _backlogs;  // their lock guards what follows
+  Backlog _backlog;
   bool _broken = false;
 };
 
