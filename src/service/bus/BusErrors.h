@@ -13,7 +13,9 @@ sdbus::Error notRegistered();
 sdbus::Error invalidName(const std::string& fault);
 // tesk.BasebandManager1.Error.TooManyClients: the service is full.
 sdbus::Error tooManyClients();
-// org.freedesktop.DBus.Error.LimitsExceeded: the caller has too many calls waiting.
+// org.freedesktop.DBus.Error.LimitsExceeded: the caller has too many calls waiting, or registers
+// too often.
 sdbus::Error tooManyCalls();
+sdbus::Error tooManyRegistrations();
 
 }  // namespace qel::service

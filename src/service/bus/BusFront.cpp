@@ -20,6 +20,8 @@ constexpr auto kCountersEvery = 5s;
 constexpr auto kTaking = 8ms;
 constexpr auto kAnswering = 4ms;
 constexpr std::size_t kMostClients = 64;
+constexpr int kMostRegistrations = 8;  // of one caller
+constexpr auto kRegistrationsEvery = 10s;
 
 constexpr const char* kOwnerLost =
     "type='signal',sender='org.freedesktop.DBus',interface='org.freedesktop.DBus',"
@@ -59,7 +61,8 @@ BusFront::BusFront(sdbus::IConnection& connection, std::shared_ptr<ServiceCore> 
   // One watch for all clients: to ask for one would wait for the bus, and so would all callers.
   _ownerWatch =
       _connection.addMatch(kOwnerLost, [this](sdbus::Message& signal) { noteOwnerChange(signal); });
-  _filter.emplace(object, [this](std::string_view caller) {
+  _filter.emplace(object, [this](CallFilter::Kind kind, std::string_view caller) {
+    if (kind == CallFilter::Kind::own) return !_calls.isFullFor(caller);
     _isRead = _reads.allows(caller);
     return _isRead;
   });
@@ -75,7 +78,6 @@ BusFront::~BusFront() {
 void BusFront::arrived(const std::string& method, const sdbus::MethodCall& call,
                        const sdbus::method_callback& answer) {
   const std::string caller = call.getSender();
-  if (_calls.isFullFor(caller)) throw tooManyCalls();
   sdbus::MethodCall looked = call;
   if (method == "Register") {
     const std::string fault = faultOfRegister(looked);
@@ -105,7 +107,17 @@ BusClient& BusFront::callingClient() {
   return *found->second;
 }
 
+// The bus daemon holds the sockets that a caller does not fetch, and stops listening to a service
+// that has sent it some dozens of them.
+void BusFront::noteRegistration() {
+  Registrations& registrations = _registrations[_caller];
+  const auto now = SteadyClock::now();
+  if (now - registrations.since >= kRegistrationsEvery) registrations = {now, 0};
+  if (++registrations.count > kMostRegistrations) throw tooManyRegistrations();
+}
+
 sdbus::UnixFd BusFront::Register(const std::string& clientName) {
+  noteRegistration();
   forget(_caller);
   if (_clients.size() >= kMostClients) throw tooManyClients();
   auto client = std::make_unique<BusClient>(
@@ -141,6 +153,7 @@ void BusFront::noteOwnerChange(sdbus::Message& signal) {
   signal >> name;
   if (!name.starts_with(':')) return;
   _calls.forget(name);
+  _registrations.erase(name);
   _vanished.push_back(std::move(name));
 }
 

@@ -82,6 +82,7 @@ class BusFront final : private FrontObject, public tesk::BasebandManager1_adapto
   bool isBusBehind() const;
 
   BusClient& callingClient();
+  void noteRegistration();
   void noteOwnerChange(sdbus::Message& signal);
   void forget(const std::string& busName);
   int pollTimeout(const sdbus::IConnection::PollData& bus) const;
@@ -104,6 +105,11 @@ class BusFront final : private FrontObject, public tesk::BasebandManager1_adapto
   bool _isRead = false;  // what is being taken off the bus now is answered at once
   std::optional<CallFilter> _filter;
   std::string _caller;  // of the call that is being answered
+  struct Registrations {
+    std::chrono::steady_clock::time_point since;
+    int count = 0;
+  };
+  std::map<std::string, Registrations> _registrations;  // of late, by the caller's bus name
   ChangedProperties _changed;
   mutable std::optional<CoreStatus> _status;  // as of this turn
   std::uint64_t _droppedOfGone = 0;

@@ -11,22 +11,25 @@ struct sd_bus_slot;
 
 namespace qel::service {
 
-// Properties, introspection and calls to methods that there are not are answered by the bus library
-// itself, at once: `mayRead` decides whether they are, or refused with LimitsExceeded. Calls of the
-// service's own interface pass. For as long as it is there, which ends before the connection.
+// Whether calls go on or are refused with LimitsExceeded, at little cost, `mayGoOn` decides, for as
+// long as the filter is there, which ends before the connection.
 class CallFilter {
  public:
-  using MayRead = std::function<bool(std::string_view caller)>;
+  enum class Kind {
+    own,             // of a method of the service
+    answeredAtOnce,  // by the bus library: properties, introspection, methods that there are not
+  };
+  using MayGoOn = std::function<bool(Kind kind, std::string_view caller)>;
 
   // `object` is any of the connection.
-  CallFilter(sdbus::IObject& object, MayRead mayRead);
+  CallFilter(sdbus::IObject& object, MayGoOn mayGoOn);
 
  private:
   struct SlotEnd {
     void operator()(sd_bus_slot* slot) const;
   };
 
-  const std::unique_ptr<MayRead> _mayRead;  // does not move
+  const std::unique_ptr<MayGoOn> _mayGoOn;  // does not move
   std::unique_ptr<sd_bus_slot, SlotEnd> _slot;
 };
 

@@ -1,11 +1,14 @@
 #include "service/bus/CallLimits.h"
 
+#include <systemd/sd-bus.h>
+
 #include <cstdint>
 #include <string_view>
 
 #include "service/ClientName.h"
 #include "service/Limits.h"
 #include "service/Request.h"
+#include "service/bus/OpenedMessage.h"
 
 namespace qel::service {
 namespace {
@@ -51,20 +54,15 @@ bool skipNumber(sdbus::Message& message, const std::string& type) {
   return type == "b" && skip<bool>(message);
 }
 
-// Stops at the limit, however many there are.
+// However many there are: the C++ library would go through them one by one.
 Refusal readData(sdbus::Message& message, std::string_view key) {
-  message.enterContainer("y");
+  const void* data = nullptr;
   std::size_t size = 0;
-  std::uint8_t byte = 0;
-  while (size <= limits::kPayloadBytes && (message >> byte)) ++size;
-  if (size > limits::kPayloadBytes) {
-    return refusal(
-        CommandCode::configurationTooLarge,
-        nameOf(key) + " has more than " + std::to_string(limits::kPayloadBytes) + " bytes");
-  }
-  message.clearFlags();
-  message.exitContainer();
-  return std::nullopt;
+  sd_bus_message_read_array(OpenedMessage::within(message), 'y', &data, &size);
+  if (size <= limits::kPayloadBytes) return std::nullopt;
+  return refusal(CommandCode::configurationTooLarge,
+                 nameOf(key) + " has " + std::to_string(size) + " bytes, at most " +
+                     std::to_string(limits::kPayloadBytes) + " are taken");
 }
 
 Refusal readValue(sdbus::Message& message, std::string_view key) {

@@ -5,7 +5,7 @@
 
 namespace qel::service {
 
-bool CallQueue::isFullFor(const std::string& caller) const {
+bool CallQueue::isFullFor(std::string_view caller) const {
   const auto found = _waiting.find(caller);
   return found != _waiting.end() && found->second.size() >= kMostOfOneCaller;
 }

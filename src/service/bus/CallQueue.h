@@ -6,6 +6,7 @@
 #include <functional>
 #include <map>
 #include <string>
+#include <string_view>
 
 namespace qel::service {
 
@@ -25,7 +26,7 @@ class CallQueue {
   // Refuses the call of a caller that has kMostOfOneCaller waiting, and beyond kMost calls the
   // newest of the caller that has most waiting.
   void add(const std::string& caller, WaitingCall call);
-  bool isFullFor(const std::string& caller) const;
+  bool isFullFor(std::string_view caller) const;
 
   bool empty() const { return _turns.empty(); }
   std::size_t size() const { return _size; }
@@ -38,8 +39,8 @@ class CallQueue {
  private:
   void refuseNewestOfMost();
 
-  std::map<std::string, std::deque<WaitingCall>> _waiting;  // none is empty
-  std::deque<std::string> _turns;                           // the callers, each once
+  std::map<std::string, std::deque<WaitingCall>, std::less<>> _waiting;  // none is empty
+  std::deque<std::string> _turns;                                        // the callers, each once
   std::size_t _size = 0;
 };
 
