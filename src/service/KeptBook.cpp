@@ -13,6 +13,8 @@
 namespace qel::service {
 namespace {
 
+using When = StateSaver::When;
+
 // How old the time of a client's last use may be in the state that is written.
 constexpr std::uint64_t kUseEveryMs = 60ULL * 60 * 1000;
 
@@ -57,11 +59,11 @@ KeptBook::KeptBook(std::unique_ptr<StateKeeper> keeper, ConfigurationStore& stor
     return _state;
   };
   _saver = std::make_unique<StateSaver>(std::move(keeper), state, waitClock);
-  if (!asKept) save();
+  if (!asKept) save(When::withinASecond);
 }
 
-void KeptBook::save() {
-  if (_saver) _saver->changed();
+void KeptBook::save(StateSaver::When when) {
+  if (_saver) _saver->changed(when);
 }
 
 bool KeptBook::restore() {
@@ -122,7 +124,7 @@ void KeptBook::note(std::string_view client, std::int64_t application) {
     const std::lock_guard lock(_mutex);
     if (!noteLocked(client, application)) return;
   }
-  save();
+  save(When::withinASecond);
 }
 
 // Whether that is worth writing down.
@@ -217,7 +219,7 @@ std::optional<tesk::CommandResult> KeptBook::install(std::string_view client,
     kept = std::move(installed);
     if (!changed) return std::nullopt;
   }
-  save();
+  save(When::now);
   return std::nullopt;
 }
 
@@ -228,7 +230,7 @@ void KeptBook::clear(std::string_view client, std::int64_t application) {
     const bool erased = _state.configurations.erase(application) > 0;
     if (!noteLocked(client, application) && !erased) return;
   }
-  save();
+  save(When::withinASecond);
 }
 
 }  // namespace qel::service

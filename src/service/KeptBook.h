@@ -51,7 +51,7 @@ class KeptBook {
   std::optional<tesk::CommandResult> makeRoom(std::string_view client, std::int64_t application,
                                               std::size_t bytes);
 
-  void save();
+  void save(StateSaver::When when);
 
   ConfigurationStore& _store;
   const Clock& _clock;

@@ -21,21 +21,40 @@ StateSaver::StateSaver(std::unique_ptr<StateKeeper> keeper, std::function<KeptSt
 
 StateSaver::~StateSaver() = default;
 
-void StateSaver::changed() {
+void StateSaver::changed(When when) {
   std::unique_lock lock(_mutex);
   const std::uint64_t change = ++_changes;
+  if (when == When::now) {
+    _isUrgent = true;
+    _dozing.request_stop();
+  }
   _moved.notify_all();
+  if (when != When::now) return;
   _moved.wait_for(lock, kPatience, [&] { return _pausing || _written >= change; });
 }
 
+bool StateSaver::waitForChange(const std::stop_token& stop) {
+  std::stop_source dozing;
+  {
+    std::unique_lock lock(_mutex);
+    const bool hasPaused = std::exchange(_pausing, false);
+    if (hasPaused && _changes != _written) return true;
+    if (!_moved.wait(lock, stop, [&] { return _changes != _written; })) return false;
+    if (_isUrgent) return true;
+    _dozing = dozing;
+  }
+  const std::stop_callback atTheEnd(stop, [&dozing] { dozing.request_stop(); });
+  _clock.waitUntilMs(_clock.nowMs() + kPauseMs, dozing.get_token());
+  return true;
+}
+
 void StateSaver::run(const std::stop_token& stop) {
-  while (true) {
+  while (waitForChange(stop)) {
     std::uint64_t writing = 0;
     {
-      std::unique_lock lock(_mutex);
-      _pausing = false;
-      if (!_moved.wait(lock, stop, [&] { return _changes != _written; })) return;
+      const std::lock_guard lock(_mutex);
       writing = _changes;
+      _isUrgent = false;
     }
     _keeper->save(_state());
     {

@@ -20,6 +20,10 @@ class StateSaverTest : public ::testing::Test {
     ++number;
     saver->changed();
   }
+  void changeAtLeisure() {
+    ++number;
+    saver->changed(StateSaver::When::withinASecond);
+  }
   // The numbers of the states that were written.
   std::vector<std::int64_t> written() const {
     std::vector<std::int64_t> numbers;
@@ -79,6 +83,30 @@ TEST_F(StateSaverTest, WritesAtOnceAgainAfterAQuietSecond) {
   change();
   ASSERT_TRUE(saved->waitFor(2));
   EXPECT_EQ(written().back(), 2);
+}
+
+TEST_F(StateSaverTest, WritesAChangeThatCanWaitWithinASecond) {
+  changeAtLeisure();
+  ASSERT_TRUE(clock.waitForWaits(1));
+  EXPECT_TRUE(saved->all().empty());
+  clock.advance(StateSaver::kPauseMs);
+  ASSERT_TRUE(saved->waitFor(1));
+}
+
+// A viewer clears its configuration and installs it again at once.
+TEST_F(StateSaverTest, WritesAChangeThatCanWaitWithTheNextThatCannot) {
+  changeAtLeisure();
+  ASSERT_TRUE(clock.waitForWaits(1));
+  change();
+  ASSERT_TRUE(saved->waitFor(1));
+  EXPECT_EQ(written(), (std::vector<std::int64_t>{2}));
+}
+
+TEST_F(StateSaverTest, WritesAtTheEndWhatCouldWait) {
+  changeAtLeisure();
+  ASSERT_TRUE(clock.waitForWaits(1));
+  saver.reset();
+  EXPECT_EQ(written(), (std::vector<std::int64_t>{1}));
 }
 
 }  // namespace
