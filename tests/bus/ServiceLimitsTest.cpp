@@ -100,7 +100,7 @@ TEST_F(ServiceLimits, ALongClientNameIsRefused) {
     EXPECT_EQ(errorOf([&] { caller.Register(std::string(8'000'000, 'n')); }), invalid);
   }
   EXPECT_EQ(errorOf([&] { caller.Register("a\x1B[31m"); }), invalid);
-  EXPECT_EQ(errorOf([&] { caller.Register(std::string(64, 'n')); }), "no error");
+  const auto events = caller.Register(std::string(64, 'n'));
   EXPECT_EQ(caller.Clients().size(), 1U);
 }
 
