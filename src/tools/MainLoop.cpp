@@ -29,8 +29,9 @@ class MainLoop::AnswerWait final : public tesk::bus::AnswerWait {
   explicit AnswerWait(MainLoop& loop) : _loop(loop) {}
 
   void wait() override {
-    const auto end = Clock::now() + kPatience;
-    while (!_woken && !_loop.isStopping() && Clock::now() < end) {
+    const bool isEnding = _loop.isStopping();  // this command belongs to a proper end
+    const auto end = Clock::now() + (isEnding ? kPatienceAtTheEnd : kPatience);
+    while (!_woken && isEnding == _loop.isStopping() && Clock::now() < end) {
       pollfd waited{_loop._signals.wakeUp().descriptor(), POLLIN, 0};
       ::poll(&waited, 1, waitUntil(end));
       _loop._signals.wakeUp().clear();
@@ -45,6 +46,7 @@ class MainLoop::AnswerWait final : public tesk::bus::AnswerWait {
 
  private:
   static constexpr std::chrono::seconds kPatience{5};
+  static constexpr std::chrono::seconds kPatienceAtTheEnd{1};
 
   MainLoop& _loop;
   std::atomic<bool> _woken = false;
