@@ -33,7 +33,7 @@ Cursor readNumbered(Target& target, Cursor cursor, std::uint32_t number, std::ui
 //   Cursor take<index>(Cursor, field)  reads the value that stands here
 // Where reading stopped, damaged if the bytes are.
 template <class Message, class Target>
-[[gnu::noinline]] Cursor readInAnyOrder(Target& target, Cursor cursor) {
+Cursor readInAnyOrder(Target& target, Cursor cursor) {
   constexpr std::uint8_t kEndOfGroup = 4;
   using Fields = std::make_index_sequence<std::tuple_size_v<decltype(Message::kFields)>>;
   while (!cursor.isAtEnd()) {

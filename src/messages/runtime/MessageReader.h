@@ -117,6 +117,13 @@ struct MessageTarget {
   Message& message;
 };
 
+// Apart from readMessage, which then needs no target in memory.
+template <class Message>
+[[gnu::noinline]] Cursor readRest(Message& message, Cursor cursor) {
+  MessageTarget<Message> target{message};
+  return readInAnyOrder<Message>(target, cursor);
+}
+
 // The order in which fields are written is the one in which nearly all arrive: it is tried first,
 // at the cost of a comparison a field, and says the same as any order does.
 template <class Message>
@@ -124,9 +131,7 @@ Cursor readMessage(Message& message, Cursor cursor) {
   MessageTarget<Message> target{message};
   cursor = readInOrder<Message>(target, cursor);
   if (cursor.isAtEnd()) return cursor;
-  // Another target, so that the first one is not in memory.
-  MessageTarget<Message> rest{message};
-  return readInAnyOrder<Message>(rest, cursor);
+  return readRest(message, cursor);
 }
 
 }  // namespace qel
