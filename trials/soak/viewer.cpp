@@ -44,7 +44,7 @@ class Reader {
  public:
   Reader(Navigation& navigation, int screens, int seconds)
       : _navigation(navigation), _screens(screens) {
-    _timer.setInterval(std::max(1, seconds * 1000 / (2 * screens)));
+    _timer.setInterval(std::max(1, seconds * 800 / (2 * screens)));
     QObject::connect(&_timer, &QTimer::timeout, &_timer, [this] { step(); });
     _timer.start();
   }
