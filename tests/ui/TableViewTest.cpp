@@ -71,6 +71,15 @@ TEST(TableView, withoutFaceAReloadOnlyMarksIt) {
   EXPECT_EQ(told, 1) << "the face that comes back catches up at once";
 }
 
+// Screens that were left kept the text of all their rows: some kilobytes each, for good.
+TEST(TableView, forgetsItsCellsWithItsFace) {
+  TableView table = tableWithPrototype();
+  table.setFace([] {});
+  table.dequeueReusableCellWithIdentifier("Field", {0, 0}).detailTextLabel->text = "-86";
+  table.setFace({});
+  EXPECT_EQ(table.cellForRowAtIndexPath({0, 0}), nullptr);
+}
+
 TEST(TableSnapshot, asksForEverythingOnceAndInOrder) {
   const auto table = testing::makeScreen<testing::FakeTable>();
   table->sections = {{"A", {{"x", "1"}, {"y", "2"}}}, {std::nullopt, {}}, {"C", {{"z", "3"}}}};

@@ -34,6 +34,7 @@ void TableView::reloadData() {
 
 void TableView::setFace(Face face) {
   _face = std::move(face);
+  if (!_face) _cells.clear();
   if (_face && _needsDrawing) _face();
 }
 

@@ -21,7 +21,7 @@ class TableView {
   void registerPrototype(TableViewCell prototype);
 
   // The cell of that row: the one it showed before, else a fresh copy of the prototype. An
-  // identifier without prototype is a fatal error. Valid as long as the table.
+  // identifier without prototype is a fatal error. Valid until the face is taken away.
   TableViewCell& dequeueReusableCellWithIdentifier(std::string_view identifier,
                                                    IndexPath indexPath);
 
@@ -31,8 +31,9 @@ class TableView {
   // Asks for everything to be drawn anew. The face is told once until it has drawn.
   void reloadData();
 
-  // Called when there is something to draw; an empty function takes the face away. A table that
-  // was marked before tells its new face at once.
+  // Called when there is something to draw; an empty function takes the face away, and the cells
+  // with it: a screen that was left may stay for good. A table that was marked before tells its new
+  // face at once.
   void setFace(Face face);
 
   bool needsDrawing() const { return _needsDrawing; }
