@@ -35,13 +35,14 @@ int Source::open(const Options& options) {
   const auto patience = options.selfTest ? std::optional(kPatienceOfASelfTest) : std::nullopt;
   _connector = std::make_shared<ClosingConnector>(tesk::bus::makeBusConnector(
       {options.bus}, _watch->observer(),
-      [patience] { return std::make_shared<EventLoopWait>(patience); }));
+      [patience] { return std::make_shared<EventLoopWait>(patience); }, _condition->observer()));
   tesk::setConnector(_connector);
   return 0;
 }
 
 void Source::showIn(Navigation& navigation) {
   if (_watch) _watch->showIn(navigation);
+  _condition->showIn(navigation);
   const auto& wrapper = navigation.controller().myTeskWrapper;
   wrapper->setLossObserver([window = QPointer(&navigation)](std::uint64_t dropped) {
     if (window) window->setLoss(lossInWords(dropped));
@@ -50,12 +51,14 @@ void Source::showIn(Navigation& navigation) {
 
 int Source::openWithin(const std::string& source) {
   service::SourceError error;
-  auto connector = service::makeInProcessConnector(source, error);
-  if (!connector) {
+  auto core = service::makeServiceCore(source, error);
+  if (!core) {
     complain("qelwatch", error.message);
     return error.exitCode;
   }
-  _connector = std::make_shared<ClosingConnector>(std::move(connector));
+  service::ConditionBook& book = core->condition();
+  book.observe([&book, tell = _condition->observer()] { tell(inWords(book.current())); });
+  _connector = std::make_shared<ClosingConnector>(service::makeInProcessConnector(std::move(core)));
   tesk::setConnector(_connector);
   return 0;
 }

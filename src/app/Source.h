@@ -6,6 +6,7 @@
 #include <string>
 
 #include "app/ClosingConnector.h"
+#include "app/ConditionLine.h"
 #include "app/Options.h"
 #include "app/ServiceWatch.h"
 
@@ -24,13 +25,15 @@ class Source {
   // standard error and the answer is the exit code; else 0.
   int open(const Options& options);
 
-  // Shows in the window whether the service can be reached, and how much came too fast.
+  // Shows in the window whether the service can be reached, how it is with the modem, and how much
+  // came too fast.
   void showIn(Navigation& navigation);
 
  private:
   int openWithin(const std::string& source);
 
   std::shared_ptr<ClosingConnector> _connector;
+  const std::shared_ptr<ConditionLine> _condition = std::make_shared<ConditionLine>();
   std::shared_ptr<ServiceWatch> _watch;  // of the service on the bus
 };
 

@@ -19,6 +19,7 @@ ServiceCore::ServiceCore(std::unique_ptr<EventSource> source, const Clock& clock
                          std::unique_ptr<StateKeeper> keeper, WaitClock& waitClock)
     : _undecodableLog(clock),
       _tagLog(clock, "not logged one by one: "),
+      _condition(clock),
       _book(std::move(keeper), _configurations, clock, waitClock),
       _source(std::move(source)) {}
 
@@ -40,6 +41,7 @@ void ServiceCore::close(const std::shared_ptr<Session>& session) {
   if (_sessions.empty() && _sourceRunning) {
     _source->stop();
     _sourceRunning = false;
+    _condition.forget();
   }
 }
 
@@ -108,6 +110,15 @@ EventReceiver::Taken ServiceCore::take(const ServiceEvent& event) {
     }
   }
   return Taken::yes;
+}
+
+void ServiceCore::conditionChanged(const SourceCondition& condition) {
+  {
+    // Not the last words of a source that was stopped.
+    const std::lock_guard lock(_mutex);
+    if (!_sourceRunning) return;
+  }
+  _condition.note(condition);
 }
 
 CoreStatus ServiceCore::status() const {

@@ -13,6 +13,7 @@
 #include <vector>
 
 #include "base/Clock.h"
+#include "service/ConditionBook.h"
 #include "service/ConfigurationStore.h"
 #include "service/Counters.h"
 #include "service/KeptBook.h"
@@ -59,8 +60,12 @@ class ServiceCore final : public EventReceiver, public std::enable_shared_from_t
     return _configurations.sizes();
   }
 
+  // How it is with the modem behind the source; nothing is known of it while the source rests.
+  ConditionBook& condition() { return _condition; }
+
   // EventReceiver, for the source.
   Taken take(const ServiceEvent& event) override;
+  void conditionChanged(const SourceCondition& condition) override;
 
  private:
   using Handler = tesk::CommandResult (ServiceCore::*)(Session&, const Dictionary&);
@@ -86,6 +91,7 @@ class ServiceCore final : public EventReceiver, public std::enable_shared_from_t
   const std::shared_ptr<ListenerSignal> _listeners = std::make_shared<ListenerSignal>();
   UndecodableLog _undecodableLog;
   UndecodableLog _tagLog;
+  ConditionBook _condition;
   KeptBook _book;
 
   mutable std::mutex _mutex;

@@ -20,6 +20,16 @@ struct Options {
   bool json = false;
 };
 
+// What is known of it; none: null.
+Value conditionValue(const tesk::bus::ConditionStatus& condition) {
+  if (condition.state.empty()) return {};
+  Dictionary known{{"state", condition.state}, {"text", condition.text}};
+  if (!condition.reason.empty()) known.set("reason", condition.reason);
+  if (!condition.model.empty()) known.set("model", condition.model);
+  if (!condition.driver.empty()) known.set("driver", condition.driver);
+  return known;
+}
+
 void printJson(const ServiceStatus& status, Output& output) {
   List configurations;
   for (const auto& [application, metrics] : status.configurations) {
@@ -36,6 +46,7 @@ void printJson(const ServiceStatus& status, Output& output) {
       {"version", status.version},
       {"source", status.source},
       {"source_running", status.sourceRunning},
+      {"condition", conditionValue(status.condition)},
       {"configurations", std::move(configurations)},
       {"clients", std::move(clients)},
       {"events", Dictionary{{"received", status.eventsReceived},
@@ -50,11 +61,20 @@ void printJson(const ServiceStatus& status, Output& output) {
 // terminal they are nothing but text.
 std::string quoted(const std::string& text) { return forTerminal(jsonText(Value(text))); }
 
+void printCondition(const tesk::bus::ConditionStatus& condition, Output& output) {
+  if (condition.state.empty()) return;
+  std::string line = "condition       " + quoted(condition.text);
+  if (!condition.model.empty()) line += ", model " + quoted(condition.model);
+  if (!condition.driver.empty()) line += ", driver " + quoted(condition.driver);
+  output.line(line);
+}
+
 void printText(const ServiceStatus& status, Output& output) {
   const auto number = [](std::uint64_t value) { return std::to_string(value); };
   output.line("service         version " + quoted(status.version));
   output.line("source          " + quoted(status.source) +
               (status.sourceRunning ? ", runs" : ", does not run: no client wants events"));
+  printCondition(status.condition, output);
   for (const auto& [application, metrics] : status.configurations) {
     output.line("configuration   application " + std::to_string(application) + ", " +
                 number(metrics) + " metrics");

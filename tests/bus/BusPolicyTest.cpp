@@ -1,42 +1,20 @@
 // The shipped bus policy, on a bus like the system's, tried as different users. Needs root, who
 // alone can become somebody else.
 
-#include <grp.h>
 #include <gtest/gtest.h>
-#include <pwd.h>
 #include <sdbus-c++/sdbus-c++.h>
-#include <sys/wait.h>
 #include <unistd.h>
 
 #include <array>
 #include <chrono>
-#include <filesystem>
-#include <fstream>
-#include <regex>
-#include <sstream>
 #include <thread>
 
+#include "bus/PolicyTrial.h"
 #include "bus/ServiceProcess.h"
 #include "tesk/bus/BasebandManager1Proxy.h"
 
 namespace qel::testing {
 namespace {
-
-// Accounts that every Debian has, in place of those that installing the package makes.
-constexpr const char* kServiceUser = "daemon";
-constexpr const char* kClientGroup = "dialout";
-
-std::string shippedPolicy() {
-  std::ostringstream content;
-  content << std::ifstream(QEL_BUS_POLICY).rdbuf();
-  std::string policy = content.str();
-  const auto start = policy.find("<busconfig>") + std::string("<busconfig>").size();
-  policy = policy.substr(start, policy.find("</busconfig>") - start);
-  policy = std::regex_replace(policy, std::regex("user=\"basebandd\""),
-                              std::string("user=\"") + kServiceUser + "\"");
-  return std::regex_replace(policy, std::regex("group=\"baseband\""),
-                            std::string("group=\"") + kClientGroup + "\"");
-}
 
 // As the system bus: who may connect may do so, and all else is denied unless allowed.
 std::string systemLikePolicy() {
@@ -47,34 +25,7 @@ std::string systemLikePolicy() {
          "<allow receive_type=\"method_call\"/><allow receive_type=\"method_return\"/>"
          "<allow receive_type=\"error\"/><allow receive_type=\"signal\"/>"
          "<allow send_destination=\"org.freedesktop.DBus\"/></policy>" +
-         shippedPolicy();
-}
-
-// Runs `work` in a child as that user and groups; what it returned.
-template <class Work>
-int as(const char* user, const char* extraGroup, Work work) {
-  const passwd account = *::getpwnam(user);
-  const gid_t extra = extraGroup ? ::getgrnam(extraGroup)->gr_gid : account.pw_gid;
-  const pid_t child = ::fork();
-  if (child == 0) {
-    const bool changed = ::setgroups(1, &extra) == 0 && ::setgid(account.pw_gid) == 0 &&
-                         ::setuid(account.pw_uid) == 0;
-    ::_exit(changed ? work() : 99);
-  }
-  int status = 0;
-  ::waitpid(child, &status, 0);
-  return WIFEXITED(status) ? WEXITSTATUS(status) : -WTERMSIG(status);
-}
-
-enum Answer { allowed = 0, denied = 1, other = 2 };
-
-int judge(const std::function<void()>& call) {
-  try {
-    call();
-    return allowed;
-  } catch (const sdbus::Error& error) {
-    return error.getName() == "org.freedesktop.DBus.Error.AccessDenied" ? denied : other;
-  }
+         shippedPolicy(QEL_BUS_POLICY);
 }
 
 class BusPolicy : public ::testing::Test {

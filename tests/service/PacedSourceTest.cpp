@@ -29,6 +29,9 @@ class Counting final : public EventSequence {
   SourceAnswer query(std::uint32_t metric) override {
     return {CommandCode::done, std::to_string(metric), _passedMs, {}};
   }
+  SourceCondition condition() const override {
+    return {"counting", "", "", std::to_string(_next) + " of " + std::to_string(_count)};
+  }
 
  private:
   std::uint64_t _count;
@@ -63,6 +66,12 @@ class Receiver final : public EventReceiver {
     return Taken::yes;
   }
 
+  void conditionChanged(const SourceCondition& condition) override {
+    const std::lock_guard lock(_mutex);
+    _conditions.push_back(condition.model);
+    _changed.notify_all();
+  }
+
   std::function<void()> inside;  // on the source's thread
 
   void listen(bool on) {
@@ -74,6 +83,13 @@ class Receiver final : public EventReceiver {
   }
   bool waitForOffers(std::size_t count) {
     return wait([&] { return _offers >= count; });
+  }
+  bool waitForConditions(std::size_t count) {
+    return wait([&] { return _conditions.size() >= count; });
+  }
+  std::vector<std::string> conditions() {
+    const std::lock_guard lock(_mutex);
+    return _conditions;
   }
   std::vector<std::uint64_t> timesMs() {
     const std::lock_guard lock(_mutex);
@@ -92,6 +108,7 @@ class Receiver final : public EventReceiver {
   bool _listening = true;
   std::size_t _offers = 0;
   std::vector<std::uint64_t> _timesMs;
+  std::vector<std::string> _conditions;
 };
 
 std::unique_ptr<PacedSource> sourceOf(std::uint64_t events, WaitClock& clock) {
@@ -212,6 +229,13 @@ TEST_F(PacedSourceTest, ManyStartsAndStopsLeaveNothingBehind) {
     source->start(receiver, listeners);
     if (i % 3 == 0) source->stop();
   }
+}
+
+TEST_F(PacedSourceTest, TellsTheConditionOfItsSequenceAtTheBeginningAndTheEnd) {
+  const auto source = sourceOf(2, clock);
+  source->start(receiver, listeners);
+  ASSERT_TRUE(receiver->waitForConditions(2));
+  EXPECT_EQ(receiver->conditions(), (std::vector<std::string>{"0 of 2", "2 of 2"}));
 }
 
 }  // namespace

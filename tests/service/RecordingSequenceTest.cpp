@@ -130,5 +130,19 @@ TEST_F(RecordingSequenceTest, HasNoAnswerForWhatItDoesNotHold) {
   EXPECT_EQ(answer.message, "metric 20005 is not in the recording");
 }
 
+// Once a recording that had ended looked like one that has nothing to say just now.
+TEST_F(RecordingSequenceTest, TellsThatItHasEnded) {
+  auto events = sequence(false);
+  EXPECT_EQ(events.condition().state, "playing");
+  for (int i = 0; i < 4; ++i) EXPECT_TRUE(events.next());
+  EXPECT_EQ(events.condition().state, "playing");
+  EXPECT_FALSE(events.next());
+  EXPECT_EQ(events.condition().state, "ended");
+  EXPECT_EQ(inWords(events.condition()), "Recording has ended");
+  auto endless = sequence(true);
+  for (int i = 0; i < 9; ++i) EXPECT_TRUE(endless.next());
+  EXPECT_EQ(endless.condition().state, "playing");
+}
+
 }  // namespace
 }  // namespace qel

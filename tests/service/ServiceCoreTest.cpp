@@ -348,5 +348,17 @@ TEST_F(ServiceCoreTest, ASinkMaySendCommands) {
   EXPECT_EQ(source->send(metricEvent(kRrcState)), Taken::nobodyListens);
 }
 
+TEST_F(ServiceCoreTest, KnowsTheConditionOfTheModemWhileTheSourceRuns) {
+  const SourceCondition locked = {"locked", "Modem locked", "SIM PIN needed"};
+  EXPECT_EQ(core->condition().current(), SourceCondition());
+  const auto session = listener(log);
+  source->receiver.lock()->conditionChanged(locked);
+  EXPECT_EQ(core->condition().current(), locked);
+  core->close(session);
+  EXPECT_EQ(core->condition().current(), SourceCondition());
+  source->receiver.lock()->conditionChanged(locked);
+  EXPECT_EQ(core->condition().current(), SourceCondition());
+}
+
 }  // namespace
 }  // namespace qel

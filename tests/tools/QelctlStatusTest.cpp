@@ -79,6 +79,27 @@ TEST(QelctlStatusOfARecording, countsReportsThatNoTableCouldDraw) {
   EXPECT_EQ(told["events"]["received"], 3);
 }
 
+// A modem that cannot give values once looked like one with nothing to report.
+TEST(QelctlStatusOfAModem, tellsHowItIsWithIt) {
+  const PrivateBus bus;
+  const ServiceProcess service(bus, "modem-manager,bus=" + bus.address());
+  Client client(bus, "tester");
+  ASSERT_TRUE(client.waitForReachable(true));
+  const auto status = [&bus](const char* form) {
+    return qelctl({"status", "--bus", bus.address(), form}).out;
+  };
+  EXPECT_TRUE(nlohmann::json::parse(status("--json"))["condition"].is_null());
+  client.transport().eventsOn();
+  ASSERT_TRUE(
+      eventually([&] { return !nlohmann::json::parse(status("--json"))["condition"].is_null(); }));
+  EXPECT_EQ(nlohmann::json::parse(status("--json"))["condition"],
+            nlohmann::json::parse(
+                R"({"state": "no-modem-manager", "text": "ModemManager not running"})"));
+  const std::string shown = qelctl({"status", "--bus", bus.address()}).out;
+  EXPECT_NE(shown.find("condition       \"ModemManager not running\"\n"), std::string::npos)
+      << shown;
+}
+
 void expectAbsent(const std::vector<std::string>& words, const std::string& why) {
   const Outcome outcome = qelctl(words);
   EXPECT_EQ(outcome.exitCode, 69) << words.front();

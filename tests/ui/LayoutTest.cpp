@@ -67,6 +67,19 @@ TEST_P(Layout, nameAndValueNeverOverlap) {
   EXPECT_TRUE(above || widths + 16 <= GetParam().width() - 32);
 }
 
+TEST_P(Layout, theLineAboutTheModemFitsAboveTheChoices) {
+  const char* line = "No modem: the chosen one is not there";
+  window.navigation().setCondition(line);
+  window.settle();
+  ASSERT_TRUE(window.find(line));
+  EXPECT_FALSE(window.find(line)->property("truncated").toBool());
+  EXPECT_GE(area(line).left(), 0);
+  EXPECT_LE(area(line).right(), GetParam().width());
+  EXPECT_GE(area(line).top(), area("Test modem").bottom() - 0.5);
+  EXPECT_LE(area(line).bottom(), area("System").top() + 0.5);
+  EXPECT_LE(area("System").bottom(), GetParam().height());
+}
+
 INSTANTIATE_TEST_SUITE_P(Sizes, Layout,
                          ::testing::Values(QSize(320, 568), QSize(360, 720), QSize(412, 915),
                                            QSize(720, 1280), QSize(720, 360)),

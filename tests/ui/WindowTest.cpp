@@ -17,6 +17,23 @@ TEST(WindowTest, startsWithTheTechnologiesAndSaysWhereValuesComeFrom) {
   EXPECT_EQ(window.warnings(), 0);
 }
 
+// The reader of an empty table once could not know that the modem waited for its PIN.
+TEST(WindowTest, theFirstScreenSaysHowItIsWithTheModem) {
+  const Window window;
+  window.window().resize(360, 720);
+  window.navigation().setCondition("Modem locked: SIM PIN needed");
+  window.settle();
+  EXPECT_EQ(window.texts(), (Strings{"qelwatch", "Device Info", "LTE", "UMTS", "GSM", "Test modem",
+                                     "Modem locked: SIM PIN needed", "System", "Light", "Dark"}));
+  ASSERT_TRUE(window.tap("LTE"));
+  EXPECT_FALSE(window.shows("Modem locked: SIM PIN needed"));
+  window.navigation().back();
+  window.navigation().setCondition("");
+  window.settle();
+  EXPECT_FALSE(window.shows("Modem locked: SIM PIN needed"));
+  EXPECT_EQ(window.warnings(), 0);
+}
+
 TEST(WindowTest, aTapGoesFromTechnologyToCategoryToFields) {
   const Window window;
   window.store().myLTERRCStateDict = {{"state", "KLTE_RRC_STATE_CONNECTED"}, {"cause", 3}};

@@ -67,10 +67,12 @@ BusFront::BusFront(sdbus::IConnection& connection, std::shared_ptr<ServiceCore> 
     return _isRead;
   });
   object.finishRegistration();
+  _core->condition().observe([wakeUp = _wakeUp] { wakeUp->signal(); });
   _connection.requestName(tesk::bus::kServiceName);
 }
 
 BusFront::~BusFront() {
+  _core->condition().observe({});
   _clients.clear();
   object.unregister();
 }
@@ -236,9 +238,17 @@ void BusFront::serveStreams(const std::vector<short>& happened) {
 // What the counters say changes all the time and is told now and then.
 void BusFront::signalChanges() {
   if (SteadyClock::now() - _notedAt >= kCountersEvery) noteCounters();
+  noteCondition();
   if (isBusBehind()) return;
   const auto names = _changed.take(SteadyClock::now());
   if (!names.empty()) object.emitPropertiesChangedSignal(INTERFACE_NAME, names);
+}
+
+void BusFront::noteCondition() {
+  SourceCondition now = _core->condition().current();
+  if (now == _notedCondition) return;
+  _notedCondition = std::move(now);
+  _changed.note({"Condition"});
 }
 
 }  // namespace qel::service

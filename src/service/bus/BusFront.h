@@ -66,6 +66,7 @@ class BusFront final : private FrontObject, public tesk::BasebandManager1_adapto
   std::string Version() override;
   std::string Source() override;
   bool SourceRunning() override;
+  std::map<std::string, sdbus::Variant> Condition() override;
   std::map<std::int64_t, std::uint32_t> Configurations() override;
   std::vector<sdbus::Struct<std::string, bool, std::uint64_t, std::uint64_t>> Clients() override;
   std::uint64_t EventsReceived() override;
@@ -85,6 +86,7 @@ class BusFront final : private FrontObject, public tesk::BasebandManager1_adapto
   void noteRegistration();
   void noteOwnerChange(sdbus::Message& signal);
   void forget(const std::string& busName);
+  void noteCondition();
   int pollTimeout(const sdbus::IConnection::PollData& bus) const;
   void serveStreams(const std::vector<short>& happened);
 
@@ -115,6 +117,7 @@ class BusFront final : private FrontObject, public tesk::BasebandManager1_adapto
   std::uint64_t _droppedOfGone = 0;
   Counted _noted;
   std::chrono::steady_clock::time_point _notedAt;
+  SourceCondition _notedCondition;
 };
 
 }  // namespace qel::service

@@ -32,6 +32,20 @@ std::string BusFront::Version() { return QEL_VERSION; }
 std::string BusFront::Source() { return status().source; }
 bool BusFront::SourceRunning() { return status().sourceRunning; }
 
+std::map<std::string, sdbus::Variant> BusFront::Condition() {
+  const SourceCondition condition = _core->condition().current();
+  std::map<std::string, sdbus::Variant> entries;
+  const auto put = [&entries](const char* key, std::string text) {
+    if (!text.empty()) entries.emplace(key, std::move(text));
+  };
+  put("state", std::string(condition.state));
+  put("text", inWords(condition));
+  put("reason", std::string(condition.reason));
+  put("model", condition.model);
+  put("driver", condition.driver);
+  return entries;
+}
+
 std::map<std::int64_t, std::uint32_t> BusFront::Configurations() {
   return _core->configurationSizes();
 }

@@ -9,6 +9,7 @@
 #include "service/CommandCodes.h"
 #include "service/ServiceEvent.h"
 #include "service/sources/ListenerSignal.h"
+#include "service/sources/SourceCondition.h"
 
 namespace qel::service {
 
@@ -21,6 +22,8 @@ class EventReceiver {
   // nobodyListens: the event went nowhere and was not counted; a source that can wait offers it
   // again after the signal that it was started with.
   virtual Taken take(const ServiceEvent& event) = 0;
+  // How it is with what stands behind the source, at first and at every change.
+  virtual void conditionChanged(const SourceCondition& /*condition*/) {}
 };
 
 // What a source has to say to a query: the event dictionary, or a code and one line why not.

@@ -28,6 +28,10 @@ struct PacedSource::Run {
     const std::lock_guard lock(mutex);
     return sequence->query(metric);
   }
+  SourceCondition condition() {
+    const std::lock_guard lock(mutex);
+    return sequence->condition();
+  }
 
   std::stop_source stop;
   std::weak_ptr<EventReceiver> receiver;
@@ -77,13 +81,21 @@ void PacedSource::play(Run& run) {
   const std::stop_token stop = run.stop.get_token();
   // Once stopped, nothing is touched any more but the run: the source, its clock and the whole
   // process may be on their way out.
+  report(run);
   while (!stop.stop_requested()) {
     const auto [event, beginsAnew] = run.next();
-    if (!event || (beginsAnew && !run.pacer.beginRound(stop))) return;
+    if (!event) return report(run);
+    if (beginsAnew && !run.pacer.beginRound(stop)) return;
     if (!run.pacer.wait(event->timeMs, stop)) return;
     run.passed(*event);
     if (!hand(run, *event)) return;
   }
+}
+
+void PacedSource::report(Run& run) {
+  if (run.stop.stop_requested()) return;
+  const SourceCondition condition = run.condition();
+  if (const auto receiver = run.receiver.lock()) receiver->conditionChanged(condition);
 }
 
 // Until someone took the event. False when stopped or nobody is left.

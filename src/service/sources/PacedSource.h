@@ -37,6 +37,7 @@ class PacedSource final : public EventSource {
   struct Run;
   static void play(Run& run);
   static bool hand(Run& run, const ServiceEvent& event);
+  static void report(Run& run);
 
   const std::string _description;
   const MakeSequence _makeSequence;

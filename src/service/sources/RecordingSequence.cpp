@@ -130,9 +130,15 @@ std::optional<ServiceEvent> RecordingSequence::next() {
   _beginsAnew = false;
   if (auto event = read()) return event;
   // One attempt: a file that has become empty must not be read for ever.
-  if (!_loops || !_reader || !reopen()) return std::nullopt;
-  _beginsAnew = true;
-  return read();
+  _beginsAnew = _loops && _reader && reopen();
+  auto first = _beginsAnew ? read() : std::nullopt;
+  _ended = !first;
+  return first;
+}
+
+SourceCondition RecordingSequence::condition() const {
+  if (!_ended) return {"playing", "Recording is playing", ""};
+  return {"ended", "Recording has ended", _reader ? "" : "it cannot be read any more"};
 }
 
 void RecordingSequence::passed(const ServiceEvent& event) {

@@ -29,6 +29,7 @@ class RecordingSequence final : public EventSequence {
   bool beginsAnew() const override { return _beginsAnew; }
   void passed(const ServiceEvent& event) override;
   SourceAnswer query(std::uint32_t metric) override;
+  SourceCondition condition() const override;
 
  private:
   std::optional<ServiceEvent> read();
@@ -40,6 +41,7 @@ class RecordingSequence final : public EventSequence {
   std::unique_ptr<RecordingReader> _reader;
   EventOfMetric _newest;
   bool _beginsAnew = false;
+  bool _ended = false;
 };
 
 }  // namespace qel::service

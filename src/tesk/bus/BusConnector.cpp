@@ -7,28 +7,32 @@ namespace {
 
 class BusConnector final : public Connector {
  public:
-  BusConnector(BusAddress address, ReachabilityObserver observer, AnswerWaitMaker makeWait)
+  BusConnector(BusAddress address, ReachabilityObserver observer, AnswerWaitMaker makeWait,
+               ConditionObserver conditionObserver)
       : _address(std::move(address)),
         _observer(std::move(observer)),
-        _makeWait(std::move(makeWait)) {}
+        _makeWait(std::move(makeWait)),
+        _conditionObserver(std::move(conditionObserver)) {}
 
   std::unique_ptr<Transport> connect(std::string_view clientName, EventSink sink) override {
     return std::make_unique<BusTransport>(_address, std::string(clientName), std::move(sink),
-                                          _observer, _makeWait);
+                                          _observer, _makeWait, _conditionObserver);
   }
 
  private:
   const BusAddress _address;
   const ReachabilityObserver _observer;
   const AnswerWaitMaker _makeWait;
+  const ConditionObserver _conditionObserver;
 };
 
 }  // namespace
 
 std::shared_ptr<Connector> makeBusConnector(BusAddress address, ReachabilityObserver observer,
-                                            AnswerWaitMaker makeWait) {
+                                            AnswerWaitMaker makeWait,
+                                            ConditionObserver conditionObserver) {
   return std::make_shared<BusConnector>(std::move(address), std::move(observer),
-                                        std::move(makeWait));
+                                        std::move(makeWait), std::move(conditionObserver));
 }
 
 }  // namespace tesk::bus

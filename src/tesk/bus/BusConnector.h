@@ -7,6 +7,7 @@
 
 #include "tesk/Transport.h"
 #include "tesk/bus/BusAddress.h"
+#include "tesk/bus/ConditionWatch.h"
 
 namespace tesk::bus {
 
@@ -31,6 +32,7 @@ using AnswerWaitMaker = std::function<std::shared_ptr<AnswerWait>()>;
 // before. While it is away commands answer kServiceUnreachable; while it only takes its time they
 // wait as `makeWait` has it, or without doing anything else.
 std::shared_ptr<Connector> makeBusConnector(BusAddress address, ReachabilityObserver observer = {},
-                                            AnswerWaitMaker makeWait = {});
+                                            AnswerWaitMaker makeWait = {},
+                                            ConditionObserver conditionObserver = {});
 
 }  // namespace tesk::bus

@@ -32,14 +32,16 @@ CommandResult unreachable(std::string_view why) { return {kServiceUnreachable, s
 
 }  // namespace
 
-BusLink::BusLink(const BusAddress& address, std::string clientName, EventSink sink, bool deliver)
+BusLink::BusLink(const BusAddress& address, std::string clientName, EventSink sink, bool deliver,
+                 ConditionObserver conditionObserver)
     : _clientName(std::move(clientName)),
       _sink(std::move(sink)),
       _connection(connectTo(address)),
+      _proxy(sdbus::createProxy(*_connection, kServiceName, kObjectPath)),
+      _condition(*_connection, *_proxy, std::move(conditionObserver)),
       _deliver(deliver),
       _pause(kFirstPause) {
   watchOwner();
-  _proxy = sdbus::createProxy(*_connection, kServiceName, kObjectPath);
   beginToRegister();
 }
 
@@ -83,6 +85,7 @@ void BusLink::registered(const sdbus::Error* error, const sdbus::UnixFd& stream)
   _stream = stream;
   _attachedAt = Clock::now();
   if (_deliver) askForDelivery();
+  _condition.ask();
   for (const Command& command : std::exchange(_waiting, {})) send(command);
 }
 
@@ -152,6 +155,7 @@ void BusLink::answered(std::uint64_t number, const sdbus::Error* error, CommandR
 void BusLink::detach(std::string_view why) {
   if (isAttached() && Clock::now() - _attachedAt > kLongestPause) _pause = kFirstPause;
   _stream.reset();
+  _condition.forget();
   _registering = false;
   ++_registration;
   _why = why;

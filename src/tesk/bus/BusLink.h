@@ -13,6 +13,7 @@
 
 #include "tesk/Transport.h"
 #include "tesk/bus/BusAddress.h"
+#include "tesk/bus/ConditionWatch.h"
 
 namespace tesk::bus {
 
@@ -38,7 +39,8 @@ class BusLink {
   };
 
   // Connects, which may take as long as the bus pleases, and begins to register.
-  BusLink(const BusAddress& address, std::string clientName, EventSink sink, bool deliver);
+  BusLink(const BusAddress& address, std::string clientName, EventSink sink, bool deliver,
+          ConditionObserver conditionObserver);
   ~BusLink();
   BusLink(const BusLink&) = delete;
   BusLink& operator=(const BusLink&) = delete;
@@ -82,6 +84,7 @@ class BusLink {
   const std::unique_ptr<sdbus::IConnection> _connection;
   sdbus::Slot _ownerMatch;
   std::unique_ptr<sdbus::IProxy> _proxy;
+  ConditionWatch _condition;
   sdbus::UnixFd _stream;
   bool _deliver;
   bool _ownerChanged = false;

@@ -77,18 +77,20 @@ class BusTransport::Worker {
   // Runs on the thread; without a link there is no bus.
   using Task = std::function<void(BusLink* link)>;
 
-  Worker(BusAddress address, std::string clientName, EventSink sink, ReachabilityObserver observer)
+  Worker(BusAddress address, std::string clientName, EventSink sink, ReachabilityObserver observer,
+         ConditionObserver conditionObserver)
       : _address(std::move(address)),
         _clientName(std::move(clientName)),
         _sink(std::move(sink)),
-        _observer(std::move(observer)) {}
+        _observer(std::move(observer)),
+        _conditionObserver(std::move(conditionObserver)) {}
 
   void run() {
     auto pause = kFirstPause;
     while (!isStopping()) {
       try {
         setConnecting(true);
-        BusLink link(_address, _clientName, _sink, _deliver);
+        BusLink link(_address, _clientName, _sink, _deliver, _conditionObserver);
         setConnecting(false);
         pause = kFirstPause;
         live(link);
@@ -192,6 +194,7 @@ class BusTransport::Worker {
   const std::string _clientName;
   const EventSink _sink;
   const ReachabilityObserver _observer;
+  const ConditionObserver _conditionObserver;
   const WakeUp _wakeUp;
   std::mutex _mutex;
   std::condition_variable _changed;
@@ -205,10 +208,11 @@ class BusTransport::Worker {
 };
 
 BusTransport::BusTransport(BusAddress address, std::string clientName, EventSink sink,
-                           ReachabilityObserver observer, AnswerWaitMaker makeWait)
+                           ReachabilityObserver observer, AnswerWaitMaker makeWait,
+                           ConditionObserver conditionObserver)
     : _makeWait(std::move(makeWait)),
       _worker(std::make_shared<Worker>(std::move(address), std::move(clientName), std::move(sink),
-                                       std::move(observer))),
+                                       std::move(observer), std::move(conditionObserver))),
       _thread([worker = _worker] { worker->run(); }) {}
 
 BusTransport::~BusTransport() {

@@ -14,7 +14,8 @@ namespace tesk::bus {
 class BusTransport final : public Transport {
  public:
   BusTransport(BusAddress address, std::string clientName, EventSink sink,
-               ReachabilityObserver observer, AnswerWaitMaker makeWait);
+               ReachabilityObserver observer, AnswerWaitMaker makeWait,
+               ConditionObserver conditionObserver);
   ~BusTransport() override;
 
   CommandResult performCommand(std::string_view command, const Message& request,

@@ -40,11 +40,24 @@ void take(const Properties& properties, const char* name, Held& value) {
   }
 }
 
+ConditionStatus conditionOf(const Properties& entries) {
+  ConditionStatus condition;
+  take(entries, "state", condition.state);
+  take(entries, "text", condition.text);
+  take(entries, "reason", condition.reason);
+  take(entries, "model", condition.model);
+  take(entries, "driver", condition.driver);
+  return condition;
+}
+
 ServiceStatus statusOf(const Properties& properties) {
   ServiceStatus status;
   take(properties, "Version", status.version);
   take(properties, "Source", status.source);
   take(properties, "SourceRunning", status.sourceRunning);
+  Properties condition;
+  take(properties, "Condition", condition);
+  status.condition = conditionOf(condition);
   take(properties, "Configurations", status.configurations);
   std::vector<ClientProperty> clients;
   take(properties, "Clients", clients);

@@ -18,10 +18,20 @@ struct ClientStatus {
   std::uint64_t dropped = 0;  // because the client did not read
 };
 
+// How it is with the modem or the recording behind the source. What is empty is not known.
+struct ConditionStatus {
+  std::string state;   // one word
+  std::string text;    // one line for people
+  std::string reason;  // in that line too
+  std::string model;   // of the modem
+  std::string driver;
+};
+
 struct ServiceStatus {
   std::string version;
   std::string source;
   bool sourceRunning = false;
+  ConditionStatus condition;
   std::map<std::int64_t, std::uint32_t> configurations;  // metrics asked for, by application
   std::vector<ClientStatus> clients;
   std::uint64_t eventsReceived = 0;

@@ -1,11 +1,13 @@
 import QtQuick
 import Qelwatch.Ui
 
-// Where the values come from, what is not shown of them, and the choice between light and dark.
+// Where the values come from, how it is with the modem, what is not shown, and the choice between
+// light and dark.
 Item {
     id: footer
 
     property string source
+    property string condition
     property string loss
 
     readonly property var choices: [
@@ -28,6 +30,18 @@ Item {
         return Math.max(4, Math.min(Theme.margin, left / (2 * choices.length)));
     }
 
+    component Line: Text {
+        x: Theme.margin
+        width: parent.width - 2 * Theme.margin
+        bottomPadding: 4
+        visible: text !== ""
+        textFormat: Text.PlainText
+        color: Theme.secondary
+        font.pointSize: Theme.headerSize
+        horizontalAlignment: Text.AlignHCenter
+        wrapMode: Text.Wrap
+    }
+
     implicitHeight: column.height + Theme.padding
 
     TextMetrics {
@@ -41,30 +55,16 @@ Item {
         id: column
         width: parent.width
 
-        Text {
-            x: Theme.margin
-            width: parent.width - 2 * Theme.margin
+        Line {
             topPadding: Theme.padding
-            bottomPadding: 4
-            visible: text !== ""
             text: footer.source
-            textFormat: Text.PlainText
-            color: Theme.secondary
-            font.pointSize: Theme.headerSize
-            horizontalAlignment: Text.AlignHCenter
-            wrapMode: Text.Wrap
         }
-        Text {
-            x: Theme.margin
-            width: parent.width - 2 * Theme.margin
-            bottomPadding: 4
-            visible: text !== ""
+        Line {
+            text: footer.condition
+            color: Theme.value
+        }
+        Line {
             text: footer.loss
-            textFormat: Text.PlainText
-            color: Theme.secondary
-            font.pointSize: Theme.headerSize
-            horizontalAlignment: Text.AlignHCenter
-            wrapMode: Text.Wrap
         }
         Row {
             anchors.horizontalCenter: parent.horizontalCenter

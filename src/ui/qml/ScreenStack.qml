@@ -64,6 +64,7 @@ FocusScope {
             focus: index === stack.target
             enabled: focus && !edge.active
             notice: stack.navigation.notice
+            condition: stack.navigation.condition
             source: stack.source
             loss: stack.navigation.loss
             storyboard: stack.navigation.storyboard

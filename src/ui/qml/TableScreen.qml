@@ -7,6 +7,7 @@ FocusScope {
 
     required property TableModel table
     property string notice
+    property string condition
     property string source
     property string loss
     required property InterfaceDescription storyboard
@@ -92,6 +93,7 @@ FocusScope {
         height: screen.isFirst ? implicitHeight : 0
         visible: screen.isFirst
         source: screen.source
+        condition: screen.condition
         loss: screen.loss
     }
 }

@@ -48,6 +48,10 @@ void Navigation::setLoss(const QString& loss) {
   if (std::exchange(_loss, loss) != loss) emit lossChanged();
 }
 
+void Navigation::setCondition(const QString& condition) {
+  if (std::exchange(_condition, condition) != condition) emit conditionChanged();
+}
+
 void Navigation::back() { _controller->popViewController(); }
 
 void Navigation::settle() {

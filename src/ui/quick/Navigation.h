@@ -25,6 +25,7 @@ class Navigation : public QAbstractListModel, public QQmlParserStatus {
   Q_PROPERTY(qel::TableModel* top READ top NOTIFY depthChanged)
   Q_PROPERTY(QString notice READ notice WRITE setNotice NOTIFY noticeChanged)
   Q_PROPERTY(QString loss READ loss WRITE setLoss NOTIFY lossChanged)
+  Q_PROPERTY(QString condition READ condition WRITE setCondition NOTIFY conditionChanged)
 
  public:
   enum Role { tableRole = Qt::UserRole + 1 };
@@ -53,6 +54,9 @@ class Navigation : public QAbstractListModel, public QQmlParserStatus {
   // What the reader does not get to see, at the foot of the first screen; empty: all is shown.
   QString loss() const { return _loss; }
   void setLoss(const QString& loss);
+  // How it is with the modem, for the first screen; empty: nothing to say.
+  QString condition() const { return _condition; }
+  void setCondition(const QString& condition);
 
   Q_INVOKABLE void back();
   Q_INVOKABLE void settle();
@@ -62,6 +66,7 @@ class Navigation : public QAbstractListModel, public QQmlParserStatus {
   void depthChanged();
   void noticeChanged();
   void lossChanged();
+  void conditionChanged();
 
  private:
   void follow(const TableModel* table, IndexPath indexPath);
@@ -74,6 +79,7 @@ class Navigation : public QAbstractListModel, public QQmlParserStatus {
   int _depth = 0;
   QString _notice;
   QString _loss;
+  QString _condition;
 };
 
 }  // namespace qel

@@ -6,6 +6,7 @@
 #include <array>
 #include <utility>
 
+#include "service/sources/modem_manager/ModemCondition.h"
 #include "service/sources/modem_manager/Names.h"
 
 namespace qel::service {
@@ -114,6 +115,11 @@ ModemLink::Clock::time_point ModemLink::due() const {
 std::optional<ModemPicture> ModemLink::picture() const {
   if (!_watched) return std::nullopt;
   return pictureOf(_tree.objects(), _watched->path(), _watched->answers());
+}
+
+std::optional<SourceCondition> ModemLink::condition() const {
+  if (_watched) return conditionOf(watchedInterfaces());
+  return conditionWithoutModem(_tree.manager(), !_wish.imei.empty() || !_wish.path.empty());
 }
 
 void ModemLink::finish() {

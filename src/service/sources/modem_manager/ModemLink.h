@@ -6,6 +6,7 @@
 #include <optional>
 #include <string>
 
+#include "service/sources/SourceCondition.h"
 #include "service/sources/modem_manager/BusCalls.h"
 #include "service/sources/modem_manager/ModemPicture.h"
 #include "service/sources/modem_manager/ObjectTree.h"
@@ -40,6 +41,8 @@ class ModemLink {
 
   // The modem as it is known now; nothing while there is none.
   std::optional<ModemPicture> picture() const;
+  // How it is with the modem; nothing while ModemManager has not answered yet.
+  std::optional<SourceCondition> condition() const;
 
   // Leaves the modem as it was found. Waits some two seconds for that at most.
   void finish();

@@ -8,6 +8,7 @@
 
 #include "base/Clock.h"
 #include "service/sources/modem_manager/MetricKeeper.h"
+#include "service/sources/modem_manager/ModemCondition.h"
 #include "tesk/bus/WakeUp.h"
 
 namespace qel::service {
@@ -47,6 +48,7 @@ struct ModemManagerSource::Run {
         said.say(address.name, "no message bus (" + error.getMessage() + "), trying again");
       }
       keeper.update(std::nullopt, 0, Steady::now(), {});
+      report(noBusCondition());
       rest(pause);
       pause = std::min(pause * 2, kLongestPause);
     }
@@ -55,6 +57,7 @@ struct ModemManagerSource::Run {
   void live(ModemLink& link) {
     while (!stopping) {
       noticeListeners();
+      if (const auto condition = link.condition()) report(*condition);
       keeper.update(link.picture(), systemClock().nowMs(), Steady::now(),
                     [this](const ServiceEvent& event) { hand(event); });
       if (stopping) break;
@@ -80,6 +83,12 @@ struct ModemManagerSource::Run {
     }
   }
 
+  void report(const SourceCondition& condition) {
+    if (stopping || condition == reported) return;
+    reported = condition;
+    if (const auto taker = receiver.lock()) taker->conditionChanged(condition);
+  }
+
   // New listeners do not shorten it.
   void rest(std::chrono::milliseconds pause) {
     const auto end = Steady::now() + pause;
@@ -102,6 +111,7 @@ struct ModemManagerSource::Run {
   // The thread only.
   SaidOnce said;
   std::uint64_t generation = 0;
+  SourceCondition reported;
 };
 
 ModemManagerSource::ModemManagerSource(ModemWish wish, tesk::bus::BusAddress address,

@@ -20,6 +20,14 @@ std::string signalRule(const char* interface, const char* member) {
          "',member='" + member + "'";
 }
 
+ObjectTree::Manager managerAfter(const sdbus::Error& error) {
+  const std::string& name = error.getName();
+  if (name == "org.freedesktop.DBus.Error.AccessDenied") return ObjectTree::Manager::denied;
+  const bool noAnswer =
+      name == "org.freedesktop.DBus.Error.NoReply" || name == "org.freedesktop.DBus.Error.Timeout";
+  return noAnswer ? ObjectTree::Manager::silent : ObjectTree::Manager::absent;
+}
+
 }  // namespace
 
 ObjectTree::ObjectTree(sdbus::IConnection& connection, BusCalls& calls)
@@ -55,6 +63,7 @@ void ObjectTree::ownerChanged(sdbus::Message& signal) {
   _owner.clear();
   ++_epoch;
   _pause = kFirstPause;
+  _manager = now.empty() ? Manager::absent : Manager::unknown;
   _askAt = now.empty() ? Clock::time_point::max() : Clock::now();
 }
 
@@ -142,6 +151,7 @@ void ObjectTree::askForAll() {
         }
         for (auto& [path, interfaces] : objects) _objects[path] = std::move(interfaces);
         _owner = reply.getSender();
+        _manager = Manager::present;
         _pause = kFirstPause;
         if (_newsMeanwhile) _askAt = Clock::now();
       },
@@ -151,6 +161,8 @@ void ObjectTree::askForAll() {
         _pause = std::min<std::chrono::seconds>(pause * 2,
                                                 absent ? kLongestPauseWithout : kLongestPause);
         _askAt = Clock::now() + pause;
+        // Who has answered once is there, whatever becomes of a later question.
+        if (_owner.empty()) _manager = managerAfter(error);
       });
 }
 

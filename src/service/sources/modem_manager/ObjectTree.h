@@ -24,6 +24,10 @@ class ObjectTree {
 
   const BusObjects& objects() const { return _objects; }
 
+  // Whether ModemManager is there: it has answered, or why not. Unknown before the first answer.
+  enum class Manager { unknown, present, absent, denied, silent };
+  Manager manager() const { return _manager; }
+
   // Makes the calls that are due. Not from within a signal or an answer. Returns the objects that
   // went since the last step: what is now at such a path is another one.
   std::set<std::string> step(Clock::time_point now);
@@ -50,6 +54,7 @@ class ObjectTree {
   void drop(const std::string& path);
 
   BusCalls& _calls;
+  Manager _manager = Manager::unknown;
   std::string _owner;        // the unique name whose signals count
   std::uint64_t _epoch = 0;  // of the owner: answers of an earlier one are late
   Clock::time_point _askAt;
