@@ -17,7 +17,7 @@ void attackOnce(const std::string& busAddress, const Attack::Deed& deed,
   const auto events = proxy.Register("trial-attacker");
   while (!stop.stop_requested()) {
     deed(*connection, proxy);
-    while (connection->processPendingRequest()) {
+    while (!stop.stop_requested() && connection->processPendingRequest()) {
     }
   }
 }
