@@ -14,6 +14,7 @@ set(QEL_SANITIZE "" CACHE STRING "Sanitizers to build with, as for -fsanitize=")
 if(QEL_SANITIZE)
   add_compile_options(-fsanitize=${QEL_SANITIZE} -fno-sanitize-recover=all -fno-omit-frame-pointer -g1)
   add_link_options(-fsanitize=${QEL_SANITIZE})
+  add_compile_definitions(_GLIBCXX_ASSERTIONS)
   find_program(QEL_LLD ld.lld)  # the usual linker takes long over sanitized objects
   if(QEL_LLD)
     add_link_options(-fuse-ld=lld)
