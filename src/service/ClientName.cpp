@@ -1,6 +1,5 @@
 #include "service/ClientName.h"
 
-#include "base/TerminalText.h"
 #include "base/Utf8.h"
 #include "service/Limits.h"
 
@@ -15,7 +14,6 @@ std::string_view faultOfClientName(std::string_view name) {
   if (name.empty()) return "the client name is empty";
   if (name.size() > limits::kClientNameBytes) return "the client name is longer than 64 bytes";
   if (!isValidUtf8(name)) return "the client name is not UTF-8";
-  if (forTerminal(name) != name) return "the client name has control characters";
   return {};
 }
 

@@ -5,9 +5,9 @@
 
 namespace qel::service {
 
-// Names are shown to people, logged and kept: they are short UTF-8 text without control characters
-// and without characters that turn the direction of writing. Nothing when the name is good, else
-// one line that says what is wrong and does not repeat the name.
+// Names are kept and shown to everybody: they are short UTF-8 text. Nothing when the name is good,
+// else one line that says what is wrong and does not repeat the name. It may hold characters that a
+// terminal obeys: whoever shows it escapes them.
 std::string_view faultOfClientName(std::string_view name);
 
 }  // namespace qel::service

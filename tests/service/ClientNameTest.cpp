@@ -24,10 +24,10 @@ TEST(ClientNameTest, RefusesAnEmptyName) {
   EXPECT_EQ(faultOfClientName(""), "the client name is empty");
 }
 
-TEST(ClientNameTest, RefusesWhatATerminalWouldObey) {
-  for (const char* name : {"a\nb", "\x1B[2J", "\x7F", "\xC2\x9B", "a\xC2\x80", "\xE2\x80\xAE",
-                           "\xE2\x81\xA6 x", "\xD8\x9C", "\xE2\x80\x8F", "\xE2\x80\xA8"}) {
-    EXPECT_EQ(faultOfClientName(name), "the client name has control characters") << name;
+// They are escaped where a name is shown.
+TEST(ClientNameTest, TakesCharactersThatATerminalObeys) {
+  for (const char* name : {"a\nb", "\x1B[2J", "\xC2\x9B", "\xE2\x80\xAE"}) {
+    EXPECT_EQ(faultOfClientName(name), "") << name;
   }
 }
 

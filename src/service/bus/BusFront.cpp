@@ -196,6 +196,7 @@ void BusFront::waitAndProcess(int stopDescriptor) {
     waited.push_back({client->stream().descriptor(), client->stream().pollEvents(), 0});
   }
   ::poll(waited.data(), waited.size(), pollTimeout(bus));
+  _status.reset();  // events went on meanwhile
   _wakeUp->clear();
   std::vector<short> happened;
   for (std::size_t i = fixed; i < waited.size(); ++i) happened.push_back(waited[i].revents);

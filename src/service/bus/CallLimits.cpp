@@ -5,6 +5,7 @@
 #include <cstdint>
 #include <string_view>
 
+#include "base/TerminalText.h"
 #include "service/ClientName.h"
 #include "service/Limits.h"
 #include "service/Request.h"
@@ -27,7 +28,8 @@ std::string_view readText(sdbus::Message& message) {
 
 // How a key is called in an answer: anybody may print that.
 std::string nameOf(std::string_view key) {
-  return faultOfClientName(key).empty() ? std::string(key) : "an entry";
+  constexpr std::size_t kLongestShown = 64;
+  return key.size() <= kLongestShown && forTerminal(key) == key ? std::string(key) : "an entry";
 }
 
 Refusal tooLong(const std::string& what) {
