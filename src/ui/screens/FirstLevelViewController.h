@@ -17,7 +17,7 @@ namespace qel {
 class FirstLevelViewController final : public TableViewController {
  public:
   std::optional<std::string> seguedThroughRow;  // the technology
-  QelViewItems tableViewFields;
+  const QelViewItems& tableViewFields = QelViewItems::shared();
   std::shared_ptr<MetricValidator> myMetricValidator = MetricValidator::shared();
 
   int numberOfSections() override;

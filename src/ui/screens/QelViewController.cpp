@@ -5,27 +5,18 @@
 #include "ui/screens/QelViewItems.h"
 
 namespace qel {
-namespace {
-
-const QelViewItems& catalogue() {
-  static const QelViewItems items;
-  return items;
-}
-
-}  // namespace
-
 int QelViewController::numberOfSections() { return 1; }
 
 int QelViewController::numberOfRowsInSection(int /*section*/) {
-  return countOf(catalogue().launchViewItemNames);
+  return countOf(QelViewItems::shared().launchViewItemNames);
 }
 
 TableViewCell& QelViewController::cellForRowAtIndexPath(IndexPath indexPath) {
   TableViewCell& cell =
       requiredTableView().dequeueReusableCellWithIdentifier("LaunchView", indexPath);
   if (!cell.textLabel) return cell;
-  cell.textLabel->text =
-      elementAt(catalogue().launchViewItemNames, indexPath.row, "row of the technology menu");
+  cell.textLabel->text = elementAt(QelViewItems::shared().launchViewItemNames, indexPath.row,
+                                   "row of the technology menu");
   return cell;
 }
 

@@ -79,4 +79,9 @@ QelViewItems::QelViewItems() {
   }
 }
 
+const QelViewItems& QelViewItems::shared() {
+  static const auto& items = *new QelViewItems;  // screens may outlast the end of the process
+  return items;
+}
+
 }  // namespace qel

@@ -15,7 +15,7 @@ namespace qel {
 // load until the process ends. A section or row that the store does not hold is a fatal error.
 class SecondLevelViewController final : public TableViewController {
  public:
-  QelViewItems tableViewFields;
+  const QelViewItems& tableViewFields = QelViewItems::shared();
   std::optional<std::string> firstSelection;    // the technology
   std::optional<std::string> seguedThroughRow;  // the category
   std::optional<TableViewCell> currentCell;

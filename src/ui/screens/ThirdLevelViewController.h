@@ -15,7 +15,7 @@ class ThirdLevelViewController final : public TableViewController {
   std::optional<std::string> firstSelection;
   std::optional<std::string> secondSelection;
   std::optional<std::string> seguedThroughRow;
-  QelViewItems tableViewFields;
+  const QelViewItems& tableViewFields = QelViewItems::shared();
 
   int numberOfSections() override;
   int numberOfRowsInSection(int section) override;
