@@ -66,7 +66,8 @@ void BatchingSink::draw(std::string_view text) {
     const std::lock_guard lock(_mutex);
     begins = _waiting.empty();
     add(text);
-    if (_isTerminal || _waiting.size() >= kBatch) {
+    const bool wasLostAlone = _dropped > 0 && _waiting.empty();  // nobody else would say so
+    if (_isTerminal || _waiting.size() >= kBatch || wasLostAlone) {
       _slowReader == SlowReader::isWaitedFor ? waitAndWrite() : writeSome();
     }
     begins = begins && !_waiting.empty();

@@ -100,6 +100,20 @@ TEST(SlowReader, losesLinesWholeAndIsToldHowMany) {
   }
 }
 
+// Nothing waited then, so nobody wrote any more, and every further line was lost too.
+TEST(SlowReader, goesOnAfterALineThatIsTooLongForIt) {
+  const Channel channel(Kind::pipe);
+  int asked = 0;
+  BatchingSink sink(
+      channel.in(), [&asked] { ++asked; }, SlowReader::losesLines);
+  sink.write(std::string(BatchingSink::kMostWaiting, 'x'));
+  EXPECT_EQ(asked, 1);
+  sink.write("the next");
+  sink.flushWhatGoes();
+  EXPECT_EQ(linesOf(channel.read()),
+            (std::vector<std::string>{std::string(kDropped) + "1", "the next"}));
+}
+
 TEST(SlowReader, leavesTheDescriptorAsItIsForOthers) {
   for (const Kind kind : {Kind::pipe, Kind::terminal}) {
     const Channel channel(kind);
