@@ -3,22 +3,13 @@
 #include <algorithm>
 #include <utility>
 
+#include "base/Weight.h"
 #include "tesk/Constants.h"
 
 namespace tesk {
 namespace {
 
-constexpr std::size_t kBytesOfAnEntry = 64;
-
-std::size_t sizeOf(const EventBacklog::Event& event) {
-  std::size_t size = kBytesOfAnEntry;
-  for (const auto& [key, value] : event.entries) {
-    size += kBytesOfAnEntry + key.view().size();
-    if (const qel::Bytes* bytes = value.asBytes()) size += bytes->size();
-    if (const auto text = value.asText()) size += text->size();
-  }
-  return size;
-}
+constexpr std::size_t kBytesOfAnEvent = 128;  // beside its entries
 
 std::optional<std::int64_t> metricOf(const EventBacklog::Event& event) {
   if (event.name != kEventMetric) return std::nullopt;
@@ -29,7 +20,7 @@ std::optional<std::int64_t> metricOf(const EventBacklog::Event& event) {
 }  // namespace
 
 bool EventBacklog::add(Event event) {
-  const std::size_t bytes = sizeOf(event);
+  const std::size_t bytes = kBytesOfAnEvent + weightOf(event.entries);
   const auto metric = metricOf(event);
   const std::lock_guard lock(_mutex);
   if (bytes > _limits.bytes) {

@@ -83,6 +83,23 @@ TEST(EventBacklog, staysWithinItsBytes) {
   EXPECT_EQ(backlog.dropped(), 98U);
 }
 
+// What was nested counted for nothing: lists of a recording filled the memory.
+TEST(EventBacklog, weighsWhatIsNested) {
+  EventBacklog backlog({.bytes = 100'000});
+  const auto nested = [](std::int64_t number) {
+    EventBacklog::Event event = metric(number, number);
+    qel::List list;
+    for (int i = 0; i < 1'000; ++i) list.push_back(Dictionary{{"text", std::string(20, 't')}});
+    event.entries.set("list", std::move(list));
+    return event;
+  };
+  for (int i = 0; i < 10; ++i) static_cast<void>(backlog.add(nested(i)));
+  const Numbers left = takeAll(backlog);
+  EXPECT_GE(left.size(), 1U);
+  EXPECT_LE(left.size(), 5U) << "each holds 20,000 bytes of text alone";
+  EXPECT_EQ(left.back(), 9);
+}
+
 TEST(EventBacklog, asksForNoMoreWorkThanEventsMayWait) {
   EventBacklog backlog({.events = 4});
   int asked = 0;

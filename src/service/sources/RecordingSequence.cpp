@@ -7,6 +7,7 @@
 #include <utility>
 
 #include "base/LogSink.h"
+#include "base/Weight.h"
 #include "messages/catalogue/KBBMetricUtility.h"
 #include "tesk/Constants.h"
 
@@ -31,27 +32,6 @@ std::optional<std::uint32_t> metricOf(const ServiceEvent& event) {
 // Of what answers queries, in bytes, roughly; a file may hold as much as it likes.
 constexpr std::size_t kMostMetricsKept = 256;
 constexpr std::size_t kLargestEventKept = 64 * 1024;
-
-std::size_t weightOf(const Dictionary& dictionary);
-
-std::size_t weightOf(const Value& value) {
-  std::size_t weight = sizeof value;
-  if (const auto text = value.asText()) weight += text->size();
-  if (const Bytes* bytes = value.asBytes()) weight += bytes->size();
-  if (const Dictionary* nested = value.asDictionary()) weight += weightOf(*nested);
-  if (const List* list = value.asList()) {
-    for (const Value& element : *list) weight += weightOf(element);
-  }
-  return weight;
-}
-
-std::size_t weightOf(const Dictionary& dictionary) {
-  std::size_t weight = 0;
-  for (const auto& [key, value] : dictionary) {
-    weight += sizeof key + key.view().size() + weightOf(value);
-  }
-  return weight;
-}
 
 bool mayKeep(const EventOfMetric& kept, std::uint32_t metric, const ServiceEvent& event) {
   return (kept.size() < kMostMetricsKept || kept.contains(metric)) &&
