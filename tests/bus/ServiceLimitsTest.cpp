@@ -127,6 +127,16 @@ TEST_F(ServiceLimits, ALargeConfigurationIsRefusedWithItsSizeAndTheLimit) {
   EXPECT_EQ(std::get<1>(answer), "kKeyPayload has 2000000 bytes, at most 4096 are taken");
 }
 
+// Each entry was looked at alone: waiting calls of a few clients could hold tens of megabytes.
+TEST_F(ServiceLimits, ARequestOfManyPayloadsIsRefused) {
+  Caller caller(bus);
+  const auto events = caller.Register("caller");
+  Request request = add(std::vector<std::uint8_t>(4'000, 0x12));
+  request.emplace("other", sdbus::Variant(std::vector<std::uint8_t>(4'000, 0x12)));
+  expectCode(caller.PerformCommand("kCommandAddConfiguration", request),
+             CommandCode::configurationTooLarge);
+}
+
 TEST_F(ServiceLimits, AValueOfATypeThatNoCommandTakesIsRefused) {
   Caller caller(bus);
   const auto events = caller.Register("caller");

@@ -56,24 +56,28 @@ bool skipNumber(sdbus::Message& message, const std::string& type) {
   return type == "b" && skip<bool>(message);
 }
 
-// However many there are: the C++ library would go through them one by one.
-Refusal readData(sdbus::Message& message, std::string_view key) {
+// However many there are: the C++ library would go through them one by one. `left` is what of the
+// data in one request is still taken.
+Refusal readData(sdbus::Message& message, std::string_view key, std::size_t& left) {
   const void* data = nullptr;
   std::size_t size = 0;
   sd_bus_message_read_array(OpenedMessage::within(message), 'y', &data, &size);
-  if (size <= limits::kPayloadBytes) return std::nullopt;
-  return refusal(CommandCode::configurationTooLarge,
-                 nameOf(key) + " has " + std::to_string(size) + " bytes, at most " +
-                     std::to_string(limits::kPayloadBytes) + " are taken");
+  if (size <= left) {
+    left -= size;
+    return std::nullopt;
+  }
+  return refusal(CommandCode::configurationTooLarge, nameOf(key) + " has " + std::to_string(size) +
+                                                         " bytes, at most " + std::to_string(left) +
+                                                         " are taken");
 }
 
-Refusal readValue(sdbus::Message& message, std::string_view key) {
+Refusal readValue(sdbus::Message& message, std::string_view key, std::size_t& dataLeft) {
   std::string type;
   std::string contents;
   message.peekType(type, contents);
   message.enterVariant(contents);
   if (contents == "ay") {
-    if (auto refused = readData(message, key)) return refused;
+    if (auto refused = readData(message, key, dataLeft)) return refused;
   } else if (contents == "s") {
     if (readText(message).size() > kLongestText) return tooLong(nameOf(key));
   } else if (!skipNumber(message, contents)) {
@@ -86,6 +90,7 @@ Refusal readValue(sdbus::Message& message, std::string_view key) {
 Refusal readRequest(sdbus::Message& message) {
   if (readText(message).size() > kLongestText) return tooLong("the command");
   message.enterContainer("{sv}");
+  std::size_t dataLeft = limits::kPayloadBytes;
   for (std::size_t entries = 0; message.enterDictEntry("sv"); ++entries) {
     if (entries == kMostEntries) {
       return refusal(CommandCode::requestTooLarge,
@@ -93,7 +98,7 @@ Refusal readRequest(sdbus::Message& message) {
     }
     const std::string_view key = readText(message);
     if (key.size() > kLongestText) return tooLong("a key");
-    if (auto refused = readValue(message, key)) return refused;
+    if (auto refused = readValue(message, key, dataLeft)) return refused;
     message.exitDictEntry();
   }
   return std::nullopt;
