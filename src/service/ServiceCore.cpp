@@ -113,12 +113,9 @@ EventReceiver::Taken ServiceCore::take(const ServiceEvent& event) {
 }
 
 void ServiceCore::conditionChanged(const SourceCondition& condition) {
-  {
-    // Not the last words of a source that was stopped.
-    const std::lock_guard lock(_mutex);
-    if (!_sourceRunning) return;
-  }
-  _condition.note(condition);
+  // Not the last words of a source that was stopped.
+  const std::lock_guard lock(_mutex);
+  if (_sourceRunning) _condition.note(condition);
 }
 
 CoreStatus ServiceCore::status() const {
