@@ -29,7 +29,7 @@ void StateSaver::changed(When when) {
     _dozing.request_stop();
   }
   _moved.notify_all();
-  if (when != When::now) return;
+  if (when != When::now || _writing || _pausing) return;
   _moved.wait_for(lock, kPatience, [&] { return _pausing || _written >= change; });
 }
 
@@ -54,12 +54,14 @@ void StateSaver::run(const std::stop_token& stop) {
     {
       const std::lock_guard lock(_mutex);
       writing = _changes;
+      _writing = true;
       _isUrgent = false;
     }
     _keeper->save(_state());
     {
       const std::lock_guard lock(_mutex);
       _written = writing;
+      _writing = false;
       _pausing = true;
     }
     _moved.notify_all();

@@ -31,7 +31,8 @@ class StateSaver {
 
   // To be called after a change, by any thread that holds no lock which `state` needs. When the
   // change is written at once, this waits for it, a few milliseconds at most: an answered command
-  // then nearly always outlives even a service that is killed.
+  // then nearly always outlives even a service that is killed. While an earlier one is being
+  // written, nobody waits: a disk that is slow delays one caller, not all that follow.
   void changed(When when = When::now);
 
  private:
@@ -48,6 +49,7 @@ class StateSaver {
   std::uint64_t _changes = 0;
   std::uint64_t _written = 0;  // so many of the changes
   bool _isUrgent = false;
+  bool _writing = false;
   bool _pausing = false;
   std::stop_source _dozing;  // stopped by a change that cannot wait
 

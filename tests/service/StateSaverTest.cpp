@@ -3,6 +3,8 @@
 #include <gtest/gtest.h>
 
 #include <atomic>
+#include <chrono>
+#include <future>
 #include <optional>
 
 #include "service/support/FakeKeeper.h"
@@ -83,6 +85,22 @@ TEST_F(StateSaverTest, WritesAtOnceAgainAfterAQuietSecond) {
   change();
   ASSERT_TRUE(saved->waitFor(2));
   EXPECT_EQ(written().back(), 2);
+}
+
+// Every change waited in vain while an earlier one was being written, and with it every caller.
+TEST_F(StateSaverTest, ADiskThatDoesNotAnswerHoldsUpNoFloodOfChanges) {
+  saved->hold(true);
+  change();
+  EXPECT_TRUE(saved->waitForBegun(1));
+  const auto flood = std::async(std::launch::async, [this] {
+    for (int i = 0; i < 10'000; ++i) change();
+  });
+  EXPECT_EQ(flood.wait_for(std::chrono::seconds(30)), std::future_status::ready);
+  EXPECT_TRUE(written().empty()) << "the disk has not answered yet";
+  saved->hold(false);
+  flood.wait();
+  saver.reset();
+  EXPECT_EQ(written(), (std::vector<std::int64_t>{1, 10'001}));
 }
 
 TEST_F(StateSaverTest, WritesAChangeThatCanWaitWithinASecond) {

@@ -17,9 +17,23 @@ namespace qel::testing {
 class KeptStates {
  public:
   void add(const service::KeptState& state) {
-    const std::lock_guard lock(_mutex);
+    std::unique_lock lock(_mutex);
+    ++_begun;
+    _changed.notify_all();
+    _changed.wait(lock, [&] { return !_isHeld; });
     _states.push_back(state);
     _changed.notify_all();
+  }
+  // Like a disk that does not answer: whoever adds a state waits from now on, or goes on.
+  void hold(bool isHeld) {
+    const std::lock_guard lock(_mutex);
+    _isHeld = isHeld;
+    _changed.notify_all();
+  }
+  // Until so many have begun to add a state.
+  bool waitForBegun(std::size_t count) const {
+    std::unique_lock lock(_mutex);
+    return _changed.wait_for(lock, std::chrono::seconds(30), [&] { return _begun >= count; });
   }
   std::vector<service::KeptState> all() const {
     const std::lock_guard lock(_mutex);
@@ -35,6 +49,8 @@ class KeptStates {
   mutable std::mutex _mutex;
   mutable std::condition_variable _changed;
   std::vector<service::KeptState> _states;
+  std::size_t _begun = 0;
+  bool _isHeld = false;
 };
 
 class FakeKeeper final : public service::StateKeeper {
