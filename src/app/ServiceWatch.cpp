@@ -12,6 +12,7 @@
 namespace qel {
 namespace {
 
+using tesk::bus::kBusy;
 using tesk::bus::kNoAnswer;
 using tesk::bus::kNoBus;
 using tesk::bus::kNoPermission;
@@ -30,6 +31,7 @@ constexpr std::array kWords = {
           ": no permission. Members of the group baseband have it."},
     Words{kTooManyClients, "has too many clients", ": waiting for a place."},
     Words{kNoAnswer, "does not answer", ""},
+    Words{kBusy, "is busy", ""},
     Words{kRefused, "refuses this viewer", ""},
     Words{kNoBus, "not reachable", ": there is no message bus."},
 };

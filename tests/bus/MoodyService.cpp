@@ -13,6 +13,10 @@ namespace {
 
 constexpr const char* kInterface = "tesk.BasebandManager1";
 
+sdbus::Error busy() {
+  return sdbus::Error("org.freedesktop.DBus.Error.LimitsExceeded", "too many calls of this caller");
+}
+
 }  // namespace
 
 MoodyService::MoodyService(const PrivateBus& bus, Mood atRegistration, Mood atCommands)
@@ -27,11 +31,18 @@ MoodyService::MoodyService(const PrivateBus& bus, Mood atRegistration, Mood atCo
         ++_registrations;
         take(std::move(registration));
       });
-  _object->registerMethod("SetDelivery").onInterface(kInterface).implementedAs([](const bool&) {});
+  _object->registerMethod("SetDelivery")
+      .onInterface(kInterface)
+      .implementedAs([this](const bool& on) {
+        const std::lock_guard lock(_mutex);
+        if (isTooBusy(_atCommands)) throw busy();
+        _delivers = on;
+      });
   _object->registerMethod("PerformCommand")
       .onInterface(kInterface)
       .implementedAs([this](Command&& command, const std::string& name, const Entries&) {
         const std::lock_guard lock(_mutex);
+        if (isTooBusy(_atCommands)) return command.returnError(busy());
         _commands.push_back(name);
         take(std::move(command));
       });
@@ -42,7 +53,14 @@ MoodyService::MoodyService(const PrivateBus& bus, Mood atRegistration, Mood atCo
 
 MoodyService::~MoodyService() { _connection->leaveEventLoop(); }
 
+bool MoodyService::isTooBusy(Mood mood) {
+  if (mood != Mood::isBusy) return false;
+  ++_refusals;
+  return true;
+}
+
 void MoodyService::take(Registration registration) {
+  if (isTooBusy(_atRegistration)) return registration.returnError(busy());
   if (_atRegistration == Mood::answers) {
     registration.returnResults(streamTo(_streams));
   } else if (_atRegistration == Mood::refuses) {
@@ -86,6 +104,16 @@ std::vector<std::string> MoodyService::commands() const {
 int MoodyService::registrations() const {
   const std::lock_guard lock(_mutex);
   return _registrations;
+}
+
+int MoodyService::refusals() const {
+  const std::lock_guard lock(_mutex);
+  return _refusals;
+}
+
+bool MoodyService::delivers() const {
+  const std::lock_guard lock(_mutex);
+  return _delivers;
 }
 
 }  // namespace qel::testing

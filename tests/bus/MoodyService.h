@@ -15,7 +15,7 @@ namespace qel::testing {
 // Has the service's name while it lives, and a thread of its own. Sends no events.
 class MoodyService {
  public:
-  enum class Mood { answers, refuses, saysNothing };
+  enum class Mood { answers, refuses, saysNothing, isBusy };
 
   MoodyService(const PrivateBus& bus, Mood atRegistration, Mood atCommands);
   ~MoodyService();
@@ -28,12 +28,16 @@ class MoodyService {
   // Of the commands that it took, in their order.
   std::vector<std::string> commands() const;
   int registrations() const;
+  // Calls that it was too busy for.
+  int refusals() const;
+  bool delivers() const;
 
  private:
   using Entries = std::map<std::string, sdbus::Variant>;
   using Registration = sdbus::Result<sdbus::UnixFd>;
   using Command = sdbus::Result<std::int32_t, std::string, Entries>;
 
+  bool isTooBusy(Mood mood);
   void take(Registration registration);
   void take(Command command);
   static sdbus::UnixFd streamTo(std::vector<sdbus::UnixFd>& kept);
@@ -48,6 +52,8 @@ class MoodyService {
   std::vector<std::string> _commands;
   std::vector<sdbus::UnixFd> _streams;
   int _registrations = 0;
+  int _refusals = 0;
+  bool _delivers = false;
 };
 
 }  // namespace qel::testing

@@ -90,6 +90,42 @@ TEST_F(SlowService, aCommandEndsWithTheServiceThatHasIt) {
   EXPECT_EQ(result.get().code, tesk::kServiceUnreachable);
 }
 
+// A service that was too busy was taken for one that is not there.
+TEST_F(SlowService, aCommandThatABusyServiceRefusedIsSentAgain) {
+  MoodyService service(bus, Mood::answers, Mood::isBusy);
+  Client client(bus, "qelwatch");
+  ASSERT_TRUE(client.waitForReachable(true));
+  auto result = std::async(std::launch::async, [&client] { return client.clear(2); });
+  ASSERT_TRUE(eventually([&service] { return service.refusals() >= 2; }));
+  EXPECT_EQ(client.why(), "baseband manager service is busy");
+  service.setMoods(Mood::answers, Mood::answers);
+  EXPECT_EQ(result.get().code, 0);
+  EXPECT_TRUE(client.waitForReachable(true));
+  EXPECT_EQ(service.commands().size(), 1U);
+  EXPECT_EQ(service.registrations(), 1);
+}
+
+// The refusal ended the registration, and with it what other commands were about to come to.
+TEST_F(SlowService, eventsThatABusyServiceDidNotTurnOnAreAskedForAgain) {
+  MoodyService service(bus, Mood::answers, Mood::isBusy);
+  Client client(bus, "qelwatch");
+  ASSERT_TRUE(client.waitForReachable(true));
+  client.transport().eventsOn();
+  ASSERT_TRUE(eventually([&service] { return service.refusals() >= 2; }));
+  service.setMoods(Mood::answers, Mood::answers);
+  EXPECT_TRUE(eventually([&service] { return service.delivers(); }));
+  EXPECT_TRUE(client.waitForReachable(true));
+  EXPECT_EQ(service.registrations(), 1);
+}
+
+TEST_F(SlowService, aServiceTooBusyToRegisterAClientIsCalledBusy) {
+  MoodyService service(bus, Mood::isBusy, Mood::answers);
+  Client client(bus, "qelwatch");
+  EXPECT_TRUE(eventually([&] { return client.why() == "baseband manager service is busy"; }));
+  service.setMoods(Mood::answers, Mood::answers);
+  EXPECT_TRUE(client.waitForReachable(true));
+}
+
 // Waits until it is told to wait no longer.
 class EndedWait final : public tesk::bus::AnswerWait {
  public:
@@ -176,6 +212,21 @@ TEST_F(ViewerOfASlowService, makesItsStartWithTheServicesOwnAnswers) {
   ChildProcess process(viewer());
   ASSERT_TRUE(eventually([this] { return fs::exists(picture); }));
   ASSERT_TRUE(eventually([&service] { return !service.commands().empty(); }));
+  service.setMoods(Mood::answers, Mood::answers);
+  EXPECT_TRUE(eventually([this] { return said().find("querySpecific") != std::string::npos; }));
+  process.signal(SIGTERM);
+  EXPECT_EQ(process.waitForEnd(), 0);
+  EXPECT_EQ(service.commands(),
+            (std::vector<std::string>{"kCommandClearConfiguration", "kCommandAddConfiguration",
+                                      "kCommandQueryMetric"}));
+  EXPECT_EQ(said().find("error=-"), std::string::npos) << said();
+}
+
+// The start waited for the return of a service that had never gone.
+TEST_F(ViewerOfASlowService, makesItsStartOnceTheServiceIsNoLongerTooBusy) {
+  MoodyService service(bus, Mood::answers, Mood::isBusy);
+  ChildProcess process(viewer());
+  ASSERT_TRUE(eventually([&service] { return service.refusals() >= 2; }));
   service.setMoods(Mood::answers, Mood::answers);
   EXPECT_TRUE(eventually([this] { return said().find("querySpecific") != std::string::npos; }));
   process.signal(SIGTERM);

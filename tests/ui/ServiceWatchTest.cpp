@@ -150,6 +150,13 @@ TEST_F(ServiceWatchTest, everyReasonHasItsOwnNotice) {
   EXPECT_TRUE(window->navigation().notice().startsWith("Baseband manager does not answer since "));
 }
 
+// A service that was too busy was said to be not reachable.
+TEST_F(ServiceWatchTest, aBusyServiceIsCalledBusy) {
+  openWindow();
+  tell(false, tesk::bus::kBusy);
+  EXPECT_EQ(window->navigation().notice(), QStringLiteral("Baseband manager is busy"));
+}
+
 TEST_F(ServiceWatchTest, whatIsLeftOutStandsAtTheFootOfTheFirstScreen) {
   openWindow();
   window->navigation().setLoss(QStringLiteral("1,204 reports left out"));

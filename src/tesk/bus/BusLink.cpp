@@ -49,6 +49,7 @@ BusLink::~BusLink() { detach(kNoBus); }
 
 std::optional<BusLink::Reachability> BusLink::reachability() const {
   if (isOverdue(Clock::now())) return Reachability{false, std::string(kNoAnswer)};
+  if (_busy) return Reachability{false, std::string(kBusy)};
   if (isAttached()) return Reachability{true, ""};
   if (!_why) return std::nullopt;
   return Reachability{false, *_why};
@@ -86,7 +87,7 @@ void BusLink::registered(const sdbus::Error* error, const sdbus::UnixFd& stream)
   _attachedAt = Clock::now();
   if (_deliver) askForDelivery();
   _condition.ask();
-  for (const Command& command : std::exchange(_waiting, {})) send(command);
+  for (Command& command : std::exchange(_waiting, {})) send(std::move(command));
 }
 
 void BusLink::failed(const sdbus::Error& error) {
@@ -104,7 +105,10 @@ void BusLink::setDelivery(bool on) {
 
 void BusLink::askForDelivery() {
   const auto answer = [this, number = _registration](const sdbus::Error* error) {
-    if (error && number == _registration) failed(*error);
+    if (number != _registration) return;
+    if (!error) return becomeIdle();
+    if (isBusy(*error)) return becomeBusy();
+    failed(*error);
   };
   _proxy->callMethodAsync("SetDelivery")
       .onInterface(kInterface)
@@ -115,7 +119,7 @@ void BusLink::askForDelivery() {
 
 void BusLink::performCommand(Command command) {
   if (isAttached()) {
-    send(command);
+    send(std::move(command));
   } else if (_registering) {
     _waiting.push_back(std::move(command));
   } else {
@@ -123,7 +127,7 @@ void BusLink::performCommand(Command command) {
   }
 }
 
-void BusLink::send(const Command& command) {
+void BusLink::send(Command command) {
   if (command.isAbandoned()) return;
   const std::uint64_t number = ++_lastNumber;
   try {
@@ -135,7 +139,7 @@ void BusLink::send(const Command& command) {
                                         std::string message, VariantMap entries) {
           answered(number, error, {code, std::move(message), std::move(entries)});
         });
-    _sent.emplace(number, Sent{Clock::now(), command.answer});
+    _sent.emplace(number, Sent{Clock::now(), std::move(command)});
   } catch (const sdbus::Error& error) {
     command.answer(unreachable(reasonOf(error)), {});
   }
@@ -144,12 +148,34 @@ void BusLink::send(const Command& command) {
 void BusLink::answered(std::uint64_t number, const sdbus::Error* error, CommandReply reply) {
   auto sent = _sent.extract(number);
   if (sent.empty()) return;
+  Command& command = sent.mapped().command;
   if (!error) {
+    becomeIdle();
     auto& [code, message, entries] = reply;
-    return sent.mapped().answer({code, std::move(message)}, fromVariants(entries));
+    return command.answer({code, std::move(message)}, fromVariants(entries));
   }
-  sent.mapped().answer(unreachable(reasonOf(*error)), {});
+  if (isBusy(*error)) {
+    _waiting.push_back(std::move(command));
+    return becomeBusy();
+  }
+  command.answer(unreachable(reasonOf(*error)), {});
   if (isNotRegistered(*error)) failed(*error);
+}
+
+void BusLink::becomeIdle() {
+  if (std::exchange(_busy, false)) _pause = kFirstPause;
+}
+
+void BusLink::becomeBusy() {
+  _busy = true;
+  if (!_tryAgainAt) tryAgainLater(kLongestPause);
+}
+
+void BusLink::tryAgain() {
+  if (!isAttached()) return beginToRegister();
+  _tryAgainAt.reset();
+  askForDelivery();
+  for (Command& command : std::exchange(_waiting, {})) send(std::move(command));
 }
 
 void BusLink::detach(std::string_view why) {
@@ -157,9 +183,13 @@ void BusLink::detach(std::string_view why) {
   _stream.reset();
   _condition.forget();
   _registering = false;
+  _busy = false;
+  _tryAgainAt.reset();
   ++_registration;
   _why = why;
-  for (const auto& [number, sent] : std::exchange(_sent, {})) sent.answer(unreachable(why), {});
+  for (const auto& [number, sent] : std::exchange(_sent, {})) {
+    sent.command.answer(unreachable(why), {});
+  }
   for (const Command& command : std::exchange(_waiting, {})) command.answer(unreachable(why), {});
 }
 
@@ -194,7 +224,7 @@ void BusLink::waitAndProcess(int wakeDescriptor) {
   ::poll(waited.data(), waited.size(), pollTimeout(bus));
   if (waited[2].revents != 0) processStream();
   processBus();
-  if (_tryAgainAt && Clock::now() >= *_tryAgainAt) beginToRegister();
+  if (_tryAgainAt && Clock::now() >= *_tryAgainAt) tryAgain();
 }
 
 void BusLink::processBus() {

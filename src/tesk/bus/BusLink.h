@@ -49,8 +49,9 @@ class BusLink {
   std::optional<Reachability> reachability() const;
 
   void setDelivery(bool on);
-  // Waits for a registration that is under way. A command that the service has takes as long as the
-  // service does: its answer is what it came to.
+  // Waits for a registration that is under way, and is sent again if the service is too busy to
+  // take it. A command that the service has takes as long as the service does: its answer is what
+  // it came to.
   void performCommand(Command command);
 
   // Waits for the bus, the stream or `wakeDescriptor`, and takes what came.
@@ -59,7 +60,7 @@ class BusLink {
  private:
   struct Sent {
     Clock::time_point at;
-    std::function<void(CommandResult, Message)> answer;
+    Command command;
   };
   using CommandReply = std::tuple<std::int32_t, std::string, std::map<std::string, sdbus::Variant>>;
 
@@ -70,10 +71,14 @@ class BusLink {
   void registered(const sdbus::Error* error, const sdbus::UnixFd& stream);
   void failed(const sdbus::Error& error);
   void askForDelivery();
-  void send(const Command& command);
+  void send(Command command);
   void answered(std::uint64_t number, const sdbus::Error* error, CommandReply reply);
   void processBus();
   void processStream();
+  // The service has taken a call, or has refused one that is to be made again.
+  void becomeIdle();
+  void becomeBusy();
+  void tryAgain();
   // The registration is over, and what was sent under it comes to nothing.
   void detach(std::string_view why);
   void tryAgainLater(std::chrono::milliseconds longestPause);
@@ -88,6 +93,7 @@ class BusLink {
   sdbus::UnixFd _stream;
   bool _deliver;
   bool _ownerChanged = false;
+  bool _busy = false;  // refused the last call, and none was taken since
 
   bool _registering = false;
   std::uint64_t _registration = 0;  // its number: answers under an earlier one are void
@@ -96,7 +102,7 @@ class BusLink {
   std::chrono::milliseconds _pause;
   std::optional<std::string> _why;  // none before the first answer
 
-  std::deque<Command> _waiting;         // for the registration
+  std::deque<Command> _waiting;         // for the registration, or a service that was busy
   std::map<std::uint64_t, Sent> _sent;  // not answered yet, by number
   std::uint64_t _lastNumber = 0;
 };

@@ -11,9 +11,12 @@ struct Reason {
   std::string_view words;
 };
 
+constexpr std::string_view kLimitsExceeded = "org.freedesktop.DBus.Error.LimitsExceeded";
+
 constexpr std::array kReasons = {
     Reason{"org.freedesktop.DBus.Error.AccessDenied", kNoPermission},
     Reason{"tesk.BasebandManager1.Error.TooManyClients", kTooManyClients},
+    Reason{kLimitsExceeded, kBusy},
     Reason{"tesk.BasebandManager1.Error.InvalidName", kRefused},
     Reason{"org.freedesktop.DBus.Error.Timeout", kNoAnswer},
     Reason{"org.freedesktop.DBus.Error.TimedOut", kNoAnswer},
@@ -34,6 +37,8 @@ std::string_view reasonOf(const sdbus::Error& error) {
 bool isNotRegistered(const sdbus::Error& error) {
   return error.getName() == "tesk.BasebandManager1.Error.NotRegistered";
 }
+
+bool isBusy(const sdbus::Error& error) { return error.getName() == kLimitsExceeded; }
 
 bool isAbsence(const sdbus::Error& error) {
   return error.getName() == "org.freedesktop.DBus.Error.ServiceUnknown" ||

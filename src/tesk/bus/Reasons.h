@@ -16,6 +16,7 @@ inline constexpr std::string_view kNoPermission =
     "no permission to use the baseband manager service (is the user in group baseband?)";
 inline constexpr std::string_view kTooManyClients = "baseband manager service has too many clients";
 inline constexpr std::string_view kNoAnswer = "baseband manager service does not answer";
+inline constexpr std::string_view kBusy = "baseband manager service is busy";
 inline constexpr std::string_view kRefused = "baseband manager service refuses this client";
 
 // The reason behind an error of a call to the service.
@@ -23,6 +24,9 @@ std::string_view reasonOf(const sdbus::Error& error);
 
 // Whether the error says that the service does not know the caller (any more).
 bool isNotRegistered(const sdbus::Error& error);
+
+// Whether the call was not taken and may be made again after a while.
+bool isBusy(const sdbus::Error& error);
 
 // Whether nothing but the service's appearance can change that: asking again is of no use.
 bool isAbsence(const sdbus::Error& error);
