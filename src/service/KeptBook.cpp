@@ -25,12 +25,25 @@ bool isOlder(std::uint64_t timeMs, std::uint64_t nowMs, std::uint64_t ageMs) {
 
 std::string number(std::size_t value) { return std::to_string(value); }
 
-std::size_t bytesWithout(const KeptState& state, std::int64_t application) {
+struct Taken {
+  std::size_t applications = 0;
   std::size_t bytes = 0;
+};
+
+// What the configurations of other applications take up.
+Taken takenByOthers(const KeptState& state, std::int64_t application) {
+  Taken taken;
   for (const auto& [other, installed] : state.configurations) {
-    if (other != application) bytes += installed.payload.size();
+    if (other == application) continue;
+    ++taken.applications;
+    taken.bytes += installed.payload.size();
   }
-  return bytes;
+  return taken;
+}
+
+bool hasRoomBeside(const Taken& others, std::size_t bytes) {
+  return others.applications < limits::kApplications &&
+         others.bytes + bytes <= limits::kAllPayloadBytes;
 }
 
 // How many other applications have their configuration from the client.
@@ -38,12 +51,6 @@ std::size_t countOthers(const KeptState& state, std::string_view client, std::in
   return static_cast<std::size_t>(std::ranges::count_if(state.configurations, [&](const auto& one) {
     return one.first != application && one.second.client == client;
   }));
-}
-
-bool hasRoom(const KeptState& state, std::int64_t application, std::size_t bytes) {
-  const bool isNew = !state.configurations.contains(application);
-  return state.configurations.size() + (isNew ? 1 : 0) <= limits::kApplications &&
-         bytesWithout(state, application) + bytes <= limits::kAllPayloadBytes;
 }
 
 }  // namespace
@@ -76,7 +83,7 @@ bool KeptBook::restore() {
     auto configuration = DeviceConfiguration::fromPayload(installed.payload, reason);
     if (!_state.applicationOfClient.contains(installed.client)) installed.client.clear();
     const bool fits =
-        hasRoom(_state, application, installed.payload.size()) &&
+        hasRoomBeside(takenByOthers(_state, application), installed.payload.size()) &&
         (installed.client.empty() ||
          countOthers(_state, installed.client, application) < limits::kApplicationsOfOneClient);
     if (!configuration || !fits) continue;
@@ -175,15 +182,20 @@ bool KeptBook::isLongGone(std::string_view client) const {
          isOlder(known->second.usedMs, _clock.nowMs(), limits::kLongGoneMs);
 }
 
-// One of a client that is long gone and of an application that nobody is in.
-bool KeptBook::forgetUnusedConfiguration(std::int64_t except) {
-  const auto unused = std::ranges::find_if(_state.configurations, [&](const auto& one) {
-    return one.first != except && isLongGone(one.second.client) && !isUsed(one.first);
-  });
-  if (unused == _state.configurations.end()) return false;
-  _store.clear(unused->first);
-  _state.configurations.erase(unused);
-  return true;
+// Those of clients that are long gone and of applications that nobody is in.
+std::optional<std::vector<std::int64_t>> KeptBook::givingWay(std::int64_t application,
+                                                             std::size_t bytes) const {
+  Taken taken = takenByOthers(_state, application);
+  std::vector<std::int64_t> giving;
+  for (const auto& [other, installed] : _state.configurations) {
+    if (hasRoomBeside(taken, bytes)) break;
+    if (other == application || !isLongGone(installed.client) || isUsed(other)) continue;
+    giving.push_back(other);
+    --taken.applications;
+    taken.bytes -= installed.payload.size();
+  }
+  if (!hasRoomBeside(taken, bytes)) return std::nullopt;
+  return giving;
 }
 
 std::optional<tesk::CommandResult> KeptBook::makeRoom(std::string_view client,
@@ -194,12 +206,16 @@ std::optional<tesk::CommandResult> KeptBook::makeRoom(std::string_view client,
                    asked + " is one too many: a client may install configurations of " +
                        number(limits::kApplicationsOfOneClient) + " applications");
   }
-  while (!hasRoom(_state, application, bytes)) {
-    if (forgetUnusedConfiguration(application)) continue;
+  const auto giving = givingWay(application, bytes);
+  if (!giving) {
     return refusal(CommandCode::tooManyConfigurations,
                    asked + " finds no room: configurations of at most " +
                        number(limits::kApplications) + " applications and " +
                        number(limits::kAllPayloadBytes) + " bytes are kept");
+  }
+  for (const std::int64_t other : *giving) {
+    _store.clear(other);
+    _state.configurations.erase(other);
   }
   return std::nullopt;
 }

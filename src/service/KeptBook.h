@@ -8,6 +8,7 @@
 #include <optional>
 #include <string>
 #include <string_view>
+#include <vector>
 
 #include "base/Clock.h"
 #include "service/ConfigurationStore.h"
@@ -47,7 +48,11 @@ class KeptBook {
   void disown(std::string_view client);
   bool isUsed(std::int64_t application) const;
   bool isLongGone(std::string_view client) const;
-  bool forgetUnusedConfiguration(std::int64_t except);
+  // The applications whose configurations have to go; nothing when all that may go are too few.
+  std::optional<std::vector<std::int64_t>> givingWay(std::int64_t application,
+                                                     std::size_t bytes) const;
+  // For a configuration that takes more room than there was: it is kept, and saved, with what went
+  // for it. For one that is refused, nothing goes.
   std::optional<tesk::CommandResult> makeRoom(std::string_view client, std::int64_t application,
                                               std::size_t bytes);
 

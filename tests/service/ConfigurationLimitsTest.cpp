@@ -20,23 +20,13 @@ using testing::EventLog;
 using testing::FakeSource;
 using testing::FakeSourceState;
 using ::testing::HasSubstr;
+using testing::triggers;
 
 class DayClock final : public Clock {
  public:
   std::uint64_t nowMs() const override { return timeMs; }
   std::uint64_t timeMs = 1'700'000'000'000;
 };
-
-Bytes triggers(std::size_t count, std::uint32_t first = 1) {
-  DeviceConfig message;
-  message.setFormat(1);
-  for (std::size_t i = 0; i < count; ++i) {
-    auto trigger = std::make_shared<ConfiguredTrigger>();
-    trigger->setFirst(first);
-    message.addTrigger(trigger);
-  }
-  return message.data();
-}
 
 class ConfigurationLimitsTest : public ::testing::Test {
  protected:

@@ -41,6 +41,26 @@ class KeptBookTest : public ::testing::Test {
     return all.empty() ? KeptState{} : all.back();
   }
 
+  // Of clients that were there just now, and one of nobody. A thousand bytes more have room.
+  KeptState nearlyFull() const {
+    KeptState state;
+    state.configurations[kOfNobody] = {ofBytes(1600)};
+    for (int i = 0; i < 32; ++i) {
+      const std::string client = "client " + std::to_string(i / 8);
+      state.configurations[i] = {ofBytes(4000), client};
+      state.applicationOfClient[client] = {i, clock.timeMs};
+    }
+    return state;
+  }
+  // Of about so many.
+  static Bytes ofBytes(std::size_t count) { return testing::triggers(count / 8, 0xFFFFFFFF); }
+  static bool isRefused(KeptBook& book, std::int64_t application, const Bytes& payload) {
+    std::string reason;
+    auto configuration = DeviceConfiguration::fromPayload(payload, reason);
+    return book.install("newcomer", application, payload, std::move(*configuration)).has_value();
+  }
+
+  static constexpr std::int64_t kOfNobody = 900;
   const Bytes payload = testing::configuration({{19972}});
   testing::CapturedSystemLog log;
   StandingClock clock;
@@ -113,6 +133,36 @@ TEST_F(KeptBookTest, WritesACommandThatChangesNothingOnceAnHour) {
   clock.timeMs += 60 * 60 * 1000;
   later->note("qelwatch", 2);
   EXPECT_EQ(lastSaved(std::move(later)).applicationOfClient.at("qelwatch").usedMs, clock.timeMs);
+}
+
+// Those of clients long gone were forgotten even when that was not enough, and nobody was told.
+TEST_F(KeptBookTest, NothingGivesWayToAConfigurationThatIsRefused) {
+  auto full = book(nearlyFull());
+  ASSERT_TRUE(store.find(kOfNobody));
+  EXPECT_TRUE(isRefused(*full, 901, ofBytes(4000)));
+  EXPECT_TRUE(store.find(kOfNobody));
+  EXPECT_FALSE(store.find(901));
+  EXPECT_FALSE(isRefused(*full, 902, ofBytes(900))) << "finds room beside it";
+  EXPECT_TRUE(lastSaved(std::move(full)).configurations.contains(kOfNobody));
+}
+
+TEST_F(KeptBookTest, WhatGivesWayIsSavedAsForgotten) {
+  auto full = book(nearlyFull());
+  EXPECT_FALSE(isRefused(*full, 901, ofBytes(2400)));
+  EXPECT_FALSE(store.find(kOfNobody));
+  ASSERT_TRUE(saved->waitFor(1));
+  EXPECT_FALSE(saved->all().front().configurations.contains(kOfNobody));
+  EXPECT_TRUE(saved->all().front().configurations.contains(901));
+}
+
+TEST_F(KeptBookTest, NoMoreGivesWayThanIsNeeded) {
+  KeptState found;
+  for (int i = 0; i < 64; ++i) found.configurations[i] = {payload};
+  auto full = book(found);
+  EXPECT_FALSE(isRefused(*full, 901, payload));
+  EXPECT_EQ(store.sizes().size(), limits::kApplications);
+  EXPECT_FALSE(isRefused(*full, 5, ofBytes(4000))) << "in place of its own";
+  EXPECT_EQ(store.sizes().size(), limits::kApplications);
 }
 
 TEST_F(KeptBookTest, ReadsAStateThatHasNoTimesAndNoOwners) {

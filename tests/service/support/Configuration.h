@@ -37,6 +37,18 @@ inline Bytes configuration(
   return message.data();
 }
 
+// So many, all alike.
+inline Bytes triggers(std::size_t count, std::uint32_t first = 1) {
+  DeviceConfig message;
+  message.setFormat(1);
+  for (std::size_t i = 0; i < count; ++i) {
+    auto trigger = std::make_shared<ConfiguredTrigger>();
+    trigger->setFirst(first);
+    message.addTrigger(trigger);
+  }
+  return message.data();
+}
+
 inline tesk::Message addRequest(Bytes payload, std::int64_t application = 2) {
   tesk::Message request;
   request.setInt64(tesk::kKeyAppID, application);
