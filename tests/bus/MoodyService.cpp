@@ -46,6 +46,10 @@ MoodyService::MoodyService(const PrivateBus& bus, Mood atRegistration, Mood atCo
         _commands.push_back(name);
         take(std::move(command));
       });
+  _object->registerProperty("Condition").onInterface(kInterface).withGetter([this] {
+    const std::lock_guard lock(_mutex);
+    return Entries{{"text", sdbus::Variant(_condition)}};
+  });
   _object->finishRegistration();
   _connection->requestName(tesk::bus::kServiceName);
   _connection->enterEventLoopAsync();
@@ -94,6 +98,11 @@ void MoodyService::setMoods(Mood atRegistration, Mood atCommands) {
   _atCommands = atCommands;
   for (auto& registration : std::exchange(_unregistered, {})) take(std::move(registration));
   for (auto& command : std::exchange(_unanswered, {})) take(std::move(command));
+}
+
+void MoodyService::setCondition(std::string text) {
+  const std::lock_guard lock(_mutex);
+  _condition = std::move(text);
 }
 
 std::vector<std::string> MoodyService::commands() const {

@@ -25,6 +25,9 @@ class MoodyService {
   // From now on. What it has said nothing to so far it answers as soon as it answers at all.
   void setMoods(Mood atRegistration, Mood atCommands);
 
+  // What it says of its modem from now on, to whoever asks.
+  void setCondition(std::string text);
+
   // Of the commands that it took, in their order.
   std::vector<std::string> commands() const;
   int registrations() const;
@@ -53,6 +56,7 @@ class MoodyService {
   std::vector<sdbus::UnixFd> _streams;
   int _registrations = 0;
   int _refusals = 0;
+  std::string _condition;
   bool _delivers = false;
 };
 

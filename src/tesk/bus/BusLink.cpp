@@ -13,6 +13,7 @@
 #include "tesk/bus/EventPacket.h"
 #include "tesk/bus/MessageConversion.h"
 #include "tesk/bus/Reasons.h"
+#include "tesk/bus/Turn.h"
 
 namespace tesk::bus {
 namespace {
@@ -228,8 +229,7 @@ void BusLink::waitAndProcess(int wakeDescriptor) {
 }
 
 void BusLink::processBus() {
-  while (_connection->processPendingRequest()) {
-  }
+  processTurn(*_connection);
   if (!std::exchange(_ownerChanged, false)) return;
   // Whoever owns the name now knows nothing of us, and the old stream was the old owner's.
   _pause = kFirstPause;

@@ -1,5 +1,6 @@
 #include "tesk/bus/ConditionWatch.h"
 
+#include <cstddef>
 #include <utility>
 #include <vector>
 
@@ -12,6 +13,18 @@ namespace {
 constexpr auto kInterface = tesk::BasebandManager1_proxy::INTERFACE_NAME;
 constexpr const char* kProperties = "org.freedesktop.DBus.Properties";
 constexpr const char* kCondition = "Condition";
+constexpr std::size_t kLongestLine = 256;  // bytes
+
+// Before the line is copied from thread to thread; no character is left in halves.
+void shorten(std::string& line) {
+  if (line.size() <= kLongestLine) return;
+  const auto isWithinCharacter = [](char c) {
+    return (static_cast<unsigned char>(c) & 0xC0) == 0x80;
+  };
+  std::size_t end = kLongestLine;
+  while (end > 0 && isWithinCharacter(line[end])) --end;
+  line.resize(end);
+}
 
 }  // namespace
 
@@ -66,6 +79,7 @@ void ConditionWatch::take(const sdbus::Variant& condition) {
       line = text->second.get<std::string>();
     }
   }
+  shorten(line);
   tell(std::move(line));
 }
 

@@ -10,8 +10,8 @@
 
 namespace tesk::bus {
 
-// Told in one line for people, at first and at every change; empty: there is nothing to say. On a
-// thread of the connection's own.
+// Told in one line for people of 256 bytes at most, at first and at every change; empty: there is
+// nothing to say. On a thread of the connection's own.
 using ConditionObserver = std::function<void(const std::string& line)>;
 
 // One thread, that of the connection; never waits. Without an observer it does nothing.

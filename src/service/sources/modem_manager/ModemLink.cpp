@@ -8,6 +8,7 @@
 
 #include "service/sources/modem_manager/ModemCondition.h"
 #include "service/sources/modem_manager/Names.h"
+#include "tesk/bus/Turn.h"
 
 namespace qel::service {
 namespace {
@@ -51,8 +52,7 @@ void ModemLink::waitAndProcess(int wakeDescriptor, Clock::time_point until) {
 }
 
 void ModemLink::process() {
-  while (_connection->processPendingRequest()) {
-  }
+  tesk::bus::processTurn(*_connection);
   const auto now = Clock::now();
   const auto gone = _tree.step(now);
   if (_watched && gone.contains(_watched->path())) leave();
@@ -129,8 +129,7 @@ void ModemLink::finish() {
       const auto bus = _connection->getEventLoopPollData();
       pollfd waited{bus.fd, bus.events, 0};
       ::poll(&waited, 1, pollTimeout(end, bus.getPollTimeout()));
-      while (_connection->processPendingRequest()) {
-      }
+      tesk::bus::processTurn(*_connection);
     }
   };
   settle();
