@@ -8,6 +8,7 @@
 #include <vector>
 
 #include "base/Rendering.h"
+#include "base/TerminalText.h"
 #include "recording/LineLimits.h"
 
 namespace qel {
@@ -116,7 +117,8 @@ class ObjectBuilder {
 
 std::string quoted(std::string_view text) {
   constexpr std::size_t kMostShown = 64;
-  return jsonText(Value(text.substr(0, kMostShown))) + (text.size() > kMostShown ? "..." : "");
+  return forTerminal(jsonText(Value(text.substr(0, kMostShown)))) +
+         (text.size() > kMostShown ? "..." : "");
 }
 
 std::variant<Dictionary, LineFault> parseJsonLine(std::string_view line) {
@@ -127,7 +129,7 @@ std::variant<Dictionary, LineFault> parseJsonLine(std::string_view line) {
   try {
     Json::sax_parse(line, &builder);
   } catch (const Json::exception& error) {
-    return LineFault{true, error.what()};
+    return LineFault{true, forTerminal(error.what())};
   }
   return builder.result();
 }

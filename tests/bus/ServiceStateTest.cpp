@@ -96,7 +96,7 @@ TEST_F(ServiceState, thatHasNoPlaceIsOneLineAndTheServiceGoesOn) {
   const std::string said = home + "/said";
   const Outcome outcome =
       run("/bin/sh", {"-c", QEL_BASEBANDD " -v --source simulated --bus '" + bus.address() +
-                                "' 2>" + said + " & until grep -q 'on the bus' " + said +
+                                "' 2>" + said + " & until grep -qs 'on the bus' " + said +
                                 "; do sleep 0.05; done; kill $!; wait $!; code=$?; cat " + said +
                                 " >&2; exit $code"});
   EXPECT_EQ(outcome.exitCode, 0);

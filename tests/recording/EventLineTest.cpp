@@ -202,6 +202,14 @@ TEST(EventLine, AFaultQuotesNoMoreThanAMessageCanHold) {
   EXPECT_LT(faultOf(lineWith(", \"" + name + "\": 1e300")).reason.size(), 200U);
 }
 
+// A delete in a key reached the message as it was.
+TEST(EventLine, AFaultQuotesNothingThatATerminalObeys) {
+  EXPECT_THAT(faultOf(lineWith(", \"a\x7F\xC2\x9B\": 1e300")).reason,
+              HasSubstr(R"("a\u007f\u009b")"));
+  EXPECT_THAT(faultOf("{\"time_ms\": 1, \"event\": \"\xE2\x80\xAE\"}").reason,
+              HasSubstr(R"("\u202e")"));
+}
+
 Value nestedLists(std::size_t depth) {
   Value value{List()};
   for (std::size_t i = 1; i < depth; ++i) value = List{std::move(value)};
