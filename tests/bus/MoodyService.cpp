@@ -27,8 +27,10 @@ MoodyService::MoodyService(const PrivateBus& bus, Mood atRegistration, Mood atCo
   _object->registerMethod("Register")
       .onInterface(kInterface)
       .implementedAs([this](Registration&& registration, const std::string&) {
-        const std::lock_guard lock(_mutex);
-        ++_registrations;
+        {
+          const std::lock_guard lock(_mutex);
+          ++_registrations;
+        }
         take(std::move(registration));
       });
   _object->registerMethod("SetDelivery")
@@ -41,9 +43,10 @@ MoodyService::MoodyService(const PrivateBus& bus, Mood atRegistration, Mood atCo
   _object->registerMethod("PerformCommand")
       .onInterface(kInterface)
       .implementedAs([this](Command&& command, const std::string& name, const Entries&) {
-        const std::lock_guard lock(_mutex);
-        if (isTooBusy(_atCommands)) return command.returnError(busy());
-        _commands.push_back(name);
+        {
+          const std::lock_guard lock(_mutex);
+          if (_atCommands != Mood::isBusy) _commands.push_back(name);
+        }
         take(std::move(command));
       });
   _object->registerProperty("Condition").onInterface(kInterface).withGetter([this] {
@@ -64,23 +67,33 @@ bool MoodyService::isTooBusy(Mood mood) {
 }
 
 void MoodyService::take(Registration registration) {
-  if (isTooBusy(_atRegistration)) return registration.returnError(busy());
-  if (_atRegistration == Mood::answers) {
-    registration.returnResults(streamTo(_streams));
-  } else if (_atRegistration == Mood::refuses) {
-    registration.returnError(
-        sdbus::Error("tesk.BasebandManager1.Error.TooManyClients", "too many clients"));
-  } else {
-    _unregistered.push_back(std::move(registration));
+  sdbus::UnixFd stream;
+  Mood mood;
+  bool tooBusy;
+  {
+    const std::lock_guard lock(_mutex);
+    mood = _atRegistration;
+    if (mood == Mood::saysNothing) return _unregistered.push_back(std::move(registration));
+    if (mood == Mood::answers) stream = streamTo(_streams);
+    tooBusy = isTooBusy(mood);
   }
+  if (tooBusy) return registration.returnError(busy());
+  if (mood == Mood::answers) return registration.returnResults(stream);
+  registration.returnError(
+      sdbus::Error("tesk.BasebandManager1.Error.TooManyClients", "too many clients"));
 }
 
 void MoodyService::take(Command command) {
-  if (_atCommands == Mood::saysNothing) {
-    _unanswered.push_back(std::move(command));
-  } else {
-    command.returnResults(_atCommands == Mood::answers ? 0 : 7, "as told", {});
+  Mood mood;
+  bool tooBusy;
+  {
+    const std::lock_guard lock(_mutex);
+    mood = _atCommands;
+    if (mood == Mood::saysNothing) return _unanswered.push_back(std::move(command));
+    tooBusy = isTooBusy(mood);
   }
+  if (tooBusy) return command.returnError(busy());
+  command.returnResults(mood == Mood::answers ? 0 : 7, "as told", {});
 }
 
 sdbus::UnixFd MoodyService::streamTo(std::vector<sdbus::UnixFd>& kept) {
@@ -93,11 +106,17 @@ sdbus::UnixFd MoodyService::streamTo(std::vector<sdbus::UnixFd>& kept) {
 }
 
 void MoodyService::setMoods(Mood atRegistration, Mood atCommands) {
-  const std::lock_guard lock(_mutex);
-  _atRegistration = atRegistration;
-  _atCommands = atCommands;
-  for (auto& registration : std::exchange(_unregistered, {})) take(std::move(registration));
-  for (auto& command : std::exchange(_unanswered, {})) take(std::move(command));
+  std::vector<Registration> unregistered;
+  std::vector<Command> unanswered;
+  {
+    const std::lock_guard lock(_mutex);
+    _atRegistration = atRegistration;
+    _atCommands = atCommands;
+    unregistered.swap(_unregistered);
+    unanswered.swap(_unanswered);
+  }
+  for (auto& registration : unregistered) take(std::move(registration));
+  for (auto& command : unanswered) take(std::move(command));
 }
 
 void MoodyService::setCondition(std::string text) {

@@ -47,6 +47,7 @@ class MoodyService {
 
   std::unique_ptr<sdbus::IConnection> _connection;  // outlives what it has to answer
   std::unique_ptr<sdbus::IObject> _object;
+  // Not held while anything is answered: the bus library calls us with a lock of its own held.
   mutable std::mutex _mutex;
   Mood _atRegistration;
   Mood _atCommands;
