@@ -188,6 +188,18 @@ class ViewerOfASlowService : public SlowService {
     return text.str();
   }
 
+  // Each command of the start once, in order, answered by the service; then SIGTERM ends the
+  // viewer.
+  void expectOneWholeStart(ChildProcess& process, const MoodyService& service) const {
+    EXPECT_TRUE(eventually([this] { return said().find("querySpecific") != std::string::npos; }));
+    process.signal(SIGTERM);
+    EXPECT_EQ(process.waitForEnd(), 0);
+    EXPECT_EQ(service.commands(),
+              (std::vector<std::string>{"kCommandClearConfiguration", "kCommandAddConfiguration",
+                                        "kCommandQueryMetric"}));
+    EXPECT_EQ(said().find("error=-"), std::string::npos) << said();
+  }
+
   const std::string home =
       (fs::temp_directory_path() / ("qelslow" + std::to_string(::getpid()))).string();
   const std::string picture = home + "/picture.png";
@@ -213,13 +225,7 @@ TEST_F(ViewerOfASlowService, makesItsStartWithTheServicesOwnAnswers) {
   ASSERT_TRUE(eventually([this] { return fs::exists(picture); }));
   ASSERT_TRUE(eventually([&service] { return !service.commands().empty(); }));
   service.setMoods(Mood::answers, Mood::answers);
-  EXPECT_TRUE(eventually([this] { return said().find("querySpecific") != std::string::npos; }));
-  process.signal(SIGTERM);
-  EXPECT_EQ(process.waitForEnd(), 0);
-  EXPECT_EQ(service.commands(),
-            (std::vector<std::string>{"kCommandClearConfiguration", "kCommandAddConfiguration",
-                                      "kCommandQueryMetric"}));
-  EXPECT_EQ(said().find("error=-"), std::string::npos) << said();
+  expectOneWholeStart(process, service);
 }
 
 // The start waited for the return of a service that had never gone.
@@ -228,13 +234,7 @@ TEST_F(ViewerOfASlowService, makesItsStartOnceTheServiceIsNoLongerTooBusy) {
   ChildProcess process(viewer());
   ASSERT_TRUE(eventually([&service] { return service.refusals() >= 2; }));
   service.setMoods(Mood::answers, Mood::answers);
-  EXPECT_TRUE(eventually([this] { return said().find("querySpecific") != std::string::npos; }));
-  process.signal(SIGTERM);
-  EXPECT_EQ(process.waitForEnd(), 0);
-  EXPECT_EQ(service.commands(),
-            (std::vector<std::string>{"kCommandClearConfiguration", "kCommandAddConfiguration",
-                                      "kCommandQueryMetric"}));
-  EXPECT_EQ(said().find("error=-"), std::string::npos) << said();
+  expectOneWholeStart(process, service);
 }
 
 }  // namespace
