@@ -7,6 +7,7 @@
 #include <chrono>
 #include <csignal>
 
+#include "bus/ErrorOf.h"
 #include "bus/ServiceProcess.h"
 #include "service/CommandCodes.h"
 #include "service/Limits.h"
@@ -68,14 +69,6 @@ class ServiceLimits : public ::testing::Test {
  protected:
   void SetUp() override { ASSERT_TRUE(Client(bus, "first").waitForReachable(true)); }
 
-  static std::string errorOf(const std::function<void()>& call) {
-    try {
-      call();
-    } catch (const sdbus::Error& error) {
-      return error.getName();
-    }
-    return "no error";
-  }
   static void expectCode(const std::tuple<std::int32_t, std::string, Request>& answer,
                          CommandCode code) {
     EXPECT_EQ(std::get<0>(answer), static_cast<std::int32_t>(code)) << std::get<1>(answer);

@@ -7,6 +7,7 @@
 #include <fstream>
 #include <set>
 
+#include "bus/ErrorOf.h"
 #include "bus/ServiceProcess.h"
 #include "messages/catalogue/KBBMetricUtility.h"
 #include "tesk/bus/BasebandManager1Proxy.h"
@@ -32,15 +33,6 @@ class ServiceOnTheBus : public ::testing::Test {
     ASSERT_TRUE(Client(bus, "first").waitForReachable(true));
     RawClient raw(*connection);
     ASSERT_TRUE(eventually([&] { return raw.Clients().empty(); }));
-  }
-
-  static std::string errorOf(const std::function<void()>& call) {
-    try {
-      call();
-    } catch (const sdbus::Error& error) {
-      return error.getName();
-    }
-    return "no error";
   }
 
   // Calls until the condition holds, for ten seconds at most.
