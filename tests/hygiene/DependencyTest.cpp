@@ -17,6 +17,7 @@ namespace {
 const std::map<std::string, std::set<std::string>> kAllowed = {
     {"base", {}},
     {"messages", {"base"}},
+    {"rrc", {"base"}},
     {"recording", {"base", "messages"}},
     {"tesk", {"base", "messages"}},
     {"connection", {"base", "tesk"}},
