@@ -35,13 +35,16 @@ enum class ReleaseCause : std::uint8_t {
   csFallbackHighPriority,
   rrcSuspend,
 };
-enum class Target : std::uint8_t {  // of a redirection or a handover
+enum class Target : std::uint8_t {  // of a redirection, a handover or a measurement
   eutra,
   geran,
   utraFdd,
   utraTdd,
+  utra,  // FDD or TDD
   cdma2000Hrpd,
   cdma20001xRtt,
+  cdma2000,  // either
+  wlan,
   nr,
 };
 
@@ -102,7 +105,7 @@ struct MeasurementObject {
 };
 
 struct MeasurementIdentity {
-  unsigned id = 0;      // 1 to 32
+  unsigned id = 0;      // 1 to 64
   unsigned object = 0;  // 1 to 32
 };
 
@@ -163,7 +166,7 @@ struct ServingResult {  // a secondary cell's
 };
 
 struct MeasurementReport {
-  unsigned id = 0;  // 1 to 32
+  unsigned id = 0;  // 1 to 64
   unsigned rsrp = 0;
   unsigned rsrq = 0;
   std::vector<EutraResult> eutra;

@@ -16,7 +16,7 @@ struct MasterInformationBlock {
 };
 
 struct Plmn {
-  std::optional<unsigned> mcc;  // absent: that of the one before it in the list
+  std::optional<unsigned> mcc;  // absent: the first of the list did not say
   unsigned mnc = 0;
   unsigned mncDigits = 0;  // 2 or 3
   bool reservedForOperator = false;
@@ -54,8 +54,7 @@ struct AccessBarring {
 };
 
 struct Sib2 {
-  bool saysBarring = false;  // the block of the three that follow was there
-  std::optional<bool> barredForEmergency;
+  std::optional<bool> barredForEmergency;  // absent: nothing is barred for anybody
   std::optional<AccessBarring> forSignalling;
   std::optional<AccessBarring> forData;
   std::optional<std::uint32_t> ulEarfcn;
