@@ -91,13 +91,13 @@ void sendWanted(Shared& shared, const std::vector<RecordedEvent>& events, const 
 }
 
 // The events of a recording, again and again.
-class WantedSource final : public service::EventSource {
+class WantedSource final : public sources::EventSource {
  public:
   WantedSource(Shared& shared, std::vector<RecordedEvent> events)
       : _shared(shared), _events(std::move(events)) {}
 
-  void start(std::weak_ptr<service::EventReceiver> receiver,
-             std::shared_ptr<service::ListenerSignal>) override {
+  void start(std::weak_ptr<sources::EventReceiver> receiver,
+             std::shared_ptr<sources::ListenerSignal>) override {
     std::thread([this, receiver = std::move(receiver)] {
       sendWanted(_shared, _events, [&receiver](Dictionary entries) {
         const auto core = receiver.lock();
@@ -106,7 +106,7 @@ class WantedSource final : public service::EventSource {
     }).detach();
   }
   void stop() override {}
-  service::SourceAnswer query(std::uint32_t) override { return {}; }
+  sources::SourceAnswer query(std::uint32_t) override { return {}; }
   std::string description() const override { return "wanted events"; }
 
  private:

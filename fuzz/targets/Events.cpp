@@ -20,7 +20,7 @@
 namespace qel::fuzz {
 namespace {
 
-using service::ServiceEvent;
+using sources::SourceEvent;
 
 constexpr int kMostEvents = 16;
 
@@ -61,7 +61,7 @@ class World {
     _overBus = overBus;
     static_cast<MetricStore&>(*_viewer) = MetricStore();
   }
-  void send(const ServiceEvent& event) { _core->take(event); }
+  void send(const SourceEvent& event) { _core->take(event); }
   void draw() {
     for (const auto& screen : _screens) snapshotOf(*screen);
   }
@@ -91,7 +91,7 @@ class World {
   std::vector<std::shared_ptr<SecondLevelViewController>> _screens;
 };
 
-ServiceEvent nextEvent(Input& input) {
+SourceEvent nextEvent(Input& input) {
   constexpr std::uint8_t kIsTrigger = 1;
   constexpr std::uint8_t kHasMore = 2;
   constexpr std::uint8_t kHasNoPayload = 4;
@@ -101,7 +101,7 @@ ServiceEvent nextEvent(Input& input) {
   const std::size_t which = input.byte();
   const std::uint32_t metric =
       which < metrics.size() ? metrics[which].identifier : input.number<std::uint32_t>();
-  ServiceEvent event{input.number<std::uint64_t>(), tesk::kEventMetric, {}};
+  SourceEvent event{input.number<std::uint64_t>(), tesk::kEventMetric, {}};
   if ((kind & kIsTrigger) != 0) {
     event.stream = tesk::kEventTrigger;
     event.entries.set(tesk::kKeyTriggerID, std::int64_t{metric});

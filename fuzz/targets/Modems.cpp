@@ -5,17 +5,17 @@
 #include "fuzz/support/Law.h"
 #include "fuzz/support/Target.h"
 #include "fuzz/support/Variants.h"
-#include "service/ServiceEvent.h"
-#include "service/sources/modem_manager/CellReadings.h"
-#include "service/sources/modem_manager/MetricKeeper.h"
-#include "service/sources/modem_manager/ModemReading.h"
-#include "service/sources/modem_manager/ModemReports.h"
-#include "service/sources/modem_manager/Names.h"
+#include "service/EventSubject.h"
+#include "sources/modem_manager/CellReadings.h"
+#include "sources/modem_manager/MetricKeeper.h"
+#include "sources/modem_manager/ModemReading.h"
+#include "sources/modem_manager/ModemReports.h"
+#include "sources/modem_manager/Names.h"
 
 namespace qel::fuzz {
 namespace {
 
-using namespace service;
+using namespace sources;
 
 // Objects are called as fuzz/support/Variants.cpp calls them.
 constexpr const char* kModemPath = "/0";
@@ -116,7 +116,7 @@ ModemAnswers nextAnswers(Input& input) {
   return answers;
 }
 
-void expectTaken(const ServiceEvent& event) {
+void expectTaken(const SourceEvent& event) {
   EventFault fault;
   law(examineEvent(event, fault).has_value(), "every report of a modem can be delivered");
 }
@@ -132,13 +132,12 @@ void tryInput(Input input) {
   MetricKeeper keeper(kPeriod);
   const MetricKeeper::Clock::time_point now{kPeriod};
   int sent = 0;
-  keeper.update(picture, timeMs, now, [&](const ServiceEvent& event) {
+  keeper.update(picture, timeMs, now, [&](const SourceEvent& event) {
     ++sent;
     expectTaken(event);
   });
-  keeper.update(picture, timeMs + 1, now, [](const ServiceEvent&) {
-    law(false, "a value that did not change is sent once");
-  });
+  keeper.update(picture, timeMs + 1, now,
+                [](const SourceEvent&) { law(false, "a value that did not change is sent once"); });
   int answered = 0;
   for (const ModemReportRow& row : modemReports()) {
     if (keeper.query(row.metric).code == CommandCode::done) ++answered;

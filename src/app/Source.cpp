@@ -50,7 +50,7 @@ void Source::showIn(Navigation& navigation) {
 }
 
 int Source::openWithin(const std::string& source) {
-  service::SourceError error;
+  sources::SourceError error;
   auto core = service::makeServiceCore(source, error);
   if (!core) {
     complain("qelwatch", error.message);

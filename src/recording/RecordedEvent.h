@@ -7,6 +7,7 @@
 #include <string_view>
 
 #include "base/Value.h"
+#include "messages/catalogue/EventNames.h"
 
 namespace qel {
 
@@ -38,7 +39,7 @@ constexpr std::optional<RecordedKind> recordedKind(std::string_view name) {
 }
 
 // The keys of the event dictionary that a recording knows; any other one is kept as it came.
-inline constexpr std::string_view kRecordedMetricKey = "kKeyMetricID";
-inline constexpr std::string_view kRecordedPayloadKey = "kKeyPayload";
+inline constexpr std::string_view kRecordedMetricKey = tesk::kKeyMetricID;
+inline constexpr std::string_view kRecordedPayloadKey = tesk::kKeyPayload;
 
 }  // namespace qel

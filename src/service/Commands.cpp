@@ -100,9 +100,9 @@ tesk::CommandResult ServiceCore::queryMetric(Session& session, const Dictionary&
   }
   _book.note(session.clientName(), application);
   if (session.application() != application) join(session, application);
-  SourceAnswer answer = _source->query(*metric);
-  if (answer.code != CommandCode::done) return refusal(answer.code, std::move(answer.message));
-  ServiceEvent event{answer.timeMs, tesk::kEventMetric, std::move(answer.entries)};
+  sources::SourceAnswer answer = _source->query(*metric);
+  if (!answer.known) return refusal(CommandCode::metricNotAvailable, std::move(answer.message));
+  sources::SourceEvent event{answer.timeMs, tesk::kEventMetric, std::move(answer.entries)};
   event.entries.set(tesk::kKeyProfileID, profile);
   event.entries.set(tesk::kKeyTriggerRef, triggerRef);
   event.entries.set(tesk::kKeyTriggerID, trigger);

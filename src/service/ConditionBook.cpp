@@ -11,8 +11,8 @@ namespace {
 constexpr std::uint64_t kMinuteMs = 60'000;
 constexpr int kMostLinesInMinute = 10;
 
-std::string lineAbout(const SourceCondition& condition) {
-  std::string line = "baseband source: " + inWords(condition);
+std::string lineAbout(const sources::SourceCondition& condition) {
+  std::string line = "baseband source: " + sources::inWords(condition);
   if (!condition.model.empty()) line += ", model " + condition.model;
   if (!condition.driver.empty()) line += ", driver " + condition.driver;
   return line;
@@ -20,12 +20,12 @@ std::string lineAbout(const SourceCondition& condition) {
 
 }  // namespace
 
-SourceCondition ConditionBook::current() const {
+sources::SourceCondition ConditionBook::current() const {
   const std::lock_guard lock(_mutex);
   return _current;
 }
 
-void ConditionBook::note(const SourceCondition& condition) {
+void ConditionBook::note(const sources::SourceCondition& condition) {
   if (!replace(condition)) return;
   log(condition);
   tell();
@@ -40,7 +40,7 @@ void ConditionBook::observe(Observer observer) {
   _observer = std::move(observer);
 }
 
-bool ConditionBook::replace(const SourceCondition& condition) {
+bool ConditionBook::replace(const sources::SourceCondition& condition) {
   const std::lock_guard lock(_mutex);
   if (_current == condition) return false;
   _current = condition;
@@ -53,7 +53,7 @@ void ConditionBook::tell() {
 }
 
 // A modem that comes and goes all the time does not fill the log.
-void ConditionBook::log(const SourceCondition& condition) {
+void ConditionBook::log(const sources::SourceCondition& condition) {
   std::string line = lineAbout(condition);
   {
     const std::lock_guard lock(_mutex);

@@ -6,7 +6,7 @@
 #include <mutex>
 
 #include "base/Clock.h"
-#include "service/sources/SourceCondition.h"
+#include "sources/SourceCondition.h"
 
 namespace qel::service {
 
@@ -19,8 +19,8 @@ class ConditionBook {
 
   explicit ConditionBook(const Clock& clock) : _clock(clock) {}
 
-  SourceCondition current() const;
-  void note(const SourceCondition& condition);
+  sources::SourceCondition current() const;
+  void note(const sources::SourceCondition& condition);
   // Nothing is known any more, as while the source does not run. Not logged.
   void forget();
   // In place of an earlier one, which is called no more once this has returned; an empty one ends
@@ -28,13 +28,13 @@ class ConditionBook {
   void observe(Observer observer);
 
  private:
-  bool replace(const SourceCondition& condition);
+  bool replace(const sources::SourceCondition& condition);
   void tell();
-  void log(const SourceCondition& condition);
+  void log(const sources::SourceCondition& condition);
 
   const Clock& _clock;
   mutable std::mutex _mutex;  // guards all but the observer
-  SourceCondition _current;
+  sources::SourceCondition _current;
   std::uint64_t _minuteMs = 0;  // when the minute began that is counted
   int _linesInMinute = 0;
   std::mutex _observerMutex;  // held while it runs

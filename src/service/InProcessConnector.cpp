@@ -2,7 +2,7 @@
 
 #include <utility>
 
-#include "service/sources/SourceChoice.h"
+#include "sources/SourceChoice.h"
 
 namespace qel::service {
 namespace {
@@ -41,11 +41,12 @@ class InProcessConnector final : public tesk::Connector {
 
 }  // namespace
 
-std::shared_ptr<ServiceCore> makeServiceCore(const std::string& sourceText, SourceError& error,
+std::shared_ptr<ServiceCore> makeServiceCore(const std::string& sourceText,
+                                             sources::SourceError& error,
                                              std::unique_ptr<StateKeeper> keeper) {
-  const auto choice = parseSourceChoice(sourceText, error);
+  const auto choice = sources::parseSourceChoice(sourceText, error);
   if (!choice) return nullptr;
-  auto source = makeSource(*choice, error);
+  auto source = sources::makeSource(*choice, error);
   if (!source) return nullptr;
   return ServiceCore::create(std::move(source), systemClock(), std::move(keeper));
 }
@@ -55,7 +56,7 @@ std::shared_ptr<tesk::Connector> makeInProcessConnector(std::shared_ptr<ServiceC
 }
 
 std::shared_ptr<tesk::Connector> makeInProcessConnector(const std::string& sourceText,
-                                                        SourceError& error) {
+                                                        sources::SourceError& error) {
   auto core = makeServiceCore(sourceText, error);
   return core ? makeInProcessConnector(std::move(core)) : nullptr;
 }

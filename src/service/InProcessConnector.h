@@ -5,14 +5,15 @@
 #include <string>
 
 #include "service/ServiceCore.h"
-#include "service/sources/SourceError.h"
+#include "sources/SourceError.h"
 #include "tesk/Transport.h"
 
 namespace qel::service {
 
 // The core on a source, named as for parseSourceChoice. Nothing when there is no such source;
 // `error` then holds an exit code and one line why. With a keeper, configurations outlive the core.
-std::shared_ptr<ServiceCore> makeServiceCore(const std::string& sourceText, SourceError& error,
+std::shared_ptr<ServiceCore> makeServiceCore(const std::string& sourceText,
+                                             sources::SourceError& error,
                                              std::unique_ptr<StateKeeper> keeper = nullptr);
 
 // Connections straight to the core. Sinks run on the source's thread, or in a query on the
@@ -21,6 +22,6 @@ std::shared_ptr<tesk::Connector> makeInProcessConnector(std::shared_ptr<ServiceC
 
 // Both in one.
 std::shared_ptr<tesk::Connector> makeInProcessConnector(const std::string& sourceText,
-                                                        SourceError& error);
+                                                        sources::SourceError& error);
 
 }  // namespace qel::service

@@ -56,7 +56,7 @@ std::size_t countOthers(const KeptState& state, std::string_view client, std::in
 }  // namespace
 
 KeptBook::KeptBook(std::unique_ptr<StateKeeper> keeper, ConfigurationStore& store,
-                   const Clock& clock, WaitClock& waitClock)
+                   const Clock& clock, sources::WaitClock& waitClock)
     : _store(store), _clock(clock) {
   if (!keeper) return;
   _state = keeper->load();

@@ -24,7 +24,7 @@ class KeptBook {
  public:
   // The store holds what is installed; it and the clocks outlive the book.
   KeptBook(std::unique_ptr<StateKeeper> keeper, ConfigurationStore& store, const Clock& clock,
-           WaitClock& waitClock);
+           sources::WaitClock& waitClock);
 
   // A client is there, or has gone. The first gives the application of its last command, if any.
   std::optional<std::int64_t> opened(std::string_view client);

@@ -7,16 +7,16 @@
 
 namespace qel::service {
 
-std::shared_ptr<ServiceCore> ServiceCore::create(std::unique_ptr<EventSource> source,
+std::shared_ptr<ServiceCore> ServiceCore::create(std::unique_ptr<sources::EventSource> source,
                                                  const Clock& clock,
                                                  std::unique_ptr<StateKeeper> keeper,
-                                                 WaitClock& waitClock) {
+                                                 sources::WaitClock& waitClock) {
   return std::shared_ptr<ServiceCore>(
       new ServiceCore(std::move(source), clock, std::move(keeper), waitClock));
 }
 
-ServiceCore::ServiceCore(std::unique_ptr<EventSource> source, const Clock& clock,
-                         std::unique_ptr<StateKeeper> keeper, WaitClock& waitClock)
+ServiceCore::ServiceCore(std::unique_ptr<sources::EventSource> source, const Clock& clock,
+                         std::unique_ptr<StateKeeper> keeper, sources::WaitClock& waitClock)
     : _undecodableLog(clock),
       _tagLog(clock, "not logged one by one: "),
       _condition(clock),
@@ -63,7 +63,8 @@ std::vector<std::shared_ptr<Session>> ServiceCore::sessions() const {
 
 // Whoever receives the event reads it again: what that logs is not to be said twice, nor is one
 // payload to fill the log.
-std::optional<EventSubject> ServiceCore::examine(const ServiceEvent& event, EventFault& fault) {
+std::optional<EventSubject> ServiceCore::examine(const sources::SourceEvent& event,
+                                                 EventFault& fault) {
   const CountedTagLines lines;
   auto subject = examineEvent(event, fault);
   noteTagLines(lines.count());
@@ -75,7 +76,7 @@ void ServiceCore::noteTagLines(std::size_t lines) {
   _tagLog.note(std::to_string(lines) + " lines about metric identifiers in place of fields");
 }
 
-EventReceiver::Taken ServiceCore::take(const ServiceEvent& event) {
+sources::EventReceiver::Taken ServiceCore::take(const sources::SourceEvent& event) {
   EventFault fault;
   const auto subject = examine(event, fault);
   if (!subject) {
@@ -112,7 +113,7 @@ EventReceiver::Taken ServiceCore::take(const ServiceEvent& event) {
   return Taken::yes;
 }
 
-void ServiceCore::conditionChanged(const SourceCondition& condition) {
+void ServiceCore::conditionChanged(const sources::SourceCondition& condition) {
   // Not the last words of a source that was stopped.
   const std::lock_guard lock(_mutex);
   if (_sourceRunning) _condition.note(condition);

@@ -19,7 +19,7 @@
 #include "service/KeptBook.h"
 #include "service/Session.h"
 #include "service/UndecodableLog.h"
-#include "service/sources/EventSource.h"
+#include "sources/EventSource.h"
 #include "tesk/Transport.h"
 
 namespace qel::service {
@@ -28,15 +28,16 @@ namespace qel::service {
 // The core's lock guards the list of sessions and whether the source runs; no sink, no session and
 // no query runs under it. The source runs from the first session that switches events on until the
 // last session closes.
-class ServiceCore final : public EventReceiver, public std::enable_shared_from_this<ServiceCore> {
+class ServiceCore final : public sources::EventReceiver,
+                          public std::enable_shared_from_this<ServiceCore> {
  public:
   // Both clocks outlive the core: one spaces out log lines and tells when a client was there last,
   // the other spaces out what is written. With a keeper, configurations and whose they are outlive
   // the core.
-  static std::shared_ptr<ServiceCore> create(std::unique_ptr<EventSource> source,
-                                             const Clock& clock = systemClock(),
-                                             std::unique_ptr<StateKeeper> keeper = nullptr,
-                                             WaitClock& waitClock = steadyWaitClock());
+  static std::shared_ptr<ServiceCore> create(
+      std::unique_ptr<sources::EventSource> source, const Clock& clock = systemClock(),
+      std::unique_ptr<StateKeeper> keeper = nullptr,
+      sources::WaitClock& waitClock = sources::steadyWaitClock());
   ~ServiceCore() override;
 
   // A session starts with events off. A client that comes back under the same name belongs to the
@@ -64,8 +65,8 @@ class ServiceCore final : public EventReceiver, public std::enable_shared_from_t
   ConditionBook& condition() { return _condition; }
 
   // EventReceiver, for the source.
-  Taken take(const ServiceEvent& event) override;
-  void conditionChanged(const SourceCondition& condition) override;
+  Taken take(const sources::SourceEvent& event) override;
+  void conditionChanged(const sources::SourceCondition& condition) override;
 
  private:
   using Handler = tesk::CommandResult (ServiceCore::*)(Session&, const Dictionary&);
@@ -75,20 +76,21 @@ class ServiceCore final : public EventReceiver, public std::enable_shared_from_t
   };
   static const std::array<Command, 3> kCommands;
 
-  ServiceCore(std::unique_ptr<EventSource> source, const Clock& clock,
-              std::unique_ptr<StateKeeper> keeper, WaitClock& waitClock);
+  ServiceCore(std::unique_ptr<sources::EventSource> source, const Clock& clock,
+              std::unique_ptr<StateKeeper> keeper, sources::WaitClock& waitClock);
 
   tesk::CommandResult addConfiguration(Session& session, const Dictionary& request);
   tesk::CommandResult clearConfiguration(Session& session, const Dictionary& request);
   tesk::CommandResult queryMetric(Session& session, const Dictionary& request);
   // From now on the session is of this application.
   void join(Session& session, std::int64_t application);
-  std::optional<EventSubject> examine(const ServiceEvent& event, EventFault& fault);
+  std::optional<EventSubject> examine(const sources::SourceEvent& event, EventFault& fault);
   void noteTagLines(std::size_t lines);
   std::vector<std::shared_ptr<Session>> sessions() const;
 
   ConfigurationStore _configurations;
-  const std::shared_ptr<ListenerSignal> _listeners = std::make_shared<ListenerSignal>();
+  const std::shared_ptr<sources::ListenerSignal> _listeners =
+      std::make_shared<sources::ListenerSignal>();
   UndecodableLog _undecodableLog;
   UndecodableLog _tagLog;
   ConditionBook _condition;
@@ -108,7 +110,7 @@ class ServiceCore final : public EventReceiver, public std::enable_shared_from_t
   std::atomic<std::uint64_t> _refusedCommands = 0;
 
   // Last: gone before anything that its events might need.
-  const std::unique_ptr<EventSource> _source;
+  const std::unique_ptr<sources::EventSource> _source;
 };
 
 }  // namespace qel::service

@@ -37,12 +37,12 @@ void Session::close() {
   _on = false;
 }
 
-void Session::deliver(const ServiceEvent& event) {
+void Session::deliver(const sources::SourceEvent& event) {
   ++_delivered;
   _sink(event.stream, tesk::Message(event.entries));
 }
 
-bool Session::wants(const DeviceConfiguration& configuration, const ServiceEvent& event,
+bool Session::wants(const DeviceConfiguration& configuration, const sources::SourceEvent& event,
                     const EventSubject& subject) {
   if (!subject.isMetric) return configuration.wantsTrigger(subject.identifier);
   const auto periodMs = configuration.periodMs(static_cast<std::uint32_t>(subject.identifier));
@@ -57,7 +57,7 @@ bool Session::wants(const DeviceConfiguration& configuration, const ServiceEvent
   return true;
 }
 
-Session::Offer Session::offer(const ServiceEvent& event, const EventSubject& subject) {
+Session::Offer Session::offer(const sources::SourceEvent& event, const EventSubject& subject) {
   const std::lock_guard lock(_deliveryMutex);
   if (!_on) return Offer::off;
   const auto application = this->application();
@@ -71,7 +71,7 @@ Session::Offer Session::offer(const ServiceEvent& event, const EventSubject& sub
   return Offer::delivered;
 }
 
-bool Session::answer(const ServiceEvent& event) {
+bool Session::answer(const sources::SourceEvent& event) {
   const std::lock_guard lock(_deliveryMutex);
   if (!_on) return false;
   deliver(event);

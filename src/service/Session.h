@@ -10,7 +10,7 @@
 
 #include "service/ConfigurationStore.h"
 #include "service/Counters.h"
-#include "service/ServiceEvent.h"
+#include "service/EventSubject.h"
 #include "tesk/Transport.h"
 
 namespace qel::service {
@@ -40,18 +40,18 @@ class Session {
   void close();
 
   // Delivers the event if this client listens and wants it.
-  Offer offer(const ServiceEvent& event, const EventSubject& subject);
+  Offer offer(const sources::SourceEvent& event, const EventSubject& subject);
   // Delivers what the client asked for, whatever its configuration. False when events are off.
-  bool answer(const ServiceEvent& event);
+  bool answer(const sources::SourceEvent& event);
   // Counts an event that went past for want of a listener here.
   void pass(Offer missed);
 
   SessionStatus status() const;
 
  private:
-  bool wants(const DeviceConfiguration& configuration, const ServiceEvent& event,
+  bool wants(const DeviceConfiguration& configuration, const sources::SourceEvent& event,
              const EventSubject& subject);
-  void deliver(const ServiceEvent& event);
+  void deliver(const sources::SourceEvent& event);
 
   const std::string _clientName;
   const tesk::EventSink _sink;

@@ -13,7 +13,7 @@ constexpr auto kPatience = 20ms;
 }  // namespace
 
 StateSaver::StateSaver(std::unique_ptr<StateKeeper> keeper, std::function<KeptState()> state,
-                       WaitClock& clock)
+                       sources::WaitClock& clock)
     : _keeper(std::move(keeper)),
       _state(std::move(state)),
       _clock(clock),

@@ -10,7 +10,7 @@
 #include <thread>
 
 #include "service/StateKeeper.h"
-#include "service/sources/WaitClock.h"
+#include "sources/WaitClock.h"
 
 namespace qel::service {
 
@@ -24,7 +24,7 @@ class StateSaver {
 
   // `state` gives what is to be written, on the saver's thread. It and `clock` outlive the saver.
   StateSaver(std::unique_ptr<StateKeeper> keeper, std::function<KeptState()> state,
-             WaitClock& clock);
+             sources::WaitClock& clock);
   ~StateSaver();
   StateSaver(const StateSaver&) = delete;
   StateSaver& operator=(const StateSaver&) = delete;
@@ -42,7 +42,7 @@ class StateSaver {
 
   const std::unique_ptr<StateKeeper> _keeper;
   const std::function<KeptState()> _state;
-  WaitClock& _clock;
+  sources::WaitClock& _clock;
 
   std::mutex _mutex;
   std::condition_variable_any _moved;

@@ -11,8 +11,8 @@ namespace {
 constexpr std::array kStopSignals = {SIGINT, SIGTERM};
 
 std::atomic<int> noted = 0;
-std::atomic<const tesk::bus::WakeUp*> woken = nullptr;
-static_assert(std::atomic<const tesk::bus::WakeUp*>::is_always_lock_free);
+std::atomic<const WakeUp*> woken = nullptr;
+static_assert(std::atomic<const WakeUp*>::is_always_lock_free);
 
 extern "C" void stopSignalArrived(int signal) {
   const int error = errno;

@@ -3,7 +3,7 @@
 
 #include <cstdint>
 
-#include "tesk/bus/WakeUp.h"
+#include "base/WakeUp.h"
 
 namespace qel::tools {
 
@@ -22,10 +22,10 @@ class StopSignals {
   // The signal that came, or 0.
   int arrived() const;
   // For poll: rung by the signal, and by whoever has work for the main thread.
-  const tesk::bus::WakeUp& wakeUp() const { return _wakeUp; }
+  const WakeUp& wakeUp() const { return _wakeUp; }
 
  private:
-  tesk::bus::WakeUp _wakeUp;
+  WakeUp _wakeUp;
 };
 
 }  // namespace qel::tools

@@ -10,7 +10,7 @@
 #include <thread>
 
 #include "bus/ServiceProcess.h"
-#include "modem_manager/FakeModemManager.h"
+#include "sources/modem_manager/FakeModemManager.h"
 #include "tesk/bus/BusConnector.h"
 #include "tesk/bus/ServiceStatus.h"
 

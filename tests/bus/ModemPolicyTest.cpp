@@ -9,8 +9,8 @@
 #include <utility>
 
 #include "bus/PolicyTrial.h"
-#include "modem_manager/FakeModemManager.h"
-#include "service/sources/modem_manager/ModemManagerSource.h"
+#include "sources/modem_manager/FakeModemManager.h"
+#include "sources/modem_manager/ModemManagerSource.h"
 #include "support/PrivateBus.h"
 
 namespace qel::testing {
@@ -144,12 +144,12 @@ TEST_F(ModemPolicy, IsEnoughForTheSource) {
     EXPECT_EQ(::write(done[1], "x", 1), 1);
   });
   as(kServiceUser, nullptr, [&] {
-    class Nobody final : public service::EventReceiver {
-      Taken take(const service::ServiceEvent&) override { return Taken::yes; }
+    class Nobody final : public sources::EventReceiver {
+      Taken take(const sources::SourceEvent&) override { return Taken::yes; }
     };
-    service::ModemManagerSource source({}, {bus->address()}, {100ms, 2s});
+    sources::ModemManagerSource source({}, {bus->address()}, {100ms, 2s});
     const auto receiver = std::make_shared<Nobody>();
-    source.start(receiver, std::make_shared<service::ListenerSignal>());
+    source.start(receiver, std::make_shared<sources::ListenerSignal>());
     char byte = 0;
     return ::read(done[0], &byte, 1) == 1 ? 0 : 1;
   });

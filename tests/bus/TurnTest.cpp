@@ -1,6 +1,6 @@
 // A connection on which messages never end.
 
-#include "tesk/bus/Turn.h"
+#include "bus/Turn.h"
 
 #include <gtest/gtest.h>
 
@@ -20,13 +20,13 @@ struct Messages {
 TEST(TurnOfTheBus, EndsThoughMoreMessagesCome) {
   constexpr int kFlood = 1'000'000;
   Messages messages{kFlood};
-  tesk::bus::processTurn(messages);
-  EXPECT_EQ(messages.left, kFlood - tesk::bus::kMostMessagesOfATurn);
+  bus::processTurn(messages);
+  EXPECT_EQ(messages.left, kFlood - bus::kMostMessagesOfATurn);
 }
 
 TEST(TurnOfTheBus, TakesAllOfAFew) {
-  Messages messages{tesk::bus::kMostMessagesOfATurn};
-  tesk::bus::processTurn(messages);
+  Messages messages{bus::kMostMessagesOfATurn};
+  bus::processTurn(messages);
   EXPECT_EQ(messages.left, 0);
 }
 

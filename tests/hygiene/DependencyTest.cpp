@@ -19,19 +19,21 @@ const std::map<std::string, std::set<std::string>> kAllowed = {
     {"messages", {"base"}},
     {"rrc", {"base"}},
     {"recording", {"base", "messages"}},
-    {"tesk", {"base", "messages"}},
+    {"bus", {"base"}},
+    {"sources", {"base", "bus", "messages", "recording"}},
+    {"tesk", {"base", "bus", "messages"}},
+    {"service", {"base", "bus", "messages", "sources", "tesk"}},
     {"connection", {"base", "tesk"}},
     {"metrics", {"base", "connection", "messages"}},
-    {"service", {"base", "messages", "recording", "tesk"}},
     {"ui", {"base", "connection", "metrics"}},
-    {"app", {"base", "metrics", "recording", "service", "tesk", "ui"}},
-    {"tools", {"base", "messages", "metrics", "recording", "tesk", "ui"}},
+    {"app", {"base", "bus", "metrics", "recording", "service", "sources", "tesk", "ui"}},
+    {"tools", {"base", "bus", "messages", "metrics", "recording", "sources", "tesk", "ui"}},
 };
 
 // Foreign header prefix → the folders (path prefixes in src/) that may include it.
 const std::vector<std::pair<std::string, std::vector<std::string>>> kForeign = {
     {"Q", {"src/ui/quick/", "src/app/"}},
-    {"sdbus-c++/", {"src/tesk/", "src/service/"}},
+    {"sdbus-c++/", {"src/bus/", "src/sources/modem_manager/", "src/tesk/", "src/service/"}},
     {"google/protobuf/", {"src/messages/generator/"}},
     {"nlohmann/", {"src/recording/", "src/tools/"}},
     {"CLI/", {"src/tools/", "src/app/", "src/service/daemon/"}},

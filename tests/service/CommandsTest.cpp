@@ -213,7 +213,7 @@ TEST_F(CommandsTest, AQueryForWhatIsNoMetricIsRefused) {
 }
 
 TEST_F(CommandsTest, WhatTheSourceCannotAnswerIsRefusedWithItsWords) {
-  source->answer = {CommandCode::metricNotAvailable, "not now", 0, {}};
+  source->answer = {false, "not now", 0, {}};
   expectRefused(tesk::kCommandQueryMetric, queryRequest(kQueryRrcState).entries(),
                 CommandCode::metricNotAvailable, "not now");
 }

@@ -8,7 +8,7 @@ namespace qel {
 namespace {
 
 using service::ConditionBook;
-using service::SourceCondition;
+using sources::SourceCondition;
 using ::testing::ElementsAre;
 using ::testing::HasSubstr;
 using ::testing::SizeIs;

@@ -6,7 +6,7 @@
 
 #include "messages/catalogue/KBBMetricUtility.h"
 #include "service/DeviceConfiguration.h"
-#include "service/sources/simulated/Changes.h"
+#include "sources/simulated/Changes.h"
 
 namespace qel {
 namespace {
@@ -35,8 +35,9 @@ TEST(ConfigurationResource, NamesEveryMetricOfTheCatalogueOnce) {
 TEST(ConfigurationResource, NamesTheTriggersOfTheModemAndOfQueries) {
   const auto configuration = resource();
   ASSERT_TRUE(configuration);
-  EXPECT_TRUE(configuration->wantsTrigger(static_cast<std::int64_t>(Trigger::cellChange)));
-  EXPECT_TRUE(configuration->wantsTrigger(static_cast<std::int64_t>(Trigger::carriersChanged)));
+  EXPECT_TRUE(configuration->wantsTrigger(static_cast<std::int64_t>(sources::Trigger::cellChange)));
+  EXPECT_TRUE(
+      configuration->wantsTrigger(static_cast<std::int64_t>(sources::Trigger::carriersChanged)));
   EXPECT_TRUE(configuration->wantsTrigger(8323091));
   EXPECT_FALSE(configuration->wantsTrigger(0));
   EXPECT_FALSE(configuration->wantsTrigger(0x800000));

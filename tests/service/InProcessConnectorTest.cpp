@@ -35,7 +35,7 @@ Bytes everything() {
 }
 
 std::shared_ptr<tesk::Connector> connectorTo(const std::string& choice) {
-  SourceError error;
+  sources::SourceError error;
   auto connector = makeInProcessConnector(choice, error);
   EXPECT_TRUE(connector) << error.message;
   return connector;

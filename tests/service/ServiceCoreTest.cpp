@@ -21,7 +21,7 @@ using testing::FakeSourceState;
 using ::testing::HasSubstr;
 using testing::metricEvent;
 using testing::triggerEvent;
-using Taken = EventReceiver::Taken;
+using Taken = sources::EventReceiver::Taken;
 
 constexpr std::uint32_t kRrcState = 19972;
 constexpr std::uint32_t kCdrxConfig = 19992;
@@ -56,7 +56,7 @@ class ServiceCoreTest : public ::testing::Test {
 TEST_F(ServiceCoreTest, DeliversTheMetricsThatAreConfiguredAsTheyAre) {
   const auto session = listener(log);
   install(*session, configuration({{kRrcState}}));
-  const ServiceEvent event = metricEvent(kRrcState);
+  const sources::SourceEvent event = metricEvent(kRrcState);
   EXPECT_EQ(source->send(event), Taken::yes);
   ASSERT_EQ(log.count(), 1U);
   EXPECT_EQ(log.events()[0].stream, tesk::kEventMetric);
@@ -216,7 +216,7 @@ TEST_F(ServiceCoreTest, EventsWithoutTheirIdentifierOrWithAPayloadThatIsNoBytesR
 TEST_F(ServiceCoreTest, AMetricWithoutAPayloadIsAnEmptyMessage) {
   const auto session = listener(log);
   install(*session, configuration({{kRrcState}}));
-  const ServiceEvent event{1, tesk::kEventMetric, {{tesk::kKeyMetricID, 0x3C4E04}}};
+  const sources::SourceEvent event{1, tesk::kEventMetric, {{tesk::kKeyMetricID, 0x3C4E04}}};
   EXPECT_EQ(source->send(event), Taken::yes);
   ASSERT_EQ(log.count(), 1U);
   EXPECT_EQ(log.events()[0].entries, event.entries);
@@ -349,15 +349,15 @@ TEST_F(ServiceCoreTest, ASinkMaySendCommands) {
 }
 
 TEST_F(ServiceCoreTest, KnowsTheConditionOfTheModemWhileTheSourceRuns) {
-  const SourceCondition locked = {"locked", "Modem locked", "SIM PIN needed"};
-  EXPECT_EQ(core->condition().current(), SourceCondition());
+  const sources::SourceCondition locked = {"locked", "Modem locked", "SIM PIN needed"};
+  EXPECT_EQ(core->condition().current(), sources::SourceCondition());
   const auto session = listener(log);
   source->receiver.lock()->conditionChanged(locked);
   EXPECT_EQ(core->condition().current(), locked);
   core->close(session);
-  EXPECT_EQ(core->condition().current(), SourceCondition());
+  EXPECT_EQ(core->condition().current(), sources::SourceCondition());
   source->receiver.lock()->conditionChanged(locked);
-  EXPECT_EQ(core->condition().current(), SourceCondition());
+  EXPECT_EQ(core->condition().current(), sources::SourceCondition());
 }
 
 }  // namespace

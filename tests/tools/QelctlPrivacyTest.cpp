@@ -5,8 +5,8 @@
 #include "messages/sim.h"
 #include "metrics/MetricValidator.h"
 #include "recording/RecordingReader.h"
-#include "service/sources/simulated/Bcd.h"
-#include "service/sources/simulated/Identities.h"
+#include "sources/simulated/Bcd.h"
+#include "sources/simulated/Identities.h"
 #include "tools/WithService.h"
 
 namespace qel::testing {
@@ -103,9 +103,9 @@ class QelctlPrivacy : public WithService {
 TEST_F(QelctlPrivacy, findsNobodyInARecording) {
   const Found open = record("open.jsonl", {"--keep-identities"});
   const Found hidden = record("hidden.jsonl");
-  const Bytes imsi = service::encodedImsi(service::kImsi);
+  const Bytes imsi = sources::encodedImsi(sources::kImsi);
   const Bytes subscriber(imsi.begin() + 4, imsi.end());  // beyond country and network
-  const Bytes iccid = service::swappedDigits(service::kIccid);
+  const Bytes iccid = sources::swappedDigits(sources::kIccid);
   for (const Bytes& secret : {imsi, subscriber, iccid}) {
     EXPECT_TRUE(holds(open, secret)) << hexText(secret);
     EXPECT_FALSE(holds(hidden, secret)) << hexText(secret);

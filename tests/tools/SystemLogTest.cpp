@@ -7,8 +7,8 @@
 #include <iterator>
 #include <sstream>
 
-#include "service/sources/simulated/Bcd.h"
-#include "service/sources/simulated/Identities.h"
+#include "sources/simulated/Bcd.h"
+#include "sources/simulated/Identities.h"
 #include "support/ChildProcess.h"
 #include "tools/WithService.h"
 
@@ -80,9 +80,9 @@ class SystemLog : public WithService {
     }
   }
 
-  const std::string imsi = hexText(service::encodedImsi(service::kImsi));
+  const std::string imsi = hexText(sources::encodedImsi(sources::kImsi));
   const std::string subscriber = imsi.substr(8);  // beyond country and network
-  const std::string card = hexText(service::swappedDigits(service::kIccid));
+  const std::string card = hexText(sources::swappedDigits(sources::kIccid));
 };
 
 TEST_F(SystemLog, hasEveryEventInFullOfAViewerThatIsStartedBare) {

@@ -11,7 +11,7 @@
 #include "messages/Schemas.h"
 #include "metrics/DispatchTable.h"
 #include "metrics/MetricValidator.h"
-#include "service/ServiceEvent.h"
+#include "service/EventSubject.h"
 #include "support/RecordingSink.h"
 #include "tesk/Constants.h"
 #include "ui/Tables.h"
@@ -23,14 +23,14 @@ namespace {
 using google::protobuf::FieldDescriptor;
 using google::protobuf::Message;
 using service::EventFault;
-using service::ServiceEvent;
+using sources::SourceEvent;
 
 std::uint32_t metricOf(const DispatchRow& row) {
   return static_cast<std::uint32_t>(row.identifier - 0x3C0000);
 }
 
-ServiceEvent reportOf(std::int64_t identifier, std::optional<Bytes> payload) {
-  ServiceEvent event{1000, tesk::kEventMetric, {{tesk::kKeyMetricID, identifier}}};
+sources::SourceEvent reportOf(std::int64_t identifier, std::optional<Bytes> payload) {
+  sources::SourceEvent event{1000, tesk::kEventMetric, {{tesk::kKeyMetricID, identifier}}};
   if (payload) event.entries.append(tesk::kKeyPayload, std::move(*payload));
   return event;
 }
@@ -132,7 +132,7 @@ class DrawableReports : public ::testing::Test {
   void drawAll() const {
     for (const auto& screen : screens) snapshotOf(*screen);
   }
-  void showWithoutAsking(const ServiceEvent& event) const {
+  void showWithoutAsking(const sources::SourceEvent& event) const {
     MetricValidator::shared()->metricsDidUpdate(event.entries);
     drawAll();
   }
@@ -146,7 +146,7 @@ TEST_F(DrawableReports, whatTheServiceHandsOnIsDrawnByEveryTable) {
   int shown = 0;
   for (const DispatchRow& row : dispatchTable()) {
     eachPayload(row, [&](std::optional<Bytes> payload) {
-      const ServiceEvent event = reportOf(row.identifier, std::move(payload));
+      const sources::SourceEvent event = reportOf(row.identifier, std::move(payload));
       EventFault fault;
       if (!examineEvent(event, fault)) return;
       showWithoutAsking(event);
@@ -160,7 +160,7 @@ TEST_F(DrawableReports, onlyReportsThatWouldEndTheViewerAreHeldBack) {
   std::map<std::uint32_t, int> heldBack;
   for (const DispatchRow& row : dispatchTable()) {
     eachPayload(row, [&](std::optional<Bytes> payload) {
-      const ServiceEvent event = reportOf(row.identifier, std::move(payload));
+      const sources::SourceEvent event = reportOf(row.identifier, std::move(payload));
       EventFault fault;
       if (examineEvent(event, fault)) return;
       EXPECT_TRUE(fault.withoutContent) << fault.reason;

@@ -246,7 +246,7 @@ void BusFront::signalChanges() {
 }
 
 void BusFront::noteCondition() {
-  SourceCondition now = _core->condition().current();
+  sources::SourceCondition now = _core->condition().current();
   if (now == _notedCondition) return;
   _notedCondition = std::move(now);
   _changed.note({"Condition"});

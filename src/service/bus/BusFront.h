@@ -10,6 +10,7 @@
 #include <string>
 #include <vector>
 
+#include "base/WakeUp.h"
 #include "service/ServiceCore.h"
 #include "service/bus/BusClient.h"
 #include "service/bus/CallFilter.h"
@@ -19,7 +20,6 @@
 #include "service/bus/ReadBudget.h"
 #include "tesk/bus/BasebandManager1Adaptor.h"
 #include "tesk/bus/BusAddress.h"
-#include "tesk/bus/WakeUp.h"
 
 namespace qel::service {
 
@@ -97,7 +97,7 @@ class BusFront final : private FrontObject, public tesk::BasebandManager1_adapto
 
   sdbus::IConnection& _connection;
   const std::shared_ptr<ServiceCore> _core;
-  const std::shared_ptr<tesk::bus::WakeUp> _wakeUp = std::make_shared<tesk::bus::WakeUp>();
+  const std::shared_ptr<WakeUp> _wakeUp = std::make_shared<WakeUp>();
   const std::shared_ptr<Backlogs> _backlogs = std::make_shared<Backlogs>();
   std::map<std::string, std::unique_ptr<BusClient>> _clients;  // by the caller's bus name
   std::vector<std::string> _vanished;
@@ -117,7 +117,7 @@ class BusFront final : private FrontObject, public tesk::BasebandManager1_adapto
   std::uint64_t _droppedOfGone = 0;
   Counted _noted;
   std::chrono::steady_clock::time_point _notedAt;
-  SourceCondition _notedCondition;
+  sources::SourceCondition _notedCondition;
 };
 
 }  // namespace qel::service

@@ -33,13 +33,13 @@ std::string BusFront::Source() { return status().source; }
 bool BusFront::SourceRunning() { return status().sourceRunning; }
 
 std::map<std::string, sdbus::Variant> BusFront::Condition() {
-  const SourceCondition condition = _core->condition().current();
+  const sources::SourceCondition condition = _core->condition().current();
   std::map<std::string, sdbus::Variant> entries;
   const auto put = [&entries](const char* key, std::string text) {
     if (!text.empty()) entries.emplace(key, std::move(text));
   };
   put("state", std::string(condition.state));
-  put("text", inWords(condition));
+  put("text", sources::inWords(condition));
   put("reason", std::string(condition.reason));
   put("model", condition.model);
   put("driver", condition.driver);

@@ -106,7 +106,7 @@ int main(int argc, char** argv) {
   using Echo = qel::SystemLogSink::Echo;
   qel::setSystemLog(std::make_shared<qel::SystemLogSink>(
       "basebandd", options->verbose ? Echo::standardError : Echo::none));
-  SourceError error;
+  qel::sources::SourceError error;
   const auto core = makeServiceCore(options->source, error, makeKeeper(*options));
   if (!core) return fail(error.exitCode, error.message);
   return run(core, {options->bus}, stop);

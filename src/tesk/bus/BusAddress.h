@@ -1,22 +1,15 @@
-// Which bus to use.
+// Where the service is found.
 #pragma once
 
-#include <sdbus-c++/IConnection.h>
-#include <memory>
-#include <string>
+#include "bus/BusAddress.h"
 
 namespace tesk::bus {
 
-// "system", "session" or a bus address such as "unix:path=/run/x".
-struct BusAddress {
-  std::string name = "system";
-};
+using qel::bus::BusAddress;
+using qel::bus::connectTo;
 
 // The service's names there.
 inline constexpr const char* kServiceName = "tesk.BasebandManager1";
 inline constexpr const char* kObjectPath = "/tesk/BasebandManager1";
-
-// A new connection. Throws sdbus::Error when there is no such bus.
-std::unique_ptr<sdbus::IConnection> connectTo(const BusAddress& address);
 
 }  // namespace tesk::bus

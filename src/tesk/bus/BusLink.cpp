@@ -9,11 +9,11 @@
 #include <limits>
 #include <utility>
 
+#include "bus/Turn.h"
 #include "tesk/bus/BasebandManager1Proxy.h"
 #include "tesk/bus/EventPacket.h"
 #include "tesk/bus/MessageConversion.h"
 #include "tesk/bus/Reasons.h"
-#include "tesk/bus/Turn.h"
 
 namespace tesk::bus {
 namespace {
@@ -229,7 +229,7 @@ void BusLink::waitAndProcess(int wakeDescriptor) {
 }
 
 void BusLink::processBus() {
-  processTurn(*_connection);
+  qel::bus::processTurn(*_connection);
   if (!std::exchange(_ownerChanged, false)) return;
   // Whoever owns the name now knows nothing of us, and the old stream was the old owner's.
   _pause = kFirstPause;

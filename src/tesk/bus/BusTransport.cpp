@@ -10,9 +10,9 @@
 #include <optional>
 #include <utility>
 
+#include "base/WakeUp.h"
 #include "tesk/bus/BusLink.h"
 #include "tesk/bus/Reasons.h"
-#include "tesk/bus/WakeUp.h"
 
 namespace tesk::bus {
 namespace {
@@ -195,7 +195,7 @@ class BusTransport::Worker {
   const EventSink _sink;
   const ReachabilityObserver _observer;
   const ConditionObserver _conditionObserver;
-  const WakeUp _wakeUp;
+  const qel::WakeUp _wakeUp;
   std::mutex _mutex;
   std::condition_variable _changed;
   std::deque<Task> _tasks;

@@ -9,7 +9,7 @@
 #include <vector>
 
 #include "service/StateKeeper.h"
-#include "service/sources/WaitClock.h"
+#include "sources/WaitClock.h"
 
 namespace qel::testing {
 
@@ -66,7 +66,7 @@ class FakeKeeper final : public service::StateKeeper {
   const service::KeptState _found;
 };
 
-class HeldWaitClock final : public service::WaitClock {
+class HeldWaitClock final : public sources::WaitClock {
  public:
   std::uint64_t nowMs() const override {
     const std::lock_guard lock(_mutex);

@@ -5,7 +5,7 @@
 #include <string>
 #include <utility>
 
-#include "service/sources/EventSource.h"
+#include "sources/EventSource.h"
 #include "tesk/Constants.h"
 
 namespace qel::testing {
@@ -14,28 +14,28 @@ namespace qel::testing {
 struct FakeSourceState {
   int starts = 0;
   int stops = 0;
-  std::weak_ptr<service::EventReceiver> receiver;
-  std::shared_ptr<service::ListenerSignal> listeners;
+  std::weak_ptr<sources::EventReceiver> receiver;
+  std::shared_ptr<sources::ListenerSignal> listeners;
   std::uint32_t queried = 0;
-  service::SourceAnswer answer;
+  sources::SourceAnswer answer;
 
-  service::EventReceiver::Taken send(const service::ServiceEvent& event) const {
+  sources::EventReceiver::Taken send(const sources::SourceEvent& event) const {
     return receiver.lock()->take(event);
   }
 };
 
-class FakeSource final : public service::EventSource {
+class FakeSource final : public sources::EventSource {
  public:
   explicit FakeSource(std::shared_ptr<FakeSourceState> state) : _state(std::move(state)) {}
 
-  void start(std::weak_ptr<service::EventReceiver> receiver,
-             std::shared_ptr<service::ListenerSignal> listeners) override {
+  void start(std::weak_ptr<sources::EventReceiver> receiver,
+             std::shared_ptr<sources::ListenerSignal> listeners) override {
     ++_state->starts;
     _state->receiver = std::move(receiver);
     _state->listeners = std::move(listeners);
   }
   void stop() override { ++_state->stops; }
-  service::SourceAnswer query(std::uint32_t metric) override {
+  sources::SourceAnswer query(std::uint32_t metric) override {
     _state->queried = metric;
     return _state->answer;
   }
@@ -48,8 +48,8 @@ class FakeSource final : public service::EventSource {
 // An LTE RRC state that decodes.
 inline const Bytes kRrcPayload = {0x08, 0xE8, 0x07, 0x10, 0x03, 0x20, 0xFA, 0x01};
 
-inline service::ServiceEvent metricEvent(std::uint32_t metric, std::uint64_t timeMs = 1000,
-                                         Bytes payload = kRrcPayload) {
+inline sources::SourceEvent metricEvent(std::uint32_t metric, std::uint64_t timeMs = 1000,
+                                        Bytes payload = kRrcPayload) {
   return {timeMs,
           tesk::kEventMetric,
           {{tesk::kKeyMetricID, std::int64_t{metric} + 0x3C0000},
@@ -57,7 +57,7 @@ inline service::ServiceEvent metricEvent(std::uint32_t metric, std::uint64_t tim
            {tesk::kKeyPayload, std::move(payload)}}};
 }
 
-inline service::ServiceEvent triggerEvent(std::int64_t trigger) {
+inline sources::SourceEvent triggerEvent(std::int64_t trigger) {
   return {1000, tesk::kEventTrigger, {{tesk::kKeyTriggerID, trigger}}};
 }
 

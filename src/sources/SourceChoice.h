@@ -1,0 +1,47 @@
+// The text by which a user names a source.
+#pragma once
+
+#include <cstdint>
+#include <memory>
+#include <optional>
+#include <string>
+#include <string_view>
+#include <variant>
+
+#include "sources/EventSource.h"
+#include "sources/SourceError.h"
+#include "sources/WaitClock.h"
+
+namespace qel::sources {
+
+struct SimulatedChoice {
+  std::uint64_t seed = 1;
+  double speed = 1;                      // simulated seconds in one
+  std::optional<std::uint64_t> startMs;  // absent: the time of the start
+};
+
+struct RecordingChoice {
+  std::string path;
+  double speed = 1;
+  bool loops = false;
+};
+
+// A modem by its IMEI or its object path; with neither the first.
+struct ModemManagerChoice {
+  std::string imei;
+  std::string path;
+  std::string bus = "system";  // or "session", or an address
+};
+
+using SourceChoice = std::variant<SimulatedChoice, RecordingChoice, ModemManagerChoice>;
+
+// "simulated[,seed=N][,speed=N][,start=MS]", "recording:FILE[,speed=N][,loop]" or
+// "modem-manager[:IMEI|:PATH][,bus=ADDRESS]". A file name and an address may contain commas.
+// Nothing when the text is none of them; `error` then says what is wrong.
+std::optional<SourceChoice> parseSourceChoice(std::string_view text, SourceError& error);
+
+// Nothing when there is no such source; a recording is read once to see that it is sound.
+std::unique_ptr<EventSource> makeSource(const SourceChoice& choice, SourceError& error,
+                                        WaitClock& clock = steadyWaitClock());
+
+}  // namespace qel::sources

@@ -1,0 +1,49 @@
+#include "sources/diagnostics/DiagnosticsReader.h"
+
+#include "sources/diagnostics/PacketTable.h"
+#include "sources/diagnostics/gsm/GsmTables.h"
+#include "sources/diagnostics/lte/LteTables.h"
+#include "sources/diagnostics/nas/NasTables.h"
+#include "sources/diagnostics/sim/SimTables.h"
+#include "sources/diagnostics/umts/UmtsTables.h"
+
+namespace qel::diagnostics {
+namespace {
+
+void age(Picture& picture, std::uint64_t nowMs) {
+  age(picture.lte, nowMs);
+  age(picture.umts, nowMs);
+  age(picture.gsm, nowMs);
+  age(picture.nas, nowMs);
+  age(picture.sim, nowMs);
+}
+
+}  // namespace
+
+const Told& DiagnosticsReader::take(const LogPacket& packet) {
+  const LogRow* row = findLog(packet.code);
+  const auto version = row && row->version ? row->version(packet.body) : std::nullopt;
+  return take(packet, row, {false, packet.code, version});
+}
+
+const Told& DiagnosticsReader::take(const ModemEvent& event) {
+  return take(event, findEvent(event.id), {true, event.id, std::nullopt});
+}
+
+template <class Packet, class Row>
+const Told& DiagnosticsReader::take(const Packet& packet, const Row* row,
+                                    const PacketCounts::Kind& kind) {
+  _told.clear();
+  if (packet.radio != 0 && packet.radio != _radio) return _told;
+  age(_picture, packet.timeMs);
+  const Outcome outcome = row ? row->read(packet, _picture, _told) : Outcome::notOurs;
+  _counts.count(kind, outcome);
+  return _told;
+}
+
+std::optional<Bytes> DiagnosticsReader::report(std::uint32_t metric, std::uint64_t timeMs) const {
+  const ReportRow* row = findReport(metric);
+  return row ? row->build(_picture, timeMs) : std::nullopt;
+}
+
+}  // namespace qel::diagnostics

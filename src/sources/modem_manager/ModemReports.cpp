@@ -1,0 +1,35 @@
+#include "sources/modem_manager/ModemReports.h"
+
+#include <array>
+
+#include "sources/Metrics.h"
+
+namespace qel::sources {
+namespace {
+
+constexpr std::array kReports = {
+    ModemReportRow{metric::kLteScellInfo, modemLteCell},
+    ModemReportRow{metric::kLteServingMeasurement, modemLteMeasurement},
+    ModemReportRow{metric::kLteRsrpRsrqSinr, modemLteQuality},
+    ModemReportRow{metric::kLteCarrierAggregation, modemLteCarriers},
+    ModemReportRow{metric::kLteNeighbours, modemLteNeighbours},
+    ModemReportRow{metric::kLteInterRat, modemLteOthers},
+    ModemReportRow{metric::kUmtsCellInfo, modemUmtsCell},
+    ModemReportRow{metric::kUmtsServingMeasurement, modemUmtsMeasurement},
+    ModemReportRow{metric::kUmtsNeighbours, modemUmtsNeighbours},
+    ModemReportRow{metric::kGsmScellInfo, modemGsmCell},
+    ModemReportRow{metric::kGsmIdleMeasurement, modemGsmMeasurement},
+    ModemReportRow{metric::kGsmNeighbours, modemGsmNeighbours},
+    ModemReportRow{metric::kEmmContext, modemEmmContext},
+    ModemReportRow{metric::kMmContext, modemMmContext},
+    ModemReportRow{metric::kGmmContext, modemGmmContext},
+    ModemReportRow{metric::kMmCommonInfo, modemMmCommonInfo},
+    ModemReportRow{metric::kBearers, modemBearers},
+    ModemReportRow{metric::kSimFiles, modemSimFiles},
+};
+
+}  // namespace
+
+std::span<const ModemReportRow> modemReports() { return kReports; }
+
+}  // namespace qel::sources
