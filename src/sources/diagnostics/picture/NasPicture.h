@@ -1,10 +1,20 @@
 // What is known of the modem on NAS.
 #pragma once
 
-#include <cstdint>
+#include "sources/diagnostics/picture/CommonPart.h"
+#include "sources/diagnostics/picture/ConnectionsPart.h"
+#include "sources/diagnostics/picture/EmmPart.h"
+#include "sources/diagnostics/picture/GmmPart.h"
+#include "sources/diagnostics/picture/MmPart.h"
 
 namespace qel::diagnostics {
 
-struct NasPicture {};
+struct NasPicture {
+  CommonPart common;
+  MmPart mm;
+  GmmPart gmm;
+  EmmPart emm;
+  ConnectionsPart connections;
+};
 
 }  // namespace qel::diagnostics
