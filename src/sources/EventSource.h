@@ -9,6 +9,7 @@
 #include "sources/ListenerSignal.h"
 #include "sources/SourceCondition.h"
 #include "sources/SourceEvent.h"
+#include "sources/SourceFacts.h"
 
 namespace qel::sources {
 
@@ -50,6 +51,9 @@ class EventSource {
 
   // One line that names it.
   virtual std::string description() const = 0;
+
+  // Any thread, at any time; empty when there is nothing to say.
+  virtual SourceFacts facts() const { return {}; }
 };
 
 }  // namespace qel::sources
