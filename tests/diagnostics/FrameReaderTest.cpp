@@ -76,7 +76,7 @@ TEST(FrameReader, TakesMarksInFrontForNothing) {
 }
 
 TEST(FrameReader, TakesOffASurplusOfFirstBytes) {
-  for (const std::size_t surplus : {1, 4, 7, 56, 300}) {
+  for (const unsigned surplus : {1U, 4U, 7U, 56U, 300U}) {
     const Reading reading = read(joined({framed(kPacket, surplus), framed(kOther)}));
     EXPECT_THAT(reading.packets, ElementsAre(kPacket, kOther)) << surplus;
     EXPECT_EQ(reading.counts.repaired, 1U);

@@ -79,7 +79,7 @@ TEST(PacketReader, LooksThroughOneWrapperOnly) {
 
 TEST(PacketReader, TakesNoLogPacketWhoseLengthsDisagree) {
   const Bytes good = logPacket(0xB193, Bytes(20));
-  for (const std::size_t offset : {2, 3, 4, 5}) {
+  for (const unsigned offset : {2U, 3U, 4U, 5U}) {
     Bytes bad = good;
     ++bad[offset];
     Reading reading;
@@ -120,7 +120,7 @@ TEST(PacketReader, SplitsEventsWithEveryFormOfPayload) {
 TEST(PacketReader, CompletesShortTimesFromTheEventBefore) {
   Reading reading;
   reading.take(eventPacket({{1, {}}}));
-  for (const std::uint64_t later : {0, 5, 200, 400, 700, 715}) {
+  for (const unsigned later : {0U, 5U, 200U, 400U, 700U, 715U}) {
     reading.take(eventPacket({{2, {}, kSomeTimeMs + later, true}}));
     EXPECT_NEAR(static_cast<double>(reading.log.events.back().timeMs),
                 static_cast<double>(kSomeTimeMs + later), 1)
