@@ -1,13 +1,87 @@
 #include "sources/diagnostics/lte/LteTables.h"
 
+#include <array>
+
+#include "sources/Metrics.h"
+#include "sources/diagnostics/layouts/LteLayouts.h"
+#include "sources/diagnostics/lte/CellLogs.h"
+#include "sources/diagnostics/lte/CellReports.h"
+#include "sources/diagnostics/lte/NeighbourLogs.h"
+#include "sources/diagnostics/lte/PowerLogs.h"
+#include "sources/diagnostics/lte/SignalLogs.h"
+#include "sources/diagnostics/lte/SignalReports.h"
+
 namespace qel::diagnostics {
+namespace {
 
-std::span<const LogRow> lteLogs() { return {}; }
+// By code.
+constexpr std::array kLogs = {
+    LogRow{kLteBroadcastLog, "LTE MIB", readLteBroadcast, versionInFirstByte},
+    LogRow{kLteServingCellLog, "LTE serving cell", readLteServingCell, versionInFirstByte},
+    LogRow{kLtePuschLog, "LTE PUSCH power", readLtePusch, versionInFirstByte},
+    LogRow{kLtePucchLog, "LTE PUCCH power", readLtePucch, versionInFirstByte},
+    LogRow{kLteConnectedCellsLog, "LTE connected cells", readLteConnectedCells, versionInFirstByte},
+    LogRow{kLteIdleServingLog, "LTE idle serving cell", readLteIdleServing, versionInFirstByte},
+    LogRow{kLteIdleIntraLog, "LTE idle neighbours", readLteIdleIntra, versionInFirstByte},
+    LogRow{kLteIdleNeighboursLog, "LTE idle measurement", readLteIdleNeighbours,
+           lteIdleNeighboursVersion},
+    LogRow{kLteMeasurementLog, "LTE serving cell measurement", readLteMeasurement,
+           lteMeasurementVersion},
+    LogRow{kLteConnectedNeighboursLog, "LTE connected measurement", readLteConnectedNeighbours,
+           lteConnectedNeighboursVersion},
+    LogRow{kLteFoundCellLog, "LTE found cell", readLteBroadcast, versionInFirstByte},
+};
 
-std::span<const EventRow> lteEvents() { return {}; }
+// By identifier.
+constexpr std::array kEvents = {
+    EventRow{1611, "LTE new cell", readLteNewCell},
+};
 
-std::span<const ReportRow> lteReports() { return {}; }
+constexpr std::array kReports = {
+    ReportRow{metric::kLteScellInfo, lteCell},
+    ReportRow{metric::kLteRsrpRsrqSinr, lteQuality},
+    ReportRow{metric::kLteServingMeasurement, lteMeasurement},
+    ReportRow{metric::kLteTxPower, lteTxPower},
+    ReportRow{metric::kLteComponentCarriers, lteComponents},
+    ReportRow{metric::kLteNeighbours, lteNeighbours},
+    ReportRow{metric::kLteCarrierAggregation, lteCarriers},
+};
 
-void age(LtePicture& /*picture*/, std::uint64_t /*nowMs*/) {}
+constexpr std::uint64_t kSignalMs = 10'000;
+constexpr std::uint64_t kNeighbourMs = 30'000;
+
+// A clock that was set backwards makes all that was before it too old.
+bool isOld(std::uint64_t timeMs, std::uint64_t nowMs, std::uint64_t limitMs) {
+  return (nowMs > timeMs ? nowMs - timeMs : timeMs - nowMs) > limitMs;
+}
+
+void ageSignals(LtePicture& picture, std::uint64_t nowMs) {
+  const auto isOldSignal = [&](const std::optional<LteSignal>& signal) {
+    return signal && isOld(signal->timeMs, nowMs, kSignalMs);
+  };
+  if (isOldSignal(picture.signal)) picture.signal.reset();
+  for (SecondaryCarrier& carrier : picture.carriers) {
+    if (!isOldSignal(carrier.signal)) continue;
+    carrier.signal.reset();
+    carrier.active.reset();
+  }
+  for (LteTransmissions* sent : {&picture.pusch, &picture.pucch}) {
+    if (isOld(sent->timeMs, nowMs, kSignalMs)) *sent = {};
+  }
+}
+
+}  // namespace
+
+std::span<const LogRow> lteLogs() { return kLogs; }
+
+std::span<const EventRow> lteEvents() { return kEvents; }
+
+std::span<const ReportRow> lteReports() { return kReports; }
+
+void age(LtePicture& picture, std::uint64_t nowMs) {
+  ageSignals(picture, nowMs);
+  picture.neighbours.forget(
+      [&](std::uint64_t timeMs) { return isOld(timeMs, nowMs, kNeighbourMs); });
+}
 
 }  // namespace qel::diagnostics

@@ -64,8 +64,11 @@ class LteNeighbours {
   static constexpr std::size_t kMost = 128;
 
   void note(const LteNeighbour& neighbour);
-  void forgetBefore(std::uint64_t timeMs);
-  void clear() { _cells.clear(); }
+  // Those whose time `isOld` says to be too old.
+  template <class IsOld>
+  void forget(IsOld isOld) {
+    std::erase_if(_cells, [&](const LteNeighbour& cell) { return isOld(cell.timeMs); });
+  }
 
   const std::vector<LteNeighbour>& cells() const { return _cells; }
 

@@ -1,0 +1,122 @@
+#include "sources/diagnostics/lte/CellReports.h"
+
+#include <memory>
+
+#include "messages/lte_neighbours.h"
+#include "messages/lte_serving.h"
+#include "sources/Bands.h"
+#include "sources/Filling.h"
+#include "sources/Levels.h"
+
+namespace qel::diagnostics {
+namespace {
+
+using sources::set;
+
+// Of SecondaryCarrierState.
+constexpr std::int32_t kConfigured = 1;
+constexpr std::int32_t kActivated = 2;
+
+std::int32_t hundredths(double value) { return sources::rounded(value * 100); }
+
+// Of each quantity by itself the best antenna's, as the modem combines them.
+void setLevels(const LteAntennas& antennas, SecondaryComponentCarrier& entry) {
+  std::optional<double> rsrp, rsrq, rssi, snr;
+  const auto take = [](std::optional<double>& best, std::optional<double> value) {
+    if (value && (!best || *value > *best)) best = value;
+  };
+  for (const auto& antenna : antennas) {
+    if (!antenna) continue;
+    take(rsrp, antenna->rsrpDbm);
+    take(rsrq, antenna->rsrqDb);
+    take(rssi, antenna->rssiDbm);
+    take(snr, antenna->snrDb);
+  }
+  if (rsrp) entry.setRsrp(hundredths(*rsrp));
+  if (rsrq) entry.setRsrq(hundredths(*rsrq));
+  if (rssi) entry.setRssi(hundredths(*rssi));
+  if (snr) entry.setSnr(hundredths(*snr));
+}
+
+std::shared_ptr<SecondaryComponentCarrier> entryOf(const SecondaryCarrier& carrier) {
+  auto entry = std::make_shared<SecondaryComponentCarrier>();
+  entry->setIndex(carrier.index);
+  entry->setState(carrier.active.value_or(false) ? kActivated : kConfigured);
+  set(*entry, &SecondaryComponentCarrier::setPci, carrier.pci);
+  set(*entry, &SecondaryComponentCarrier::setDlEarfcn, carrier.earfcn);
+  set(*entry, &SecondaryComponentCarrier::setDlRfBand, carrier.band);
+  set(*entry, &SecondaryComponentCarrier::setDlBandwidth, carrier.bandwidth);
+  entry->setHasUplink(carrier.hasUplink);
+  set(*entry, &SecondaryComponentCarrier::setUlEarfcn, carrier.ulEarfcn);
+  set(*entry, &SecondaryComponentCarrier::setUlRfBand, carrier.ulBand);
+  set(*entry, &SecondaryComponentCarrier::setUlBandwidth, carrier.ulBandwidth);
+  if (carrier.signal) setLevels(carrier.signal->antennas, *entry);
+  return entry;
+}
+
+}  // namespace
+
+std::optional<Bytes> lteCell(const Picture& picture, std::uint64_t timeMs) {
+  const auto& cell = picture.lte.serving;
+  if (!cell) return std::nullopt;
+  KCellularLteScellInfo message;
+  message.setTimestamp(timeMs);
+  message.setPhyCellId(cell->name.pci);
+  message.setDlFreq(cell->name.earfcn);
+  message.setUlFreq(cell->ulEarfcn);
+  set(message, &KCellularLteScellInfo::setDlBw, cell->dlBandwidth);
+  set(message, &KCellularLteScellInfo::setUlBw, cell->ulBandwidth);
+  message.setCellId(cell->cellId);
+  message.setFreqBandInd(cell->band);
+  message.setTrackingAreaCode(cell->area);
+  message.setNumMncDigits(cell->mncDigits);
+  message.setSelPlmnMcc(cell->mcc);
+  message.setSelPlmnMnc(cell->mnc);
+  return message.data();
+}
+
+std::optional<Bytes> lteNeighbours(const Picture& picture, std::uint64_t timeMs) {
+  KCellularLteNbrEutraCellMeas message;
+  message.setTimestamp(timeMs);
+  for (const LteNeighbour& neighbour : picture.lte.neighbours.cells()) {
+    if (neighbour.cell == picture.lte.camped) continue;
+    auto entry = std::make_shared<EgwErrcNbrEutraMeas>();
+    entry->setNbrEarfcn(neighbour.cell.earfcn);
+    entry->setNbrPhysCellId(neighbour.cell.pci);
+    set(*entry, &EgwErrcNbrEutraMeas::setFreqBandInd, sources::lteBandOf(neighbour.cell.earfcn));
+    set(*entry, &EgwErrcNbrEutraMeas::setNbrRsrp, neighbour.rsrpDbm, sources::rsrpIndex);
+    set(*entry, &EgwErrcNbrEutraMeas::setNbrRsrq, neighbour.rsrqDb, sources::rsrqIndex);
+    message.addMeasNbrEutra(entry);
+  }
+  return message.data();
+}
+
+std::optional<Bytes> lteCarriers(const Picture& picture, std::uint64_t timeMs) {
+  KCellularLteCarrierAggregationStatus message;
+  message.setTimestamp(timeMs);
+  for (const SecondaryCarrier& carrier : picture.lte.carriers) message.addSccList(entryOf(carrier));
+  return message.data();
+}
+
+std::optional<Bytes> lteComponents(const Picture& picture, std::uint64_t timeMs) {
+  const LtePicture& lte = picture.lte;
+  KCellularLteComponentCarrierInfo message;
+  message.setTimestamp(timeMs);
+  if (lte.camped) message.setPccEarfcn(lte.camped->earfcn);
+  if (lte.serving && lte.serving->name == lte.camped) {
+    set(message, &KCellularLteComponentCarrierInfo::setPccBandwidth, lte.serving->dlBandwidth);
+  }
+  if (!lte.carriers.empty()) {
+    const SecondaryCarrier& first = lte.carriers.front();
+    set(message, &KCellularLteComponentCarrierInfo::setScc0Earfcn, first.earfcn);
+    set(message, &KCellularLteComponentCarrierInfo::setScc0Bandwidth, first.bandwidth);
+  }
+  if (lte.carriers.size() > 1) {
+    const SecondaryCarrier& second = lte.carriers[1];
+    set(message, &KCellularLteComponentCarrierInfo::setScc1Earfcn, second.earfcn);
+    set(message, &KCellularLteComponentCarrierInfo::setScc1Bandwidth, second.bandwidth);
+  }
+  return message.data();
+}
+
+}  // namespace qel::diagnostics
