@@ -7,6 +7,7 @@
 #include <array>
 #include <cerrno>
 #include <cstdint>
+#include <utility>
 
 namespace qel {
 namespace {
@@ -22,10 +23,6 @@ class Descriptor {
   Descriptor(const Descriptor&) = delete;
   Descriptor& operator=(const Descriptor&) = delete;
 
-  bool isRegularFile() const {
-    struct stat about {};
-    return _number >= 0 && ::fstat(_number, &about) == 0 && S_ISREG(about.st_mode);
-  }
   int number() const { return _number; }
 
  private:
@@ -34,16 +31,22 @@ class Descriptor {
 
 }  // namespace
 
-Bytes contentOfFile(const std::string& path, std::size_t most) {
+FileContent readFile(const std::string& path, std::size_t most) {
+  using Fault = FileContent::Fault;
   const Descriptor file(path);
-  if (!file.isRegularFile()) return {};
+  struct stat about {};
+  if (file.number() < 0 || ::fstat(file.number(), &about) != 0) {
+    return {{}, Fault::unreadable, errno};
+  }
+  if (!S_ISREG(about.st_mode)) return {{}, Fault::notRegular, 0};
   Bytes content;
   std::array<std::uint8_t, 16 * 1024> piece{};
   while (true) {
     const ssize_t count = ::read(file.number(), piece.data(), piece.size());
     if (count < 0 && errno == EINTR) continue;
-    if (count == 0) return content;
-    if (count < 0 || content.size() + static_cast<std::size_t>(count) > most) return {};
+    if (count < 0) return {{}, Fault::unreadable, errno};
+    if (count == 0) return {std::move(content), Fault::none, 0};
+    if (content.size() + static_cast<std::size_t>(count) > most) return {{}, Fault::tooLarge, 0};
     content.insert(content.end(), piece.begin(), piece.begin() + count);
   }
 }

@@ -1,7 +1,6 @@
 #include "service/StateFile.h"
 
 #include <fcntl.h>
-#include <sys/stat.h>
 #include <unistd.h>
 
 #include <cerrno>
@@ -11,6 +10,7 @@
 #include <optional>
 
 #include "base/DescriptorSink.h"
+#include "base/FileContent.h"
 #include "base/LogSink.h"
 #include "messages/service_state.h"
 
@@ -71,44 +71,28 @@ void log(const std::string& path, const std::string& what) {
   systemLog().write("basebandd: " + path + ": " + what);
 }
 
-std::string unreadable(int error) { return std::string("cannot be read: ") + std::strerror(error); }
-
-// All of the descriptor, up to one byte more than a state may have; 0 or the error number.
-int readState(int descriptor, Bytes& content) {
-  Bytes part(std::size_t{1} << 16);
-  while (content.size() <= StateFile::kLargest) {
-    const ssize_t count = ::read(descriptor, part.data(), part.size());
-    if (count < 0 && errno == EINTR) continue;
-    if (count < 0) return errno;
-    if (count == 0) break;
-    content.insert(content.end(), part.begin(), part.begin() + count);
+// Why there is nothing to be had of the file, or no word when it is not there.
+std::string inWords(const FileContent& content) {
+  switch (content.fault) {
+    case FileContent::Fault::none:
+      return "";
+    case FileContent::Fault::unreadable:
+      if (content.error == ENOENT) return "";
+      return std::string("cannot be read: ") + std::strerror(content.error);
+    case FileContent::Fault::notRegular:
+      return "not a regular file, ignored";
+    case FileContent::Fault::tooLarge:
+      return "larger than any state of this service, ignored";
   }
-  return 0;
+  return "";
 }
 
 // What the file says, or nothing; `fault` then holds why, unless there is no file.
 std::optional<KeptState> stateIn(const std::string& path, std::string& fault) {
-  // Not blocking: opening a FIFO would wait for its other end.
-  const File file(::open(path.c_str(), O_RDONLY | O_NONBLOCK | O_NOCTTY | O_CLOEXEC));
-  if (file.descriptor < 0) {
-    if (errno != ENOENT) fault = unreadable(errno);
-    return std::nullopt;
-  }
-  struct stat status {};
-  if (::fstat(file.descriptor, &status) != 0 || !S_ISREG(status.st_mode)) {
-    fault = "not a regular file, ignored";
-    return std::nullopt;
-  }
-  Bytes content;
-  if (const int error = readState(file.descriptor, content)) {
-    fault = unreadable(error);
-    return std::nullopt;
-  }
-  if (content.size() > StateFile::kLargest) {
-    fault = "larger than any state of this service, ignored";
-    return std::nullopt;
-  }
-  auto state = decoded(content);
+  const FileContent content = readFile(path, StateFile::kLargest);
+  fault = inWords(content);
+  if (content.fault != FileContent::Fault::none) return std::nullopt;
+  auto state = decoded(content.bytes);
   if (!state) fault = "not a state of this service, ignored";
   return state;
 }
