@@ -1,7 +1,5 @@
 #include "support/diagnostics/UmtsPackets.h"
 
-#include "base/Rendering.h"
-#include "messages/catalogue/MetricMessages.h"
 #include "support/diagnostics/Packets.h"
 
 namespace qel::diagnostics::test {
@@ -83,20 +81,6 @@ Bytes umtsRrcOf(unsigned channel, unsigned uarfcn, unsigned scramblingCode, Byte
   BodyWriter body;
   body.u8(channel).u8(0x28).u16(message.size()).u16(uarfcn).u16(scramblingCode);
   return body.bytes(message);
-}
-
-std::vector<std::uint32_t> UmtsModem::send(std::uint16_t code, ByteView body) {
-  const Told& told = _reader.take(LogPacket{code, _timeMs, 0, body});
-  return {told.begin(), told.end()};
-}
-
-std::string UmtsModem::said(std::uint32_t metric) const {
-  const auto payload = _reader.report(metric, _timeMs);
-  if (!payload) return {};
-  auto dictionary = findMetricMessage(metric)->describe(*payload);
-  if (!dictionary) return "cannot be read";
-  dictionary->remove("timestamp");
-  return jsonText(*dictionary);
 }
 
 }  // namespace qel::diagnostics::test

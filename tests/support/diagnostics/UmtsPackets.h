@@ -1,4 +1,4 @@
-// Bodies of a modem's logs about UMTS, and a modem that sends them.
+// Bodies of a modem's logs about UMTS.
 #pragma once
 
 #include <cstdint>
@@ -6,7 +6,7 @@
 #include <vector>
 
 #include "base/Bytes.h"
-#include "sources/diagnostics/DiagnosticsReader.h"
+#include "support/diagnostics/SpeakingModem.h"
 
 namespace qel::diagnostics::test {
 
@@ -47,26 +47,6 @@ Bytes umtsGainControl(const std::vector<WrittenUmtsFrame>& frames);  // 0x4176
 Bytes umtsRrc(unsigned channel, ByteView message);
 Bytes umtsRrcOf(unsigned channel, unsigned uarfcn, unsigned scramblingCode, ByteView message);
 
-// A modem whose packets a reader takes. Time goes by only when told.
-class UmtsModem {
- public:
-  // The metrics that it told something about, in order.
-  std::vector<std::uint32_t> send(std::uint16_t code, ByteView body);
-  void wait(std::uint64_t milliseconds) { _timeMs += milliseconds; }
-  void setTime(std::uint64_t milliseconds) { _timeMs = milliseconds; }
-
-  // The metric as JSON without its time; empty when there is nothing to say.
-  std::string said(std::uint32_t metric) const;
-
-  const DiagnosticsReader& reader() const { return _reader; }
-  // How many packets came to that.
-  std::uint64_t understood() const { return _reader.counts().total().understood; }
-  std::uint64_t damaged() const { return _reader.counts().total().damaged; }
-  std::uint64_t ofUnknownVersion() const { return _reader.counts().total().unknownVersion; }
-
- private:
-  DiagnosticsReader _reader;
-  std::uint64_t _timeMs = 1'790'000'000'000;
-};
+using UmtsModem = SpeakingModem;
 
 }  // namespace qel::diagnostics::test
