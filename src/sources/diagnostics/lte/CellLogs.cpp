@@ -1,23 +1,13 @@
 #include "sources/diagnostics/lte/CellLogs.h"
 
-#include <array>
-
 #include "sources/Metrics.h"
+#include "sources/diagnostics/lte/Bandwidth.h"
 #include "sources/diagnostics/lte/LevelCheck.h"
 #include "sources/diagnostics/lte/LteRead.h"
 #include "sources/diagnostics/packets/Bits.h"
 
 namespace qel::diagnostics {
 namespace {
-
-// By the number of resource blocks (36.101, table 5.6-1).
-std::optional<std::uint32_t> bandwidthCode(std::uint32_t blocks) {
-  constexpr std::array kBlocks = {6U, 15U, 25U, 50U, 75U, 100U};
-  for (std::uint32_t code = 0; code < kBlocks.size(); ++code) {
-    if (kBlocks[code] == blocks) return code;
-  }
-  return std::nullopt;
-}
 
 LteServingCell servingCellOf(const Values& values) {
   LteServingCell cell;
@@ -49,7 +39,7 @@ Outcome readLteServingCell(const LogPacket& packet, Picture& picture, Told& told
     if (!canBe(cell)) return Outcome::damaged;
     picture.technology = Technology::lte;
     picture.lte.serving = cell;
-    picture.lte.camped = cell.name;
+    picture.lte.camp(cell.name);
     told.tell(metric::kLteScellInfo);
     return Outcome::understood;
   });
@@ -70,9 +60,7 @@ Outcome readLteNewCell(const ModemEvent& event, Picture& picture, Told& /*told*/
   if (event.payload.size() != kBytes) return Outcome::damaged;
   const LteCellName name{u16At(event.payload, 1), u16At(event.payload, 3)};
   if (!isCell(name)) return Outcome::damaged;
-  LtePicture& lte = picture.lte;
-  if (lte.serving && lte.serving->name != name) lte.serving.reset();
-  lte.camped = name;
+  picture.lte.camp(name);
   return Outcome::understood;
 }
 

@@ -72,6 +72,11 @@ std::optional<Bytes> lteCell(const Picture& picture, std::uint64_t timeMs) {
   message.setNumMncDigits(cell->mncDigits);
   message.setSelPlmnMcc(cell->mcc);
   message.setSelPlmnMnc(cell->mnc);
+  const auto& rules = picture.lte.rules;
+  if (rules && rules->cell == cell->name && rules->sib1 && rules->sib1->tdd) {
+    message.setTddSfAssignment(rules->sib1->tdd->subframeAssignment);
+    message.setTddSsfPatterns(rules->sib1->tdd->specialSubframePattern);
+  }
   return message.data();
 }
 
@@ -81,9 +86,11 @@ std::optional<Bytes> lteNeighbours(const Picture& picture, std::uint64_t timeMs)
   for (const LteNeighbour& neighbour : picture.lte.neighbours.cells()) {
     if (neighbour.cell == picture.lte.camped) continue;
     auto entry = std::make_shared<EgwErrcNbrEutraMeas>();
-    entry->setNbrEarfcn(neighbour.cell.earfcn);
     entry->setNbrPhysCellId(neighbour.cell.pci);
-    set(*entry, &EgwErrcNbrEutraMeas::setFreqBandInd, sources::lteBandOf(neighbour.cell.earfcn));
+    if (neighbour.cell.earfcn != kUnknownEarfcn) {
+      entry->setNbrEarfcn(neighbour.cell.earfcn);
+      set(*entry, &EgwErrcNbrEutraMeas::setFreqBandInd, sources::lteBandOf(neighbour.cell.earfcn));
+    }
     set(*entry, &EgwErrcNbrEutraMeas::setNbrRsrp, neighbour.rsrpDbm, sources::rsrpIndex);
     set(*entry, &EgwErrcNbrEutraMeas::setNbrRsrq, neighbour.rsrqDb, sources::rsrqIndex);
     message.addMeasNbrEutra(entry);

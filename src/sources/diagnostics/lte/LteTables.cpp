@@ -7,15 +7,21 @@
 #include "sources/diagnostics/lte/CellLogs.h"
 #include "sources/diagnostics/lte/CellReports.h"
 #include "sources/diagnostics/lte/NeighbourLogs.h"
+#include "sources/diagnostics/lte/OverTheAirLog.h"
 #include "sources/diagnostics/lte/PowerLogs.h"
+#include "sources/diagnostics/lte/Reported.h"
+#include "sources/diagnostics/lte/RrcReports.h"
+#include "sources/diagnostics/lte/RrcStates.h"
 #include "sources/diagnostics/lte/SignalLogs.h"
 #include "sources/diagnostics/lte/SignalReports.h"
+#include "sources/diagnostics/lte/SystemInformation.h"
 
 namespace qel::diagnostics {
 namespace {
 
 // By code.
 constexpr std::array kLogs = {
+    LogRow{0xB0C0, "LTE RRC over the air", readLteOverTheAir, versionInFirstByte},
     LogRow{kLteBroadcastLog, "LTE MIB", readLteBroadcast, versionInFirstByte},
     LogRow{kLteServingCellLog, "LTE serving cell", readLteServingCell, versionInFirstByte},
     LogRow{kLtePuschLog, "LTE PUSCH power", readLtePusch, versionInFirstByte},
@@ -34,16 +40,24 @@ constexpr std::array kLogs = {
 
 // By identifier.
 constexpr std::array kEvents = {
+    EventRow{1606, "LTE RRC state", readRrcState},
+    EventRow{1607, "LTE out of service", readOutOfService},
+    EventRow{1608, "LTE radio link failure", readRadioLinkFailure},
     EventRow{1611, "LTE new cell", readLteNewCell},
 };
 
 constexpr std::array kReports = {
     ReportRow{metric::kLteScellInfo, lteCell},
+    ReportRow{metric::kLteRrcState, lteRrcState},
+    ReportRow{metric::kLteCdrxConfig, lteReception},
+    ReportRow{metric::kLteRadioLinkFailure, lteRadioLinkFailure},
     ReportRow{metric::kLteRsrpRsrqSinr, lteQuality},
     ReportRow{metric::kLteServingMeasurement, lteMeasurement},
     ReportRow{metric::kLteTxPower, lteTxPower},
     ReportRow{metric::kLteComponentCarriers, lteComponents},
+    ReportRow{metric::kLteSelRes, lteRules},
     ReportRow{metric::kLteNeighbours, lteNeighbours},
+    ReportRow{metric::kLteInterRat, lteOthers},
     ReportRow{metric::kLteCarrierAggregation, lteCarriers},
 };
 
@@ -82,6 +96,8 @@ void age(LtePicture& picture, std::uint64_t nowMs) {
   ageSignals(picture, nowMs);
   picture.neighbours.forget(
       [&](std::uint64_t timeMs) { return isOld(timeMs, nowMs, kNeighbourMs); });
+  std::erase_if(picture.connection.others.cells,
+                [&](const LteOther& cell) { return isOld(cell.timeMs, nowMs, kNeighbourMs); });
 }
 
 }  // namespace qel::diagnostics

@@ -72,7 +72,7 @@ Outcome readLteConnectedCells(const LogPacket& packet, Picture& picture, Told& t
     const LteCellName server = nameOf(reading.head);
     const auto cells = neighboursOf(reading, packet.timeMs);
     if (!cells || !isCell(server)) return Outcome::damaged;
-    if (reading.head.number(Field::cellIndex) == 0) picture.lte.camped = server;
+    if (reading.head.number(Field::cellIndex) == 0) picture.lte.camp(server);
     note(*cells, picture.lte, told);
     return Outcome::understood;
   });
@@ -91,7 +91,7 @@ Outcome readLteIdleServing(const LogPacket& packet, Picture& picture, Told& /*to
   return readWhole(packet, [&](const Reading& reading) {
     const LteCellName server = nameOf(reading.head);
     if (!isCell(server)) return Outcome::damaged;
-    picture.lte.camped = server;
+    picture.lte.camp(server);
     return Outcome::understood;
   });
 }

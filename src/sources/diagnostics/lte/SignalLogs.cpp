@@ -44,7 +44,7 @@ Outcome readLteMeasurement(const LogPacket& packet, Picture& picture, Told& told
   LtePicture& lte = picture.lte;
   if (const JudgedCell* primary = primaryOf(judged.cells)) {
     lte.signal = LteSignal{primary->name, primary->antennas, packet.timeMs};
-    lte.camped = primary->name;
+    lte.camp(primary->name);
     if (!picture.technology) picture.technology = Technology::lte;
     told.tell(metric::kLteServingMeasurement);
     told.tell(metric::kLteRsrpRsrqSinr);

@@ -70,7 +70,11 @@ constexpr std::array kRefusals = {
 };
 
 // Where the phone is when a network refuses it.
-std::optional<TrackingArea> servingTrackingArea(const Picture& /*picture*/) { return std::nullopt; }
+std::optional<TrackingArea> servingTrackingArea(const Picture& picture) {
+  const auto& cell = picture.lte.serving;
+  if (!cell) return std::nullopt;
+  return TrackingArea{plmnOf({cell->mcc, cell->mnc, cell->mncDigits}), cell->area};
+}
 
 void setRegistration(EmmPart& emm, std::int32_t status) {
   if (!emm.registrationIsModems) emm.registration = status;

@@ -39,4 +39,15 @@ std::optional<Network> networkOf(const PlmnCode& plmn) {
   return network;
 }
 
+PlmnCode plmnOf(const Network& network) {
+  const bool three = network.mncDigits == 3;
+  const std::uint32_t mnc = three ? network.mnc / 10 : network.mnc;
+  const std::uint32_t last = three ? network.mnc % 10 : 0xFU;
+  const auto octet = [](std::uint32_t high, std::uint32_t low) {
+    return static_cast<std::uint8_t>(high << 4U | low);
+  };
+  return {octet(network.mcc / 10 % 10, network.mcc / 100 % 10), octet(last, network.mcc % 10),
+          octet(mnc % 10, mnc / 10 % 10)};
+}
+
 }  // namespace qel::diagnostics

@@ -45,6 +45,7 @@ RoutingArea routingAreaAt(ByteView bytes, std::size_t offset);
 
 // Nothing when a digit is none.
 std::optional<Network> networkOf(const PlmnCode& plmn);
+PlmnCode plmnOf(const Network& network);
 
 // As a field of a message.
 inline Bytes bytesOf(const PlmnCode& plmn) { return {plmn.begin(), plmn.end()}; }

@@ -8,6 +8,9 @@
 
 namespace qel::diagnostics {
 
+// In reports of the phone's, where it was not seen which channel they are about.
+inline constexpr std::uint32_t kUnknownEarfcn = 0xFFFFFFFF;
+
 // What tells a cell from others at one place.
 struct LteCellName {
   std::uint32_t earfcn = 0;

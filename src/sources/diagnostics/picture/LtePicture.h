@@ -5,6 +5,8 @@
 #include <vector>
 
 #include "sources/diagnostics/picture/LteCells.h"
+#include "sources/diagnostics/picture/LteConnection.h"
+#include "sources/diagnostics/picture/LteRules.h"
 
 namespace qel::diagnostics {
 
@@ -17,9 +19,19 @@ struct LtePicture {
   std::vector<SecondaryCarrier> carriers;
   LteTransmissions pusch;
   LteTransmissions pucch;
+  LteConnection connection;
+  std::optional<LteRules> rules;
 
   // A cell that somebody else measured, for instance the phone in a report to the network.
   void noteNeighbour(const LteNeighbour& neighbour) { neighbours.note(neighbour); }
+
+  // The phone is on that cell: what was known of the one before holds no longer.
+  void camp(const LteCellName& cell) {
+    if (camped == cell) return;
+    camped = cell;
+    if (serving && serving->name != cell) serving.reset();
+    connection.others.cells.clear();
+  }
 };
 
 }  // namespace qel::diagnostics
