@@ -74,6 +74,7 @@ Judgement judge(const rrc::generator::Tables& tables, const std::vector<JudgedTy
       judgement.differences.push_back("not read: " + hexText(messages[i].message.pdu));
       continue;
     }
+    for (const rrc::Found& found : reading->found) judgement.kinds.insert(found.mark);
     std::vector<Token> tokens = tokensOf(*reading, tables);
     std::erase_if(tokens, [&](const Token& token) {
       return !token.name.empty() && peculiarities.reckoned.contains(token.name);

@@ -18,7 +18,8 @@ struct Peculiarities {
 
 struct Judgement {
   std::size_t fields = 0;
-  std::size_t further = 0;  // that tshark shows and the schema passes over
+  std::set<rrc::Mark> kinds;  // of fields
+  std::size_t further = 0;    // that tshark shows and the schema passes over
   std::vector<std::string> differences;
 };
 

@@ -33,20 +33,40 @@ Bytes RandomRrc::randomBytes(std::size_t size) {
   return bytes;
 }
 
-bool RandomRrc::isReadable(const Type& type, std::size_t index) const {
+bool RandomRrc::mayChoose(const Type& type, std::size_t index) const {
   const TypeIndex of = field(type, index).type;
   if (of == TypeIndex::none || _choice.never.contains(nameOf(type, index))) return false;
   const Type& inside = _tables.types[static_cast<std::size_t>(of)];
   if (inside.kind != Kind::choice) return inside.kind != Kind::stop;
   for (std::size_t i = 0; i < std::size_t{inside.count} + inside.additions; ++i) {
-    if (isReadable(inside, i)) return true;
+    if (mayChoose(inside, i)) return true;
   }
   return false;
 }
 
 bool RandomRrc::wants(const Type& type, std::size_t index, int depth) {
-  constexpr int kShallow = 8;
-  return isReadable(type, index) && chance(depth < kShallow ? 75 : 40);
+  constexpr int kShallow = 14;
+  constexpr unsigned kSeldom = 10;
+  if (!mayChoose(type, index)) return false;
+  unsigned& uses = _uses[type.first + index];
+  const bool wanted = chance(uses < kSeldom ? 90 : depth < kShallow ? 65 : 40);
+  uses += wanted ? 1 : 0;
+  return wanted;
+}
+
+std::size_t RandomRrc::alternative(const Type& type) {
+  std::vector<std::size_t> readable;
+  const std::size_t all = std::size_t{type.count} + type.additions;
+  for (std::size_t i = 0; i < all; ++i) {
+    if (mayChoose(type, i)) readable.push_back(i);
+  }
+  if (readable.empty()) return 0;
+  const auto uses = [&](std::size_t i) -> unsigned& { return _uses[type.first + i]; };
+  const auto seldom = *std::min_element(readable.begin(), readable.end(),
+                                        [&](auto a, auto b) { return uses(a) < uses(b); });
+  const std::size_t chosen = chance(60) ? seldom : readable[upTo(readable.size() - 1)];
+  ++uses(chosen);
+  return chosen;
 }
 
 void RandomRrc::write(BitWriter& bits, TypeIndex index, const std::string& name, int depth) {
@@ -142,12 +162,7 @@ void RandomRrc::sequence(BitWriter& bits, const Type& type, int depth) {
 }
 
 void RandomRrc::choice(BitWriter& bits, const Type& type, const std::string& name, int depth) {
-  std::vector<std::size_t> readable;
-  const std::size_t all = std::size_t{type.count} + type.additions;
-  for (std::size_t i = 0; i < all; ++i) {
-    if (isReadable(type, i)) readable.push_back(i);
-  }
-  const std::size_t chosen = readable.empty() ? 0 : readable[upTo(readable.size() - 1)];
+  const std::size_t chosen = alternative(type);
   _tokens.push_back(tokenOf(_tables, type, name, static_cast<std::int64_t>(chosen), {}));
   if (type.extensible) bits.flag(chosen >= type.count);
   if (chosen < type.count) {

@@ -26,9 +26,15 @@ class RandomRrc {
     std::set<std::string> never = {};  // fields and alternatives that are never chosen
   };
   RandomRrc(const rrc::generator::Tables& tables, Choice choice)
-      : _tables(tables), _choice(std::move(choice)), _engine(_choice.seed) {}
+      : _tables(tables),
+        _choice(std::move(choice)),
+        _engine(_choice.seed),
+        _uses(tables.fields.size()) {}
 
   RandomRrcMessage message(rrc::TypeIndex type);
+
+  // Whether there is something to read in that field or alternative.
+  bool mayChoose(const rrc::Type& type, std::size_t index) const;
 
  private:
   void write(BitWriter& bits, rrc::TypeIndex index, const std::string& name, int depth);
@@ -44,7 +50,7 @@ class RandomRrc {
   std::uint64_t upTo(std::uint64_t most) { return _engine() % (most + 1); }
   bool chance(unsigned percent) { return upTo(99) < percent; }
   std::int64_t between(std::int64_t low, std::int64_t high);
-  bool isReadable(const rrc::Type& type, std::size_t index) const;
+  std::size_t alternative(const rrc::Type& type);
   bool wants(const rrc::Type& type, std::size_t index, int depth);
   const rrc::Field& field(const rrc::Type& type, std::size_t index) const {
     return _tables.fields[type.first + index];
@@ -57,6 +63,7 @@ class RandomRrc {
   const rrc::generator::Tables& _tables;
   Choice _choice;
   std::mt19937_64 _engine;
+  std::vector<unsigned> _uses;  // of each field: those that were seldom chosen are preferred
   std::vector<Token> _tokens;
 };
 

@@ -3,11 +3,14 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <array>
+#include <set>
 
 #include "rrc/BitWriter.h"
 #include "rrc/Captures.h"
 #include "rrc/Judge.h"
+#include "rrc/LteValues.h"
 #include "rrc/RandomRrc.h"
 #include "rrc/SchemaFiles.h"
 #include "rrc/lte/Messages.h"
@@ -58,6 +61,7 @@ void expectAgreement(const std::vector<JudgedType>& messages, bool mayShowMore) 
       judge(lteTables(), messages, shownOf(messages), kPeculiarities, mayShowMore);
   ::testing::Test::RecordProperty("messages", static_cast<int>(messages.size()));
   ::testing::Test::RecordProperty("fields", static_cast<int>(judgement.fields));
+  ::testing::Test::RecordProperty("kinds", static_cast<int>(judgement.kinds.size()));
   EXPECT_GT(judgement.fields, messages.size());
   EXPECT_TRUE(judgement.differences.empty())
       << judgement.differences.size() << " differences in " << judgement.fields << " fields of "
@@ -67,9 +71,10 @@ void expectAgreement(const std::vector<JudgedType>& messages, bool mayShowMore) 
   }
 }
 
-// Channels of which more than the message's name is read.
-constexpr std::array kReadChannels = {Channel::bcchBch, Channel::bcchDlSch, Channel::dlCcch,
-                                      Channel::dlDcch,  Channel::ulCcch,    Channel::ulDcch};
+// Channels of which more than the message's name is read, those with more to read more often.
+constexpr std::array kReadChannels = {
+    Channel::bcchBch, Channel::bcchDlSch, Channel::bcchDlSch, Channel::dlCcch, Channel::dlCcch,
+    Channel::dlDcch,  Channel::dlDcch,    Channel::dlDcch,    Channel::ulCcch, Channel::ulDcch};
 
 // What tshark looks into must not be random.
 const std::set<std::string> kNotRandom = {"locationInfo-r10", "handover"};
@@ -87,7 +92,61 @@ std::vector<JudgedType> randomMessages(unsigned seed, std::size_t count) {
 
 TEST(TsharkJudge, readsRandomMessagesAlike) {
   if (!hasTshark()) GTEST_SKIP() << "no tshark";
-  expectAgreement(randomMessages(1, 3000), false);
+  expectAgreement(randomMessages(1, 4000), false);
+}
+
+// Random system information may hold a block twice; its values are those of the last.
+bool repeatsABlock(const std::vector<Shown>& shown) {
+  std::set<std::string> blocks;
+  return std::any_of(shown.begin(), shown.end(), [&](const Shown& one) {
+    return one.name == "sib-TypeAndInfo-item" && !blocks.insert(one.value).second;
+  });
+}
+
+void expectValuesAsShown(const std::vector<JudgedType>& messages,
+                         const std::vector<Channel>& channels) {
+  constexpr int kMostShown = 5;
+  const auto shown = shownOf(messages);
+  std::size_t claims = 0;
+  int contradictions = 0;
+  for (std::size_t i = 0; i < messages.size(); ++i) {
+    if (repeatsABlock(shown[i])) continue;
+    const auto message = rrc::readLteMessage(channels[i], messages[i].message.pdu);
+    ASSERT_TRUE(message) << hexText(messages[i].message.pdu);
+    for (const Claim& claim : claimsOf(*message)) {
+      ++claims;
+      const std::string text = contradiction(claim, shown[i]);
+      if (text.empty() || ++contradictions > kMostShown) continue;
+      ADD_FAILURE() << messages[i].message.dissector << ' ' << hexText(messages[i].message.pdu)
+                    << '\n'
+                    << text;
+    }
+  }
+  ::testing::Test::RecordProperty("claims", static_cast<int>(claims));
+  EXPECT_GT(claims, messages.size());
+  EXPECT_EQ(contradictions, 0);
+}
+
+TEST(TsharkJudge, showsTheValuesThatAreMadeOfRandomMessages) {
+  if (!hasTshark()) GTEST_SKIP() << "no tshark";
+  const auto messages = randomMessages(2, 3000);
+  std::vector<Channel> channels;
+  for (std::size_t i = 0; i < messages.size(); ++i) {
+    channels.push_back(kReadChannels[i % kReadChannels.size()]);
+  }
+  expectValuesAsShown(messages, channels);
+}
+
+TEST(TsharkJudge, showsTheValuesThatAreMadeOfMessagesOfRealModems) {
+  if (!hasTshark()) GTEST_SKIP() << "no tshark";
+  std::vector<JudgedType> messages;
+  std::vector<Channel> channels;
+  for (auto& [channel, pdu] : capturedLteMessages()) {
+    messages.push_back(judged(channel, pdu));
+    channels.push_back(channel);
+  }
+  if (messages.empty()) GTEST_SKIP() << "QEL_DIAG_CAPTURES names no logs";
+  expectValuesAsShown(messages, channels);
 }
 
 // A message by its place among the alternatives, and nothing but zeros in it.

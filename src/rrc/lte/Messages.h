@@ -32,6 +32,8 @@ struct Message {
   std::optional<MeasurementReport> report;
 
   std::vector<Bytes> nas;  // messages of the non-access stratum that it carries
+
+  bool operator==(const Message&) const = default;
 };
 
 }  // namespace qel::rrc::lte

@@ -13,6 +13,8 @@ namespace qel::rrc::lte {
 struct MasterInformationBlock {
   unsigned dlBandwidthBlocks = 0;  // 6 15 25 50 75 100
   unsigned sfnHigh = 0;            // the upper 8 bits of the system frame number's 10
+
+  bool operator==(const MasterInformationBlock&) const = default;
 };
 
 struct Plmn {
@@ -20,11 +22,15 @@ struct Plmn {
   unsigned mnc = 0;
   unsigned mncDigits = 0;  // 2 or 3
   bool reservedForOperator = false;
+
+  bool operator==(const Plmn&) const = default;
 };
 
 struct TddConfiguration {
   unsigned subframeAssignment = 0;      // 0 to 6
   unsigned specialSubframePattern = 0;  // 0 to 8
+
+  bool operator==(const TddConfiguration&) const = default;
 };
 
 struct Sib1 {
@@ -43,6 +49,8 @@ struct Sib1 {
   std::vector<unsigned> furtherBands;  // the wider one where there are two
   std::optional<TddConfiguration> tdd;
   std::optional<bool> imsEmergencySupport;  // absent: the message is of release 8
+
+  bool operator==(const Sib1&) const = default;
 };
 
 struct AccessBarring {
@@ -51,6 +59,8 @@ struct AccessBarring {
   unsigned timeIndex = 0;       // 0 to 7
   unsigned timeS = 0;           // 4 to 512
   unsigned specialClasses = 0;  // bits 4 to 0 are classes 11 to 15
+
+  bool operator==(const AccessBarring&) const = default;
 };
 
 struct Sib2 {
@@ -59,6 +69,8 @@ struct Sib2 {
   std::optional<AccessBarring> forData;
   std::optional<std::uint32_t> ulEarfcn;
   std::optional<unsigned> ulBandwidthBlocks;
+
+  bool operator==(const Sib2&) const = default;
 };
 
 struct Sib3 {
@@ -75,6 +87,8 @@ struct Sib3 {
   std::optional<int> pMaxDbm;
   std::optional<unsigned> measuredBandwidthBlocks;
   unsigned tReselectionS = 0;
+
+  bool operator==(const Sib3&) const = default;
 };
 
 struct EutraCarrier {
@@ -91,10 +105,14 @@ struct EutraCarrier {
   std::optional<unsigned> priority;
   int qOffsetDb = 0;
   std::vector<unsigned> furtherBands;
+
+  bool operator==(const EutraCarrier&) const = default;
 };
 
 struct Sib5 {
   std::vector<EutraCarrier> carriers;
+
+  bool operator==(const Sib5&) const = default;
 };
 
 struct UtraCarrier {
@@ -107,12 +125,16 @@ struct UtraCarrier {
   int qRxLevMin = 0;  // dBm = 2 times this + 1
   int pMaxDbm = 0;
   std::optional<int> qQualMinDb;  // FDD only
+
+  bool operator==(const UtraCarrier&) const = default;
 };
 
 struct Sib6 {
   std::vector<UtraCarrier> fdd;
   std::vector<UtraCarrier> tdd;
   unsigned tReselectionS = 0;
+
+  bool operator==(const Sib6&) const = default;
 };
 
 struct GeranCarriers {
@@ -125,11 +147,15 @@ struct GeranCarriers {
   std::optional<unsigned> pMaxDbm;
   unsigned threshXHigh = 0;  // steps of 2 dB
   unsigned threshXLow = 0;   // steps of 2 dB
+
+  bool operator==(const GeranCarriers&) const = default;
 };
 
 struct Sib7 {
   std::vector<GeranCarriers> carriers;
   unsigned tReselectionS = 0;
+
+  bool operator==(const Sib7&) const = default;
 };
 
 }  // namespace qel::rrc::lte
