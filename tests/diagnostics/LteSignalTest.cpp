@@ -247,5 +247,27 @@ TEST(LteMeasurement, isForgottenWhenTheClockGoesBack) {
   EXPECT_EQ(receivers(modem), "");
 }
 
+TEST(LteMeasurement, tellsWhetherThePhoneIsConnectedOnceThatIsKnown) {
+  constexpr std::uint16_t kStateEvent = 1606;
+  LteModem modem;
+  const Bytes measured = lteMeasurement(4, 5780, {kCell});
+  modem.send(kMeasurement, measured);
+  EXPECT_EQ(receivers(modem).find("is_connected_mode"), std::string::npos);
+  modem.sendEvent(kStateEvent, Bytes{4});
+  EXPECT_NE(receivers(modem).find(R"("is_connected_mode": true)"), std::string::npos)
+      << receivers(modem);
+  modem.sendEvent(kStateEvent, Bytes{2});
+  EXPECT_NE(receivers(modem).find(R"("is_connected_mode": false)"), std::string::npos)
+      << receivers(modem);
+}
+
+// A report on neighbours, once there was one, may be an empty list; before that there is none.
+TEST(DiagnosticsReader, saysNothingOfWhatWasNeverTold) {
+  LteModem modem;
+  modem.send(kMeasurement, lteMeasurement(4, 5780, {kCell}));
+  EXPECT_EQ(modem.said(54031), "");
+  EXPECT_EQ(modem.said(kCarriers), "");
+}
+
 }  // namespace
 }  // namespace qel::diagnostics

@@ -38,12 +38,18 @@ const Told& DiagnosticsReader::take(const Packet& packet, const Row* row,
   age(_picture, packet.timeMs);
   const Outcome outcome = row ? row->read(packet, _picture, _told) : Outcome::notOurs;
   _counts.count(kind, outcome);
+  for (const std::uint32_t metric : _told) _everTold.tell(metric);
   return _told;
 }
 
 std::optional<Bytes> DiagnosticsReader::report(std::uint32_t metric, std::uint64_t timeMs) const {
-  const ReportRow* row = findReport(metric);
+  const ReportRow* row = _everTold.contains(metric) ? findReport(metric) : nullptr;
   return row ? row->build(_picture, timeMs) : std::nullopt;
+}
+
+void DiagnosticsReader::forget() {
+  _picture = {};
+  _everTold.clear();
 }
 
 }  // namespace qel::diagnostics

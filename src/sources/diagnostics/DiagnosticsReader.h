@@ -27,7 +27,7 @@ class DiagnosticsReader {
   std::optional<Bytes> report(std::uint32_t metric, std::uint64_t timeMs) const;
 
   // The modem has begun anew: what was known of it holds no longer. The counts go on.
-  void forget() { _picture = {}; }
+  void forget();
 
   const Picture& picture() const { return _picture; }
   const PacketCounts& counts() const { return _counts; }
@@ -39,6 +39,7 @@ class DiagnosticsReader {
   const unsigned _radio;
   Picture _picture;
   Told _told;
+  Told _everTold;  // since the modem began
   PacketCounts _counts;
 };
 

@@ -12,11 +12,11 @@ namespace qel::diagnostics {
 class Told {
  public:
   void tell(std::uint32_t metric) {
-    if (std::find(begin(), end(), metric) != end()) return;
-    if (_count < _metrics.size()) _metrics[_count++] = metric;
+    if (!contains(metric) && _count < _metrics.size()) _metrics[_count++] = metric;
   }
   void clear() { _count = 0; }
 
+  bool contains(std::uint32_t metric) const { return std::find(begin(), end(), metric) != end(); }
   bool empty() const { return _count == 0; }
   std::size_t size() const { return _count; }
   const std::uint32_t* begin() const { return _metrics.data(); }

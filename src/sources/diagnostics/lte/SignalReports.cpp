@@ -60,6 +60,9 @@ std::optional<Bytes> lteMeasurement(const Picture& picture, std::uint64_t timeMs
   if (!signal) return std::nullopt;
   KCellularLteServingCellMeasurement message;
   message.setTimestamp(timeMs);
+  if (const auto& state = picture.lte.connection.rrc.state) {
+    message.setIsConnectedMode(*state == LteRrcState::kConnected);
+  }
   addReceivers(signal->antennas, message);
   return message.data();
 }

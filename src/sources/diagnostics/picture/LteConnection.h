@@ -14,6 +14,8 @@ namespace qel::diagnostics {
 
 // Where the connection stands. Codes are those of the report on it (19972).
 struct LteRrcState {
+  static constexpr std::int32_t kConnected = 3;
+
   std::optional<std::int32_t> state;
   std::uint64_t sinceMs = 0;
   std::optional<std::int32_t> previous;
