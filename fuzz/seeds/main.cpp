@@ -10,6 +10,7 @@
 #include "fuzz/seeds/MessageSeeds.h"
 #include "fuzz/seeds/ModemSeeds.h"
 #include "fuzz/seeds/RecordedSeeds.h"
+#include "fuzz/seeds/RrcSeeds.h"
 #include "fuzz/support/Seed.h"
 #include "messages/service_state.h"
 #include "tesk/Constants.h"
@@ -87,6 +88,7 @@ void makeSeeds(const std::filesystem::path& directory, const char* recording,
   writeAll(directory / "requests", requestSeeds(wishes));
   writeAll(directory / "states", stateSeeds(wishes));
   writeAll(directory / "modems", modems());
+  writeAll(directory / "rrc", rrcSeeds());
 }
 
 }  // namespace

@@ -20,7 +20,7 @@ const std::map<std::string, std::set<std::string>> kAllowed = {
     {"rrc", {"base"}},
     {"recording", {"base", "messages"}},
     {"bus", {"base"}},
-    {"sources", {"base", "bus", "messages", "recording"}},
+    {"sources", {"base", "bus", "messages", "recording", "rrc"}},
     {"tesk", {"base", "bus", "messages"}},
     {"service", {"base", "bus", "messages", "sources", "tesk"}},
     {"connection", {"base", "tesk"}},

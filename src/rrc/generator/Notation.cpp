@@ -88,6 +88,12 @@ bool isName(std::string_view word) {
          });
 }
 
+Shape shapeOf(Kind kind) {
+  Shape shape;
+  shape.kind = kind;
+  return shape;
+}
+
 class Parser {
  public:
   explicit Parser(std::vector<Line> lines) : _lines(std::move(lines)) {}
@@ -116,11 +122,11 @@ class Parser {
 
   Shape shape(Words& words, std::size_t indent) {
     const std::string word = words.take();
-    if (word == "NULL") return {.kind = Kind::null};
-    if (word == "BOOL") return {.kind = Kind::boolean};
-    if (word == "STOP") return {.kind = Kind::stop};
+    if (word == "NULL") return shapeOf(Kind::null);
+    if (word == "BOOL") return shapeOf(Kind::boolean);
+    if (word == "STOP") return shapeOf(Kind::stop);
     if (word == "INT") {
-      Shape result{.kind = Kind::integer};
+      Shape result = shapeOf(Kind::integer);
       words.range(result.low, result.high);
       return result;
     }
@@ -131,7 +137,9 @@ class Parser {
     if (word == "SEQUENCE") return group(words.place(), Kind::sequence, indent);
     if (word == "CHOICE") return group(words.place(), Kind::choice, indent);
     if (!isName(word)) words.place().refuse("not a type: " + word);
-    return {.reference = word};
+    Shape result;
+    result.reference = word;
+    return result;
   }
 
   static void checkSize(const Words& words, const Shape& shape) {
@@ -139,7 +147,7 @@ class Parser {
   }
 
   Shape string(Words& words, Kind kind, std::size_t indent) {
-    Shape result{.kind = kind};
+    Shape result = shapeOf(kind);
     result.unbounded = words.done() || words.front() == "OF";
     if (!result.unbounded) words.range(result.low, result.high);
     checkSize(words, result);
@@ -148,7 +156,7 @@ class Parser {
   }
 
   Shape list(Words& words, std::size_t indent) {
-    Shape result{.kind = Kind::list};
+    Shape result = shapeOf(Kind::list);
     words.range(result.low, result.high);
     checkSize(words, result);
     if (!words.skip("OF")) words.place().refuse("'OF' is missing");
@@ -157,7 +165,7 @@ class Parser {
   }
 
   static Shape enumerated(Words& words) {
-    Shape result{.kind = Kind::enumerated};
+    Shape result = shapeOf(Kind::enumerated);
     std::string count = words.take();
     const bool numbered = count.ends_with(':');
     if (numbered) count.pop_back();
@@ -176,7 +184,7 @@ class Parser {
 
   // The lines below, one step deeper.
   Shape group(const Place& place, Kind kind, std::size_t indent) {
-    Shape result{.kind = kind};
+    Shape result = shapeOf(kind);
     while (_next < _lines.size() && _lines[_next].indent > indent) {
       const Line& line = _lines[_next++];
       if (line.indent != indent + kIndent) line.place.refuse("indented by no step of two");
@@ -198,7 +206,7 @@ class Parser {
       const std::int64_t count = words.done() ? 1 : words.number();
       if (count < 1 || count > kMostSkipped || !words.done()) line.place.refuse("no such count");
       shape.additions.resize(shape.additions.size() + static_cast<std::size_t>(count),
-                             {.place = line.place});
+                             {line.place, {}, false, false, {}});
     } else if (shape.kind == Kind::sequence && words.skip("group")) {
       if (!words.done()) line.place.refuse("too much behind 'group'");
       const Shape inside = group(line.place, Kind::sequence, line.indent);

@@ -29,23 +29,23 @@ struct Member;
 
 struct Shape {
   Kind kind = Kind::null;
-  std::string reference = {};  // the type of that name; then the rest says nothing
+  std::string reference;  // the type of that name; then the rest says nothing
   bool extensible = false;
   bool unbounded = false;
   std::int64_t low = 0;
   std::int64_t high = 0;
-  std::vector<std::int64_t> numbers = {};
-  std::vector<Shape> content = {};  // of a list or of contained octets: one
-  std::vector<Member> root = {};
-  std::vector<Member> additions = {};
+  std::vector<std::int64_t> numbers;
+  std::vector<Shape> content;  // of a list or of contained octets: one
+  std::vector<Member> root;
+  std::vector<Member> additions;
 };
 
 struct Member {
   Place place;
-  std::string name = {};  // empty: an addition that is skipped
+  std::string name;  // empty: an addition that is skipped
   bool wanted = false;
   bool optional = false;
-  Shape shape = {};
+  Shape shape;
 };
 
 struct Definition {
