@@ -80,12 +80,10 @@ class Words {
 };
 
 bool isName(std::string_view word) {
-  constexpr std::string_view kMore = "-";
   const auto letter = [](char c) { return (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z'); };
   return !word.empty() && letter(word.front()) &&
-         std::all_of(word.begin(), word.end(), [&](char c) {
-           return letter(c) || (c >= '0' && c <= '9') || kMore.find(c) != kMore.npos;
-         });
+         std::all_of(word.begin(), word.end(),
+                     [&](char c) { return letter(c) || (c >= '0' && c <= '9') || c == '-'; });
 }
 
 Shape shapeOf(Kind kind) {
