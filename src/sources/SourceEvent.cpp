@@ -14,4 +14,14 @@ SourceEvent metricEvent(std::uint32_t metric, Bytes payload, std::uint64_t timeM
            {tesk::kKeyPayload, std::move(payload)}}};
 }
 
+std::optional<std::uint32_t> metricOf(const SourceEvent& event) {
+  if (event.stream != tesk::kEventMetric) return std::nullopt;
+  const Value* value = event.entries.find(tesk::kKeyMetricID);
+  const auto identifier = value ? value->asInt64() : std::nullopt;
+  if (!identifier || *identifier < kMetricEventBase || *identifier > kMetricEventBase + 0xFFFF) {
+    return std::nullopt;
+  }
+  return static_cast<std::uint32_t>(*identifier - kMetricEventBase);
+}
+
 }  // namespace qel::sources

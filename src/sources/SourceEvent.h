@@ -2,6 +2,7 @@
 #pragma once
 
 #include <cstdint>
+#include <optional>
 #include <string_view>
 
 #include "base/Value.h"
@@ -17,5 +18,7 @@ struct SourceEvent {
 
 // A metric's, by its 16-bit identifier.
 SourceEvent metricEvent(std::uint32_t metric, Bytes payload, std::uint64_t timeMs);
+// The identifier; nothing when the event is no metric's.
+std::optional<std::uint32_t> metricOf(const SourceEvent& event);
 
 }  // namespace qel::sources

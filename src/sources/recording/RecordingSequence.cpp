@@ -9,7 +9,6 @@
 #include "base/LogSink.h"
 #include "base/Weight.h"
 #include "messages/catalogue/EventNames.h"
-#include "messages/catalogue/KBBMetricUtility.h"
 
 namespace qel::sources {
 namespace {
@@ -17,16 +16,6 @@ namespace {
 SourceEvent serviceEvent(RecordedEvent event) {
   const auto stream = event.kind == RecordedKind::metric ? tesk::kEventMetric : tesk::kEventTrigger;
   return {event.timeMs, stream, std::move(event.entries)};
-}
-
-std::optional<std::uint32_t> metricOf(const SourceEvent& event) {
-  if (event.stream != tesk::kEventMetric) return std::nullopt;
-  const Value* value = event.entries.find(tesk::kKeyMetricID);
-  const auto identifier = value ? value->asInt64() : std::nullopt;
-  if (!identifier || *identifier < kMetricEventBase || *identifier > kMetricEventBase + 0xFFFF) {
-    return std::nullopt;
-  }
-  return static_cast<std::uint32_t>(*identifier - kMetricEventBase);
 }
 
 // Of what answers queries, in bytes, roughly; a file may hold as much as it likes.
