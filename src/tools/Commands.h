@@ -24,5 +24,6 @@ void addStatusCommand(CLI::App& app, Action& chosen);
 // `verbose` is read when the subcommand runs.
 void addLiveCommand(CLI::App& app, Action& chosen, const bool& verbose);
 void addRecordCommand(CLI::App& app, Action& chosen);
+void addImportCommand(CLI::App& app, Action& chosen);
 
 }  // namespace qel::tools

@@ -52,6 +52,7 @@ int main(int argc, char* argv[]) {
   tools::addStatusCommand(app, chosen);
   tools::addLiveCommand(app, chosen, verbose);
   tools::addRecordCommand(app, chosen);
+  tools::addImportCommand(app, chosen);
 
   try {
     app.parse(argc, argv);
