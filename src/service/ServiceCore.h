@@ -61,6 +61,9 @@ class ServiceCore final : public sources::EventReceiver,
     return _configurations.sizes();
   }
 
+  // What the source knows about where its events come from.
+  sources::SourceFacts facts() const { return _source->facts(); }
+
   // How it is with the modem behind the source; nothing is known of it while the source rests.
   ConditionBook& condition() { return _condition; }
 

@@ -21,6 +21,8 @@ class EventSequence {
   virtual void passed(const SourceEvent& /*event*/) {}
   // The metric as it is at the moment, by its 16-bit identifier.
   virtual SourceAnswer query(std::uint32_t metric) = 0;
+  // What is to be known about where the events are from.
+  virtual SourceFacts facts() const { return {}; }
   // How it is with what the events are from; changes with the end of the events at most.
   virtual SourceCondition condition() const { return {}; }
 };

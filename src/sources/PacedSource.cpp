@@ -28,6 +28,10 @@ struct PacedSource::Run {
     const std::lock_guard lock(mutex);
     return sequence->query(metric);
   }
+  SourceFacts facts() {
+    const std::lock_guard lock(mutex);
+    return sequence->facts();
+  }
   SourceCondition condition() {
     const std::lock_guard lock(mutex);
     return sequence->condition();
@@ -67,14 +71,20 @@ void PacedSource::stop() {
   _run.reset();
 }
 
+std::shared_ptr<PacedSource::Run> PacedSource::run() const {
+  const std::lock_guard lock(_mutex);
+  return _run;
+}
+
 SourceAnswer PacedSource::query(std::uint32_t metric) {
-  std::shared_ptr<Run> run;
-  {
-    const std::lock_guard lock(_mutex);
-    run = _run;
-  }
-  if (!run) return {false, "the source is not running", 0, {}};
-  return run->query(metric);
+  const auto now = run();
+  if (!now) return {false, "the source is not running", 0, {}};
+  return now->query(metric);
+}
+
+SourceFacts PacedSource::facts() const {
+  const auto now = run();
+  return now ? now->facts() : SourceFacts();
 }
 
 void PacedSource::play(Run& run) {

@@ -32,9 +32,11 @@ class PacedSource final : public EventSource {
   void stop() override;
   SourceAnswer query(std::uint32_t metric) override;
   std::string description() const override { return _description; }
+  SourceFacts facts() const override;
 
  private:
   struct Run;
+  std::shared_ptr<Run> run() const;
   static void play(Run& run);
   static bool hand(Run& run, const SourceEvent& event);
   static void report(Run& run);
@@ -44,7 +46,7 @@ class PacedSource final : public EventSource {
   const double _speed;
   WaitClock& _clock;
 
-  std::mutex _mutex;  // guards the two below; no event and no query runs under it
+  mutable std::mutex _mutex;  // guards the two below; no event and no query runs under it
   std::shared_ptr<Run> _run;
   RunThreads _threads;  // last: they end first
 };

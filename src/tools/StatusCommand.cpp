@@ -30,6 +30,12 @@ Value conditionValue(const tesk::bus::ConditionStatus& condition) {
   return known;
 }
 
+Dictionary factsValue(const std::vector<tesk::bus::FactStatus>& facts) {
+  Dictionary known;
+  for (const auto& fact : facts) known.set(fact.name, fact.value);
+  return known;
+}
+
 void printJson(const ServiceStatus& status, Output& output) {
   List configurations;
   for (const auto& [application, metrics] : status.configurations) {
@@ -47,6 +53,7 @@ void printJson(const ServiceStatus& status, Output& output) {
       {"source", status.source},
       {"source_running", status.sourceRunning},
       {"condition", conditionValue(status.condition)},
+      {"facts", factsValue(status.facts)},
       {"configurations", std::move(configurations)},
       {"clients", std::move(clients)},
       {"events", Dictionary{{"received", status.eventsReceived},
@@ -75,6 +82,9 @@ void printText(const ServiceStatus& status, Output& output) {
   output.line("source          " + quoted(status.source) +
               (status.sourceRunning ? ", runs" : ", does not run: no client wants events"));
   printCondition(status.condition, output);
+  for (const auto& fact : status.facts) {
+    output.line("fact            " + quoted(fact.name) + ": " + quoted(fact.value));
+  }
   for (const auto& [application, metrics] : status.configurations) {
     output.line("configuration   application " + std::to_string(application) + ", " +
                 number(metrics) + " metrics");

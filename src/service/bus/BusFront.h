@@ -67,6 +67,7 @@ class BusFront final : private FrontObject, public tesk::BasebandManager1_adapto
   std::string Source() override;
   bool SourceRunning() override;
   std::map<std::string, sdbus::Variant> Condition() override;
+  std::vector<sdbus::Struct<std::string, std::string>> SourceFacts() override;
   std::map<std::int64_t, std::uint32_t> Configurations() override;
   std::vector<sdbus::Struct<std::string, bool, std::uint64_t, std::uint64_t>> Clients() override;
   std::uint64_t EventsReceived() override;

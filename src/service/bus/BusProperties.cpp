@@ -3,6 +3,12 @@
 #include "service/bus/BusFront.h"
 
 namespace qel::service {
+namespace {
+
+// A message on the bus has room for them all.
+constexpr std::size_t kMostFacts = 1200;
+
+}  // namespace
 
 const CoreStatus& BusFront::status() const {
   if (!_status) _status = _core->status();
@@ -44,6 +50,15 @@ std::map<std::string, sdbus::Variant> BusFront::Condition() {
   put("model", condition.model);
   put("driver", condition.driver);
   return entries;
+}
+
+std::vector<sdbus::Struct<std::string, std::string>> BusFront::SourceFacts() {
+  std::vector<sdbus::Struct<std::string, std::string>> rows;
+  for (auto& [name, value] : _core->facts().rows) {
+    if (rows.size() == kMostFacts) break;
+    rows.emplace_back(std::make_tuple(name, value));
+  }
+  return rows;
 }
 
 std::map<std::int64_t, std::uint32_t> BusFront::Configurations() {

@@ -40,6 +40,14 @@ void take(const Properties& properties, const char* name, Held& value) {
   }
 }
 
+std::vector<FactStatus> factsOf(const Properties& properties) {
+  std::vector<sdbus::Struct<std::string, std::string>> rows;
+  take(properties, "SourceFacts", rows);
+  std::vector<FactStatus> facts;
+  for (const auto& row : rows) facts.push_back({std::get<0>(row), std::get<1>(row)});
+  return facts;
+}
+
 ConditionStatus conditionOf(const Properties& entries) {
   ConditionStatus condition;
   take(entries, "state", condition.state);
@@ -58,6 +66,7 @@ ServiceStatus statusOf(const Properties& properties) {
   Properties condition;
   take(properties, "Condition", condition);
   status.condition = conditionOf(condition);
+  status.facts = factsOf(properties);
   take(properties, "Configurations", status.configurations);
   std::vector<ClientProperty> clients;
   take(properties, "Clients", clients);

@@ -27,11 +27,18 @@ struct ConditionStatus {
   std::string driver;
 };
 
+// A row of what the source knows about where its events come from.
+struct FactStatus {
+  std::string name;
+  std::string value;
+};
+
 struct ServiceStatus {
   std::string version;
   std::string source;
   bool sourceRunning = false;
   ConditionStatus condition;
+  std::vector<FactStatus> facts;
   std::map<std::int64_t, std::uint32_t> configurations;  // metrics asked for, by application
   std::vector<ClientStatus> clients;
   std::uint64_t eventsReceived = 0;
