@@ -11,7 +11,7 @@ namespace qel::sources {
 struct SourceCondition {
   std::string_view state;     // one word for programs; empty: there is nothing to say
   std::string_view headline;  // for people
-  std::string_view reason;    // why, for people, where there is more to say
+  std::string reason;         // why, for people, where there is more to say
   std::string model = {};
   std::string driver = {};
 

@@ -64,9 +64,16 @@ bool ModemLink::isWished(const std::string& path, const BusInterfaces& interface
   const auto modem = interfaces.find(mm::kModem);
   if (modem == interfaces.end()) return false;
   if (!_wish.path.empty()) return path == _wish.path;
-  return _wish.imei.empty() ||
-         busValue<std::string>(modem->second, "EquipmentIdentifier") == _wish.imei ||
+  if (_wish.imei.empty()) return mayBeDevice(modem->second);
+  return busValue<std::string>(modem->second, "EquipmentIdentifier") == _wish.imei ||
          busValue<std::string>(propertiesOf(interfaces, mm::kModem3gpp), "Imei") == _wish.imei;
+}
+
+// ModemManager names some devices by words of its own: those may be any.
+bool ModemLink::mayBeDevice(const BusProperties& modem) const {
+  const std::string wished = _wish.device ? _wish.device() : "";
+  const std::string device = busValue<std::string>(modem, "Device").value_or("");
+  return wished.empty() || !device.starts_with("/sys/") || device == wished;
 }
 
 // With the modem goes what was asked of it: an answer would find nobody.

@@ -2,6 +2,7 @@
 #pragma once
 
 #include <chrono>
+#include <functional>
 #include <memory>
 #include <optional>
 #include <string>
@@ -16,10 +17,12 @@
 
 namespace qel::sources {
 
-// Which modem, by one of the two; with neither the first that there is.
+// Which modem, by one of the first two; with neither the first that there is. Where `device` gives
+// a device of /sys, one that ModemManager says to be another device is not meant.
 struct ModemWish {
-  std::string imei;
-  std::string path;
+  std::string imei = {};
+  std::string path = {};
+  std::function<std::string()> device = {};
 };
 
 struct ModemTiming {
@@ -52,6 +55,7 @@ class ModemLink {
   void choose();
   void leave();
   bool isWished(const std::string& path, const BusInterfaces& interfaces) const;
+  bool mayBeDevice(const BusProperties& modem) const;
   void attend(Clock::time_point now);
   const BusInterfaces& watchedInterfaces() const;
   Clock::time_point due() const;

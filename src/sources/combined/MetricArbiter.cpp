@@ -1,0 +1,35 @@
+#include "sources/combined/MetricArbiter.h"
+
+#include <utility>
+
+namespace qel::sources {
+
+bool MetricArbiter::lets(SourcePart part, const SourceEvent& event) {
+  const auto metric = metricOf(event);
+  if (!metric) return true;
+  Entry& entry = _entries[*metric];
+  if (part == betterPart(*metric)) {
+    entry = {true, event.timeMs, {}};
+    return true;
+  }
+  if (entry.isHeld && part == SourcePart::port && event.timeMs > entry.toldMs + kManagerSilentMs) {
+    entry = {};
+  }
+  if (entry.isHeld) entry.withheld = {event};
+  return !entry.isHeld;
+}
+
+std::vector<SourceEvent> MetricArbiter::lose(SourcePart part) {
+  std::vector<SourceEvent> instead;
+  for (auto& [metric, entry] : _entries) {
+    if (part == betterPart(metric)) {
+      for (SourceEvent& event : entry.withheld) instead.push_back(std::move(event));
+      entry = {};
+    } else {
+      entry.withheld.clear();
+    }
+  }
+  return instead;
+}
+
+}  // namespace qel::sources
