@@ -13,7 +13,7 @@ std::uint64_t BitReader::bits(unsigned count) {
   while (count > 0) {
     const auto offset = static_cast<unsigned>(_position % 8);
     const unsigned taken = count < 8 - offset ? count : 8 - offset;
-    const unsigned shifted = _bytes[_position / 8] >> (8 - offset - taken);
+    const unsigned shifted = unsigned{_bytes[_position / 8]} >> (8 - offset - taken);
     value = value << taken | (shifted & ((1U << taken) - 1));
     _position += taken;
     count -= taken;
