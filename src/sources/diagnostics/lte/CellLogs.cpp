@@ -34,7 +34,7 @@ bool canBe(const LteServingCell& cell) {
 }  // namespace
 
 Outcome readLteServingCell(const LogPacket& packet, Picture& picture, Told& told) {
-  return readWhole(packet, [&](const Reading& reading) {
+  const Outcome outcome = readWhole(packet, [&](const Reading& reading) {
     const LteServingCell cell = servingCellOf(reading.head);
     if (!canBe(cell)) return Outcome::damaged;
     picture.technology = Technology::lte;
@@ -43,6 +43,9 @@ Outcome readLteServingCell(const LogPacket& packet, Picture& picture, Told& told
     told.tell(metric::kLteScellInfo);
     return Outcome::understood;
   });
+  follow(picture.lte.servingLog, outcome);
+  if (picture.lte.serverUnread()) told.tell(metric::kLteScellInfo);
+  return outcome;
 }
 
 Outcome readLteBroadcast(const LogPacket& packet, Picture& picture, Told& /*told*/) {

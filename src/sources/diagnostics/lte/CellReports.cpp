@@ -7,6 +7,7 @@
 #include "sources/Bands.h"
 #include "sources/Filling.h"
 #include "sources/Levels.h"
+#include "sources/diagnostics/lte/Bandwidth.h"
 
 namespace qel::diagnostics {
 namespace {
@@ -54,26 +55,61 @@ std::shared_ptr<SecondaryComponentCarrier> entryOf(const SecondaryCarrier& carri
   return entry;
 }
 
+void add(const LteServingCell& cell, KCellularLteScellInfo& message) {
+  message.setPhyCellId(cell.name.pci);
+  message.setDlFreq(cell.name.earfcn);
+  message.setUlFreq(cell.ulEarfcn);
+  set(message, &KCellularLteScellInfo::setDlBw, cell.dlBandwidth);
+  set(message, &KCellularLteScellInfo::setUlBw, cell.ulBandwidth);
+  message.setCellId(cell.cellId);
+  message.setFreqBandInd(cell.band);
+  message.setTrackingAreaCode(cell.area);
+  message.setNumMncDigits(cell.mncDigits);
+  message.setSelPlmnMcc(cell.mcc);
+  message.setSelPlmnMnc(cell.mnc);
+}
+
+// Of several networks that share the cell it does not say which one was selected.
+void addNetwork(const std::vector<rrc::lte::Plmn>& networks, KCellularLteScellInfo& message) {
+  if (networks.size() != 1 || !networks[0].mcc) return;
+  message.setNumMncDigits(networks[0].mncDigits);
+  message.setSelPlmnMcc(*networks[0].mcc);
+  message.setSelPlmnMnc(networks[0].mnc);
+}
+
+void addBroadcast(const LteRules& rules, const std::optional<LteBroadcast>& bandwidth,
+                  KCellularLteScellInfo& message) {
+  message.setPhyCellId(rules.cell.pci);
+  message.setDlFreq(rules.cell.earfcn);
+  if (bandwidth && bandwidth->name == rules.cell) {
+    set(message, &KCellularLteScellInfo::setDlBw, bandwidth->dlBandwidth);
+  }
+  message.setCellId(rules.sib1->cellIdentity);
+  message.setFreqBandInd(rules.sib1->band);
+  message.setTrackingAreaCode(rules.sib1->trackingAreaCode);
+  addNetwork(rules.sib1->plmns, message);
+  if (!rules.sib2) return;
+  set(message, &KCellularLteScellInfo::setUlFreq, rules.sib2->ulEarfcn);
+  if (rules.sib2->ulBandwidthBlocks) {
+    set(message, &KCellularLteScellInfo::setUlBw, bandwidthCode(*rules.sib2->ulBandwidthBlocks));
+  }
+}
+
 }  // namespace
 
 std::optional<Bytes> lteCell(const Picture& picture, std::uint64_t timeMs) {
-  const auto& cell = picture.lte.serving;
-  if (!cell) return std::nullopt;
+  const LtePicture& lte = picture.lte;
+  const LteRules* broadcast = lte.serverUnread();
+  if (!lte.serving && !broadcast) return std::nullopt;
   KCellularLteScellInfo message;
   message.setTimestamp(timeMs);
-  message.setPhyCellId(cell->name.pci);
-  message.setDlFreq(cell->name.earfcn);
-  message.setUlFreq(cell->ulEarfcn);
-  set(message, &KCellularLteScellInfo::setDlBw, cell->dlBandwidth);
-  set(message, &KCellularLteScellInfo::setUlBw, cell->ulBandwidth);
-  message.setCellId(cell->cellId);
-  message.setFreqBandInd(cell->band);
-  message.setTrackingAreaCode(cell->area);
-  message.setNumMncDigits(cell->mncDigits);
-  message.setSelPlmnMcc(cell->mcc);
-  message.setSelPlmnMnc(cell->mnc);
-  const auto& rules = picture.lte.rules;
-  if (rules && rules->cell == cell->name && rules->sib1 && rules->sib1->tdd) {
+  if (lte.serving) {
+    add(*lte.serving, message);
+  } else {
+    addBroadcast(*broadcast, lte.broadcast, message);
+  }
+  const auto& rules = lte.rules;
+  if (rules && rules->cell == lte.camped && rules->sib1 && rules->sib1->tdd) {
     message.setTddSfAssignment(rules->sib1->tdd->subframeAssignment);
     message.setTddSsfPatterns(rules->sib1->tdd->specialSubframePattern);
   }

@@ -3,7 +3,7 @@
 
 #include "sources/diagnostics/layouts/Layout.h"
 #include "sources/diagnostics/packets/Packet.h"
-#include "sources/diagnostics/picture/LteCells.h"
+#include "sources/diagnostics/picture/LtePicture.h"
 
 namespace qel::diagnostics {
 
@@ -15,6 +15,13 @@ Outcome readWhole(const LogPacket& packet, Take take) {
   if (!layout) return Outcome::unknownVersion;
   const auto reading = read(*layout, packet.body);
   return reading ? take(*reading) : Outcome::damaged;
+}
+
+inline void follow(LteLogState& state, Outcome outcome) {
+  if (outcome == Outcome::understood) state = LteLogState::isRead;
+  if (outcome == Outcome::unknownVersion && state == LteLogState::notSeen) {
+    state = LteLogState::isUnread;
+  }
 }
 
 inline LteCellName nameOf(const Values& values) {

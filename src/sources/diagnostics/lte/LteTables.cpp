@@ -74,6 +74,7 @@ void ageSignals(LtePicture& picture, std::uint64_t nowMs) {
     return signal && isOld(signal->timeMs, nowMs, kSignalMs);
   };
   if (isOldSignal(picture.signal)) picture.signal.reset();
+  if (picture.level && isOld(picture.level->timeMs, nowMs, kSignalMs)) picture.level.reset();
   for (SecondaryCarrier& carrier : picture.carriers) {
     if (!isOldSignal(carrier.signal)) continue;
     carrier.signal.reset();

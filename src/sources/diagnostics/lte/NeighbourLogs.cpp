@@ -34,6 +34,14 @@ Outcome readListed(const LogPacket& packet, std::uint8_t part, Picture& picture,
   return judged.outcome;
 }
 
+// How well the serving cell is received, for want of a log that says it antenna by antenna.
+void noteLevel(const Reading& reading, std::uint64_t timeMs, LtePicture& lte, Told& told) {
+  const Values& head = reading.head;
+  if (!isLikely(head[Field::rsrp], head[Field::rsrq])) return;
+  lte.level = LteLevel{head[Field::rsrp], head[Field::rsrq], head.find(Field::rssi), timeMs};
+  if (lte.signalLog == LteLogState::isUnread) told.tell(metric::kLteServingMeasurement);
+}
+
 // Nothing when one of them cannot be a cell: then the packet is something else. A cell that the
 // modem knows and has not heard reads as the scale's lowest.
 std::optional<std::vector<LteNeighbour>> neighboursOf(const Reading& reading,
@@ -72,7 +80,10 @@ Outcome readLteConnectedCells(const LogPacket& packet, Picture& picture, Told& t
     const LteCellName server = nameOf(reading.head);
     const auto cells = neighboursOf(reading, packet.timeMs);
     if (!cells || !isCell(server)) return Outcome::damaged;
-    if (reading.head.number(Field::cellIndex) == 0) picture.lte.camp(server);
+    if (reading.head.number(Field::cellIndex) == 0) {
+      picture.lte.camp(server);
+      noteLevel(reading, packet.timeMs, picture.lte, told);
+    }
     note(*cells, picture.lte, told);
     return Outcome::understood;
   });
@@ -87,11 +98,12 @@ Outcome readLteIdleIntra(const LogPacket& packet, Picture& picture, Told& told) 
   });
 }
 
-Outcome readLteIdleServing(const LogPacket& packet, Picture& picture, Told& /*told*/) {
+Outcome readLteIdleServing(const LogPacket& packet, Picture& picture, Told& told) {
   return readWhole(packet, [&](const Reading& reading) {
     const LteCellName server = nameOf(reading.head);
     if (!isCell(server)) return Outcome::damaged;
     picture.lte.camp(server);
+    noteLevel(reading, packet.timeMs, picture.lte, told);
     return Outcome::understood;
   });
 }

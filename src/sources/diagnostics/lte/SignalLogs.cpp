@@ -5,6 +5,7 @@
 #include "sources/Metrics.h"
 #include "sources/diagnostics/lte/Judged.h"
 #include "sources/diagnostics/lte/LevelCheck.h"
+#include "sources/diagnostics/lte/LteRead.h"
 #include "sources/diagnostics/packets/Subpackets.h"
 
 namespace qel::diagnostics {
@@ -40,8 +41,9 @@ bool takeSecondary(const JudgedCell& cell, std::uint64_t timeMs, LtePicture& lte
 
 Outcome readLteMeasurement(const LogPacket& packet, Picture& picture, Told& told) {
   const JudgedCells judged = readJudged(packet, kServingCellResult, serverAgrees);
-  if (judged.outcome != Outcome::understood) return judged.outcome;
   LtePicture& lte = picture.lte;
+  follow(lte.signalLog, judged.outcome);
+  if (judged.outcome != Outcome::understood) return judged.outcome;
   if (const JudgedCell* primary = primaryOf(judged.cells)) {
     lte.signal = LteSignal{primary->name, primary->antennas, packet.timeMs};
     lte.camp(primary->name);

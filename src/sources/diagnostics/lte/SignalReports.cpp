@@ -10,6 +10,7 @@ namespace qel::diagnostics {
 namespace {
 
 using sources::rounded;
+using sources::set;
 
 // The list's places are the antennas: one that received nothing keeps its place, empty.
 void addReceivers(const LteAntennas& antennas, KCellularLteServingCellMeasurement& message) {
@@ -25,6 +26,23 @@ void addReceivers(const LteAntennas& antennas, KCellularLteServingCellMeasuremen
     }
     message.addRxInfo(receiver);
   }
+}
+
+// All antennas as one receiver.
+void addTogether(const LteLevel& level, KCellularLteServingCellMeasurement& message) {
+  auto receiver = std::make_shared<RxInfo>();
+  if (level.rssiDbm) receiver->setRssi(rounded(*level.rssiDbm));
+  receiver->setRsrpRange(sources::rsrpIndex(level.rsrpDbm));
+  receiver->setRsrqRange(sources::rsrqIndex(level.rsrqDb));
+  message.addRxInfo(receiver);
+}
+
+// Nothing while the phone leaves LTE or comes to it.
+std::optional<bool> isConnected(const LtePicture& lte) {
+  constexpr std::int32_t kEnding = 4;  // the last state that has anything to do with a connection
+  const auto state = lte.connection.rrc.state;
+  if (!state || *state > kEnding) return std::nullopt;
+  return *state >= LteRrcState::kConnected;
 }
 
 std::shared_ptr<RsrpRsrqSinr> sampleOf(const LteSignal& signal) {
@@ -43,11 +61,11 @@ std::shared_ptr<RsrpRsrqSinr> sampleOf(const LteSignal& signal) {
   return sample;
 }
 
-void addPower(const LteTransmissions& transmissions, void (TxPowerInfo::*set)(std::int32_t),
+void addPower(const LteTransmissions& transmissions, void (TxPowerInfo::*setPower)(std::int32_t),
               KCellularLteTxPower& message) {
   for (const LteTransmission& transmission : transmissions.list) {
     auto entry = std::make_shared<TxPowerInfo>();
-    ((*entry).*set)(transmission.powerDbm);
+    ((*entry).*setPower)(transmission.powerDbm);
     entry->setSubframeIndex(transmission.subframe);
     message.addTxPowerInfo(entry);
   }
@@ -56,14 +74,16 @@ void addPower(const LteTransmissions& transmissions, void (TxPowerInfo::*set)(st
 }  // namespace
 
 std::optional<Bytes> lteMeasurement(const Picture& picture, std::uint64_t timeMs) {
-  const auto& signal = picture.lte.signal;
-  if (!signal) return std::nullopt;
+  const LtePicture& lte = picture.lte;
+  if (!lte.signal && !lte.level) return std::nullopt;
   KCellularLteServingCellMeasurement message;
   message.setTimestamp(timeMs);
-  if (const auto& state = picture.lte.connection.rrc.state) {
-    message.setIsConnectedMode(*state == LteRrcState::kConnected);
+  set(message, &KCellularLteServingCellMeasurement::setIsConnectedMode, isConnected(lte));
+  if (lte.signal) {
+    addReceivers(lte.signal->antennas, message);
+  } else {
+    addTogether(*lte.level, message);
   }
-  addReceivers(signal->antennas, message);
   return message.data();
 }
 

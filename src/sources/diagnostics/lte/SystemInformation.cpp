@@ -102,6 +102,7 @@ void takeSystemInformation(const rrc::LteMessage& message, const LteCellName& ce
   keep(message.sib3, rules->sib3);
   keep(message.sib5, rules->sib5);
   told.tell(metric::kLteSelRes);
+  if (picture.lte.serverUnread()) told.tell(metric::kLteScellInfo);
 }
 
 std::optional<Bytes> lteRules(const Picture& picture, std::uint64_t timeMs) {

@@ -54,6 +54,14 @@ struct LteSignal {
   std::uint64_t timeMs = 0;
 };
 
+// What all antennas together make of a cell.
+struct LteLevel {
+  double rsrpDbm = 0;
+  double rsrqDb = 0;
+  std::optional<double> rssiDbm;
+  std::uint64_t timeMs = 0;
+};
+
 struct LteNeighbour {
   LteCellName cell;
   std::optional<double> rsrpDbm;

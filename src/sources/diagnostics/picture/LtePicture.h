@@ -1,6 +1,7 @@
 // What is known of the modem on LTE.
 #pragma once
 
+#include <cstdint>
 #include <optional>
 #include <vector>
 
@@ -10,17 +11,30 @@
 
 namespace qel::diagnostics {
 
+// Whether a log that comes can be read. A modem writes each in one version.
+enum class LteLogState : std::uint8_t { notSeen, isRead, isUnread };
+
 struct LtePicture {
   std::optional<LteServingCell> serving;
   std::optional<LteCellName> camped;  // by the latest packet that names the cell in use
   std::optional<LteBroadcast> broadcast;
   std::optional<LteSignal> signal;  // of the primary carrier
+  std::optional<LteLevel> level;    // likewise, by other logs
+  // Where these are unread, others stand in for them as far as they can.
+  LteLogState servingLog = LteLogState::notSeen;
+  LteLogState signalLog = LteLogState::notSeen;
   LteNeighbours neighbours;
   std::vector<SecondaryCarrier> carriers;
   LteTransmissions pusch;
   LteTransmissions pucch;
   LteConnection connection;
   std::optional<LteRules> rules;
+
+  // What the serving cell says of itself, where the modem's log of it is unread; else null.
+  const LteRules* serverUnread() const {
+    const bool standsIn = servingLog == LteLogState::isUnread && rules && rules->sib1;
+    return standsIn && rules->cell == camped ? &*rules : nullptr;
+  }
 
   // A cell that somebody else measured, for instance the phone in a report to the network.
   void noteNeighbour(const LteNeighbour& neighbour) { neighbours.note(neighbour); }
