@@ -6,8 +6,8 @@
 #include "fuzz/support/Target.h"
 #include "fuzz/support/Variants.h"
 #include "service/EventSubject.h"
+#include "sources/MetricKeeper.h"
 #include "sources/modem_manager/CellReadings.h"
-#include "sources/modem_manager/MetricKeeper.h"
 #include "sources/modem_manager/ModemReading.h"
 #include "sources/modem_manager/ModemReports.h"
 #include "sources/modem_manager/Names.h"
@@ -129,18 +129,19 @@ void tryInput(Input input) {
   const BusObjects objects = nextObjects(input);
   const ModemAnswers answers = nextAnswers(input);
   const ModemPicture picture = pictureOf(objects, kModemPath, answers);
-  MetricKeeper keeper(kPeriod);
+  MetricKeeper keeper(keptModemReports(), kPeriod);
+  const auto build = modemReportBuilder(picture);
   const MetricKeeper::Clock::time_point now{kPeriod};
   int sent = 0;
-  keeper.update(picture, timeMs, now, [&](const SourceEvent& event) {
+  keeper.update(build, timeMs, now, [&](const SourceEvent& event) {
     ++sent;
     expectTaken(event);
   });
-  keeper.update(picture, timeMs + 1, now,
+  keeper.update(build, timeMs + 1, now,
                 [](const SourceEvent&) { law(false, "a value that did not change is sent once"); });
   int answered = 0;
   for (const ModemReportRow& row : modemReports()) {
-    if (keeper.query(row.metric).code == CommandCode::done) ++answered;
+    if (keeper.query(row.metric).known) ++answered;
   }
   law(answered == sent, "what was sent can be asked for");
   tellsServingCell(answers);

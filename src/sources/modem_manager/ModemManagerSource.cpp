@@ -8,8 +8,9 @@
 
 #include "base/Clock.h"
 #include "base/WakeUp.h"
-#include "sources/modem_manager/MetricKeeper.h"
+#include "sources/MetricKeeper.h"
 #include "sources/modem_manager/ModemCondition.h"
+#include "sources/modem_manager/ModemReports.h"
 
 namespace qel::sources {
 namespace {
@@ -27,7 +28,7 @@ struct ModemManagerSource::Run {
       : wish(std::move(modemWish)),
         address(std::move(busAddress)),
         timing(modemTiming),
-        keeper(modemTiming.period) {}
+        keeper(keptModemReports(), modemTiming.period) {}
 
   void stop() {
     stopping = true;
@@ -47,7 +48,7 @@ struct ModemManagerSource::Run {
         if (stopping) break;
         said.say(address.name, "no message bus (" + error.getMessage() + "), trying again");
       }
-      keeper.update(std::nullopt, 0, Steady::now(), {});
+      keeper.clear();
       report(noBusCondition());
       rest(pause);
       pause = std::min(pause * 2, kLongestPause);
@@ -58,13 +59,18 @@ struct ModemManagerSource::Run {
     while (!stopping) {
       noticeListeners();
       if (const auto condition = link.condition()) report(*condition);
-      keeper.update(link.picture(), systemClock().nowMs(), Steady::now(),
-                    [this](const SourceEvent& event) { hand(event); });
+      update(link.picture());
       if (stopping) break;
       link.waitAndProcess(wakeUp.descriptor(), keeper.due());
       wakeUp.clear();
     }
     link.finish();
+  }
+
+  void update(const std::optional<ModemPicture>& modem) {
+    if (!modem) return keeper.clear();
+    keeper.update(modemReportBuilder(*modem), systemClock().nowMs(), Steady::now(),
+                  [this](const SourceEvent& event) { hand(event); });
   }
 
   // A new listener is told everything.

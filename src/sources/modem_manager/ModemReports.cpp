@@ -1,5 +1,6 @@
 #include "sources/modem_manager/ModemReports.h"
 
+#include <algorithm>
 #include <array>
 
 #include "sources/Metrics.h"
@@ -31,5 +32,18 @@ constexpr std::array kReports = {
 }  // namespace
 
 std::span<const ModemReportRow> modemReports() { return kReports; }
+
+std::vector<MetricKeeper::Row> keptModemReports() {
+  std::vector<MetricKeeper::Row> rows;
+  for (const ModemReportRow& row : kReports) rows.push_back({row.metric});
+  return rows;
+}
+
+MetricKeeper::Build modemReportBuilder(const ModemPicture& modem) {
+  return [&modem](std::uint32_t metric, std::uint64_t timeMs) {
+    const auto row = std::ranges::find(kReports, metric, &ModemReportRow::metric);
+    return row == kReports.end() ? std::nullopt : row->build(modem, timeMs);
+  };
+}
 
 }  // namespace qel::sources

@@ -4,8 +4,10 @@
 #include <cstdint>
 #include <optional>
 #include <span>
+#include <vector>
 
 #include "base/Bytes.h"
+#include "sources/MetricKeeper.h"
 #include "sources/modem_manager/ModemPicture.h"
 
 namespace qel::sources {
@@ -19,6 +21,10 @@ struct ModemReportRow {
 };
 
 std::span<const ModemReportRow> modemReports();
+
+// The same, for a keeper. The builder is for as long as the picture is there.
+std::vector<MetricKeeper::Row> keptModemReports();
+MetricKeeper::Build modemReportBuilder(const ModemPicture& modem);
 
 std::optional<Bytes> modemLteCell(const ModemPicture& modem, std::uint64_t timeMs);
 std::optional<Bytes> modemLteMeasurement(const ModemPicture& modem, std::uint64_t timeMs);
