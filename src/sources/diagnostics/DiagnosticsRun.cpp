@@ -1,0 +1,207 @@
+#include "sources/diagnostics/DiagnosticsRun.h"
+
+#include <poll.h>
+
+#include <algorithm>
+#include <array>
+#include <utility>
+
+#include "base/Clock.h"
+#include "base/LogSink.h"
+#include "sources/diagnostics/DiagnosticsCondition.h"
+#include "sources/diagnostics/PacketTable.h"
+
+namespace qel::diagnostics {
+namespace {
+
+using namespace std::chrono_literals;
+using State = DiagnosticsSession::State;
+
+WantedPackets allThatIsRead() {
+  return {[](std::uint16_t code) { return findLog(code) != nullptr; },
+          [](std::uint16_t id) { return findEvent(id) != nullptr; }};
+}
+
+// For poll: rounded up, and -1 for ever.
+int timeoutUntil(std::chrono::steady_clock::time_point moment) {
+  constexpr auto kLongest = std::chrono::milliseconds{24h};
+  if (moment == std::chrono::steady_clock::time_point::max()) return -1;
+  const auto left =
+      std::chrono::ceil<std::chrono::milliseconds>(moment - std::chrono::steady_clock::now());
+  return static_cast<int>(std::clamp(left, 0ms, kLongest).count());
+}
+
+}  // namespace
+
+DiagnosticsSource::Run::Run(const DiagnosticsChoice& choice, const DiagnosticsWorld& world,
+                            const DiagnosticsTiming& timing,
+                            std::weak_ptr<sources::EventReceiver> receiver,
+                            std::shared_ptr<sources::ListenerSignal> listeners)
+    : _world(world),
+      _timing(timing),
+      _receiver(std::move(receiver)),
+      _listeners(std::move(listeners)),
+      _metrics(choice.radio, timing.period,
+               [this](const sources::SourceEvent& event) { hand(event); }),
+      _wish(choice.port),
+      _generation(_listeners->generation()) {}
+
+void DiagnosticsSource::Run::stop() {
+  _stopping = true;
+  _wakeUp.signal();
+}
+
+// Finds the port, lives with it until it is lost, pauses, and so on.
+void DiagnosticsSource::Run::play() {
+  PortFinder finder(_wish, _world.search());
+  auto pause = _timing.firstPause;
+  while (!_stopping) {
+    if (const auto port = finder.open()) {
+      {
+        const std::lock_guard lock(_factsMutex);
+        _facts = {};
+        _facts.port = finder.port().address;
+        _facts.modem = finder.port().modem;
+      }
+      if (live(*port)) pause = _timing.firstPause;
+    } else {
+      report(conditionWithoutPort(finder.trouble()));
+      say(adviceWithoutPort(finder.port(), finder.trouble()));
+    }
+    if (_stopping) break;
+    const auto end = Clock::now() + pause;
+    pause = std::min(pause * 2, _timing.longestPause);
+    // A device may come at any time; udev needs a moment for it.
+    while (!_stopping && Clock::now() < end) {
+      std::array<pollfd, 2> waited{pollfd{_wakeUp.descriptor(), POLLIN, 0},
+                                   pollfd{finder.descriptor(), POLLIN, 0}};
+      ::poll(waited.data(), waited.size(), timeoutUntil(end));
+      _wakeUp.clear();
+      if (waited[1].revents == 0) continue;
+      rest(_timing.firstPause);
+      pause = _timing.firstPause;
+      break;
+    }
+  }
+}
+
+bool DiagnosticsSource::Run::live(DiagPort& port) {
+  DiagnosticsSession session(port, _metrics, allThatIsRead(), _timing.session, Clock::now());
+  _slept = _world.asleep();
+  _endAt = Clock::time_point::max();
+  bool hasListened = false;
+  while (!session.isOver() && Clock::now() < _endAt) {
+    wait(port, session);
+    turn(port, session);
+    hasListened = hasListened || session.state() == State::listening;
+  }
+  _metrics.forget();
+  report(conditionOf(session, false));
+  if (!_stopping) say(adviceOf(session.state(), {_facts.port, _facts.modem}));
+  const std::lock_guard lock(_factsMutex);
+  _facts.port.clear();
+  return hasListened;
+}
+
+void DiagnosticsSource::Run::wait(const DiagPort& port, const DiagnosticsSession& session) {
+  const auto until = std::min({session.due(), _metrics.due(), _endAt});
+  std::array<pollfd, 2> waited{pollfd{_wakeUp.descriptor(), POLLIN, 0},
+                               pollfd{port.descriptor(), POLLIN, 0}};
+  ::poll(waited.data(), waited.size(), timeoutUntil(until));
+  if (waited[0].revents != 0) _wakeUp.clear();
+  _readable = waited[1].revents != 0;
+}
+
+void DiagnosticsSource::Run::turn(DiagPort& port, DiagnosticsSession& session) {
+  const auto now = Clock::now();
+  _metrics.atTime(now, systemClock().nowMs());
+  if (_stopping && _endAt == Clock::time_point::max()) {
+    _endAt = now + _timing.ending;
+    session.end(now);
+  }
+  noticeListeners();
+  noticeSleep(session);
+  if (_readable) session.receive(now);
+  _metrics.refresh();
+  const State before = session.state();
+  session.listen(_anyoneListens, now);
+  session.step(now);
+  if (session.state() == State::resting && before != State::resting) _metrics.forget();
+  noteFacts(port, session);
+  report(conditionOf(session, _metrics.knowsCell()));
+}
+
+void DiagnosticsSource::Run::noticeListeners() {
+  const std::uint64_t now = _listeners->generation();
+  if (std::exchange(_generation, now) == now) return;
+  _anyoneListens = true;
+  _metrics.sendAll();
+}
+
+void DiagnosticsSource::Run::noticeSleep(DiagnosticsSession& session) {
+  constexpr auto kNap = 1s;
+  const auto slept = _world.asleep();
+  if (slept < std::exchange(_slept, slept) + kNap) return;
+  _metrics.compareClocksAnew();
+  session.check(Clock::now());
+}
+
+void DiagnosticsSource::Run::hand(const sources::SourceEvent& event) {
+  if (_stopping) return;
+  // Held no longer than this: letting go may be the end of the receiver and of the source.
+  if (const auto taker = _receiver.lock()) {
+    _anyoneListens = taker->take(event) == sources::EventReceiver::Taken::yes;
+  } else {
+    _stopping = true;
+  }
+}
+
+void DiagnosticsSource::Run::report(const sources::SourceCondition& condition) {
+  if (_stopping || condition == _reported) return;
+  _reported = condition;
+  if (const auto taker = _receiver.lock()) taker->conditionChanged(condition);
+}
+
+// The same thing again and again is said once.
+void DiagnosticsSource::Run::say(const std::string& line) {
+  if (line.empty() || line == _said) return;
+  _said = line;
+  systemLog().write("diag: " + line);
+}
+
+// New listeners do not shorten it.
+void DiagnosticsSource::Run::rest(std::chrono::milliseconds pause) {
+  const auto end = Clock::now() + pause;
+  while (!_stopping && Clock::now() < end) {
+    pollfd waited{_wakeUp.descriptor(), POLLIN, 0};
+    ::poll(&waited, 1, timeoutUntil(end));
+    _wakeUp.clear();
+  }
+}
+
+void DiagnosticsSource::Run::noteFacts(const DiagPort& port, const DiagnosticsSession& session) {
+  const std::lock_guard lock(_factsMutex);
+  _facts.frames = port.counts();
+  _facts.unwantedPackets = session.unwantedPackets();
+  _facts.replacedMasks = session.replacedMasks();
+  if (_facts.version.has_value() != session.version().has_value()) {
+    _facts.version = session.version();
+  }
+  if (_facts.build.has_value() != session.build().has_value()) _facts.build = session.build();
+  _rate.note(_facts.frames.bytes, Clock::now());
+}
+
+sources::SourceFacts DiagnosticsSource::Run::facts() const {
+  const PacketCounts counts = _metrics.counts();
+  const std::lock_guard lock(_factsMutex);
+  PortFacts facts = _facts;
+  facts.bytesPerSecond = _rate.perSecond(Clock::now());
+  return factsOf(facts, counts);
+}
+
+std::string DiagnosticsSource::Run::modem() const {
+  const std::lock_guard lock(_factsMutex);
+  return _facts.port.empty() ? "" : _facts.modem;
+}
+
+}  // namespace qel::diagnostics

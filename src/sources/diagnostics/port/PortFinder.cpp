@@ -1,0 +1,65 @@
+#include "sources/diagnostics/port/PortFinder.h"
+
+#include <algorithm>
+
+namespace qel::diagnostics {
+namespace {
+
+using Kind = PortTrouble::Kind;
+
+// A port that is there and cannot be had says more than one that is not.
+int weightOf(Kind kind) {
+  switch (kind) {
+    case Kind::held:
+      return 3;
+    case Kind::denied:
+      return 2;
+    case Kind::failed:
+      return 1;
+    case Kind::absent:
+      break;
+  }
+  return 0;
+}
+
+}  // namespace
+
+std::unique_ptr<DiagPort> PortFinder::open() {
+  _search->clear();
+  const std::vector<FoundPort> known = _search->ports();
+  _port = {_wish, ""};
+  _trouble = {Kind::absent, "none was found"};
+  for (const FoundPort& candidate : candidates()) {
+    PortTrouble trouble;
+    if (auto port = openPort(candidate.address, trouble)) {
+      _port = candidate;
+      _modem = candidate.modem;
+      return port;
+    }
+    const bool isKnown = candidate.address.starts_with('/') &&
+                         std::ranges::count(known, candidate.address, &FoundPort::address) != 0;
+    if (trouble.kind == Kind::absent && isKnown) {
+      trouble = {Kind::denied, "its device is hidden from this program"};
+    }
+    if (weightOf(trouble.kind) <= weightOf(_trouble.kind)) continue;
+    _port = candidate;
+    _trouble = trouble;
+  }
+  return nullptr;
+}
+
+std::vector<FoundPort> PortFinder::candidates() {
+  std::vector<FoundPort> ports = _search->ports();
+  const auto isOfModem = [this](const FoundPort& port) {
+    return !_modem.empty() && port.modem == _modem;
+  };
+  if (!_wish.empty()) {
+    std::erase_if(ports,
+                  [&](const FoundPort& port) { return port.address == _wish || !isOfModem(port); });
+    ports.insert(ports.begin(), {_wish, _search->modemOf(_wish)});
+  }
+  std::ranges::stable_partition(ports, isOfModem);
+  return ports;
+}
+
+}  // namespace qel::diagnostics
