@@ -5,7 +5,6 @@
 // outlive them.
 #pragma once
 
-#include <concepts>
 #include <cstddef>
 #include <cstdint>
 #include <optional>
