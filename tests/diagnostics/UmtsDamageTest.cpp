@@ -5,6 +5,7 @@
 #include <random>
 
 #include "messages/catalogue/MetricMessages.h"
+#include "support/diagnostics/UmtsMessages.h"
 #include "support/diagnostics/UmtsPackets.h"
 
 namespace qel::diagnostics {
@@ -25,6 +26,8 @@ std::vector<Whole> wholePackets() {
           {0x4005, umtsRanks(0, cells, {{62, 21, -85}})},
           {0x4005, umtsRanks(1, cells, {{62, 21, -85}})},
           {0x4005, umtsRanks(2, cells, {{62, 21, -85}})},
+          {0x412F, umtsRrc(0, umtsConnectionRequest(12))},
+          {0x412F, umtsRrc(4, umtsWholeBlock(1, 3, umtsBlock3({.intraSearch = 8})))},
           {0x4176, umtsGainControl({{-100, -60, 174}, {-110, -70, 184}})}};
 }
 

@@ -28,6 +28,11 @@ const Tables& lteTables() {
   return tables;
 }
 
+const Tables& umtsTables() {
+  static const Tables tables = tablesOfFiles(QEL_RRC_UMTS_SCHEMAS);
+  return tables;
+}
+
 Tables tablesOf(std::string_view notation, Wanted wanted) {
   std::vector<Definition> definitions;
   readNotation(notation, "test", definitions);

@@ -7,8 +7,9 @@
 
 namespace qel::testing {
 
-// The schema of LTE, every field of it wanted.
+// The schemas of LTE and of UMTS, every field of them wanted.
 const rrc::generator::Tables& lteTables();
+const rrc::generator::Tables& umtsTables();
 
 // A schema of a test's own. Throws NotationError.
 rrc::generator::Tables tablesOf(std::string_view notation,

@@ -56,4 +56,9 @@ Bytes Node::octets() const {
   return bytes;
 }
 
+BitRange Node::bits() const {
+  if (!_reading) return {};
+  return {_reading->message(), found().bit, found().bits};
+}
+
 }  // namespace qel::rrc

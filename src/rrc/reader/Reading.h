@@ -27,6 +27,18 @@ struct Found {
 
 class Reading;
 
+// A string of bits inside of a message.
+struct BitRange {
+  ByteView message;
+  std::size_t first = 0;
+  std::size_t count = 0;
+
+  bool at(std::size_t index) const {
+    const std::size_t bit = first + index;
+    return (message[bit / 8] >> (7 - bit % 8) & 1) != 0;
+  }
+};
+
 class Node {
  public:
   Node() = default;
@@ -49,6 +61,8 @@ class Node {
   std::optional<std::int64_t> index() const;
   // A whole number of bytes; empty when it is none.
   Bytes octets() const;
+  // Of a string; without bits when it is none.
+  BitRange bits() const;
 
  private:
   const Found& found() const;

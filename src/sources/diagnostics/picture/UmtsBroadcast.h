@@ -31,6 +31,8 @@ struct UmtsSelection {
 struct UmtsPacketAccess {
   bool downlink = false;
   bool uplink = false;
+
+  friend bool operator==(const UmtsPacketAccess&, const UmtsPacketAccess&) = default;
 };
 
 // Block 19.

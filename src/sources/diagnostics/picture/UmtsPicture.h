@@ -8,6 +8,7 @@
 
 #include "sources/diagnostics/packets/Plmn.h"
 #include "sources/diagnostics/picture/UmtsBroadcast.h"
+#include "sources/diagnostics/picture/UmtsSegments.h"
 
 namespace qel::diagnostics {
 
@@ -89,6 +90,7 @@ struct UmtsPicture {
   std::optional<UmtsNeighbours> neighbours;
   UmtsConnection connection;
   UmtsBroadcast broadcast;
+  UmtsSegments segments;
 };
 
 }  // namespace qel::diagnostics

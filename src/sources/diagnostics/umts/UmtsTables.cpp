@@ -13,6 +13,7 @@ constexpr std::array kLogs = {
     LogRow{0x4127, "UMTS serving cell", readUmtsCell, nullptr},
     LogRow{0x4125, "UMTS RRC state", readUmtsState, nullptr},
     LogRow{0x4005, "UMTS reselection ranks", readUmtsRanks, versionOfUmtsRanks},
+    LogRow{0x412F, "UMTS RRC message", readUmtsRrcMessage, nullptr},
     LogRow{0x4176, "UMTS gain control", readUmtsGainControl, versionInFirstByte},
 };
 
