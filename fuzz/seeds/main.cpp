@@ -7,6 +7,7 @@
 #include <string>
 
 #include "base/FatalError.h"
+#include "fuzz/seeds/FrameSeeds.h"
 #include "fuzz/seeds/MessageSeeds.h"
 #include "fuzz/seeds/ModemSeeds.h"
 #include "fuzz/seeds/RecordedSeeds.h"
@@ -89,6 +90,7 @@ void makeSeeds(const std::filesystem::path& directory, const char* recording,
   writeAll(directory / "states", stateSeeds(wishes));
   writeAll(directory / "modems", modems());
   writeAll(directory / "rrc", rrcSeeds());
+  writeAll(directory / "frames", frameSeeds());
 }
 
 }  // namespace
