@@ -7,6 +7,7 @@
 #include <string>
 
 #include "base/FatalError.h"
+#include "fuzz/seeds/DiagnosticsSeeds.h"
 #include "fuzz/seeds/FrameSeeds.h"
 #include "fuzz/seeds/MessageSeeds.h"
 #include "fuzz/seeds/ModemSeeds.h"
@@ -91,6 +92,7 @@ void makeSeeds(const std::filesystem::path& directory, const char* recording,
   writeAll(directory / "modems", modems());
   writeAll(directory / "rrc", rrcSeeds());
   writeAll(directory / "frames", frameSeeds());
+  writeAll(directory / "diagnostics", diagnosticsSeeds());
 }
 
 }  // namespace

@@ -16,14 +16,15 @@ using rrc::lte::RadioConfiguration;
 using rrc::lte::Reconfiguration;
 using rrc::lte::SecondaryCell;
 
-void takeReception(const RadioConfiguration& radio, Picture& picture, Told& told) {
+// A connection begins with antennas as they are; that alone is nothing new to be told.
+void takeReception(const RadioConfiguration& radio, bool begins, Picture& picture, Told& told) {
   LteReception& reception = picture.lte.connection.reception;
   if (radio.defaultTransmissionMode) reception.transmissionMode.reset();
   if (!radio.drx && !radio.transmissionMode) return;
   reception.configured = true;
   if (radio.drx) reception.drx = radio.drx->setup;
   if (radio.transmissionMode) reception.transmissionMode = radio.transmissionMode;
-  told.tell(metric::kLteCdrxConfig);
+  if (radio.drx || !begins) told.tell(metric::kLteCdrxConfig);
 }
 
 std::optional<std::uint32_t> codeOf(const std::optional<unsigned>& blocks) {
@@ -136,9 +137,10 @@ void takeReconfiguration(const Reconfiguration& change, Picture& picture, Told& 
 void takeConfiguration(const rrc::LteMessage& message, std::uint64_t timeMs, Picture& picture,
                        Told& told) {
   LteConnection& connection = picture.lte.connection;
-  if (message.kind == Kind::rrcConnectionSetup) connection.reception = {};
+  const bool begins = message.kind == Kind::rrcConnectionSetup;
+  if (begins) connection.reception = {};
   if (message.reconfiguration) takeReconfiguration(*message.reconfiguration, picture, told);
-  if (message.radio) takeReception(*message.radio, picture, told);
+  if (message.radio) takeReception(*message.radio, begins, picture, told);
   if (message.reconfiguration || message.radio) connection.configuredMs = timeMs;
 }
 

@@ -1,5 +1,6 @@
 #include "sources/diagnostics/lte/SystemInformation.h"
 
+#include <algorithm>
 #include <memory>
 
 #include "messages/lte_serving.h"
@@ -19,6 +20,9 @@ using rrc::lte::Sib3;
 using sources::set;
 using Rules = KCellularLteSelReselCellInfo;
 
+// As many as the block's first list holds; what its second one adds is left out.
+constexpr std::size_t kMostFrequencies = 8;
+
 constexpr int kStepDb = 2;  // of levels; qualities are signalled in dB
 
 // Of NbrEutra::FrameType.
@@ -29,8 +33,14 @@ std::optional<unsigned> inDb(const std::optional<unsigned>& steps) {
   return steps ? std::optional(*steps * kStepDb) : std::nullopt;
 }
 
+// As the cell's first list has them: 64 is the mark of a band that stands in a second list.
+void addBands(const Sib1& sib, Rules& report) {
+  constexpr unsigned kMark = 64;
+  for (const unsigned band : sib.furtherBands) report.addMultiBandInfo(std::min(band, kMark));
+}
+
 void add(const Sib1& sib, Rules& report) {
-  for (const unsigned band : sib.furtherBands) report.addMultiBandInfo(band);
+  addBands(sib, report);
   set(report, &Rules::setImsEmergencySupport, sib.imsEmergencySupport);
   report.setQRxLevMin(sib.qRxLevMin * kStepDb);
   set(report, &Rules::setQQualMin, sib.qQualMinDb);
@@ -114,7 +124,10 @@ std::optional<Bytes> lteRules(const Picture& picture, std::uint64_t timeMs) {
   if (rules->sib2) add(*rules->sib2, report);
   if (rules->sib3) add(*rules->sib3, report);
   if (rules->sib5) {
-    for (const EutraCarrier& carrier : rules->sib5->carriers) report.addNbrEutra(entryOf(carrier));
+    auto carriers = rules->sib5->carriers;
+    if (carriers.size() > kMostFrequencies) carriers.resize(kMostFrequencies);
+    std::ranges::stable_sort(carriers, {}, &EutraCarrier::earfcn);
+    for (const EutraCarrier& carrier : carriers) report.addNbrEutra(entryOf(carrier));
   }
   return report.data();
 }

@@ -38,13 +38,11 @@ constexpr std::array kOfRegistered = {kNormalService, kNormalService, kInProgres
                                       kNoService,     kNoService,     kLimitedService};
 
 std::optional<std::int32_t> registrationOf(std::uint8_t state, std::uint32_t substate) {
-  const auto in = [](const auto& row, std::uint32_t index) -> std::optional<std::int32_t> {
-    if (index >= row.size()) return std::nullopt;
-    return row[index];
-  };
-  if (state == kDeregistered) return in(kOfDeregistered, substate);
-  if (state == kRegistered) return in(kOfRegistered, substate);
-  return in(kOfState, state);
+  if (state == kDeregistered && substate < kOfDeregistered.size()) return kOfDeregistered[substate];
+  if (state == kRegistered && substate < kOfRegistered.size()) return kOfRegistered[substate];
+  // Of further substates there is no list; the state holds all the same.
+  if (state < kOfState.size()) return kOfState[state];
+  return std::nullopt;
 }
 
 // What a refusal does to the phone's registration (24.301, clauses 5.5.1.2.5, 5.5.3.2.5, 5.6.1.5).
