@@ -3,6 +3,7 @@
 
 #include "sources/diagnostics/picture/CommonPart.h"
 #include "sources/diagnostics/picture/ConnectionsPart.h"
+#include "sources/diagnostics/picture/ContextsPart.h"
 #include "sources/diagnostics/picture/EmmPart.h"
 #include "sources/diagnostics/picture/GmmPart.h"
 #include "sources/diagnostics/picture/MmPart.h"
@@ -15,6 +16,7 @@ struct NasPicture {
   GmmPart gmm;
   EmmPart emm;
   ConnectionsPart connections;
+  ContextsPart contexts;
 };
 
 }  // namespace qel::diagnostics
