@@ -29,8 +29,9 @@ std::optional<Options> parseOptions(int argc, const char* const* argv, int& exit
   line.set_version_flag("--version", "qelwatch " QELWATCH_VERSION);
   auto* source = line.add_option("--source", options.source,
                                  "values from within, without the baseband manager service: "
-                                 "simulated[,seed=N][,speed=N], recording:FILE[,speed=N][,loop] or "
-                                 "modem-manager[:IMEI|:PATH]")
+                                 "simulated[,seed=N][,speed=N], recording:FILE[,speed=N][,loop], "
+                                 "diag[:PORT], diag:FILE[,speed=N], modem-manager[:IMEI|:PATH] or "
+                                 "auto")
                      ->type_name("SOURCE");
   line.add_option("--bus", options.bus,
                   "where the baseband manager service is: system, session or a bus address")

@@ -8,6 +8,7 @@
 #include "app/EventLoopWait.h"
 #include "base/TerminalText.h"
 #include "service/InProcessConnector.h"
+#include "sources/diagnostics/port/PortName.h"
 #include "tesk/Transport.h"
 
 namespace qel {
@@ -15,7 +16,13 @@ namespace {
 
 const QString kRecording = QStringLiteral("recording:");
 constexpr std::chrono::milliseconds kPatienceOfASelfTest{5000};
-const QString kModemManager = QStringLiteral("modem-manager");
+const QString kSimulated = QStringLiteral("simulated");
+const QString kDiagnostics = QStringLiteral("diag:");
+
+// The name of the file behind the beginning of a source's text.
+QString fileIn(const QString& text, const QString& beginning) {
+  return QFileInfo(text.mid(beginning.size()).section(u',', 0, 0)).fileName();
+}
 
 QString lossInWords(std::uint64_t dropped) {
   return QLocale(QLocale::English).toString(static_cast<qulonglong>(dropped)) +
@@ -66,10 +73,12 @@ int Source::openWithin(const std::string& source) {
 QString sourceInWords(const std::string& source) {
   if (source.empty()) return QStringLiteral("Baseband manager service");
   const QString text = QString::fromStdString(source);
-  if (text.startsWith(kModemManager)) return QStringLiteral("Modem of this device");
-  if (!text.startsWith(kRecording)) return QStringLiteral("Simulated modem");
-  const QString file = text.mid(kRecording.size()).section(u',', 0, 0);
-  return QStringLiteral("Recording ") + QFileInfo(file).fileName();
+  if (text.startsWith(kRecording)) return QStringLiteral("Recording ") + fileIn(text, kRecording);
+  if (text.startsWith(kSimulated)) return QStringLiteral("Simulated modem");
+  const QString place = fileIn(text, kDiagnostics);
+  const bool isFile = text.startsWith(kDiagnostics) &&
+                      !diagnostics::isPortName(text.mid(kDiagnostics.size()).toStdString());
+  return isFile ? QStringLiteral("Raw log ") + place : QStringLiteral("Modem of this device");
 }
 
 }  // namespace qel

@@ -33,11 +33,29 @@ struct ModemManagerChoice {
   std::string bus = "system";  // or "session", or an address
 };
 
-using SourceChoice = std::variant<SimulatedChoice, RecordingChoice, ModemManagerChoice>;
+// A diagnostics port or a file of what one sent. `place` is a device, "@NAME" for a router's socket
+// or a file; empty: the likeliest port.
+struct DiagnosticsPlace {
+  std::string place;
+  unsigned radio = 1;
+  std::optional<double> speed;  // of a file
+};
 
-// "simulated[,seed=N][,speed=N][,start=MS]", "recording:FILE[,speed=N][,loop]" or
-// "modem-manager[:IMEI|:PATH][,bus=ADDRESS]". A file name and an address may contain commas.
-// Nothing when the text is none of them; `error` then says what is wrong.
+// The port and ModemManager together. `isPortMissed`: it was asked for by name.
+struct CombinedChoice {
+  DiagnosticsPlace port;
+  ModemManagerChoice manager;
+  bool isPortMissed = true;
+};
+
+using SourceChoice = std::variant<SimulatedChoice, RecordingChoice, ModemManagerChoice,
+                                  DiagnosticsPlace, CombinedChoice>;
+
+// "simulated[,seed=N][,speed=N][,start=MS]", "recording:FILE[,speed=N][,loop]",
+// "modem-manager[:IMEI|:PATH][,bus=ADDRESS]", "diag[:PORT][,radio=N]", "diag:FILE[,speed=N]
+// [,radio=N]", "diag[:PORT][,radio=N]+modem-manager[…]" or "auto[,bus=ADDRESS]". A file name and an
+// address may contain commas. Nothing when the text is none of them; `error` then says what is
+// wrong.
 std::optional<SourceChoice> parseSourceChoice(std::string_view text, SourceError& error);
 
 // Nothing when there is no such source; a recording is read once to see that it is sound.

@@ -57,6 +57,43 @@ TEST(SourceChoice, AFileNameMayHaveCommasAndColons) {
   EXPECT_EQ(choiceOf<RecordingChoice>("recording:a,loop,b").path, "a,loop,b");
 }
 
+TEST(SourceChoice, ADiagnosticsPortIsADeviceOrASocketOrWhateverIsThere) {
+  EXPECT_EQ(choiceOf<DiagnosticsPlace>("diag").place, "");
+  EXPECT_EQ(choiceOf<DiagnosticsPlace>("diag,radio=2").radio, 2U);
+  const auto device = choiceOf<DiagnosticsPlace>("diag:/dev/ttyUSB0,radio=2");
+  EXPECT_EQ(device.place, "/dev/ttyUSB0");
+  EXPECT_EQ(device.radio, 2U);
+  EXPECT_EQ(choiceOf<DiagnosticsPlace>("diag:@diag").place, "@diag");
+}
+
+TEST(SourceChoice, ARawLogIsAFileThatNeedNotBeThereYet) {
+  const auto choice = choiceOf<DiagnosticsPlace>("diag:a,b.qmdl,radio=2,speed=10");
+  EXPECT_EQ(choice.place, "a,b.qmdl");
+  EXPECT_EQ(choice.speed, 10);
+  EXPECT_EQ(choice.radio, 2U);
+  EXPECT_FALSE(choiceOf<DiagnosticsPlace>("diag:a.mi2log").speed);
+}
+
+TEST(SourceChoice, APortAndModemManagerMayBeOneSource) {
+  const auto plain = choiceOf<CombinedChoice>("diag+modem-manager");
+  EXPECT_EQ(plain.port.place, "");
+  EXPECT_TRUE(plain.isPortMissed);
+  const auto named =
+      choiceOf<CombinedChoice>("diag:/dev/ttyUSB0,radio=2+modem-manager:123456789012345,bus=a+b");
+  EXPECT_EQ(named.port.place, "/dev/ttyUSB0");
+  EXPECT_EQ(named.port.radio, 2U);
+  EXPECT_EQ(named.manager.imei, "123456789012345");
+  EXPECT_EQ(named.manager.bus, "a+b");
+}
+
+TEST(SourceChoice, AutoTakesBothAndMissesNoPort) {
+  const auto choice = choiceOf<CombinedChoice>("auto");
+  EXPECT_EQ(choice.port.place, "");
+  EXPECT_EQ(choice.manager.bus, "system");
+  EXPECT_FALSE(choice.isPortMissed);
+  EXPECT_EQ(choiceOf<CombinedChoice>("auto,bus=session").manager.bus, "session");
+}
+
 TEST(SourceChoice, WhatIsNoSourceIsWrongUsageAndNamed) {
   const std::pair<const char*, const char*> bad[] = {
       {"", "unknown source \"\""},
@@ -78,6 +115,19 @@ TEST(SourceChoice, WhatIsNoSourceIsWrongUsageAndNamed) {
       {"recording:,loop", "no file named"},
       {"recording:a,speed=0", "bad option \"speed=0\""},
       {"recording:a,speed=fast", "bad option \"speed=fast\""},
+      {"diagx", "unknown source"},
+      {"diag:", "no port or file named"},
+      {"diag,radio=0", "bad option \"radio=0\""},
+      {"diag,radio=x", "bad option \"radio=x\""},
+      {"diag,colour=5", "bad option \"colour=5\""},
+      {"diag,speed=2", "a port has no speed"},
+      {"diag:/dev/ttyUSB0,speed=2", "a port has no speed"},
+      {"diag:a.qmdl,speed=fast", "bad option \"speed=fast\""},
+      {"diag:a.qmdl+modem-manager", "a file and ModemManager do not go together"},
+      {"diag+modem-manager:x", "bad modem \":x\""},
+      {"diag+nothing", "bad option"},
+      {"autox", "unknown source"},
+      {"auto,loop", "bad option \"loop\""},
   };
   for (const auto& [text, reason] : bad) {
     SourceError error;

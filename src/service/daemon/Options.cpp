@@ -14,8 +14,9 @@ std::optional<Options> parseOptions(int argc, const char* const* argv, int& exit
   app.set_version_flag("--version", "basebandd " QEL_VERSION);
   app.add_option("--source", options.source,
                  "Where events come from: simulated[,seed=N][,speed=N], "
-                 "recording:FILE[,speed=N][,loop] or "
-                 "modem-manager[:IMEI|:PATH][,bus=ADDRESS]")
+                 "recording:FILE[,speed=N][,loop], modem-manager[:IMEI|:PATH][,bus=ADDRESS], "
+                 "diag[:PORT][,radio=N][+modem-manager...], diag:FILE[,speed=N][,radio=N] or "
+                 "auto[,bus=ADDRESS]")
       ->capture_default_str();
   app.add_option("--bus", options.bus, "system, session or a bus address")->capture_default_str();
   auto* state =

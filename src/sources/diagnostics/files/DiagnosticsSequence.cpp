@@ -1,6 +1,7 @@
 #include "sources/diagnostics/files/DiagnosticsSequence.h"
 
 #include "base/LogSink.h"
+#include "sources/diagnostics/DiagnosticsFacts.h"
 
 namespace qel::diagnostics {
 
@@ -36,6 +37,15 @@ SourceAnswer DiagnosticsSequence::query(std::uint32_t metric) {
   const auto found = _newest.find(metric);
   if (found != _newest.end()) return {true, "", found->second.timeMs, found->second.entries};
   return {false, "metric " + std::to_string(metric) + " has not been told so far", 0, {}};
+}
+
+sources::SourceFacts DiagnosticsSequence::facts() const {
+  if (!_events) return {};
+  PortFacts facts;
+  facts.port = _events->log().name();
+  facts.build = _events->build();
+  facts.frames = _events->log().frames();
+  return factsOf(facts, _events->ofFirstRadio());
 }
 
 SourceCondition DiagnosticsSequence::condition() const {

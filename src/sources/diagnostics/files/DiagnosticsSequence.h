@@ -20,6 +20,7 @@ class DiagnosticsSequence final : public sources::EventSequence {
   void passed(const sources::SourceEvent& event) override;
   sources::SourceAnswer query(std::uint32_t metric) override;
   sources::SourceCondition condition() const override;
+  sources::SourceFacts facts() const override;
 
  private:
   std::unique_ptr<RawLogEvents> _events;  // none: it can no longer be opened

@@ -24,6 +24,10 @@ RawLogEvents::Radio* RawLogEvents::radioOf(unsigned number) {
   return &_radios.try_emplace(number, Radio{DiagnosticsReader(number), 0}).first->second;
 }
 
+PacketCounts RawLogEvents::ofFirstRadio() const {
+  return _radios.empty() ? PacketCounts() : _radios.begin()->second.reader.counts();
+}
+
 std::map<PacketCounts::Kind, PacketCounts::Row> RawLogEvents::counts() const {
   std::map<PacketCounts::Kind, PacketCounts::Row> sum;
   for (const auto& [number, radio] : _radios) {

@@ -29,6 +29,8 @@ class RawLogEvents final : private PacketSink {
   const RawLog& log() const { return *_log; }
   // The packets by their kinds, of all radios that are read.
   std::map<PacketCounts::Kind, PacketCounts::Row> counts() const;
+  // Those of the first radio that is read.
+  PacketCounts ofFirstRadio() const;
   // Logs and events of other radios, which were passed over.
   std::uint64_t ofOtherRadios() const { return _ofOtherRadios; }
   // What the modem was asked about itself while the log was made.
