@@ -29,7 +29,8 @@ constexpr std::array<std::string_view, 11> kUsualKeys = {tesk::kKeyAppID,
 std::span<const std::string_view> usualKeys() { return kUsualKeys; }
 
 Bytes Input::piece() {
-  const std::size_t size = std::min<std::size_t>(number<std::uint16_t>(), _left.size());
+  const std::size_t wanted = number<std::uint16_t>();
+  const std::size_t size = std::min(wanted, _left.size());
   Bytes piece(_left.begin(), _left.begin() + static_cast<std::ptrdiff_t>(size));
   _left = _left.subspan(size);
   return piece;
