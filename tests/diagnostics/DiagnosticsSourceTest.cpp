@@ -12,40 +12,24 @@
 #include "support/diagnostics/Packets.h"
 #include "support/diagnostics/PlayedSearch.h"
 #include "support/diagnostics/PseudoModem.h"
+#include "support/diagnostics/ServingCell.h"
 #include "support/diagnostics/SourceLog.h"
 
 namespace qel::diagnostics {
 namespace {
 
 using namespace std::chrono_literals;
-using test::BodyWriter;
 using test::comesTrue;
 using test::FakeRouter;
+using test::kServingCell;
 using test::ModemBrain;
 using test::PseudoModem;
+using test::servingCell;
 using ::testing::Contains;
 using ::testing::HasSubstr;
 using ::testing::IsEmpty;
 
-constexpr std::uint16_t kServingCell = 0xB0C2;
 constexpr const char* kUsb = "/sys/devices/usb1/1-2";
-
-Bytes servingCell(unsigned pci) {
-  return BodyWriter()
-      .u8(3)
-      .u16(pci)
-      .u32(1300)
-      .u32(19300)
-      .u8(50)
-      .u8(50)
-      .u32(0x1234501)
-      .u16(77)
-      .u32(3)
-      .u16(1)
-      .u8(2)
-      .u16(1)
-      .u8(0);
-}
 
 class DiagnosticsSourceTest : public ::testing::Test {
  protected:

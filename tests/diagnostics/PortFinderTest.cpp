@@ -2,6 +2,9 @@
 
 #include <gtest/gtest.h>
 
+#include <cstdlib>
+#include <vector>
+
 #include "sources/diagnostics/DiagnosticsCondition.h"
 #include "support/diagnostics/FakeRouter.h"
 #include "support/diagnostics/PlayedSearch.h"
@@ -106,6 +109,17 @@ TEST(PortAdvice, SaysWhatToDo) {
   EXPECT_NE(advice(Kind::absent).find("/dev/ttyUSB0"), std::string::npos);
   EXPECT_EQ(conditionWithoutPort({Kind::held, ""}).state, "held");
   EXPECT_EQ(conditionWithoutPort({Kind::denied, ""}).state, "no-rights");
+}
+
+// The machine of ports.umockdev, where this program runs under umockdev-run.
+TEST(UdevPortSearch, FindsTerminalsAndNodesAndTheirModems) {
+  if (std::getenv("UMOCKDEV_DIR") == nullptr) GTEST_SKIP() << "not run by umockdev-run";
+  const std::vector<FoundPort> expected = {
+      {"/dev/ttyUSB0", "/sys/devices/pci0000:00/0000:00:14.0/usb1/1-2"},
+      {"/dev/wwan0qcdm0", "/sys/devices/pci0000:00/0000:01:00.0"},
+      {"@diag", ""},
+  };
+  EXPECT_EQ(makeUdevPortSearch()->ports(), expected);
 }
 
 TEST(UdevPortSearch, OffersTheRouterLast) {
