@@ -54,6 +54,7 @@ void DiagnosticsSource::Run::stop() {
 // Finds the port, lives with it until it is lost, pauses, and so on.
 void DiagnosticsSource::Run::play() {
   PortFinder finder(_wish, _world.search());
+  bool isFirst = true;
   auto pause = _timing.firstPause;
   while (!_stopping) {
     if (const auto port = finder.open()) {
@@ -64,11 +65,14 @@ void DiagnosticsSource::Run::play() {
         _facts.modem = finder.port().modem;
       }
       if (live(*port)) pause = _timing.firstPause;
+    } else if (isFirst && finder.trouble().kind == PortTrouble::Kind::held) {
+      rest(_timing.ending);  // a run before this one may just be leaving it
     } else {
       report(conditionWithoutPort(finder.trouble()));
       say(adviceWithoutPort(finder.port(), finder.trouble()));
     }
     if (_stopping) break;
+    isFirst = false;
     const auto end = Clock::now() + pause;
     pause = std::min(pause * 2, _timing.longestPause);
     // A device may come at any time; udev needs a moment for it.
@@ -99,7 +103,7 @@ bool DiagnosticsSource::Run::live(DiagPort& port) {
   report(conditionOf(session, false));
   if (!_stopping) say(adviceOf(session.state(), {_facts.port, _facts.modem}));
   const std::lock_guard lock(_factsMutex);
-  _facts.port.clear();
+  _facts = {};
   return hasListened;
 }
 
