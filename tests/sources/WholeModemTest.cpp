@@ -77,9 +77,9 @@ Logs onGsm() {
                    .u8(0xFF)},
       {0x512F, radioMessage(RadioChannel::broadcast, systemInformation3({}))},
       {0x512F, radioMessage(RadioChannel::broadcast, systemInformation13({}))},
-      {0x512F, radioMessage(RadioChannel::slow, measurementReport(37, 2))},
       {0x507A, BodyWriter().u16(level(-71)).u8(0)},
       {0x5071, BodyWriter().u8(1).u16(kBand900 | 5).u16(level(-65)).u8(1).u8(0x2B).zeros(6)},
+      {0x512F, radioMessage(RadioChannel::slow, measurementReport(37, 2))},
       {0x7130, Bytes{3, 0, 0}},
       {0x7131, Bytes{19, 8, 0}},
   };
