@@ -59,6 +59,24 @@ TEST_F(QelctlStatus, letsNoNameCommandTheTerminal) {
   EXPECT_EQ(status()["clients"][0]["name"], name);
 }
 
+TEST(QelctlStatusOfARawLog, tellsWhichPacketsCameAndWhatBecameOfThem) {
+  const PrivateBus bus;
+  const ServiceProcess service(bus, "diag:" QEL_RAW_LOGS "/pixel5_2023.qmdl,speed=1000");
+  Client client(bus, "tester");
+  ASSERT_TRUE(client.waitForReachable(true));
+  ASSERT_EQ(client.install(7, {20330, 54017}).code, 0);
+  client.transport().eventsOn();
+  ASSERT_TRUE(client.waitForMetrics(26));
+  const auto told = nlohmann::json::parse(qelctl({"status", "--json", "--bus", bus.address()}).out);
+  EXPECT_EQ(told["facts"]["frames"], "19");
+  EXPECT_EQ(told["facts"]["bad frames"], "0");
+  EXPECT_EQ(told["facts"]["log B193 version 48"], "13 understood");
+  const auto text = qelctl({"status", "--bus", bus.address()}).out;
+  EXPECT_NE(text.find(R"(fact            "log B193 version 48": "13 understood")"),
+            std::string::npos)
+      << text;
+}
+
 // Reports without content went to every viewer and ended it.
 TEST(QelctlStatusOfARecording, countsReportsThatNoTableCouldDraw) {
   const TemporaryRecording recording(metricLine(0x3C0000 + 11788, Bytes{}) +

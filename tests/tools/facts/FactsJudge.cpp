@@ -30,6 +30,10 @@ constexpr std::uint64_t kKeptMs = 61'000;  // what was measured holds for this l
 
 // Facts have the carriers of the first list alone; release 12 has another one.
 constexpr const char* kCarriers = "nbr_eutra";
+// What stands for a carrier or a band that a later list names: facts have it as it stands.
+constexpr std::int64_t kCarrierElsewhere = 65535;
+constexpr std::int64_t kBandElsewhere = 64;
+constexpr const char* kBands = "multi_band_info";
 // What facts tell in part only: of UMTS's receivers what they measure when idle, and one of the
 // transmission modes.
 const std::map<std::int64_t, std::string> kPartlyKnown = {{53506, "rx_info"},
@@ -91,7 +95,7 @@ bool isEqualList(const std::string& name, const json& expected, const json& told
       if (!isReceiver(wanted, told)) return false;
       continue;
     }
-    bool any = false;
+    bool any = name == kBands && wanted == kBandElsewhere;
     for (const json& element : told) {
       any = any || (wanted.is_object() ? element.is_object() && isMatch(wanted, {}, element)
                                        : isEqual(name, wanted, element));
@@ -210,7 +214,15 @@ bool isBacked(const Told& told, const json& candidate, const std::set<std::strin
     if (fact.metric != told.metric || fact.time.firstMs > told.timeMs + 1) return false;
     if (fact.metric == kRrcState && !fact.time.holds(told.timeMs)) return false;
     if (fact.metric == kNeighbours && fact.time.lastMs + kKeptMs < told.timeMs) return false;
-    return hasAll(fact.all, names) && isMatch(fact.key, fact.opt, candidate);
+    return hasAll(fact.all, names) &&
+           isMatch(fact.key, fact.isSoft ? json::object() : fact.opt, candidate);
+  });
+}
+
+bool hasCarrierElsewhere(const json& candidate) {
+  const json carriers = candidate.value(kCarriers, json::array());
+  return std::any_of(carriers.begin(), carriers.end(), [](const json& carrier) {
+    return carrier.value("earfcn", std::int64_t{0}) >= kCarrierElsewhere;
   });
 }
 
@@ -256,6 +268,7 @@ class Court {
       if (partly != kPartlyKnown.end() && names == std::set{partly->second}) continue;
       for (const json& candidate : told.candidates) {
         if (!hasAll(candidate, names) || isBacked(told, candidate, names, _facts)) continue;
+        if (names.contains(kCarriers) && hasCarrierElsewhere(candidate)) continue;
         const std::string name = std::to_string(told.metric);
         ++_verdict.metrics[name].extra;
         json shown;
