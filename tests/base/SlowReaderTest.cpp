@@ -163,8 +163,8 @@ TEST(SlowReader, losesNoLineWhenItIsWaitedFor) {
 
 TEST(SlowReader, isWaitedForUntilTheProgramIsToldToEnd) {
   const Channel pipe(Kind::pipe);
-  BatchingSink sink(pipe.in());
   int asked = 0;
+  BatchingSink sink(pipe.in());
   sink.setGivesUp([&asked] { return ++asked >= 3; });
   for (int i = 0; i < 10'000 && asked < 3; ++i) sink.write(std::string(100, '.'));
   EXPECT_EQ(asked, 3);

@@ -73,7 +73,7 @@ TEST(Value, copiesAllTheWayDown) {
 }
 
 TEST(Value, canTakeTheValueOfItsOwnElement) {
-  Value value(List{List{"deep"}});
+  Value value(List{Value(List{"deep"})});
   value = Value(value.asList()->front());
   EXPECT_EQ(value, Value(List{"deep"}));
 }
