@@ -21,8 +21,7 @@ int filter(sd_bus_message* message, void* mayGoOn, sd_bus_error* /*error*/) {
                         : CallFilter::Kind::answeredAtOnce;
   const char* caller = sd_bus_message_get_sender(message);
   if ((*static_cast<CallFilter::MayGoOn*>(mayGoOn))(kind, caller ? caller : "")) return kGoesOn;
-  const sd_bus_error refused =
-      SD_BUS_ERROR_MAKE_CONST(SD_BUS_ERROR_LIMITS_EXCEEDED, "too many calls of this caller");
+  const sd_bus_error refused{SD_BUS_ERROR_LIMITS_EXCEEDED, "too many calls of this caller", 0};
   sd_bus_reply_method_error(message, &refused);
   return kIsAnswered;
 }
