@@ -14,6 +14,9 @@ set(QEL_SANITIZE "" CACHE STRING "Sanitizers to build with, as for -fsanitize=")
 if(QEL_SANITIZE)
   add_compile_options(-fsanitize=${QEL_SANITIZE} -fno-sanitize-recover=all -fno-omit-frame-pointer -g1)
   add_link_options(-fsanitize=${QEL_SANITIZE})
+  if(CMAKE_CXX_COMPILER_ID STREQUAL "Clang")
+    add_compile_options("SHELL:-Xclang -fno-pch-timestamp")  # else the compiler cache never hits
+  endif()
   add_compile_definitions(_GLIBCXX_ASSERTIONS)
   find_program(QEL_LLD ld.lld)  # the usual linker takes long over sanitized objects
   if(QEL_LLD)
@@ -47,6 +50,14 @@ function(qel_harden_programs)
   add_link_options(-Wl,-z,relro -Wl,-z,now)
 endfunction()
 
+# What fuzzers look at counts the branches it takes, so that they see what an input reached.
+option(BUILD_FUZZERS "Build the fuzzers, with clang" OFF)
+function(qel_count_branches name)
+  if(BUILD_FUZZERS)
+    target_compile_options(${name} PRIVATE -fsanitize=fuzzer-no-link)
+  endif()
+endfunction()
+
 # Our own code only; generated foreign code links without it.
 add_library(qel_warnings INTERFACE)
 target_compile_options(qel_warnings INTERFACE
@@ -66,6 +77,7 @@ function(qel_add_library name)
   add_library(${name} STATIC ${ARG_SOURCES})
   target_include_directories(${name} PUBLIC ${CMAKE_SOURCE_DIR}/src)
   target_link_libraries(${name} PUBLIC ${ARG_DEPENDS} PRIVATE qel_warnings)
+  qel_count_branches(${name})
   if(QEL_SANITIZE AND TARGET qel_base AND NOT name STREQUAL qel_base)
     target_precompile_headers(${name} REUSE_FROM qel_base)
   elseif(QEL_SANITIZE)
