@@ -29,7 +29,7 @@ std::unique_ptr<DiagPort> PortFinder::open() {
   const std::vector<FoundPort> known = _search->ports();
   _port = {_wish, ""};
   _trouble = {Kind::absent, "none was found"};
-  for (const FoundPort& candidate : candidates()) {
+  for (const FoundPort& candidate : candidates(known)) {
     PortTrouble trouble;
     if (auto port = openPort(candidate.address, trouble)) {
       _port = candidate;
@@ -48,8 +48,7 @@ std::unique_ptr<DiagPort> PortFinder::open() {
   return nullptr;
 }
 
-std::vector<FoundPort> PortFinder::candidates() {
-  std::vector<FoundPort> ports = _search->ports();
+std::vector<FoundPort> PortFinder::candidates(std::vector<FoundPort> ports) {
   const auto isOfModem = [this](const FoundPort& port) {
     return !_modem.empty() && port.modem == _modem;
   };

@@ -29,7 +29,8 @@ class PortFinder {
   void clear() { _search->clear(); }
 
  private:
-  std::vector<FoundPort> candidates();
+  // What to try, in order, of the ports that are known.
+  std::vector<FoundPort> candidates(std::vector<FoundPort> ports);
 
   const std::string _wish;
   const std::unique_ptr<PortSearch> _search;

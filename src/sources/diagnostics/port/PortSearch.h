@@ -18,9 +18,9 @@ struct FoundPort {
 class PortSearch {
  public:
   virtual ~PortSearch() = default;
-  // The likeliest first. A port that is named may be asked to have a modem's name too.
+  // The likeliest first.
   virtual std::vector<FoundPort> ports() = 0;
-  // The modem of a port that need not be among them; empty when that cannot be told.
+  // That of a port that need not be among them; empty when it cannot be told.
   virtual std::string modemOf(const std::string& address) = 0;
   // Readable once there may be other ports than before; none is -1.
   virtual int descriptor() const { return -1; }
