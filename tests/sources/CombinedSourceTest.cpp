@@ -114,12 +114,16 @@ TEST_F(CombinedSourceTest, TellsNothingOfOneThatIsGone) {
   EXPECT_EQ(heard->payloads, (std::vector<int>{1}));
 }
 
-TEST_F(CombinedSourceTest, TurnsToThePortWhenModemManagerNoLongerRepeatsAMetric) {
+TEST_F(CombinedSourceTest, TurnsToTheOtherWhenTheBetterOneHasNoValueAnyMore) {
   start();
   tell(manager, kSimFiles, 1);
-  tell(port, kSimFiles, 2, 14);
-  tell(port, kSimFiles, 3, 16);
-  EXPECT_EQ(heard->payloads, (std::vector<int>{1, 3}));
+  tell(port, kSimFiles, 2);
+  manager->answer = {false, "not now", 0, {}};
+  tell(port, kSimFiles, 3);
+  manager->answer = {};
+  tell(manager, kSimFiles, 4);
+  tell(port, kSimFiles, 5);
+  EXPECT_EQ(heard->payloads, (std::vector<int>{1, 3, 4}));
 }
 
 TEST_F(CombinedSourceTest, AsksTheBetterOneFirst) {

@@ -12,8 +12,12 @@ namespace qel::sources {
 // From a start to its stop.
 class CombinedSource::Run {
  public:
-  Run(std::weak_ptr<EventReceiver> receiver, bool isPortMissed)
-      : _receiver(std::move(receiver)), _isPortMissed(isPortMissed) {}
+  Run(std::weak_ptr<EventReceiver> receiver, std::weak_ptr<EventSource> port,
+      std::weak_ptr<EventSource> manager, bool isPortMissed)
+      : _receiver(std::move(receiver)),
+        _portSource(std::move(port)),
+        _managerSource(std::move(manager)),
+        _isPortMissed(isPortMissed) {}
 
   void stop() {
     {
@@ -62,8 +66,17 @@ class CombinedSource::Run {
   }
 
   bool lets(SourcePart part, const SourceEvent& event) {
+    {
+      const std::lock_guard lock(_mutex);
+      if (_arbiter.lets(part, event)) return true;
+    }
+    // The better one may have lost this metric alone.
+    const std::uint32_t metric = *metricOf(event);
+    const auto better = (part == SourcePart::port ? _managerSource : _portSource).lock();
+    if (!better || better->query(metric).known) return false;
     const std::lock_guard lock(_mutex);
-    return _arbiter.lets(part, event);
+    _arbiter.release(metric);
+    return true;
   }
 
   Change noted(SourcePart part, const SourceCondition& condition) {
@@ -82,6 +95,8 @@ class CombinedSource::Run {
   }
 
   const std::weak_ptr<EventReceiver> _receiver;
+  const std::weak_ptr<EventSource> _portSource;
+  const std::weak_ptr<EventSource> _managerSource;
   const bool _isPortMissed;
   std::mutex _mutex;  // guards all that follows; the receiver is not called under it
   std::condition_variable _turn;
@@ -116,7 +131,7 @@ CombinedSource::~CombinedSource() { stop(); }
 void CombinedSource::start(std::weak_ptr<EventReceiver> receiver,
                            std::shared_ptr<ListenerSignal> listeners) {
   stop();
-  auto run = std::make_shared<Run>(std::move(receiver), _wish == Port::missed);
+  auto run = std::make_shared<Run>(std::move(receiver), _port, _manager, _wish == Port::missed);
   auto portEar = std::make_shared<Ear>(run, SourcePart::port);
   auto managerEar = std::make_shared<Ear>(run, SourcePart::manager);
   {

@@ -9,11 +9,8 @@ bool MetricArbiter::lets(SourcePart part, const SourceEvent& event) {
   if (!metric) return true;
   Entry& entry = _entries[*metric];
   if (part == betterPart(*metric)) {
-    entry = {true, event.timeMs, {}};
+    entry = {true, {}};
     return true;
-  }
-  if (entry.isHeld && part == SourcePart::port && event.timeMs > entry.toldMs + kManagerSilentMs) {
-    entry = {};
   }
   if (entry.isHeld) entry.withheld = {event};
   return !entry.isHeld;

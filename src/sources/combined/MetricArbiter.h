@@ -14,19 +14,16 @@ namespace qel::sources {
 // again when the better one is lost. One thread at a time.
 class MetricArbiter {
  public:
-  // ModemManager's metrics come again every few seconds: one that has stayed away for so long has
-  // no value there any more.
-  static constexpr std::uint64_t kManagerSilentMs = 15'000;
-
-  // Whether the event is to be sent.
+  // Whether the event is to be sent. One that is not is kept, to stand in.
   bool lets(SourcePart part, const SourceEvent& event);
+  // The better source of the metric has no value of it any more.
+  void release(std::uint32_t metric) { _entries.erase(metric); }
   // That source tells nothing for now. What the other one last said in its place is to be sent.
   std::vector<SourceEvent> lose(SourcePart part);
 
  private:
   struct Entry {
     bool isHeld = false;                // the better one has a value
-    std::uint64_t toldMs = 0;           // by the better one
     std::vector<SourceEvent> withheld;  // the other's newest, at most one
   };
 
