@@ -59,6 +59,7 @@ struct Fact {
 struct Told {
   std::int64_t metric;
   std::uint64_t timeMs;
+  bool isOfFurtherRadio;  // facts do not tell a modem's radios apart
   json values;
   std::vector<json> candidates;
 };
@@ -173,7 +174,9 @@ std::vector<Told> readRecording(const std::string& path) {
     const auto metric = *event->entries.find("kKeyMetricID")->asInt64() - kMetricEventBase;
     const MetricMessage* row = findMetricMessage(static_cast<std::uint32_t>(metric));
     const Bytes payload = *event->entries.find("kKeyPayload")->asBytes();
-    told.push_back({metric, event->timeMs, json::parse(jsonText(*row->describe(payload))), {}});
+    const bool isFurther = *event->entries.find("kKeyProfileID")->asInt64() > 0;
+    told.push_back(
+        {metric, event->timeMs, isFurther, json::parse(jsonText(*row->describe(payload))), {}});
     if (metric == kRrcState) putNumbers(told.back().values, payload);
     addCandidates(told.back().values, json::object(), told.back().candidates);
   }
@@ -263,6 +266,7 @@ class Court {
     const auto found = _names.find(told.metric);
     if (found == _names.end()) return;
     if (told.metric == kRrcState && told.values.value("state", std::int64_t{0}) == kEnding) return;
+    if (told.metric == kRrcState && told.isOfFurtherRadio) return;
     const auto partly = kPartlyKnown.find(told.metric);
     for (const auto& names : found->second) {
       if (partly != kPartlyKnown.end() && names == std::set{partly->second}) continue;
