@@ -94,8 +94,8 @@ TEST(Qelctl, explainsItselfAndEverySubcommand) {
   EXPECT_TRUE(qelctl({"--version"}).out.starts_with("qelctl "));
   const Outcome help = qelctl({"--help"});
   EXPECT_EQ(help.exitCode, 0);
-  for (const char* command :
-       {"decode", "replay", "store", "screen", "screens", "metrics", "status", "live", "record"}) {
+  for (const char* command : {"decode", "replay", "store", "screen", "screens", "metrics", "status",
+                              "live", "record", "import", "diag-report"}) {
     EXPECT_NE(help.out.find(command), std::string::npos);
     const Outcome detail = qelctl({command, "--help"});
     EXPECT_EQ(detail.exitCode, 0);
