@@ -186,6 +186,16 @@ TEST(LteNeighbours, doNotCountTheCellWhereThePhoneIs) {
   EXPECT_NE(said.find("503"), std::string::npos) << said;
 }
 
+TEST(LteNeighbours, countTheCellWhereThePhoneIsToldToGoUntilItIsThere) {
+  LteModem modem;
+  modem.send(0xB0C2, test::lteServingCell(3));
+  modem.sendEvent(1611, test::lteNewCellEvent(5780, 173));
+  modem.send(kConnected, lteConnectedNeighbours(4, 5780, kTwo));
+  EXPECT_EQ(modem.said(kNeighbours), kTwoSaid);
+  modem.send(kIdleServing, test::lteIdleServing(5, 5780, {173, -98.9, -9.4}));
+  EXPECT_EQ(modem.said(kNeighbours).find("173"), std::string::npos);
+}
+
 TEST(LteNeighbours, areForgottenThirtySecondsAfterTheyWereMeasured) {
   LteModem modem;
   modem.send(kConnected, lteConnectedNeighbours(4, 5780, kTwo));

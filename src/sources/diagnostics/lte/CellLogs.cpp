@@ -39,7 +39,7 @@ Outcome readLteServingCell(const LogPacket& packet, Picture& picture, Told& told
     if (!canBe(cell)) return Outcome::damaged;
     picture.technology = Technology::lte;
     picture.lte.serving = cell;
-    picture.lte.camp(cell.name);
+    picture.lte.measureFrom(cell.name);
     told.tell(metric::kLteScellInfo);
     return Outcome::understood;
   });

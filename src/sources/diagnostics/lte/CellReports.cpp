@@ -120,7 +120,7 @@ std::optional<Bytes> lteNeighbours(const Picture& picture, std::uint64_t timeMs)
   KCellularLteNbrEutraCellMeas message;
   message.setTimestamp(timeMs);
   for (const LteNeighbour& neighbour : picture.lte.neighbours.cells()) {
-    if (neighbour.cell == picture.lte.camped) continue;
+    if (neighbour.cell == picture.lte.measuredFrom) continue;
     auto entry = std::make_shared<EgwErrcNbrEutraMeas>();
     entry->setNbrPhysCellId(neighbour.cell.pci);
     if (neighbour.cell.earfcn != kUnknownEarfcn) {

@@ -81,7 +81,7 @@ Outcome readLteConnectedCells(const LogPacket& packet, Picture& picture, Told& t
     const auto cells = neighboursOf(reading, packet.timeMs);
     if (!cells || !isCell(server)) return Outcome::damaged;
     if (reading.head.number(Field::cellIndex) == 0) {
-      picture.lte.camp(server);
+      picture.lte.measureFrom(server);
       noteLevel(reading, packet.timeMs, picture.lte, told);
     }
     note(*cells, picture.lte, told);
@@ -102,7 +102,7 @@ Outcome readLteIdleServing(const LogPacket& packet, Picture& picture, Told& told
   return readWhole(packet, [&](const Reading& reading) {
     const LteCellName server = nameOf(reading.head);
     if (!isCell(server)) return Outcome::damaged;
-    picture.lte.camp(server);
+    picture.lte.measureFrom(server);
     noteLevel(reading, packet.timeMs, picture.lte, told);
     return Outcome::understood;
   });

@@ -46,7 +46,7 @@ Outcome readLteMeasurement(const LogPacket& packet, Picture& picture, Told& told
   if (judged.outcome != Outcome::understood) return judged.outcome;
   if (const JudgedCell* primary = primaryOf(judged.cells)) {
     lte.signal = LteSignal{primary->name, primary->antennas, packet.timeMs};
-    lte.camp(primary->name);
+    lte.measureFrom(primary->name);
     if (!picture.technology) picture.technology = Technology::lte;
     told.tell(metric::kLteServingMeasurement);
     told.tell(metric::kLteRsrpRsrqSinr);

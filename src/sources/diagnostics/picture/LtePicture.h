@@ -17,6 +17,9 @@ enum class LteLogState : std::uint8_t { notSeen, isRead, isUnread };
 struct LtePicture {
   std::optional<LteServingCell> serving;
   std::optional<LteCellName> camped;  // by the latest packet that names the cell in use
+  // Likewise of those that measure: a command to go elsewhere comes before the last measurements
+  // here.
+  std::optional<LteCellName> measuredFrom;
   std::optional<LteBroadcast> broadcast;
   std::optional<LteSignal> signal;  // of the primary carrier
   std::optional<LteLevel> level;    // likewise, by other logs
@@ -34,6 +37,12 @@ struct LtePicture {
   const LteRules* serverUnread() const {
     const bool standsIn = servingLog == LteLogState::isUnread && rules && rules->sib1;
     return standsIn && rules->cell == camped ? &*rules : nullptr;
+  }
+
+  // The phone measures, and so is, on that cell.
+  void measureFrom(const LteCellName& cell) {
+    measuredFrom = cell;
+    camp(cell);
   }
 
   // A cell that somebody else measured, for instance the phone in a report to the network.
