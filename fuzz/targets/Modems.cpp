@@ -117,8 +117,8 @@ ModemAnswers nextAnswers(Input& input) {
 }
 
 void expectTaken(const SourceEvent& event) {
-  EventFault fault;
-  law(examineEvent(event, fault).has_value(), "every report of a modem can be delivered");
+  service::EventFault fault;
+  law(service::examineEvent(event, fault).has_value(), "every report of a modem can be delivered");
 }
 
 }  // namespace
