@@ -17,11 +17,17 @@ constexpr std::uint64_t kWallMs = 1'790'000'000'000;
 
 class LiveMetricsTest : public ::testing::Test {
  protected:
-  void send(unsigned pci, unsigned radio = 1) {
-    const Bytes body = servingCell(pci);
-    metrics.atTime(now, kWallMs + static_cast<std::uint64_t>((now - begin) / 1ms));
-    metrics.log({kServingCell, 315'964'800'000 + static_cast<std::uint64_t>((now - begin) / 1ms),
-                 radio, body});
+  void send(unsigned pci, unsigned radio = 1) { sendLog(kServingCell, servingCell(pci), radio); }
+  void sendLog(std::uint16_t code, const Bytes& body, unsigned radio = 1) {
+    const auto passed = static_cast<std::uint64_t>((now - begin) / 1ms);
+    metrics.atTime(now, kWallMs + passed);
+    metrics.log({code, 315'964'800'000 + passed, radio, body});
+  }
+  // Of GSM: a level of -71 dBm, and one neighbour.
+  void sendLevels() {
+    sendLog(0x507A, test::BodyWriter().u16(0x10000 - 71 * 16).u8(0));
+    sendLog(0x5071,
+            test::BodyWriter().u8(1).u16(0x8005).u16(0x10000 - 65 * 16).u8(1).u8(7).zeros(6));
   }
   void pass(std::chrono::milliseconds time) {
     now += time;
@@ -60,7 +66,7 @@ TEST_F(LiveMetricsTest, HoldsBackAModemThatChangesItsMindAllTheTime) {
   EXPECT_EQ(metrics.due(), now + 1s);
   pass(1s);
   EXPECT_EQ(cells(), 21U);  // the last of them
-  EXPECT_EQ(metrics.due(), LiveMetrics::Clock::time_point::max());
+  EXPECT_GT(metrics.due(), now + 5s);
 }
 
 TEST_F(LiveMetricsTest, RepeatsAValueAfterThePeriodForAsLongAsPacketsCome) {
@@ -74,6 +80,33 @@ TEST_F(LiveMetricsTest, RepeatsAValueAfterThePeriodForAsLongAsPacketsCome) {
   pass(1h);
   EXPECT_EQ(cells(), before);
   EXPECT_EQ(metrics.due(), LiveMetrics::Clock::time_point::max());
+}
+
+TEST_F(LiveMetricsTest, ForgetsTheLevelsOfAModemThatGoesQuietWithTwoLooks) {
+  sendLevels();
+  pass(1s);
+  const auto neighbours = [this] {
+    return metrics.query(metric::kGsmNeighbours).entries.find("kKeyPayload")->asBytes()->size();
+  };
+  const std::size_t withOne = neighbours();
+  ASSERT_TRUE(metrics.query(metric::kGsmIdleMeasurement).known);
+  ASSERT_EQ(metrics.due(), begin + 10'001ms);
+  pass((metrics.due() - now) / 1ms * 1ms);
+  EXPECT_FALSE(metrics.query(metric::kGsmIdleMeasurement).known);
+  EXPECT_EQ(neighbours(), withOne);
+  ASSERT_EQ(metrics.due(), begin + 30'001ms);
+  pass((metrics.due() - now) / 1ms * 1ms);
+  EXPECT_LT(neighbours(), withOne);
+  EXPECT_EQ(metrics.due(), LiveMetrics::Clock::time_point::max());
+}
+
+TEST_F(LiveMetricsTest, ForgetsLevelsWhileOnlyTheOtherRadioIsHeard) {
+  sendLevels();
+  for (int i = 0; i < 12; ++i) {
+    pass(1s);
+    send(1, 2);
+  }
+  EXPECT_FALSE(metrics.query(metric::kGsmIdleMeasurement).known);
 }
 
 TEST_F(LiveMetricsTest, ListensToItsRadioAlone) {

@@ -8,17 +8,6 @@
 #include "sources/diagnostics/umts/UmtsTables.h"
 
 namespace qel::diagnostics {
-namespace {
-
-void age(Picture& picture, std::uint64_t nowMs) {
-  age(picture.lte, nowMs);
-  age(picture.umts, nowMs);
-  age(picture.gsm, nowMs);
-  age(picture.nas, nowMs);
-  age(picture.sim, nowMs);
-}
-
-}  // namespace
 
 const Told& DiagnosticsReader::take(const LogPacket& packet) {
   const LogRow* row = findLog(packet.code);
@@ -35,11 +24,19 @@ const Told& DiagnosticsReader::take(const Packet& packet, const Row* row,
                                     const PacketCounts::Kind& kind) {
   _told.clear();
   if (packet.radio != 0 && packet.radio != _radio) return _told;
-  age(_picture, packet.timeMs);
+  age(packet.timeMs);
   const Outcome outcome = row ? row->read(packet, _picture, _told) : Outcome::notOurs;
   _counts.count(kind, outcome);
   for (const std::uint32_t metric : _told) _everTold.tell(metric);
   return _told;
+}
+
+void DiagnosticsReader::age(std::uint64_t nowMs) {
+  diagnostics::age(_picture.lte, nowMs);
+  diagnostics::age(_picture.umts, nowMs);
+  diagnostics::age(_picture.gsm, nowMs);
+  diagnostics::age(_picture.nas, nowMs);
+  diagnostics::age(_picture.sim, nowMs);
 }
 
 std::optional<Bytes> DiagnosticsReader::report(std::uint32_t metric, std::uint64_t timeMs) const {

@@ -23,6 +23,9 @@ class DiagnosticsReader {
   const Told& take(const LogPacket& packet);
   const Told& take(const ModemEvent& event);
 
+  // What has become old by then is gone; a packet does the same with its own time.
+  void age(std::uint64_t nowMs);
+
   // The metric as it is known now; nothing when the port has told nothing of it.
   std::optional<Bytes> report(std::uint32_t metric, std::uint64_t timeMs) const;
 

@@ -21,6 +21,9 @@ constexpr std::array kLevels = {
     metric::kUmtsNeighbours,        metric::kUmtsTxPower,     metric::kGsmIdleMeasurement,
     metric::kGsmCallMeasurement,    metric::kGsmNeighbours,
 };
+// When a signal and when a neighbour have just become old.
+constexpr std::array kOldAfter = {std::chrono::milliseconds{10'001},
+                                  std::chrono::milliseconds{30'001}};
 constexpr unsigned kLevelsPerSecond = 1;
 constexpr unsigned kMostPerSecond = 20;  // of a modem that says the opposite all the time
 
@@ -57,6 +60,7 @@ template <class Packet>
 void LiveMetrics::take(Packet packet) {
   packet.timeMs = _clock.hostMs(packet.timeMs, _wallMs);
   _packetMs = packet.timeMs;
+  _packetAt = _now;
   _packets = true;
   const Told* told = nullptr;
   {
@@ -69,7 +73,20 @@ void LiveMetrics::take(Packet packet) {
 void LiveMetrics::refresh() {
   constexpr std::chrono::seconds kPause{1};
   const bool mayBeOld = _packets && _now >= _updatedAt + kPause;
-  if (mayBeOld || _now >= _keeper.waitingUntil()) updateAll();
+  if (mayBeOld || _now >= due()) updateAll();
+}
+
+LiveMetrics::Clock::time_point LiveMetrics::due() const {
+  return std::min(_keeper.waitingUntil(), agesAt());
+}
+
+LiveMetrics::Clock::time_point LiveMetrics::agesAt() const {
+  if (_packetAt) {
+    for (const auto age : kOldAfter) {
+      if (_updatedAt < *_packetAt + age) return *_packetAt + age;
+    }
+  }
+  return Clock::time_point::max();
 }
 
 void LiveMetrics::sendAll() {
@@ -80,6 +97,10 @@ void LiveMetrics::sendAll() {
 void LiveMetrics::updateAll() {
   _updatedAt = _now;
   _packets = false;
+  if (_packetAt) {
+    const auto quiet = std::chrono::floor<std::chrono::milliseconds>(_now - *_packetAt);
+    _reader.age(_packetMs + static_cast<std::uint64_t>(quiet.count()));
+  }
   _keeper.update(_build, _packetMs, _now, _send);
 }
 
@@ -87,6 +108,7 @@ void LiveMetrics::forget() {
   const std::lock_guard lock(_mutex);
   _reader.forget();
   _clock.beginAnew();
+  _packetAt.reset();
   _keeper.clear();
 }
 

@@ -4,6 +4,7 @@
 #include <chrono>
 #include <cstdint>
 #include <mutex>
+#include <optional>
 
 #include "sources/MetricKeeper.h"
 #include "sources/diagnostics/DiagnosticsReader.h"
@@ -25,8 +26,9 @@ class LiveMetrics final : public PacketSink {
   void atTime(Clock::time_point now, std::uint64_t wallMs);
   // After them: sends what had to wait, and looks once a second for what has become old.
   void refresh();
-  // When refresh() has something to send without a packet.
-  Clock::time_point due() const { return _keeper.waitingUntil(); }
+  // When refresh() has something to do without a packet. A modem that goes quiet is looked at twice
+  // more, when its last signal and its last neighbour have become old.
+  Clock::time_point due() const;
 
   // A new listener is told everything.
   void sendAll();
@@ -46,6 +48,7 @@ class LiveMetrics final : public PacketSink {
   template <class Packet>
   void take(Packet packet);
   void updateAll();
+  Clock::time_point agesAt() const;
 
   const Send _send;
   const sources::MetricKeeper::Build _build;
@@ -57,7 +60,8 @@ class LiveMetrics final : public PacketSink {
   Clock::time_point _updatedAt;
   std::uint64_t _wallMs = 0;
   std::uint64_t _packetMs = 0;  // of the last one
-  bool _packets = false;        // since all metrics were looked at
+  std::optional<Clock::time_point> _packetAt;
+  bool _packets = false;  // since all metrics were looked at
 };
 
 }  // namespace qel::diagnostics
