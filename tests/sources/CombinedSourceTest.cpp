@@ -114,6 +114,16 @@ TEST_F(CombinedSourceTest, TellsNothingOfOneThatIsGone) {
   EXPECT_EQ(heard->payloads, (std::vector<int>{1}));
 }
 
+TEST_F(CombinedSourceTest, TellsNothingThatTheOtherDoesNotKnowAnyMore) {
+  start();
+  set(port, kRunning);
+  tell(port, kSignal, 1);
+  tell(manager, kSignal, 2);
+  manager->answer = {false, "an hour ago", 0, {}};
+  set(port, kNoPort);
+  EXPECT_EQ(heard->payloads, (std::vector<int>{1}));
+}
+
 TEST_F(CombinedSourceTest, TurnsToTheOtherWhenTheBetterOneHasNoValueAnyMore) {
   start();
   tell(manager, kSimFiles, 1);

@@ -38,7 +38,9 @@ class CombinedSource::Run {
   void noteCondition(SourcePart part, const SourceCondition& condition) {
     if (!beginTurn()) return;
     const Change change = noted(part, condition);
-    for (const SourceEvent& event : change.instead) hand(event);
+    for (const SourceEvent& event : change.instead) {
+      if (isStillKnown(otherThan(part), event)) hand(event);
+    }
     if (const auto receiver = _receiver.lock()) receiver->conditionChanged(change.condition);
     endTurn();
   }
@@ -71,12 +73,16 @@ class CombinedSource::Run {
       if (_arbiter.lets(part, event)) return true;
     }
     // The better one may have lost this metric alone.
-    const std::uint32_t metric = *metricOf(event);
-    const auto better = (part == SourcePart::port ? _managerSource : _portSource).lock();
-    if (!better || better->query(metric).known) return false;
+    if (isStillKnown(otherThan(part), event)) return false;
     const std::lock_guard lock(_mutex);
-    _arbiter.release(metric);
+    _arbiter.release(*metricOf(event));
     return true;
+  }
+
+  // A source that is being destroyed is not to be replaced.
+  bool isStillKnown(SourcePart part, const SourceEvent& event) const {
+    const auto source = (part == SourcePart::port ? _portSource : _managerSource).lock();
+    return !source || source->query(*metricOf(event)).known;
   }
 
   Change noted(SourcePart part, const SourceCondition& condition) {

@@ -18,7 +18,8 @@ class MetricArbiter {
   bool lets(SourcePart part, const SourceEvent& event);
   // The better source of the metric has no value of it any more.
   void release(std::uint32_t metric) { _entries.erase(metric); }
-  // That source tells nothing for now. What the other one last said in its place is to be sent.
+  // That source tells nothing for now. What the other one last said in its place is to be sent,
+  // if it still has a value of it.
   std::vector<SourceEvent> lose(SourcePart part);
 
  private:
