@@ -63,8 +63,9 @@ void ModemLink::process() {
 bool ModemLink::isWished(const std::string& path, const BusInterfaces& interfaces) const {
   const auto modem = interfaces.find(mm::kModem);
   if (modem == interfaces.end()) return false;
+  if (!mayBeDevice(modem->second)) return false;
   if (!_wish.path.empty()) return path == _wish.path;
-  if (_wish.imei.empty()) return mayBeDevice(modem->second);
+  if (_wish.imei.empty()) return true;
   return busValue<std::string>(modem->second, "EquipmentIdentifier") == _wish.imei ||
          busValue<std::string>(propertiesOf(interfaces, mm::kModem3gpp), "Imei") == _wish.imei;
 }

@@ -2,6 +2,7 @@
 // was locked, failed or not there looked like one with nothing to report.
 #include <gmock/gmock.h>
 
+#include <atomic>
 #include <condition_variable>
 #include <mutex>
 
@@ -178,6 +179,43 @@ TEST(ModemConditionInWords, TakesNoNonsenseFromTheModem) {
   EXPECT_EQ(condition.state, "starting");
   EXPECT_EQ(condition.model, "a[31m model");
   EXPECT_EQ(condition.driver, std::string(64, 'd'));
+}
+
+FakeInterfaces modemOnDevice(const char* device, double dbm, const std::string& imei) {
+  FakeInterfaces modem = modemWithRsrp(dbm, imei);
+  modem.at(kModem).insert_or_assign("Device", FakeProperty(std::string(device)));
+  return modem;
+}
+
+constexpr const char* kFirstDevice = "/sys/devices/usb1/1-2";
+constexpr const char* kSecondDevice = "/sys/devices/usb1/1-3";
+constexpr const char* kFirstImei = "350000000000011";
+
+struct TwoModems : ModemWorld {
+  explicit TwoModems(const ModemWish& wish) : ModemWorld(wish) {
+    manager->add(pathOf(0), modemOnDevice(kFirstDevice, -80, kFirstImei));
+    manager->add(pathOf(1), modemOnDevice(kSecondDevice, -70, "350000000000029"));
+  }
+};
+
+TEST(ModemOfAPort, IsTheOneOnThePortsDevice) {
+  TwoModems world({"", "", [] { return std::string(kSecondDevice); }});
+  world.start();
+  EXPECT_TRUE(world.waitForRsrp(-70));
+}
+
+TEST(ModemOfAPort, IsANamedOneOnThePortsDeviceAlone) {
+  for (ModemWish wish : {ModemWish{kFirstImei, "", {}}, ModemWish{"", pathOf(0), {}}}) {
+    std::atomic<bool> isOther = true;
+    wish.device = [&] { return std::string(isOther ? kSecondDevice : kFirstDevice); };
+    TwoModems world(wish);
+    const auto log = std::make_shared<ConditionLog>();
+    world.source->start(log, world.listeners);
+    ASSERT_TRUE(log->waitFor("No modem: the chosen one is not there"));
+    isOther = false;
+    world.start();
+    EXPECT_TRUE(world.waitForRsrp(-80));
+  }
 }
 
 }  // namespace
