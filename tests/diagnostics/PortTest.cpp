@@ -128,6 +128,15 @@ TEST(TerminalPort, SaysThatAnotherHoldsIt) {
   const int other = ::open(modem.path().c_str(), O_RDWR | O_NOCTTY);
   ASSERT_EQ(::ioctl(other, TIOCEXCL), 0);
   EXPECT_EQ(triedByNobody(modem.path()), Kind::held);
+  EXPECT_EQ(Reading(modem.path()).trouble.kind, Kind::held);  // of root, too
+  ::close(other);
+}
+
+TEST(TerminalPort, IsFreeForOthersAfterwards) {
+  PseudoModem modem;
+  const int other = ::open(modem.path().c_str(), O_RDWR | O_NOCTTY);
+  ASSERT_TRUE(Reading(modem.path()).port);
+  EXPECT_TRUE(Reading(modem.path()).port);
   ::close(other);
 }
 
@@ -179,6 +188,17 @@ TEST(RouterPort, SkipsAMessageThatIsTooLong) {
   ASSERT_TRUE(reading.receiveUntil(2));
   EXPECT_EQ(reading.packets[1], everyByte());
   EXPECT_EQ(reading.port->counts().badFrames, 1U);
+}
+
+TEST(RouterPort, SkipsAnEmptyMessage) {
+  FakeRouter router;
+  Reading reading(router.address());
+  ASSERT_TRUE(reading.port->send(Request::eventsOff()));
+  ASSERT_TRUE(reading.receiveUntil(1));
+  router.send(Bytes());
+  router.send(everyByte());
+  ASSERT_TRUE(reading.receiveUntil(2));
+  EXPECT_EQ(reading.packets[1], everyByte());
 }
 
 TEST(RouterPort, IsLostWithTheRouter) {

@@ -29,6 +29,12 @@ bool makeRaw(int terminal) {
   return ::tcsetattr(terminal, TCSANOW, &settings) == 0;
 }
 
+// Those who may do everything can open a terminal that another keeps to itself.
+bool isKept(int terminal) {
+  int kept = 0;
+  return ::ioctl(terminal, TIOCGEXCL, &kept) == 0 && kept != 0;
+}
+
 }  // namespace
 
 std::unique_ptr<DiagPort> DevicePort::open(const std::string& path, PortTrouble& trouble) {
@@ -39,12 +45,18 @@ std::unique_ptr<DiagPort> DevicePort::open(const std::string& path, PortTrouble&
     return trouble = {PortTrouble::Kind::failed, "no device"}, nullptr;
   }
   if (::isatty(device.number()) != 0) {
+    if (isKept(device.number())) {
+      return trouble = {PortTrouble::Kind::held, "held by another program"}, nullptr;
+    }
     if (!makeRaw(device.number())) return trouble = systemTrouble(errno), nullptr;
     ::ioctl(device.number(), TIOCEXCL);
     ::tcflush(device.number(), TCIOFLUSH);
   }
   return std::make_unique<DevicePort>(std::move(device));
 }
+
+// A terminal that another has open as well would stay shut behind us.
+DevicePort::~DevicePort() { ::ioctl(descriptor(), TIOCNXCL); }
 
 bool DevicePort::receive(const FrameReader::Take& take) {
   std::array<std::uint8_t, kMostBytesOfATurn> bytes;

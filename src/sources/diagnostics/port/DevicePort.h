@@ -16,6 +16,7 @@ class DevicePort final : public DiagPort {
   static std::unique_ptr<DiagPort> open(const std::string& path, PortTrouble& trouble);
 
   explicit DevicePort(Descriptor device) : _device(std::move(device)) {}
+  ~DevicePort() override;
 
   int descriptor() const override { return _device.number(); }
   bool receive(const FrameReader::Take& take) override;

@@ -1,5 +1,6 @@
 #include "sources/diagnostics/port/RouterPort.h"
 
+#include <poll.h>
 #include <sys/socket.h>
 #include <sys/un.h>
 
@@ -35,14 +36,20 @@ bool RouterPort::receive(const FrameReader::Take& take) {
   for (int i = 0; i < kMostPacketsOfATurn; ++i) {
     const ssize_t count = ::recv(descriptor(), _buffer.data(), _buffer.size(), MSG_TRUNC);
     if (count < 0) return errno == EAGAIN || errno == EINTR;
-    if (count == 0) return false;
+    if (count == 0 && hasEnded()) return false;
     const auto length = static_cast<std::size_t>(count);
     _counts.bytes += length;
-    const bool isWhole = length <= _buffer.size();
+    const bool isWhole = length > 0 && length <= _buffer.size();
     ++(isWhole ? _counts.frames : _counts.badFrames);
     if (isWhole) take(ByteView(_buffer).first(length));
   }
   return true;
+}
+
+// An empty message reads like the end.
+bool RouterPort::hasEnded() const {
+  pollfd socket{descriptor(), POLLRDHUP, 0};
+  return ::poll(&socket, 1, 0) != 0;
 }
 
 bool RouterPort::send(const Request& request) {

@@ -11,7 +11,7 @@
 namespace qel::diagnostics {
 
 // A packet is a message: no frames. What one client sets holds for all, and the modem's answers go
-// to all. A message longer than a frame may be is skipped.
+// to all. A message longer than a frame may be is skipped, as is an empty one.
 class RouterPort final : public DiagPort {
  public:
   // An abstract socket; "@NAME" stands for NAME with zeros up to the end of the address.
@@ -27,6 +27,8 @@ class RouterPort final : public DiagPort {
 
  private:
   static constexpr std::size_t kBufferBytes = FrameReader::kLongestFrame;
+
+  bool hasEnded() const;
 
   Descriptor _socket;
   std::vector<std::uint8_t> _buffer;
