@@ -107,6 +107,17 @@ TEST(Request, KnowsEveryRefusal) {
   EXPECT_EQ(Request::logsOff().answerIn(ofAnother), Answer::none);
 }
 
+TEST(Request, TakesARefusalThatDoesNotTellTheOperationForAnothers) {
+  const Request ranges = Request::logRanges();
+  for (std::size_t echoed = 1; echoed <= 8; ++echoed) {
+    const ByteView echo = ranges.packet().first(echoed);
+    const Answer expected = echoed == 8 ? Answer::refused : Answer::none;
+    const Bytes refusal = BodyWriter().u8(0x14).bytes(echo);
+    EXPECT_EQ(ranges.answerIn(refusal), expected) << echoed;
+  }
+  EXPECT_EQ(Request::eventsOn().answerIn(Bytes{0x13, 0x60}), Answer::none);
+}
+
 TEST(Request, TakesABadStatusForARefusal) {
   const Bytes answer = BodyWriter().u8(0x73).zeros(3).u32(3).u32(2);
   EXPECT_EQ(Request::setLogMask(LogMask(11, 8)).answerIn(answer), Answer::refused);

@@ -53,10 +53,14 @@ void append(Bytes& bytes, std::initializer_list<std::uint32_t> words) {
 
 void append(Bytes& bytes, ByteView more) { bytes.insert(bytes.end(), more.begin(), more.end()); }
 
+// A router hands over the refusals of others' requests too: the command alone does not tell them
+// apart where it has operations.
 bool isRefusalOf(ByteView packet, ByteView request) {
   if (packet.size() < 2 || std::ranges::count(kRefusals, packet[0]) == 0) return false;
   const ByteView echo = packet.subspan(1);
   const std::size_t length = std::min(echo.size(), request.size());
+  const std::size_t least = request[0] == kLogConfiguration ? kOperationOffset + 4 : 2;
+  if (length < std::min(least, request.size())) return false;
   return std::ranges::equal(echo.first(length), request.first(length));
 }
 
