@@ -59,7 +59,7 @@ std::unique_ptr<EventSource> make(const DiagnosticsPlace& choice, SourceError& e
 // Of several modems ModemManager's is the one whose port it is.
 std::unique_ptr<EventSource> make(const CombinedChoice& choice, SourceError&, WaitClock&) {
   auto port = std::make_shared<diagnostics::DiagnosticsSource>(
-      diagnostics::DiagnosticsChoice{choice.port.place, choice.port.radio});
+      diagnostics::DiagnosticsChoice{choice.port.place, choice.port.radio, choice.isPortMissed});
   auto deviceOfPort = [held = std::weak_ptr(port)] {
     const auto source = held.lock();
     return source ? source->modem() : std::string();

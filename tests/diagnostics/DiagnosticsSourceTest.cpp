@@ -41,11 +41,12 @@ class DiagnosticsSourceTest : public ::testing::Test {
   }
   ~DiagnosticsSourceTest() override { source.reset(); }
 
-  DiagnosticsSource& begin(const std::string& wish = "") {
+  DiagnosticsSource& begin(const std::string& wish = "", bool isMissed = true) {
     DiagnosticsWorld world;
     world.search = [ports = ports] { return std::make_unique<test::PlayedSearch>(ports); };
     world.asleep = [this] { return std::chrono::milliseconds{asleepMs}; };
-    source = std::make_unique<DiagnosticsSource>(DiagnosticsChoice{wish, 1}, world, timing);
+    source =
+        std::make_unique<DiagnosticsSource>(DiagnosticsChoice{wish, 1, isMissed}, world, timing);
     source->start(log, listeners);
     return *source;
   }
@@ -138,6 +139,20 @@ TEST_F(DiagnosticsSourceTest, WaitsForAPort) {
   PseudoModem modem;
   ports->set({{modem.path(), kUsb}});
   EXPECT_TRUE(log->waitForState("searching"));
+}
+
+TEST_F(DiagnosticsSourceTest, SaysInTheLogThatThereIsNoPortWhenOneIsMissed) {
+  begin();
+  EXPECT_TRUE(comesTrue([&] { return !system.lines().empty(); }));
+  EXPECT_THAT(system.lines().at(0), HasSubstr("no diagnostics port found"));
+}
+
+TEST_F(DiagnosticsSourceTest, SaysNoWordOfAPortThatIsOnlyWelcome) {
+  begin("", false);
+  ASSERT_TRUE(log->waitForState("no-port"));
+  ports->set({{"/dev/a-port-that-only-udev-sees", kUsb}});  // what is wrong with one is said
+  ASSERT_TRUE(comesTrue([&] { return !system.lines().empty(); }));
+  EXPECT_THAT(system.lines().at(0), HasSubstr("a-port-that-only-udev-sees"));
 }
 
 TEST_F(DiagnosticsSourceTest, SaysThatADeviceIsHiddenFromTheService) {

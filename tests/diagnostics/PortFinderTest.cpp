@@ -1,8 +1,10 @@
 #include "sources/diagnostics/port/PortFinder.h"
 
 #include <gtest/gtest.h>
+#include <unistd.h>
 
 #include <cstdlib>
+#include <filesystem>
 #include <vector>
 
 #include "sources/diagnostics/DiagnosticsCondition.h"
@@ -60,6 +62,8 @@ TEST(PortFinder, TakesTheWishedPortAlone) {
   Finding without("/dev/gone");
   without.ports->set({{other.path(), kOther}});
   EXPECT_EQ(without.opened(), "");
+  EXPECT_EQ(without.finder.port().address, "/dev/gone");
+  EXPECT_EQ(without.finder.trouble().words, "No such file or directory");
 }
 
 TEST(PortFinder, TakesAPortThatNobodyKnowsWhenItIsWished) {
@@ -88,6 +92,30 @@ TEST(PortFinder, FollowsTheModemWhenAnotherHasTakenItsName) {
   ASSERT_EQ(finding.opened(), first.path());
   finding.ports->set({{first.path(), kOther}, {second.path(), kModem}});
   EXPECT_EQ(finding.opened(), second.path());
+}
+
+TEST(PortFinder, KnowsOtherPortsFromOtherNews) {
+  Finding finding;
+  finding.ports->set({{"/dev/gone", kOther}});
+  EXPECT_EQ(finding.opened(), "");
+  finding.ports->set({{"/dev/gone", kOther}});
+  EXPECT_FALSE(finding.finder.hasChanged());
+  PseudoModem modem;
+  finding.ports->set({{"/dev/gone", kOther}, {modem.path(), kModem}});
+  EXPECT_TRUE(finding.finder.hasChanged());
+  EXPECT_EQ(finding.opened(), modem.path());
+}
+
+TEST(PortFinder, KnowsWhenAWishedPortComesThatNobodyLists) {
+  const PseudoModem modem;
+  const std::string path = ::testing::TempDir() + "qel-port-" + std::to_string(::getpid());
+  Finding finding(path);
+  ASSERT_EQ(finding.opened(), "");
+  EXPECT_FALSE(finding.finder.hasChanged());
+  std::filesystem::create_symlink(modem.path(), path);
+  EXPECT_TRUE(finding.finder.hasChanged());
+  EXPECT_EQ(finding.opened(), path);
+  std::filesystem::remove(path);
 }
 
 TEST(PortFinder, SaysWhyThereIsNone) {

@@ -44,6 +44,7 @@ DiagnosticsSource::Run::Run(const DiagnosticsChoice& choice, const DiagnosticsWo
       _metrics(choice.radio, timing.period,
                [this](const sources::SourceEvent& event) { hand(event); }),
       _wish(choice.port),
+      _isMissed(choice.isMissed || !choice.port.empty()),
       _generation(_listeners->generation()) {}
 
 void DiagnosticsSource::Run::stop() {
@@ -57,6 +58,7 @@ void DiagnosticsSource::Run::play() {
   bool isFirst = true;
   auto pause = _timing.firstPause;
   while (!_stopping) {
+    auto longest = _timing.longestPause;
     if (const auto port = finder.open()) {
       {
         const std::lock_guard lock(_factsMutex);
@@ -69,24 +71,30 @@ void DiagnosticsSource::Run::play() {
       rest(_timing.ending);  // a run before this one may just be leaving it
     } else {
       report(conditionWithoutPort(finder.trouble()));
-      say(adviceWithoutPort(finder.port(), finder.trouble()));
+      const bool isAbsent = finder.trouble().kind == PortTrouble::Kind::absent;
+      if (_isMissed || !isAbsent) say(adviceWithoutPort(finder.port(), finder.trouble()));
+      if (isAbsent && finder.descriptor() >= 0) longest = _timing.longestPauseWhenTold();
     }
     if (_stopping) break;
     isFirst = false;
     const auto end = Clock::now() + pause;
-    pause = std::min(pause * 2, _timing.longestPause);
-    // A device may come at any time; udev needs a moment for it.
-    while (!_stopping && Clock::now() < end) {
-      std::array<pollfd, 2> waited{pollfd{_wakeUp.descriptor(), POLLIN, 0},
-                                   pollfd{finder.descriptor(), POLLIN, 0}};
-      ::poll(waited.data(), waited.size(), timeoutUntil(end));
-      _wakeUp.clear();
-      if (waited[1].revents == 0) continue;
-      rest(_timing.firstPause);
-      pause = _timing.firstPause;
-      break;
-    }
+    pause = std::min(pause * 2, longest);
+    if (waitForPorts(finder, end)) pause = _timing.firstPause;
   }
+}
+
+// Whether there are others before the end. What else udev does is no reason to try again.
+bool DiagnosticsSource::Run::waitForPorts(PortFinder& finder, Clock::time_point end) {
+  while (!_stopping && Clock::now() < end) {
+    std::array<pollfd, 2> waited{pollfd{_wakeUp.descriptor(), POLLIN, 0},
+                                 pollfd{finder.descriptor(), POLLIN, 0}};
+    ::poll(waited.data(), waited.size(), timeoutUntil(end));
+    _wakeUp.clear();
+    if (waited[1].revents == 0) continue;
+    rest(_timing.firstPause);  // udev needs a moment for a device
+    if (finder.hasChanged()) return true;
+  }
+  return false;
 }
 
 bool DiagnosticsSource::Run::live(DiagPort& port) {

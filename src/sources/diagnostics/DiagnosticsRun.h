@@ -37,6 +37,7 @@ class DiagnosticsSource::Run {
   // Whether logs came to be on.
   bool live(DiagPort& port);
   void turn(DiagPort& port, DiagnosticsSession& session);
+  bool waitForPorts(PortFinder& finder, Clock::time_point end);
   void wait(const DiagPort& port, const DiagnosticsSession& session);
   void noticeListeners();
   void noticeSleep(DiagnosticsSession& session);
@@ -60,6 +61,7 @@ class DiagnosticsSource::Run {
 
   // The thread only.
   const std::string _wish;
+  const bool _isMissed;
   std::uint64_t _generation;
   bool _anyoneListens = true;  // until an event goes nowhere
   bool _readable = false;

@@ -19,6 +19,8 @@ struct DiagnosticsTiming {
   std::chrono::milliseconds period{5000};  // from report to report of a metric that stays
   std::chrono::milliseconds firstPause{250};
   std::chrono::milliseconds longestPause{10000};
+  // Where there is no port, and the system tells of one that comes.
+  std::chrono::milliseconds longestPauseWhenTold() const { return 6 * longestPause; }
   std::chrono::milliseconds ending{500};  // the modem has that long to hear that logs are off
   SessionTiming session;
 };

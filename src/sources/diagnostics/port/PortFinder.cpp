@@ -1,5 +1,7 @@
 #include "sources/diagnostics/port/PortFinder.h"
 
+#include <unistd.h>
+
 #include <algorithm>
 
 namespace qel::diagnostics {
@@ -29,7 +31,9 @@ std::unique_ptr<DiagPort> PortFinder::open() {
   const std::vector<FoundPort> known = _search->ports();
   _port = {_wish, ""};
   _trouble = {Kind::absent, "none was found"};
-  for (const FoundPort& candidate : candidates(known)) {
+  const std::vector<FoundPort> tried = candidates(known);
+  _tried = look(tried);
+  for (const FoundPort& candidate : tried) {
     PortTrouble trouble;
     if (auto port = openPort(candidate.address, trouble)) {
       _port = candidate;
@@ -41,11 +45,26 @@ std::unique_ptr<DiagPort> PortFinder::open() {
     if (trouble.kind == Kind::absent && isKnown) {
       trouble = {Kind::denied, "its device is hidden from this program"};
     }
-    if (weightOf(trouble.kind) <= weightOf(_trouble.kind)) continue;
+    const bool isWished = candidate.address == _wish && _trouble.kind == Kind::absent;
+    if (!isWished && weightOf(trouble.kind) <= weightOf(_trouble.kind)) continue;
     _port = candidate;
     _trouble = trouble;
   }
   return nullptr;
+}
+
+bool PortFinder::hasChanged() {
+  _search->clear();
+  return look(candidates(_search->ports())) != _tried;
+}
+
+std::vector<PortFinder::Sight> PortFinder::look(const std::vector<FoundPort>& ports) {
+  std::vector<Sight> sights;
+  for (const FoundPort& port : ports) {
+    const bool isRouter = port.address.starts_with('@');
+    sights.push_back({port, isRouter || ::access(port.address.c_str(), R_OK | W_OK) == 0});
+  }
+  return sights;
 }
 
 std::vector<FoundPort> PortFinder::candidates(std::vector<FoundPort> ports) {

@@ -26,14 +26,23 @@ class PortFinder {
 
   // To be waited for while there is no port; -1 when nothing tells.
   int descriptor() const { return _search->descriptor(); }
-  void clear() { _search->clear(); }
+  // Clears it: whether there are other ports now than open() has tried, or rights to others.
+  bool hasChanged();
 
  private:
+  struct Sight {
+    FoundPort port;
+    bool isAllowed;  // always true of a router
+
+    friend bool operator==(const Sight&, const Sight&) = default;
+  };
+  static std::vector<Sight> look(const std::vector<FoundPort>& ports);
   // What to try, in order, of the ports that are known.
   std::vector<FoundPort> candidates(std::vector<FoundPort> ports);
 
   const std::string _wish;
   const std::unique_ptr<PortSearch> _search;
+  std::vector<Sight> _tried;
   std::string _modem;  // of the port that was open last
   FoundPort _port;
   PortTrouble _trouble;
