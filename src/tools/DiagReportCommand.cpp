@@ -13,8 +13,8 @@
 #include "sources/SourceError.h"
 #include "sources/diagnostics/PacketTable.h"
 #include "sources/diagnostics/files/RawLog.h"
+#include "sources/diagnostics/port/PortFinder.h"
 #include "sources/diagnostics/port/PortName.h"
-#include "sources/diagnostics/port/PortSearch.h"
 #include "sources/diagnostics/session/DiagnosticsSession.h"
 #include "tools/Commands.h"
 #include "tools/PacketReport.h"
@@ -49,21 +49,13 @@ diagnostics::FrameReader::Counts readFile(const std::string& path, PacketReport&
 }
 
 std::unique_ptr<diagnostics::DiagPort> openPort(const std::string& wished) {
-  std::string address = wished;
-  if (address.empty()) {
-    const auto ports = diagnostics::makeUdevPortSearch()->ports();
-    if (ports.empty()) throw ToolError(EX_NOINPUT, "no diagnostics port found");
-    address = ports.front().address;
-  }
-  diagnostics::PortTrouble trouble;
-  auto port = diagnostics::openPort(address, trouble);
-  if (port) return port;
-  if (wished.empty() && trouble.kind == diagnostics::PortTrouble::Kind::absent) {
-    throw ToolError(EX_NOINPUT, "no diagnostics port found");
-  }
-  const bool isHeld = trouble.kind == diagnostics::PortTrouble::Kind::held;
+  diagnostics::PortFinder finder(wished, diagnostics::makeUdevPortSearch());
+  if (auto port = finder.open()) return port;
+  const std::string& address = finder.port().address;
+  if (address.empty()) throw ToolError(EX_NOINPUT, "no diagnostics port found");
+  const bool isHeld = finder.trouble().kind == diagnostics::PortTrouble::Kind::held;
   throw ToolError(EX_NOINPUT, address,
-                  trouble.words + (isHeld ? " (does the service listen there?)" : ""));
+                  finder.trouble().words + (isHeld ? " (does the service listen there?)" : ""));
 }
 
 // Until then, a signal or the end of the session.

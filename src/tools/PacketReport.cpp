@@ -13,12 +13,16 @@ namespace {
 
 using diagnostics::PacketCounts;
 
-constexpr unsigned kMostRadios = 16;
+// There are no modems of more radios: such a packet is damaged.
+bool isCounted(unsigned radio) {
+  constexpr unsigned kMostRadios = 16;
+  return radio <= kMostRadios;
+}
 
 }  // namespace
 
 diagnostics::DiagnosticsReader& PacketReport::readerOf(unsigned radio) {
-  const unsigned number = std::clamp(radio, 1U, kMostRadios);
+  const unsigned number = std::max(radio, 1U);
   return _readers.try_emplace(number, number).first->second;
 }
 
@@ -29,6 +33,7 @@ void PacketReport::measure(const Kind& kind, std::size_t length) {
 }
 
 void PacketReport::log(const diagnostics::LogPacket& packet) {
+  if (!isCounted(packet.radio)) return;
   const auto* row = diagnostics::findLog(packet.code);
   const auto version = row && row->version ? row->version(packet.body) : std::nullopt;
   measure({false, packet.code, version}, packet.body.size());
@@ -36,6 +41,7 @@ void PacketReport::log(const diagnostics::LogPacket& packet) {
 }
 
 void PacketReport::event(const diagnostics::ModemEvent& event) {
+  if (!isCounted(event.radio)) return;
   measure({true, event.id, std::nullopt}, event.payload.size());
   readerOf(event.radio).take(event);
 }
