@@ -276,6 +276,24 @@ TEST(CardTrace, DoesNotTakeAnotherFileForTheOneBeforeWhoseSelectionWasLost) {
   EXPECT_FALSE(holdsSecret(heart));
 }
 
+// A status is asked for, a file is not found: whatever lies between may hide a selection.
+TEST(CardTrace, TakesAFileOnlyRightBehindItsSelection) {
+  CardTrace status;
+  status.selectUsim().select(0x6F07).ask({0x80, 0xF2, 0, 0}, {1}).read(kSecret);
+  CardTrace missing;
+  missing.selectUsim().select(0x6F07).send({0, 0xA4, 0, 4}, {0x6F, 0x7B}, 0x6A82).read(kSecret);
+  for (const CardTrace& trace : {status, missing}) {
+    Heart heart;
+    EXPECT_THAT(play(heart, trace), IsEmpty());
+    EXPECT_FALSE(holdsSecret(heart));
+  }
+  CardTrace described;
+  described.selectUsim().select(0x6F07).ask({0, 0xC0, 0, 0}, {0x62, 0}).read(kImsi);
+  Heart heart;
+  play(heart, described);
+  EXPECT_THAT(filesOf(heart), ElementsAre(Pair(0x6F07, kImsi)));
+}
+
 TEST(CardTrace, TakesAnotherCardForAnother) {
   CardTrace first;
   first.reset().select(0x2FE2).read(Bytes(10, 1)).selectUsim().select(0x6F07).read(kImsi);

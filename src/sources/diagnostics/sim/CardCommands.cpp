@@ -16,6 +16,7 @@ using Directory = CardChannel::Directory;
 enum Instruction : std::uint8_t {
   kManageChannel = 0x70,
   kSelect = 0xA4,
+  kGetResponse = 0xC0,
   kReadBinary = 0xB0,
   kReadRecord = 0xB2,
 };
@@ -30,6 +31,12 @@ struct Command {
   // Without encryption, on one of the first four channels; the old cards' class has but one.
   bool isPlain() const { return kind == kOldClass || (kind & 0xFC) == 0; }
   std::size_t channel() const { return kind == kOldClass ? 0 : kind & 3U; }
+
+  // Between a file's selection and the last read of it come its description and other reads alone.
+  bool leavesFile() const {
+    const bool reads = instruction == kReadBinary || instruction == kReadRecord;
+    return isPlain() && (reads || instruction == kGetResponse);
+  }
 
   static constexpr std::uint8_t kOldClass = 0xA0;
 
@@ -78,8 +85,8 @@ bool isTelephony(const CardChannel& channel, std::size_t number) {
 
 bool isOfRoot(std::uint32_t identifier) { return identifier >> 8 == 0x2F; }
 
-// The file that a command reads; 0 for none that is kept. What is read once more without being
-// selected again may be another file, whose selection was not seen: it is left alone.
+// The file that a command reads; 0 for none that is kept. What is read once more, or later, without
+// being selected again may be another file, whose selection was not seen: it is left alone.
 std::uint32_t fileOf(const Command& command, const CardChannel& channel) {
   const auto place = placeOf(command);
   if (!place) return 0;
@@ -219,6 +226,8 @@ void takeCommand(Picture& picture, Told& told, std::uint8_t firstStatus) {
   constexpr std::uint8_t kOldAnswerWaits = 0x9F;
   SimPicture& sim = picture.sim;
   const Command command(sim.exchange);
+  const bool isOnFirstFour = (command.kind & 0x40) == 0;
+  if (isOnFirstFour && !command.leavesFile()) sim.channels[command.channel()].file = 0;
   if (!command.isPlain()) return;
   CardChannel& channel = sim.channels[command.channel()];
   const bool done = firstStatus == kDone || firstStatus == kDoneAndMore;
