@@ -113,6 +113,19 @@ TEST(EmmMessages, ofRejectionTellTheCauseAndWhatFollows) {
   EXPECT_EQ(modem.saying(kContext)["update_status"], "EPS_STATUS_ROAMING_NOT_ALLOWED");
 }
 
+TEST(EmmMessages, ofRefusedRoamingForgetTheIdentityWhenAttachingAlone) {
+  for (const unsigned cause : {13U, 15U}) {
+    AirModem modem;
+    modem.nas(kEmmIn, attachAccept(0x49, areasValue({5}), {gutiElement({})}));
+    modem.nas(kEmmIn, updateReject(cause));
+    EXPECT_TRUE(modem.saying(kContext).contains("guti")) << cause;
+    EXPECT_EQ(modem.reader().picture().nas.emm.areas.size(), 1U);
+    modem.nas(kEmmIn, attachReject(cause));
+    EXPECT_FALSE(modem.saying(kContext).contains("guti")) << cause;
+    EXPECT_TRUE(modem.reader().picture().nas.emm.areas.empty());
+  }
+}
+
 TEST(EmmMessages, leaveTheStatusToTheModemWhereItTellsIt) {
   AirModem modem;
   modem.send(kEmmState, emmState(3, 0));

@@ -45,26 +45,28 @@ std::optional<std::int32_t> registrationOf(std::uint8_t state, std::uint32_t sub
   return std::nullopt;
 }
 
+enum class Forgets : std::uint8_t { never, whenAttaching, always };
+
 // What a refusal does to the phone's registration (24.301, clauses 5.5.1.2.5, 5.5.3.2.5, 5.6.1.5).
 struct RefusalRow {
   std::uint32_t cause;
   std::int32_t updateStatus;
-  bool forgetsIdentity;
+  Forgets identity;
   std::vector<TrackingArea> CommonPart::*forbidden;
 };
 constexpr std::array kRefusals = {
-    RefusalRow{3, kRoamingNotAllowed, true, nullptr},
-    RefusalRow{6, kRoamingNotAllowed, true, nullptr},
-    RefusalRow{7, kRoamingNotAllowed, true, nullptr},
-    RefusalRow{8, kRoamingNotAllowed, true, nullptr},
-    RefusalRow{9, kNotUpdated, true, nullptr},
-    RefusalRow{11, kRoamingNotAllowed, true, nullptr},
-    RefusalRow{12, kRoamingNotAllowed, true, &CommonPart::noServiceTracking},
-    RefusalRow{13, kRoamingNotAllowed, false, &CommonPart::noRoamingTracking},
-    RefusalRow{14, kRoamingNotAllowed, true, nullptr},
-    RefusalRow{15, kRoamingNotAllowed, false, &CommonPart::noRoamingTracking},
-    RefusalRow{25, kRoamingNotAllowed, false, nullptr},
-    RefusalRow{35, kRoamingNotAllowed, true, nullptr},
+    RefusalRow{3, kRoamingNotAllowed, Forgets::always, nullptr},
+    RefusalRow{6, kRoamingNotAllowed, Forgets::always, nullptr},
+    RefusalRow{7, kRoamingNotAllowed, Forgets::always, nullptr},
+    RefusalRow{8, kRoamingNotAllowed, Forgets::always, nullptr},
+    RefusalRow{9, kNotUpdated, Forgets::always, nullptr},
+    RefusalRow{11, kRoamingNotAllowed, Forgets::always, nullptr},
+    RefusalRow{12, kRoamingNotAllowed, Forgets::always, &CommonPart::noServiceTracking},
+    RefusalRow{13, kRoamingNotAllowed, Forgets::whenAttaching, &CommonPart::noRoamingTracking},
+    RefusalRow{14, kRoamingNotAllowed, Forgets::always, nullptr},
+    RefusalRow{15, kRoamingNotAllowed, Forgets::whenAttaching, &CommonPart::noRoamingTracking},
+    RefusalRow{25, kRoamingNotAllowed, Forgets::never, nullptr},
+    RefusalRow{35, kRoamingNotAllowed, Forgets::always, nullptr},
 };
 
 // Where the phone is when a network refuses it.
@@ -144,7 +146,8 @@ void takeReject(const EmmMessage& message, Picture& picture, Told& told) {
   const auto row = std::ranges::find(kRefusals, message.cause.value_or(0), &RefusalRow::cause);
   if (row == kRefusals.end()) return;
   emm.updateStatus = row->updateStatus;
-  if (row->forgetsIdentity) {
+  const bool attaching = message.type == EmmType::attachReject;
+  if (row->identity == Forgets::always || (row->identity == Forgets::whenAttaching && attaching)) {
     emm.identity.reset();
     emm.areas.clear();
   }
