@@ -88,5 +88,18 @@ TEST(LteOverTheAir, withAMessageThatEndsEarlyIsDamaged) {
   EXPECT_EQ(modem.damaged(), 1U);
 }
 
+TEST(LteOverTheAir, ofACellThatCannotBeIsDamaged) {
+  AirModem modem;
+  const auto isDamaged = [&](const AirCell& cell) {
+    const auto before = modem.damaged();
+    return modem.air(AirChannel::ulCcch, connectionRequest(3), cell).empty() &&
+           modem.damaged() == before + 1;
+  };
+  EXPECT_TRUE(isDamaged({.earfcn = 1300, .pci = 504}));
+  EXPECT_TRUE(isDamaged({.earfcn = 262144, .pci = 185}));
+  EXPECT_EQ(modem.reader().picture().lte.camped, std::nullopt);
+  EXPECT_FALSE(isDamaged({.earfcn = 262143, .pci = 503}));
+}
+
 }  // namespace
 }  // namespace qel::diagnostics

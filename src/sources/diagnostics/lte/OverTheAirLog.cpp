@@ -2,6 +2,7 @@
 
 #include "rrc/lte/Messages.h"
 #include "sources/diagnostics/lte/Configuration.h"
+#include "sources/diagnostics/lte/LevelCheck.h"
 #include "sources/diagnostics/lte/OverTheAir.h"
 #include "sources/diagnostics/lte/Reported.h"
 #include "sources/diagnostics/lte/RrcStates.h"
@@ -32,6 +33,7 @@ Outcome readLteOverTheAir(const LogPacket& packet, Picture& picture, Told& told)
   const OverTheAir air = overTheAir(packet.body);
   if (air.outcome != Outcome::understood) return air.outcome;
   if (!isRead(air.channel)) return Outcome::notOurs;
+  if (!isCell(air.cell)) return Outcome::damaged;
   const auto message = rrc::readLteMessage(air.channel, air.message);
   if (!message) return Outcome::damaged;
   if (air.channel == LteChannel::bcchDlSch) {
