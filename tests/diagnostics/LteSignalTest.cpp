@@ -188,6 +188,13 @@ TEST(LteMeasurement, ofAnUnknownVersionIsReadByAKnownLayoutThatFits) {
   }
 }
 
+TEST(LteMeasurement, ofAKnownVersionThatDoesNotFitIsReadByOneThatDoes) {
+  LteModem modem;
+  EXPECT_EQ(modem.send(kMeasurement, lteMeasurementCalled(4, 40, 5780, {kCell})),
+            (Metrics{kReceivers, kSamples}));
+  EXPECT_EQ(modem.reader().picture().lte.signal->antennas[0]->rsrpDbm, -108);
+}
+
 TEST(LteMeasurement, ofAnUnknownVersionThatNoLayoutFitsTellsNothing) {
   WrittenLteCell cell = kCell;
   cell.antennas[0].rsrqDb -= 1;

@@ -59,8 +59,12 @@ JudgedCells readJudged(const LogPacket& packet, std::uint8_t id,
   const Subpacket part = findSubpacket(packet.body, id);
   if (part.outcome != Outcome::understood) return {part.outcome, {}};
   const Layout* layout = findLayout(packet.code, id, part.version);
-  return layout ? readKnown(*layout, part.data, agrees)
-                : readUnknown(layoutsOf(packet.code, id), part.version, part.data, agrees);
+  const JudgedCells known =
+      layout ? readKnown(*layout, part.data, agrees) : JudgedCells{Outcome::unknownVersion, {}};
+  if (known.outcome == Outcome::understood) return known;
+  // Some modems write another layout under the number of one that is known.
+  JudgedCells tried = readUnknown(layoutsOf(packet.code, id), part.version, part.data, agrees);
+  return tried.outcome == Outcome::understood ? tried : known;
 }
 
 }  // namespace qel::diagnostics
