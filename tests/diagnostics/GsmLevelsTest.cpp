@@ -243,6 +243,14 @@ TEST(GsmNeighbours, AreGoneWhenNotMeasuredForHalfAMinute) {
   EXPECT_EQ(report.gsmNcellMeas()[0]->arfcn(), 6U);
 }
 
+TEST(GsmNeighbours, AreGoneWhenTheClockIsSetBack) {
+  Heart heart;
+  heart.take(0x507B, BodyWriter().u8(1).u16(5).u16(sixteenths(-70)));
+  heart.timeMs -= 31'000;
+  heart.take(0x507B, Bytes{0});
+  EXPECT_TRUE(heart.picture().gsm.neighbours->empty());
+}
+
 TEST(GsmNeighbours, AreSixtyFourAtMost) {
   Heart heart;
   for (std::uint32_t arfcn = 1; arfcn <= 100; ++arfcn) {
@@ -276,6 +284,20 @@ TEST(GsmReselection, TellsServingCellAndNeighboursBehindEitherHead) {
   }
   Heart heart;
   heart.take(0x51FC, reselection(27));
+  EXPECT_EQ(heart.counts().damaged, 1U);
+}
+
+TEST(GsmReselection, HasNoLevelsThatAreNone) {
+  constexpr std::size_t kHeadBytes = 26;
+  Bytes body = reselection(kHeadBytes);
+  body[kHeadBytes + 5] = 64;
+  Heart heart;
+  heart.take(0x51FC, body);
+  const auto report = heart.report<KCellularGsmGrrEventMeasCr>(metric::kGsmNeighbours);
+  ASSERT_EQ(report.gsmNcellMeas().size(), 1U);
+  EXPECT_EQ(report.gsmNcellMeas()[0]->arfcn(), 8U);
+  body[5] = 64;
+  EXPECT_THAT(heart.take(0x51FC, body), IsEmpty());
   EXPECT_EQ(heart.counts().damaged, 1U);
 }
 

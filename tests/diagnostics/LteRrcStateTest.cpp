@@ -172,11 +172,13 @@ std::optional<std::uint64_t> failureCause(const AirModem& modem) {
   const auto payload = modem.reader().report(kFailure, 1);
   if (!payload) return std::nullopt;
   EXPECT_EQ((*payload)[0], 0x08);
-  EXPECT_EQ((*payload)[1], 1);
-  if (payload->size() == 2) return 255;
-  EXPECT_EQ(payload->size(), 4U);
-  EXPECT_EQ((*payload)[2], 0x10);
-  return (*payload)[3];
+  std::size_t at = 1;
+  while (((*payload)[at] & 0x80) != 0) ++at;
+  ++at;
+  if (payload->size() == at) return 255;
+  EXPECT_EQ(payload->size(), at + 2);
+  EXPECT_EQ((*payload)[at], 0x10);
+  return (*payload)[at + 1];
 }
 
 TEST(LteRadioLinkFailure, isToldByItsEvent) {
@@ -213,6 +215,22 @@ TEST(LteRadioLinkFailure, endsInIdleWhenTheNetworkRejects) {
   modem.air(AirChannel::dlCcch, reestablishmentReject());
   EXPECT_EQ(modem.saying(kState)["state"], "KLTE_RRC_STATE_IDLE");
   EXPECT_EQ(modem.saying(kState)["cause"], "KLTE_RRC_CAUSE_REL_CONN_FAIL_REEST_REJ");
+}
+
+TEST(LteRadioLinkFailure, hasItsOwnTimeAndIsNewsForHalfAMinute) {
+  AirModem modem;
+  const auto payload = [&] { return modem.reader().report(kFailure, 1'790'000'099'000); };
+  modem.setTime(1'790'000'000'000);
+  modem.sendEvent(kLinkFailureEvent, Bytes{1, 0});
+  const auto first = payload();
+  modem.wait(20'000);
+  modem.air(AirChannel::dlDcch, ciphering());
+  EXPECT_EQ(payload(), first);
+  modem.sendEvent(kLinkFailureEvent, Bytes{2, 0});
+  EXPECT_NE(payload(), first);
+  modem.wait(30'001);
+  modem.air(AirChannel::dlDcch, ciphering());
+  EXPECT_EQ(payload(), std::nullopt);
 }
 
 }  // namespace

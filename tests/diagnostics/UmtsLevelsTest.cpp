@@ -100,6 +100,15 @@ TEST(UmtsNeighbours, areForgottenWithTheCellThatTheyWereNeighboursOf) {
   EXPECT_EQ(modem.said(kSignal), "");
 }
 
+TEST(UmtsNeighbours, areForgottenWhenTheClockIsSetBack) {
+  UmtsModem modem;
+  modem.send(kRanks, umtsRanks(0, kThreeCells));
+  modem.setTime(1'780'000'000'000);
+  modem.send(0xB0FF, {});
+  EXPECT_EQ(modem.said(kNeighbours), "");
+  EXPECT_EQ(modem.said(kSignal), "");
+}
+
 TEST(UmtsGainControl, tellsTheMeanOfEachReceiversFrames) {
   UmtsModem modem;
   EXPECT_EQ(modem.send(kGainControl,

@@ -81,14 +81,18 @@ Outcome readGsmMonitoredCells(const LogPacket& packet, Picture& picture, Told& t
 Outcome readGsmReselectionLevels(const LogPacket& packet, Picture& picture, Told& told) {
   constexpr std::size_t kCellBytes = 25;
   const ByteView body = packet.body;
+  constexpr std::uint8_t kMostRxlev = 63;
+  const auto isHeard = [](ByteView cell) { return cell[5] <= kMostRxlev; };
   const auto levelDbm = [](ByteView cell) { return cell[5] - 110.5; };
   for (const std::size_t headBytes : {std::size_t{26}, std::size_t{28}}) {
     if (body.size() < headBytes) break;
     const std::size_t count = body[headBytes - 1];
     if (count > kMostCells || body.size() != headBytes + count * kCellBytes) continue;
+    if (!isHeard(body)) return Outcome::damaged;
     std::vector<GsmNeighbour> cells;
     for (std::size_t i = 0; i < count; ++i) {
       const ByteView cell = body.subspan(headBytes + i * kCellBytes, kCellBytes);
+      if (!isHeard(cell)) continue;
       cells.push_back({carrierOf(u16At(cell, 0)).arfcn, {}, levelDbm(cell), packet.timeMs});
     }
     setIdleLevel(picture, told, {levelDbm(body), carrierOf(u16At(body, 0)).arfcn, packet.timeMs});

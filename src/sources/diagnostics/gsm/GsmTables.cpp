@@ -6,6 +6,7 @@
 #include "sources/diagnostics/gsm/GsmLogs.h"
 #include "sources/diagnostics/gsm/GsmReports.h"
 #include "sources/diagnostics/packets/Twin.h"
+#include "sources/diagnostics/picture/Age.h"
 
 namespace qel::diagnostics {
 namespace {
@@ -43,13 +44,6 @@ constexpr std::array kReports = {
     ReportRow{metric::kGsmNeighbours, gsmNeighboursReport},
     ReportRow{metric::kGsmGprsConfig, gsmPacketConfigReport},
 };
-
-constexpr std::uint64_t kSignalMs = 10'000;
-constexpr std::uint64_t kNeighbourMs = 30'000;
-
-bool isOld(std::uint64_t timeMs, std::uint64_t nowMs, std::uint64_t mostMs) {
-  return nowMs > timeMs && nowMs - timeMs > mostMs;
-}
 
 }  // namespace
 

@@ -15,6 +15,7 @@
 #include "sources/diagnostics/lte/SignalLogs.h"
 #include "sources/diagnostics/lte/SignalReports.h"
 #include "sources/diagnostics/lte/SystemInformation.h"
+#include "sources/diagnostics/picture/Age.h"
 
 namespace qel::diagnostics {
 namespace {
@@ -61,13 +62,7 @@ constexpr std::array kReports = {
     ReportRow{metric::kLteCarrierAggregation, lteCarriers},
 };
 
-constexpr std::uint64_t kSignalMs = 10'000;
-constexpr std::uint64_t kNeighbourMs = 30'000;
-
-// A clock that was set backwards makes all that was before it too old.
-bool isOld(std::uint64_t timeMs, std::uint64_t nowMs, std::uint64_t limitMs) {
-  return (nowMs > timeMs ? nowMs - timeMs : timeMs - nowMs) > limitMs;
-}
+constexpr std::uint64_t kFailureMs = 30'000;  // so long a loss of the connection is news
 
 void ageSignals(LtePicture& picture, std::uint64_t nowMs) {
   const auto isOldSignal = [&](const std::optional<LteSignal>& signal) {
@@ -99,6 +94,8 @@ void age(LtePicture& picture, std::uint64_t nowMs) {
       [&](std::uint64_t timeMs) { return isOld(timeMs, nowMs, kNeighbourMs); });
   std::erase_if(picture.connection.others.cells,
                 [&](const LteOther& cell) { return isOld(cell.timeMs, nowMs, kNeighbourMs); });
+  auto& failure = picture.connection.failure;
+  if (failure && isOld(failure->timeMs, nowMs, kFailureMs)) failure.reset();
 }
 
 }  // namespace qel::diagnostics

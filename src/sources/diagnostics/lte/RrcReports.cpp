@@ -21,12 +21,13 @@ std::optional<Bytes> lteRrcState(const Picture& picture, std::uint64_t timeMs) {
   return report.data();
 }
 
-// There is no schema for it: time and cause, as its relatives begin.
-std::optional<Bytes> lteRadioLinkFailure(const Picture& picture, std::uint64_t timeMs) {
+// There is no schema for it: time and cause, as its relatives begin. The time is the failure's own,
+// by which each is told from the one before.
+std::optional<Bytes> lteRadioLinkFailure(const Picture& picture, std::uint64_t /*timeMs*/) {
   const auto& failure = picture.lte.connection.failure;
   if (!failure) return std::nullopt;
   PBDataWriter writer;
-  PBDataWriterWriteUint64Field(writer, timeMs, 1);
+  PBDataWriterWriteUint64Field(writer, failure->timeMs, 1);
   if (failure->cause) {
     PBDataWriterWriteUint32Field(writer, static_cast<std::uint32_t>(*failure->cause), 2);
   }

@@ -3,6 +3,7 @@
 #include <array>
 
 #include "sources/Metrics.h"
+#include "sources/diagnostics/picture/Age.h"
 #include "sources/diagnostics/umts/UmtsReaders.h"
 #include "sources/diagnostics/umts/UmtsReports.h"
 
@@ -27,15 +28,8 @@ constexpr std::array kReports = {
     ReportRow{metric::kUmtsNeighbours, umtsNeighbours},
 };
 
-constexpr std::uint64_t kSignalMs = 10'000;
-constexpr std::uint64_t kNeighboursMs = 30'000;
-
-bool older(std::uint64_t thenMs, std::uint64_t nowMs, std::uint64_t longestMs) {
-  return nowMs > thenMs && nowMs - thenMs > longestMs;
-}
-
 void age(std::optional<UmtsLevel>& level, std::uint64_t nowMs) {
-  if (level && older(level->timeMs, nowMs, kSignalMs)) level.reset();
+  if (level && isOld(level->timeMs, nowMs, kSignalMs)) level.reset();
 }
 
 }  // namespace
@@ -52,7 +46,7 @@ void age(UmtsPicture& picture, std::uint64_t nowMs) {
   age(picture.signal.ecnoDb, nowMs);
   for (auto& rssiDbm : picture.signal.rssiDbm) age(rssiDbm, nowMs);
   age(picture.transmitDbm, nowMs);
-  if (picture.neighbours && older(picture.neighbours->timeMs, nowMs, kNeighboursMs))
+  if (picture.neighbours && isOld(picture.neighbours->timeMs, nowMs, kNeighbourMs))
     picture.neighbours.reset();
 }
 
