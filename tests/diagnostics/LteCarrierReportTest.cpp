@@ -106,6 +106,7 @@ TEST(LteCarrierReport, areToldInShortBesideThePrimaryOne) {
 TEST(LteCarrierReport, thatAreReleasedLeaveThePrimaryOne) {
   Picture picture = withTwoCarriers();
   picture.lte.carriers.clear();
+  picture.lte.carriersTold = true;
   EXPECT_EQ(said(kComponents, picture), R"({"pcc_earfcn": 5780, "pcc_bandwidth": 3})");
   EXPECT_EQ(said(kCarriers, picture), "{}");
 }

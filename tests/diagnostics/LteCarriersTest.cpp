@@ -119,5 +119,26 @@ TEST(LteCarriers, outliveAnEventAboutTheConnectionBefore) {
   EXPECT_FALSE(modem.saying(kCarriers).contains("scc_list"));
 }
 
+TEST(LteCarriers, areNotToldInANewCellThatHasSaidNothingOfThem) {
+  AirModem modem;
+  modem.air(AirChannel::dlDcch, secondaryCells({}, {{1, 301, 700}}));
+  modem.wait(1);
+  modem.air(AirChannel::dlDcch, connectionRelease(1));
+  EXPECT_FALSE(modem.saying(kCarriers).is_null());
+  EXPECT_FALSE(modem.saying(kComponents).is_null());
+  modem.air(AirChannel::dlCcch, plainSetup(), {.earfcn = 1300, .pci = 7});
+  EXPECT_TRUE(modem.saying(kCarriers).is_null());
+  EXPECT_TRUE(modem.saying(kComponents).is_null());
+}
+
+TEST(LteCarriers, goWhenTheNetworkConfiguresEverythingAnew) {
+  AirModem modem;
+  EXPECT_EQ(modem.air(AirChannel::dlDcch, fullConfiguration()), ToldMetrics{metric::kLteRrcState});
+  modem.air(AirChannel::dlDcch, secondaryCells({}, {{1, 301, 700}}));
+  EXPECT_EQ(modem.air(AirChannel::dlDcch, fullConfiguration()),
+            (ToldMetrics{kCarriers, kComponents}));
+  EXPECT_FALSE(modem.saying(kCarriers).contains("scc_list"));
+}
+
 }  // namespace
 }  // namespace qel::diagnostics

@@ -2,7 +2,9 @@
 
 #include <gtest/gtest.h>
 
+#include "sources/Metrics.h"
 #include "support/diagnostics/LtePackets.h"
+#include "support/diagnostics/OtaPackets.h"
 
 namespace qel::diagnostics {
 namespace {
@@ -89,6 +91,22 @@ TEST(LteNewCell, endsWhatWasKnownOfTheOneBefore) {
   modem.sendEvent(kNewCell, test::lteNewCellEvent(5780, 186));
   EXPECT_EQ(modem.said(kCellInfo), "");
   EXPECT_EQ(modem.reader().picture().lte.camped, (LteCellName{5780, 186}));
+}
+
+TEST(LteNewCell, hasNeitherTheRulesNorTheLevelsOfTheOneBefore) {
+  LteModem modem;
+  modem.send(kServingCell, lteServingCell(3));
+  modem.send(0xB193, test::lteMeasurement(24, 5780, {{185, {test::heard(-108, -82, 50)}}}));
+  modem.send(0xB17F, test::lteIdleServing(5, 5780, {185, -99, -9.5}));
+  modem.send(0xB0C0, test::overTheAir(test::AirChannel::bcchDlSch, test::sib1Message({}),
+                                      {.earfcn = 5780, .pci = 185}));
+  const auto knows = [&] {
+    return std::vector{!modem.said(metric::kLteSelRes).empty(),
+                       !modem.said(metric::kLteServingMeasurement).empty()};
+  };
+  EXPECT_EQ(knows(), (std::vector{true, true}));
+  modem.sendEvent(kNewCell, test::lteNewCellEvent(5780, 186));
+  EXPECT_EQ(knows(), (std::vector{false, false}));
 }
 
 TEST(LteNewCell, ofAnotherLengthIsDamaged) {

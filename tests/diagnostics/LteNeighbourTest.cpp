@@ -206,6 +206,9 @@ TEST(LteNeighbours, areForgottenThirtySecondsAfterTheyWereMeasured) {
   const auto& known = modem.reader().picture().lte.neighbours.cells();
   ASSERT_EQ(known.size(), 1U);
   EXPECT_EQ(known[0].cell.pci, 503U);
+  modem.wait(30'001);
+  modem.send(0xB0FF, {});
+  EXPECT_EQ(modem.said(kNeighbours), "");
 }
 
 TEST(LteNeighbours, theOldestMakesRoom) {

@@ -40,6 +40,7 @@ std::string text(std::uint32_t metric, const std::optional<Bytes>& payload) {
 TEST(LteLevel, ofTheIdleCellStandsInForAnUnreadMeasurement) {
   LteModem modem;
   modem.send(kMeasurement, kUnread);
+  modem.send(kIdleServing, lteIdleServing(5, 5780, {185, -99, -9.5}));
   EXPECT_EQ(modem.send(kIdleServing, lteIdleServing(5, 5780, {185, -99, -9.5})),
             Metrics{kReceivers});
   EXPECT_EQ(modem.said(kReceivers),
@@ -49,6 +50,7 @@ TEST(LteLevel, ofTheIdleCellStandsInForAnUnreadMeasurement) {
 TEST(LteLevel, ofTheConnectedCellStandsInForAnUnreadMeasurement) {
   LteModem modem;
   modem.send(kMeasurement, kUnread);
+  modem.send(kConnectedCells, lteConnectedCells(4, 5780, {185, -99, -9.5}, {}));
   EXPECT_EQ(modem.send(kConnectedCells, lteConnectedCells(4, 5780, {185, -99, -9.5}, {})),
             Metrics{kReceivers});
   EXPECT_EQ(modem.said(kReceivers), R"({"rx_info": [{"rsrp_range": 41, "rsrq_range": 20}]})");
@@ -69,6 +71,18 @@ TEST(LteLevel, isNotToldWhereMeasurementsAreRead) {
 TEST(LteLevel, isNotToldWhereNoMeasurementCame) {
   LteModem modem;
   EXPECT_TRUE(modem.send(kIdleServing, lteIdleServing(5, 5780, {185, -99, -9.5})).empty());
+}
+
+TEST(LteLevel, standsInFromTheSecondOnWhereNoMeasurementComesOrComesAnyMore) {
+  LteModem modem;
+  const Bytes level = lteIdleServing(5, 5780, {185, -99, -9.5});
+  modem.send(kIdleServing, level);
+  EXPECT_EQ(modem.send(kIdleServing, level), Metrics{kReceivers});
+  modem.send(kMeasurement, test::lteMeasurement(24, 5780, kHeard));
+  modem.wait(6'000);
+  EXPECT_TRUE(modem.send(kIdleServing, level).empty());
+  modem.wait(6'000);
+  EXPECT_EQ(modem.send(kIdleServing, level), Metrics{kReceivers});
 }
 
 // The picture of a phone on a cell that has said who it is.

@@ -266,6 +266,8 @@ Bytes secondaryCells(const std::vector<unsigned>& removed, const std::vector<Air
   return bits.bytes();
 }
 
+Bytes fullConfiguration() { return reconfiguration(0b000001).bits(0b01, 2).bits(0b010, 3).bytes(); }
+
 Bytes handover(unsigned pci, std::uint32_t earfcn) {
   BitWriter bits = reconfiguration(0b010000);
   bits.flag(false).bits(0b1000, 4).number(pci, 0, 503).flag(false).bits(earfcn, 16);

@@ -102,6 +102,8 @@ struct AirSecondary {
 };
 Bytes secondaryCells(const std::vector<unsigned>& removed, const std::vector<AirSecondary>& added);
 
+Bytes fullConfiguration();  // instead of a change
+
 Bytes handover(unsigned pci, std::uint32_t earfcn);
 
 struct AirMeasured {

@@ -14,14 +14,14 @@ Outcome readGsmCell(const LogPacket& packet, Picture& picture, Told& told) {
   if (body.size() < kBytes) return Outcome::damaged;
   const std::uint32_t stationColour = body[2];
   const std::uint32_t networkColour = body[3];
-  GsmCamp camp;
-  camp.carrier = carrierOf(u16At(body, 0));
-  camp.cell = {locationAreaAt(body, 6), u16At(body, 4)};
-  camp.bsic = networkColour << 3 | stationColour;
+  GsmCamp own;
+  own.carrier = carrierOf(u16At(body, 0));
+  own.cell = {locationAreaAt(body, 6), u16At(body, 4)};
+  own.bsic = networkColour << 3 | stationColour;
   if (stationColour > kMostColour || networkColour > kMostColour) return Outcome::damaged;
-  if (!networkOf(camp.cell.area.plmn)) return Outcome::damaged;
-  enterCell(picture, camp.cell);
-  picture.gsm.camp = camp;
+  if (!networkOf(own.cell.area.plmn)) return Outcome::damaged;
+  camp(picture, own.cell);
+  picture.gsm.camp = own;
   told.tell(metric::kGsmScellInfo);
   return Outcome::understood;
 }

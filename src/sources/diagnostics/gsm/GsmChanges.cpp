@@ -14,15 +14,20 @@ void leaveCell(GsmPicture& picture) {
 
 }  // namespace
 
+void camp(Picture& picture, const GsmCell& cell) {
+  changeTo(picture, Technology::gsm);
+  enterCell(picture, cell);
+}
+
 void enterCell(Picture& picture, const GsmCell& cell) {
-  picture.technology = Technology::gsm;
+  if (!picture.technology) changeTo(picture, Technology::gsm);
   if (picture.gsm.cell == cell) return;
   leaveCell(picture.gsm);
   picture.gsm.cell = cell;
 }
 
 void enterArea(Picture& picture, const LocationArea& area) {
-  picture.technology = Technology::gsm;
+  if (!picture.technology) changeTo(picture, Technology::gsm);
   if (picture.gsm.cell && picture.gsm.cell->area != area) leaveCell(picture.gsm);
 }
 

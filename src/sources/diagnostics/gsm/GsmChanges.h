@@ -6,10 +6,14 @@
 
 namespace qel::diagnostics {
 
-// The phone is on that cell: what belonged to another one goes.
+// The phone is on that cell, and so on GSM: what belonged to another one goes.
+void camp(Picture& picture, const GsmCell& cell);
+
+// Likewise, by what the cell sends to all. A phone elsewhere reads that too when it looks around,
+// and stays there.
 void enterCell(Picture& picture, const GsmCell& cell);
 
-// Likewise, of a message that names the area alone.
+// The same of a message that names the area alone.
 void enterArea(Picture& picture, const LocationArea& area);
 
 // Whether it is a change; the serving cell's report tells of it.

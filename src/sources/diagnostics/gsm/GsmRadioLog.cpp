@@ -63,7 +63,7 @@ Outcome takeSystemInformation6(const Message& message, Picture& picture, Told& t
   const auto cell = readSystemInformation6(message.bytes);
   if (!cell) return Outcome::damaged;
   const bool isNew = picture.gsm.cell != cell;
-  enterCell(picture, *cell);
+  camp(picture, *cell);
   if (isNew) told.tell(metric::kGsmScellInfo);
   return Outcome::understood;
 }

@@ -79,6 +79,7 @@ std::optional<Bytes> gsmCellReport(const Picture& picture, std::uint64_t timeMs)
 
 std::optional<Bytes> gsmIdleConfigReport(const Picture& picture, std::uint64_t timeMs) {
   const GsmPicture& gsm = picture.gsm;
+  if (!gsm.cell && gsm.broadcast == GsmBroadcast{}) return std::nullopt;
   KCellularGsmIdleConfig message;
   message.setTimestamp(timeMs);
   if (const GsmCamp* camp = gsm.ownCamp()) {

@@ -37,7 +37,7 @@ Outcome readLteServingCell(const LogPacket& packet, Picture& picture, Told& told
   const Outcome outcome = readWhole(packet, [&](const Reading& reading) {
     const LteServingCell cell = servingCellOf(reading.head);
     if (!canBe(cell)) return Outcome::damaged;
-    picture.technology = Technology::lte;
+    changeTo(picture, Technology::lte);
     picture.lte.serving = cell;
     picture.lte.measureFrom(cell.name);
     told.tell(metric::kLteScellInfo);

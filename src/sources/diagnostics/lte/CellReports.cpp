@@ -95,6 +95,9 @@ void addBroadcast(const LteRules& rules, const std::optional<LteBroadcast>& band
   }
 }
 
+// That there are none is told as well, once the network has said so in that cell.
+bool knowsCarriers(const LtePicture& lte) { return lte.carriersTold || !lte.carriers.empty(); }
+
 }  // namespace
 
 std::optional<Bytes> lteCell(const Picture& picture, std::uint64_t timeMs) {
@@ -119,6 +122,7 @@ std::optional<Bytes> lteCell(const Picture& picture, std::uint64_t timeMs) {
 std::optional<Bytes> lteNeighbours(const Picture& picture, std::uint64_t timeMs) {
   KCellularLteNbrEutraCellMeas message;
   message.setTimestamp(timeMs);
+  bool any = false;
   for (const LteNeighbour& neighbour : picture.lte.neighbours.cells()) {
     if (neighbour.cell == picture.lte.measuredFrom) continue;
     auto entry = std::make_shared<EgwErrcNbrEutraMeas>();
@@ -130,11 +134,13 @@ std::optional<Bytes> lteNeighbours(const Picture& picture, std::uint64_t timeMs)
     set(*entry, &EgwErrcNbrEutraMeas::setNbrRsrp, neighbour.rsrpDbm, sources::rsrpIndex);
     set(*entry, &EgwErrcNbrEutraMeas::setNbrRsrq, neighbour.rsrqDb, sources::rsrqIndex);
     message.addMeasNbrEutra(entry);
+    any = true;
   }
-  return message.data();
+  return any ? std::optional(message.data()) : std::nullopt;
 }
 
 std::optional<Bytes> lteCarriers(const Picture& picture, std::uint64_t timeMs) {
+  if (!knowsCarriers(picture.lte)) return std::nullopt;
   KCellularLteCarrierAggregationStatus message;
   message.setTimestamp(timeMs);
   for (const SecondaryCarrier& carrier : picture.lte.carriers) message.addSccList(entryOf(carrier));
@@ -143,6 +149,7 @@ std::optional<Bytes> lteCarriers(const Picture& picture, std::uint64_t timeMs) {
 
 std::optional<Bytes> lteComponents(const Picture& picture, std::uint64_t timeMs) {
   const LtePicture& lte = picture.lte;
+  if (!knowsCarriers(lte)) return std::nullopt;
   KCellularLteComponentCarrierInfo message;
   message.setTimestamp(timeMs);
   if (lte.camped) message.setPccEarfcn(lte.camped->earfcn);

@@ -55,6 +55,8 @@ SecondaryCarrier carrierOf(const SecondaryCell& cell) {
 void takeCarriers(const Reconfiguration& change, Picture& picture, Told& told) {
   constexpr std::size_t kMost = 31;  // indices (36.331, clause 6.4)
   auto& carriers = picture.lte.carriers;
+  const bool had = !carriers.empty();
+  if (change.fullConfiguration) carriers.clear();
   for (const unsigned index : change.removedSecondaryCells) {
     std::erase_if(carriers, [&](const SecondaryCarrier& known) { return known.index == index; });
   }
@@ -67,7 +69,9 @@ void takeCarriers(const Reconfiguration& change, Picture& picture, Told& told) {
     }
   }
   std::ranges::sort(carriers, {}, &SecondaryCarrier::index);
-  if (change.removedSecondaryCells.empty() && change.secondaryCells.empty()) return;
+  const bool isReleased = change.fullConfiguration && had;
+  if (!isReleased && change.removedSecondaryCells.empty() && change.secondaryCells.empty()) return;
+  picture.lte.carriersTold = true;
   told.tell(metric::kLteCarrierAggregation);
   told.tell(metric::kLteComponentCarriers);
 }

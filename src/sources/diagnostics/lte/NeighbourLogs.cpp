@@ -38,8 +38,9 @@ Outcome readListed(const LogPacket& packet, std::uint8_t part, Picture& picture,
 void noteLevel(const Reading& reading, std::uint64_t timeMs, LtePicture& lte, Told& told) {
   const Values& head = reading.head;
   if (!isLikely(head[Field::rsrp], head[Field::rsrq])) return;
+  const bool isFirst = !lte.level;  // then such a log may only be on its way
   lte.level = LteLevel{head[Field::rsrp], head[Field::rsrq], head.find(Field::rssi), timeMs};
-  if (lte.signalLog == LteLogState::isUnread) told.tell(metric::kLteServingMeasurement);
+  if (!lte.signal && !isFirst) told.tell(metric::kLteServingMeasurement);
 }
 
 // Nothing when one of them cannot be a cell: then the packet is something else. A cell that the

@@ -42,12 +42,12 @@ bool takeSecondary(const JudgedCell& cell, std::uint64_t timeMs, LtePicture& lte
 Outcome readLteMeasurement(const LogPacket& packet, Picture& picture, Told& told) {
   const JudgedCells judged = readJudged(packet, kServingCellResult, serverAgrees);
   LtePicture& lte = picture.lte;
-  follow(lte.signalLog, judged.outcome);
   if (judged.outcome != Outcome::understood) return judged.outcome;
   if (const JudgedCell* primary = primaryOf(judged.cells)) {
-    lte.signal = LteSignal{primary->name, primary->antennas, packet.timeMs};
+    // Phones elsewhere measure cells here too.
+    if (!picture.technology) changeTo(picture, Technology::lte);
     lte.measureFrom(primary->name);
-    if (!picture.technology) picture.technology = Technology::lte;
+    lte.signal = LteSignal{primary->name, primary->antennas, packet.timeMs};
     told.tell(metric::kLteServingMeasurement);
     told.tell(metric::kLteRsrpRsrqSinr);
   }

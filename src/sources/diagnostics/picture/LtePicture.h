@@ -23,11 +23,11 @@ struct LtePicture {
   std::optional<LteBroadcast> broadcast;
   std::optional<LteSignal> signal;  // of the primary carrier
   std::optional<LteLevel> level;    // likewise, by other logs
-  // Where these are unread, others stand in for them as far as they can.
+  // Where it is unread, others stand in for it as far as they can.
   LteLogState servingLog = LteLogState::notSeen;
-  LteLogState signalLog = LteLogState::notSeen;
   LteNeighbours neighbours;
   std::vector<SecondaryCarrier> carriers;
+  bool carriersTold = false;  // the network has: that there are none is known
   LteTransmissions pusch;
   LteTransmissions pucch;
   LteConnection connection;
@@ -53,6 +53,10 @@ struct LtePicture {
     if (camped == cell) return;
     camped = cell;
     if (serving && serving->name != cell) serving.reset();
+    if (signal && signal->cell != cell) signal.reset();
+    if (rules && rules->cell != cell) rules.reset();
+    level.reset();
+    if (carriers.empty()) carriersTold = false;
     connection.others.cells.clear();
   }
 };

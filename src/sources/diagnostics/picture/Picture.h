@@ -23,4 +23,8 @@ struct Picture {
   SimPicture sim;
 };
 
+// The phone's serving cell is one of that technology: what belonged to cells of others, and to the
+// connection there, holds no longer.
+void changeTo(Picture& picture, Technology technology);
+
 }  // namespace qel::diagnostics

@@ -82,7 +82,7 @@ Outcome readUmtsCell(const LogPacket& packet, Picture& picture, Told& told) {
   const auto cell = cellIn(packet.body);
   if (!cell) return Outcome::damaged;
   settleOn(*cell, picture.umts);
-  picture.technology = Technology::umts;
+  changeTo(picture, Technology::umts);
   told.tell(metric::kUmtsCellInfo);
   return Outcome::understood;
 }
@@ -93,7 +93,7 @@ Outcome readUmtsState(const LogPacket& packet, Picture& picture, Told& told) {
   const auto state = stateOf(packet.body[0], elsewhere);
   if (!state) return Outcome::damaged;
   enter(*state, picture.umts.connection);
-  if (picture.umts.connection.connected().value_or(false)) picture.technology = Technology::umts;
+  if (picture.umts.connection.connected().value_or(false)) changeTo(picture, Technology::umts);
   told.tell(metric::kUmtsRrcState);
   return Outcome::understood;
 }

@@ -84,7 +84,7 @@ Outcome readUmtsRanks(const LogPacket& packet, Picture& picture, Told& told) {
   auto cells = cellsIn(packet.body, kLayouts[*version]);
   if (!cells) return Outcome::damaged;
   if (cells->umts.empty()) return Outcome::understood;  // no serving cell
-  picture.technology = Technology::umts;
+  changeTo(picture, Technology::umts);
   picture.umts.signal = signalOf(cells->umts.front(), packet.timeMs);
   cells->umts.erase(cells->umts.begin());
   cells->timeMs = packet.timeMs;
