@@ -262,7 +262,7 @@ TEST_F(DiagnosticsSourceTest, StopsInTheMiddleOfAFlood) {
   PseudoModem modem;
   beginWith(modem);
   const Bytes noise(4096, 0x55);
-  modem.stream(100'000, [&] { return noise; });
+  modem.stream(100'000, [noise] { return noise; });
   ASSERT_TRUE(comesTrue([&] { return fact("bytes a second").size() >= 5; }));
   source.reset();  // returns
   SUCCEED();

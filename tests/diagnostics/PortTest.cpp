@@ -88,7 +88,7 @@ TEST(TerminalPort, TakesATurnsWorthOfAFlood) {
   PseudoModem modem;
   Reading reading(modem.path());
   const Bytes noise(4096, 0x55);
-  modem.stream(1'000'000, [&] { return noise; });
+  modem.stream(1'000'000, [noise] { return noise; });
   ASSERT_TRUE(comesTrue([&] { return reading.receive() && reading.port->counts().bytes > 0; }));
   for (int i = 0; i < 50; ++i) {
     const std::uint64_t before = reading.port->counts().bytes;

@@ -54,7 +54,7 @@ TEST(QelctlDiagReport, hasNothingOfWhatIsInThePackets) {
 TEST(QelctlDiagReport, listensToAModem) {
   diagnostics::test::PseudoModem modem;
   const Bytes packet = framed(logPacket(0xB0C2, Bytes{99}));
-  modem.stream(20, [&] { return packet; });
+  modem.stream(20, [packet] { return packet; });
   const Outcome outcome = qelctl({"diag-report", modem.path(), "--duration", "3"});
   EXPECT_EQ(outcome.exitCode, 0) << outcome.err;
   for (const char* part : {"model: Pseudo modem\n", "build: MPSS.PSEUDO", "radio 1, B0C2/99: "}) {

@@ -108,10 +108,13 @@ bool DiagnosticsSource::Run::live(DiagPort& port) {
     hasListened = hasListened || session.state() == State::listening;
   }
   _metrics.forget();
+  const FoundPort lost = {_facts.port, _facts.modem};
+  {
+    const std::lock_guard lock(_factsMutex);
+    _facts = {};
+  }
   report(conditionOf(session, false));
-  if (!_stopping) say(adviceOf(session.state(), {_facts.port, _facts.modem}));
-  const std::lock_guard lock(_factsMutex);
-  _facts = {};
+  if (!_stopping) say(adviceOf(session.state(), lost));
   return hasListened;
 }
 
@@ -140,7 +143,8 @@ void DiagnosticsSource::Run::turn(DiagPort& port, DiagnosticsSession& session) {
   session.step(now);
   if (session.state() == State::resting && before != State::resting) _metrics.forget();
   noteFacts(port, session);
-  report(conditionOf(session, _metrics.knowsCell()));
+  // What is over is told once all that was known is forgotten.
+  if (!session.isOver()) report(conditionOf(session, _metrics.knowsCell()));
 }
 
 void DiagnosticsSource::Run::noticeListeners() {

@@ -11,6 +11,7 @@
 #include "messages/wcdma.h"
 #include "sources/modem_manager/CellList.h"
 #include "sources/modem_manager/ModemWorld.h"
+#include "support/Sanitized.h"
 
 namespace qel::testing {
 namespace {
@@ -254,9 +255,7 @@ std::ptrdiff_t residentMb() {
 
 // The whole answer was unpacked at once, and what that took was kept for good.
 TEST(CellList, OfTwentyThousandCellsIsNotKeptInMemory) {
-#if defined(__SANITIZE_ADDRESS__) || defined(__SANITIZE_THREAD__)
-  GTEST_SKIP() << "a sanitizer keeps memory that is given back";
-#endif
+  if (testing::kIsSanitized) GTEST_SKIP() << "a sanitizer keeps memory that is given back";
   const PrivateBus bus;
   const auto connection = sdbus::createSessionBusConnectionWithAddress(bus.address());
   const auto object = sdbus::createProxy(*connection, "org.example.Nobody", "/");
