@@ -1,10 +1,24 @@
 #include "recording/RecordingReader.h"
 
+#include <sysexits.h>
+
 #include <utility>
 
 #include "recording/EventLine.h"
 
 namespace qel {
+
+int RecordingFault::exitCode() const {
+  switch (kind) {
+    case Kind::notOpened:
+      return EX_NOINPUT;
+    case Kind::badData:
+      return EX_DATAERR;
+    case Kind::notRead:
+      return EX_IOERR;
+  }
+  return EX_SOFTWARE;
+}
 
 std::unique_ptr<RecordingReader> RecordingReader::open(const std::string& path, BadLines badLines,
                                                        RecordingFault& fault) {

@@ -16,6 +16,9 @@ struct RecordingFault {
   enum class Kind { notOpened, badData, notRead };
   Kind kind = Kind::notOpened;
   std::string message;
+
+  // What a program should end with, of sysexits(3).
+  int exitCode() const;
 };
 
 // JSON Lines, plain or gzip whatever the file is called. One line in memory at a time. One thread.

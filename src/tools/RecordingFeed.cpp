@@ -10,17 +10,7 @@
 namespace qel::tools {
 namespace {
 
-ToolError asError(const RecordingFault& fault) {
-  switch (fault.kind) {
-    case RecordingFault::Kind::notOpened:
-      return {EX_NOINPUT, fault.message};
-    case RecordingFault::Kind::badData:
-      return {EX_DATAERR, fault.message};
-    case RecordingFault::Kind::notRead:
-      return {EX_IOERR, fault.message};
-  }
-  return {EX_SOFTWARE, fault.message};
-}
+ToolError asError(const RecordingFault& fault) { return {fault.exitCode(), fault.message}; }
 
 }  // namespace
 

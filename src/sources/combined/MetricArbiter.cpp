@@ -12,7 +12,7 @@ bool MetricArbiter::lets(SourcePart part, const SourceEvent& event) {
     entry = {true, {}};
     return true;
   }
-  if (entry.isHeld) entry.withheld = {event};
+  if (entry.isHeld) entry.withheld = event;
   return !entry.isHeld;
 }
 
@@ -20,10 +20,10 @@ std::vector<SourceEvent> MetricArbiter::lose(SourcePart part) {
   std::vector<SourceEvent> instead;
   for (auto& [metric, entry] : _entries) {
     if (part == betterPart(metric)) {
-      for (SourceEvent& event : entry.withheld) instead.push_back(std::move(event));
+      if (entry.withheld) instead.push_back(std::move(*entry.withheld));
       entry = {};
     } else {
-      entry.withheld.clear();
+      entry.withheld.reset();
     }
   }
   return instead;

@@ -3,6 +3,7 @@
 
 #include <cstdint>
 #include <map>
+#include <optional>
 #include <vector>
 
 #include "sources/SourceEvent.h"
@@ -24,8 +25,8 @@ class MetricArbiter {
 
  private:
   struct Entry {
-    bool isHeld = false;                // the better one has a value
-    std::vector<SourceEvent> withheld;  // the other's newest, at most one
+    bool isHeld = false;                  // the better one has a value
+    std::optional<SourceEvent> withheld;  // the other's newest
   };
 
   std::map<std::uint32_t, Entry> _entries;  // by metric, of which there are few

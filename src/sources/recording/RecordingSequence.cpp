@@ -27,17 +27,7 @@ bool mayKeep(const EventOfMetric& kept, std::uint32_t metric, const SourceEvent&
          weightOf(event.entries) <= kLargestEventKept;
 }
 
-SourceError errorOf(const RecordingFault& fault) {
-  switch (fault.kind) {
-    case RecordingFault::Kind::notOpened:
-      return {EX_NOINPUT, fault.message};
-    case RecordingFault::Kind::badData:
-      return {EX_DATAERR, fault.message};
-    case RecordingFault::Kind::notRead:
-      return {EX_IOERR, fault.message};
-  }
-  return {EX_SOFTWARE, fault.message};
-}
+SourceError errorOf(const RecordingFault& fault) { return {fault.exitCode(), fault.message}; }
 
 }  // namespace
 
