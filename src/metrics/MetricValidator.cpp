@@ -51,6 +51,11 @@ MetricValidator::MetricValidator(std::shared_ptr<TeskWrapper> wrapper, const Tim
   if (mySharedTeskInstance) mySharedTeskInstance->listen();
 }
 
+void MetricValidator::setObserver(MetricObserver* observer, const Clock& clock) {
+  _observer = observer;
+  _clock = &clock;
+}
+
 void MetricValidator::metricsDidUpdate(const std::optional<Dictionary>& event) {
   if (!event) fatalError("a metric event without a dictionary");
   if (processMetric(*event)) standardOutput().write("Received Valid Metric");
@@ -73,7 +78,8 @@ bool MetricValidator::processMetric(const Dictionary& event) {
   }
   const Value* payload = event.find(payloadKey);
   const Bytes* bytes = payload ? payload->asBytes() : nullptr;
-  auto record = row->describe(bytes ? ByteView(*bytes) : ByteView());
+  const ByteView view = bytes ? ByteView(*bytes) : ByteView();
+  auto record = row->describe(view);
   if (!record) refusePayload(*metricID);
 
   Slot& slot = this->*row->slot;
@@ -81,6 +87,7 @@ bool MetricValidator::processMetric(const Dictionary& event) {
   rewriteTimestamp(*slot);
   logRecord(row->logText, *slot);
   applyDerivation(row->derivation, *slot, *this, dlbwlookup);
+  if (_observer) _observer->metricWasStored({*row, *slot, view, _clock->nowMs()});
   return true;
 }
 

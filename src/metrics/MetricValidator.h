@@ -6,11 +6,13 @@
 #include <optional>
 #include <string>
 
+#include "base/Clock.h"
 #include "base/LogSink.h"
 #include "base/TimeZone.h"
 #include "connection/TeskWrapper.h"
 #include "connection/TeskWrapperDelegate.h"
 #include "metrics/BandwidthTable.h"
+#include "metrics/MetricObserver.h"
 #include "metrics/MetricStore.h"
 
 namespace qel {
@@ -34,6 +36,10 @@ class MetricValidator final : public MetricStore,
 
   // Decodes and stores one metric. True when its identifier has a handler.
   bool processMetric(const Dictionary& event);
+
+  // Tells it of every metric after the last step, with the clock's time as that of reception. Both
+  // must outlive this, or be taken away again: null ends it.
+  void setObserver(MetricObserver* observer, const Clock& clock = systemClock());
 
   // The metric identifiers as events carry them.
   static constexpr std::int64_t K_LTE_CDRX_CONFIG = 3952152;
@@ -82,6 +88,8 @@ class MetricValidator final : public MetricStore,
   void logRecord(std::string_view text, const Dictionary& record);
 
   DateTexts _dates;
+  MetricObserver* _observer = nullptr;
+  const Clock* _clock = &systemClock();
   std::string _line;  // the one being logged, kept for its memory
 };
 

@@ -17,17 +17,21 @@ namespace {
 const std::map<std::string, std::set<std::string>> kAllowed = {
     {"base", {}},
     {"messages", {"base"}},
+    {"radio", {"base", "messages"}},
     {"rrc", {"base"}},
     {"recording", {"base", "messages"}},
     {"bus", {"base"}},
-    {"sources", {"base", "bus", "messages", "recording", "rrc"}},
+    {"sources", {"base", "bus", "messages", "radio", "recording", "rrc"}},
     {"tesk", {"base", "bus", "messages"}},
     {"service", {"base", "bus", "messages", "sources", "tesk"}},
     {"connection", {"base", "tesk"}},
     {"metrics", {"base", "connection", "messages"}},
-    {"ui", {"base", "connection", "metrics"}},
-    {"app", {"base", "bus", "metrics", "recording", "service", "sources", "tesk", "ui"}},
-    {"tools", {"base", "bus", "messages", "metrics", "recording", "sources", "tesk", "ui"}},
+    {"history", {"base", "messages", "metrics", "radio", "recording"}},
+    {"ui", {"base", "connection", "history", "messages", "metrics", "radio"}},
+    {"app", {"base", "bus", "history", "metrics", "recording", "service", "sources", "tesk", "ui"}},
+    {"tools",
+     {"base", "bus", "history", "messages", "metrics", "radio", "recording", "sources", "tesk",
+      "ui"}},
 };
 
 // Foreign header prefix → the folders (path prefixes in src/) that may include it.

@@ -1,0 +1,27 @@
+// Who follows the dispatcher.
+#pragma once
+
+#include <cstdint>
+
+#include "base/Value.h"
+#include "metrics/DispatchTable.h"
+
+namespace qel {
+
+// One metric that the dispatcher has stored; valid during the call only.
+struct StoredMetric {
+  const DispatchRow& row;
+  const Dictionary& record;  // as it stands in its slot, after the last derivation
+  ByteView payload;          // as it came
+  std::uint64_t receivedMs;  // since 1970-01-01 00:00 UTC
+};
+
+// Main thread.
+class MetricObserver {
+ public:
+  virtual ~MetricObserver() = default;
+  // After the dispatcher's last step. The store must stay as it is.
+  virtual void metricWasStored(const StoredMetric& metric) = 0;
+};
+
+}  // namespace qel
