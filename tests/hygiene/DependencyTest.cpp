@@ -28,10 +28,13 @@ const std::map<std::string, std::set<std::string>> kAllowed = {
     {"metrics", {"base", "connection", "messages"}},
     {"history", {"base", "messages", "metrics", "radio", "recording"}},
     {"ui", {"base", "connection", "history", "messages", "metrics", "radio"}},
-    {"app", {"base", "bus", "history", "metrics", "recording", "service", "sources", "tesk", "ui"}},
-    {"tools",
-     {"base", "bus", "history", "messages", "metrics", "radio", "recording", "sources", "tesk",
+    {"feed", {"base", "history", "service", "sources", "tesk", "ui"}},
+    {"app",
+     {"base", "bus", "feed", "history", "metrics", "recording", "service", "sources", "tesk",
       "ui"}},
+    {"tools",
+     {"base", "bus", "feed", "history", "messages", "metrics", "radio", "recording", "sources",
+      "tesk", "ui"}},
 };
 
 // Foreign header prefix → the folders (path prefixes in src/) that may include it.

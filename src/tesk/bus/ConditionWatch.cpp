@@ -13,17 +13,24 @@ namespace {
 constexpr auto kInterface = tesk::BasebandManager1_proxy::INTERFACE_NAME;
 constexpr const char* kProperties = "org.freedesktop.DBus.Properties";
 constexpr const char* kCondition = "Condition";
-constexpr std::size_t kLongestLine = 256;  // bytes
+constexpr std::size_t kLongestText = 256;  // bytes
 
-// Before the line is copied from thread to thread; no character is left in halves.
-void shorten(std::string& line) {
-  if (line.size() <= kLongestLine) return;
+// Before the text is copied from thread to thread; no character is left in halves.
+std::string shortened(std::string text) {
+  if (text.size() <= kLongestText) return text;
   const auto isWithinCharacter = [](char c) {
     return (static_cast<unsigned char>(c) & 0xC0) == 0x80;
   };
-  std::size_t end = kLongestLine;
-  while (end > 0 && isWithinCharacter(line[end])) --end;
-  line.resize(end);
+  std::size_t end = kLongestText;
+  while (end > 0 && isWithinCharacter(text[end])) --end;
+  text.resize(end);
+  return text;
+}
+
+std::string textAt(const std::map<std::string, sdbus::Variant>& entries, const char* key) {
+  const auto found = entries.find(key);
+  if (found == entries.end() || !found->second.containsValueOfType<std::string>()) return {};
+  return shortened(found->second.get<std::string>());
 }
 
 }  // namespace
@@ -66,27 +73,23 @@ void ConditionWatch::ask() {
 
 void ConditionWatch::forget() {
   ++_question;
-  tell("");
+  tell({});
 }
 
 void ConditionWatch::take(const sdbus::Variant& condition) {
   ++_question;
-  std::string line;
+  Condition told;
   if (condition.containsValueOfType<Entries>()) {
     const auto entries = condition.get<Entries>();
-    const auto text = entries.find("text");
-    if (text != entries.end() && text->second.containsValueOfType<std::string>()) {
-      line = text->second.get<std::string>();
-    }
+    told = {textAt(entries, "text"), textAt(entries, "state"), textAt(entries, "model")};
   }
-  shorten(line);
-  tell(std::move(line));
+  tell(std::move(told));
 }
 
-void ConditionWatch::tell(std::string line) {
-  if (!_observer || line == _told) return;
-  _told = line;
-  _observer(line);
+void ConditionWatch::tell(Condition condition) {
+  if (!_observer || condition == _told) return;
+  _told = std::move(condition);
+  _observer(_told);
 }
 
 }  // namespace tesk::bus

@@ -10,9 +10,19 @@
 
 namespace tesk::bus {
 
-// Told in one line for people of 256 bytes at most, at first and at every change; empty: there is
-// nothing to say. On a thread of the connection's own.
-using ConditionObserver = std::function<void(const std::string& line)>;
+// Each text of 256 bytes at most.
+struct Condition {
+  std::string line;   // for people; empty: there is nothing to say
+  std::string state;  // one word for programs
+  std::string model;  // of the modem; empty: not known
+
+  // For observers that only show the line.
+  operator const std::string&() const { return line; }
+  friend bool operator==(const Condition&, const Condition&) = default;
+};
+
+// Told at first and at every change. On a thread of the connection's own.
+using ConditionObserver = std::function<void(const Condition& condition)>;
 
 // One thread, that of the connection; never waits. Without an observer it does nothing.
 class ConditionWatch {
@@ -30,11 +40,11 @@ class ConditionWatch {
   using Entries = std::map<std::string, sdbus::Variant>;
 
   void take(const sdbus::Variant& condition);
-  void tell(std::string line);
+  void tell(Condition condition);
 
   sdbus::IProxy& _service;
   const ConditionObserver _observer;
-  std::string _told;
+  Condition _told;
   std::uint64_t _question = 0;  // its number: the answer to an earlier one is late
   sdbus::Slot _changes;
 };

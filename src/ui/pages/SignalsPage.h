@@ -126,8 +126,7 @@ struct ReadOff {
   std::vector<ReadOffValue> values;  // serving first, then strongest first; none within a gap
   std::string spoken;
 };
-ReadOff readOff(const SignalsPage& page, const Chart& chart, std::uint64_t timeMs,
-                const TimeZone& zone = systemTimeZone());
+ReadOff readOff(const Chart& chart, std::uint64_t timeMs, const TimeZone& zone = systemTimeZone());
 // The next point of the serving cell's curve, for reading off with keys; none: there is none.
 std::optional<std::uint64_t> pointAfter(const Chart& chart, std::uint64_t timeMs);
 std::optional<std::uint64_t> pointBefore(const Chart& chart, std::uint64_t timeMs);
