@@ -17,26 +17,32 @@
 
 namespace qel {
 
-// A neighbour: a cell that the phone measures and is not on.
+// A neighbour: a cell that the phone measures and is not on. At least one of channel and code is
+// known.
 struct Neighbour {
   Technology technology = Technology::lte;
-  std::uint32_t channel = 0;
-  std::uint32_t code = 0;
+  std::optional<std::uint32_t> channel;  // as of a serving cell
+  std::optional<std::uint32_t> code;
   std::optional<float> levelDbm;
   std::optional<float> qualityDb;
   std::uint64_t timeMs = 0;  // of the report
+
+  bool isSameCellAs(const Neighbour& other) const {
+    return technology == other.technology && channel == other.channel && code == other.code;
+  }
 };
 
-// Main thread only. Told of every stored metric, by the same call from a live service, from a
-// recording and from a test. Everything is asked for as of a moment, so that one history of a whole
-// recording answers for each of its moments.
+// Main thread only. Told of every metric, by the same call from a live service, from a recording
+// and from a test. Everything is asked for as of a moment, so that one history of a whole recording
+// answers for each of its moments. A time of reception that goes back counts as the one before it;
+// a happening keeps its own.
 class History final : public MetricObserver {
  public:
   struct Limits {
     Series::Limits series;
     Journal::Limits journal;
-    std::size_t mostHappenings = 10000;  // beyond them the oldest go
-    std::size_t mostNeighbours = 64;     // cells with a curve; the one silent for longest goes
+    std::size_t mostHappenings = 10000;         // beyond them the oldest go
+    std::size_t mostNeighbourReports = 20'000;  // that curves of neighbours are made of
   };
 
   History();
@@ -44,6 +50,7 @@ class History final : public MetricObserver {
   ~History() override;
 
   void metricWasStored(const StoredMetric& metric) override;
+  void metricWasPassedOver(const PassedMetric& metric) override;
   // What no report tells: service and modem lost and found, gaps in delivery, marks.
   void add(Happening happening);
 
@@ -56,23 +63,30 @@ class History final : public MetricObserver {
   std::size_t happeningsUntil(std::uint64_t atMs) const;
 
   const Series& series(Quantity quantity) const;
+  // As in the newest report of the technology in use; nothing when that has reported none.
   std::optional<Cell> servingCell(std::uint64_t atMs) const;
+  // As the last serving-cell or RRC report told; nothing before one and after one that says that
+  // its technology is not in use.
   std::optional<Technology> technology(std::uint64_t atMs) const;
 
-  // The cells of the newest lists of the technology in use, strongest first.
+  // Those of the technology in use, then the others, each strongest first: what the reports of the
+  // ten seconds before the newest one named.
   std::vector<Neighbour> neighbours(std::uint64_t atMs) const;
-  // The levels of one cell; null: never measured.
-  const Series* levels(Technology technology, std::uint32_t channel, std::uint32_t code) const;
+  // The levels of one of them within both times.
+  std::vector<Run> levels(const Neighbour& cell, std::uint64_t fromMs, std::uint64_t toMs) const;
 
   // The newest report of a metric (as events carry it) that is not after this time.
   std::optional<JournalEntry> lastReport(std::int64_t metric, std::uint64_t atMs) const;
-  // How long it is from report to report, as seen lately; nothing before two have come.
-  std::optional<std::uint64_t> periodMs(std::int64_t metric) const;
+  // How long it is from report to report, as seen last before this time; nothing before two have
+  // come.
+  std::optional<std::uint64_t> periodMs(std::int64_t metric, std::uint64_t atMs = kLatest) const;
   // When anything at all came last.
   std::optional<std::uint64_t> lastReceivedMs(std::uint64_t atMs) const;
 
   // Payloads as they came, for the curve of any field.
   const Journal& journal() const;
+
+  static constexpr std::uint64_t kLatest = ~std::uint64_t{0};
 
  private:
   struct State;

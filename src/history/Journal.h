@@ -1,9 +1,11 @@
 // The payloads of the last minutes, as they came.
 #pragma once
 
+#include <array>
 #include <cstdint>
+#include <deque>
+#include <memory>
 #include <optional>
-#include <span>
 #include <vector>
 
 #include "base/Bytes.h"
@@ -19,7 +21,7 @@ struct JournalEntry {
 };
 
 // In the order in which they came; the oldest go when they are too old or too many. The newest of
-// each metric stays, whatever its age.
+// each metric stays, whatever its age. Times that go back are taken as the last one.
 class Journal {
  public:
   struct Limits {
@@ -30,15 +32,67 @@ class Journal {
   Journal() = default;
   explicit Journal(const Limits& limits) : _limits(limits) {}
 
+  // No more than 32 different rows, which live as long as the journal.
   void add(const DispatchRow& row, std::uint64_t receivedMs, ByteView payload);
 
   // Those of one metric within both times, oldest first.
   std::vector<JournalEntry> of(std::int64_t metric, std::uint64_t fromMs, std::uint64_t toMs) const;
   // The newest of one metric that is not after this time.
   std::optional<JournalEntry> last(std::int64_t metric, std::uint64_t atMs) const;
+  // The newest of all that is not after this time.
+  std::optional<std::uint64_t> lastMs(std::uint64_t atMs) const;
+  // Up to `most` of one metric that are not after this time, newest first.
+  std::vector<JournalEntry> newest(std::int64_t metric, std::uint64_t atMs, std::size_t most) const;
+
+  // What it holds, without the newest of metrics that are no more among the others.
+  std::size_t bytes() const { return _bytes; }
 
  private:
+  static constexpr std::size_t kMostRows = 32;
+
+  // A run of entries: each a head of four bytes (and four more for a long payload) and its payload.
+  struct Chunk {
+    std::uint64_t number = 0;
+    std::uint64_t fromMs = 0;
+    std::uint64_t toMs = 0;
+    std::uint32_t rows = 0;  // a bit for each that occurs
+    std::size_t size = 0;
+    std::size_t capacity = 0;
+    std::unique_ptr<std::uint8_t[]> content;
+  };
+  // The last one of a row whose chunk has gone.
+  struct Kept {
+    std::uint64_t receivedMs = 0;
+    std::vector<std::uint8_t> payload;
+  };
+  struct Place {
+    std::size_t row = 0;
+    std::size_t begin = 0;  // of the payload within the chunk
+    std::size_t size = 0;
+    std::uint64_t receivedMs = 0;
+  };
+
+  std::size_t placeOf(const DispatchRow& row);
+  std::optional<std::size_t> find(std::int64_t metric) const;
+  Chunk& chunkFor(std::uint64_t receivedMs, std::size_t size);
+  void closeNewest();
+  void begin(std::uint64_t receivedMs, std::size_t size);
+  void dropOldest();
+  static Place read(const Chunk& chunk, std::size_t& position);
+  static std::vector<Place> placesOf(const Chunk& chunk, std::size_t row, std::uint64_t fromMs,
+                                     std::uint64_t toMs);
+  JournalEntry entry(const Chunk& chunk, const Place& place) const;
+  // How many of the chunks begin not after this time.
+  std::size_t chunksUntil(std::uint64_t atMs) const;
+
   Limits _limits;
+  std::array<const DispatchRow*, kMostRows> _rows{};
+  std::array<std::uint64_t, kMostRows> _newestIn{};  // number of the chunk
+  std::array<std::optional<Kept>, kMostRows> _kept;
+  std::deque<Chunk> _chunks;
+  std::uint64_t _nextNumber = 1;
+  std::uint64_t _lastMs = 0;
+  std::size_t _bytes = 0;
 };
 
 }  // namespace qel

@@ -71,14 +71,15 @@ bool MetricValidator::processMetric(const Dictionary& event) {
   if (!metricID) fatalError("a metric event without an integer under \"" + metricIDKey + "\"");
   logHexadecimal(*metricID);
 
-  const DispatchRow* row = findDispatchRow(*metricID);
-  if (!row) {
-    standardOutput().write("I dont care for this Metric");
-    return false;
-  }
   const Value* payload = event.find(payloadKey);
   const Bytes* bytes = payload ? payload->asBytes() : nullptr;
   const ByteView view = bytes ? ByteView(*bytes) : ByteView();
+  const DispatchRow* row = findDispatchRow(*metricID);
+  if (!row) {
+    standardOutput().write("I dont care for this Metric");
+    if (_observer) _observer->metricWasPassedOver({*metricID, view, _clock->nowMs()});
+    return false;
+  }
   auto record = row->describe(view);
   if (!record) refusePayload(*metricID);
 

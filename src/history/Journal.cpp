@@ -1,0 +1,201 @@
+#include "history/Journal.h"
+
+#include <algorithm>
+#include <cstring>
+
+#include "base/FatalError.h"
+
+namespace qel {
+namespace {
+
+// The head of an entry: milliseconds since the chunk's begin, then row and size in one.
+constexpr std::size_t kHeadBytes = 4;
+constexpr std::uint64_t kMostOffsetMs = 0xFFFF;
+constexpr unsigned kSizeBits = 11;
+constexpr std::size_t kLongSize = (1U << kSizeBits) - 1;  // the size follows in four bytes
+constexpr std::size_t kLongBytes = 4;
+
+constexpr std::size_t kChunkBytes = 32 * 1024;
+
+template <class Number>
+std::uint8_t* put(std::uint8_t* out, Number number) {
+  std::memcpy(out, &number, sizeof number);
+  return out + sizeof number;
+}
+
+template <class Number>
+Number take(const std::uint8_t* content, std::size_t& position) {
+  Number number;
+  std::memcpy(&number, content + position, sizeof number);
+  position += sizeof number;
+  return number;
+}
+
+}  // namespace
+
+void Journal::add(const DispatchRow& row, std::uint64_t receivedMs, ByteView payload) {
+  receivedMs = _lastMs = std::max(receivedMs, _lastMs);
+  const std::size_t place = placeOf(row);
+  const bool isLong = payload.size() >= kLongSize;
+  const std::size_t size = kHeadBytes + (isLong ? kLongBytes : 0) + payload.size();
+  Chunk& chunk = chunkFor(receivedMs, size);
+  const std::size_t shortSize = isLong ? kLongSize : payload.size();
+  std::uint8_t* out = chunk.content.get() + chunk.size;
+  out = put(out, static_cast<std::uint16_t>(receivedMs - chunk.fromMs));
+  out = put(out, static_cast<std::uint16_t>(place << kSizeBits | shortSize));
+  if (isLong) out = put(out, static_cast<std::uint32_t>(payload.size()));
+  if (!payload.empty()) std::memcpy(out, payload.data(), payload.size());
+  chunk.size += size;
+  chunk.toMs = receivedMs;
+  chunk.rows |= 1U << place;
+  _newestIn[place] = chunk.number;
+}
+
+std::size_t Journal::placeOf(const DispatchRow& row) {
+  for (std::size_t i = 0; i < kMostRows; ++i) {
+    if (!_rows[i]) _rows[i] = &row;
+    if (_rows[i] == &row) return i;
+  }
+  fatalError("a journal of more metrics than there are");
+}
+
+std::optional<std::size_t> Journal::find(std::int64_t metric) const {
+  for (std::size_t i = 0; i < kMostRows && _rows[i]; ++i) {
+    if (_rows[i]->identifier == metric) return i;
+  }
+  return std::nullopt;
+}
+
+// The newest chunk, or a new one where its time or its room has come to an end.
+Journal::Chunk& Journal::chunkFor(std::uint64_t receivedMs, std::size_t size) {
+  if (!_chunks.empty()) {
+    Chunk& newest = _chunks.back();
+    const bool isInTime = receivedMs - newest.fromMs <= kMostOffsetMs;
+    if (isInTime && newest.size + size <= newest.capacity) return newest;
+    closeNewest();
+  }
+  begin(receivedMs, size);
+  return _chunks.back();
+}
+
+// Gives back the room that it did not fill.
+void Journal::closeNewest() {
+  Chunk& chunk = _chunks.back();
+  auto exact = std::make_unique_for_overwrite<std::uint8_t[]>(chunk.size);
+  std::memcpy(exact.get(), chunk.content.get(), chunk.size);
+  _bytes -= chunk.capacity - chunk.size;
+  chunk.capacity = chunk.size;
+  chunk.content = std::move(exact);
+}
+
+void Journal::begin(std::uint64_t receivedMs, std::size_t size) {
+  const std::size_t capacity = std::max(kChunkBytes, size);
+  const auto isOld = [&](const Chunk& chunk) {
+    return _limits.ageMs > 0 && receivedMs - chunk.toMs > _limits.ageMs;
+  };
+  while (!_chunks.empty() && (isOld(_chunks.front()) || _bytes + capacity > _limits.bytes)) {
+    dropOldest();
+  }
+  _bytes += capacity;
+  _chunks.push_back({_nextNumber++, receivedMs, receivedMs, 0, 0, capacity,
+                     std::make_unique_for_overwrite<std::uint8_t[]>(capacity)});
+}
+
+void Journal::dropOldest() {
+  const Chunk& chunk = _chunks.front();
+  for (std::size_t position = 0; position < chunk.size;) {
+    const Place place = read(chunk, position);
+    if (_newestIn[place.row] != chunk.number) continue;
+    const auto* payload = chunk.content.get() + place.begin;
+    _kept[place.row] = Kept{place.receivedMs, {payload, payload + place.size}};
+  }
+  _bytes -= chunk.capacity;
+  _chunks.pop_front();
+}
+
+Journal::Place Journal::read(const Chunk& chunk, std::size_t& position) {
+  const std::uint8_t* content = chunk.content.get();
+  Place place;
+  place.receivedMs = chunk.fromMs + take<std::uint16_t>(content, position);
+  const auto head = take<std::uint16_t>(content, position);
+  place.row = head >> kSizeBits;
+  place.size = head & kLongSize;
+  if (place.size == kLongSize) place.size = take<std::uint32_t>(content, position);
+  place.begin = position;
+  position += place.size;
+  return place;
+}
+
+std::vector<Journal::Place> Journal::placesOf(const Chunk& chunk, std::size_t row,
+                                              std::uint64_t fromMs, std::uint64_t toMs) {
+  std::vector<Place> places;
+  if ((chunk.rows >> row & 1U) == 0) return places;
+  for (std::size_t position = 0; position < chunk.size;) {
+    const Place place = read(chunk, position);
+    if (place.receivedMs > toMs) break;
+    if (place.row == row && place.receivedMs >= fromMs) places.push_back(place);
+  }
+  return places;
+}
+
+JournalEntry Journal::entry(const Chunk& chunk, const Place& place) const {
+  return {_rows[place.row], place.receivedMs, {chunk.content.get() + place.begin, place.size}};
+}
+
+std::size_t Journal::chunksUntil(std::uint64_t atMs) const {
+  const auto after =
+      std::ranges::upper_bound(_chunks, atMs, {}, [](const Chunk& chunk) { return chunk.fromMs; });
+  return static_cast<std::size_t>(after - _chunks.begin());
+}
+
+std::vector<JournalEntry> Journal::of(std::int64_t metric, std::uint64_t fromMs,
+                                      std::uint64_t toMs) const {
+  std::vector<JournalEntry> entries;
+  const auto row = find(metric);
+  if (!row) return entries;
+  const std::size_t end = chunksUntil(toMs);
+  for (std::size_t i = 0; i < end; ++i) {
+    if (_chunks[i].toMs < fromMs) continue;
+    for (const Place& place : placesOf(_chunks[i], *row, fromMs, toMs)) {
+      entries.push_back(entry(_chunks[i], place));
+    }
+  }
+  return entries;
+}
+
+std::vector<JournalEntry> Journal::newest(std::int64_t metric, std::uint64_t atMs,
+                                          std::size_t most) const {
+  std::vector<JournalEntry> entries;
+  const auto row = find(metric);
+  if (!row) return entries;
+  for (std::size_t i = chunksUntil(atMs); i-- > 0 && entries.size() < most;) {
+    const auto places = placesOf(_chunks[i], *row, 0, atMs);
+    for (auto place = places.rbegin(); place != places.rend() && entries.size() < most; ++place) {
+      entries.push_back(entry(_chunks[i], *place));
+    }
+  }
+  const auto& kept = _kept[*row];
+  if (entries.size() < most && kept && kept->receivedMs <= atMs) {
+    entries.push_back({_rows[*row], kept->receivedMs, kept->payload});
+  }
+  return entries;
+}
+
+std::optional<JournalEntry> Journal::last(std::int64_t metric, std::uint64_t atMs) const {
+  const auto entries = newest(metric, atMs, 1);
+  return entries.empty() ? std::nullopt : std::optional(entries.front());
+}
+
+std::optional<std::uint64_t> Journal::lastMs(std::uint64_t atMs) const {
+  std::optional<std::uint64_t> last;
+  const std::size_t chunks = chunksUntil(atMs);
+  if (chunks == 0) return last;
+  const Chunk& chunk = _chunks[chunks - 1];
+  for (std::size_t position = 0; position < chunk.size;) {
+    const Place place = read(chunk, position);
+    if (place.receivedMs <= atMs) last = place.receivedMs;
+  }
+  return last;
+}
+
+}  // namespace qel

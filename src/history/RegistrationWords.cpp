@@ -1,0 +1,140 @@
+// Why a network rejects (24.008, clauses 10.5.3.6 and 10.5.5.14; 24.301, clause 9.9.3.9), what it
+// rejects, and why a procedure fails without it.
+#include <algorithm>
+#include <array>
+
+#include "history/Words.h"
+
+namespace qel {
+namespace {
+
+constexpr auto kWords = [] {
+  std::array rows = {
+      NamedWords{"KNAS_MM_REJ_CAUSE_NONE", "", 0},
+      NamedWords{"KNAS_MM_REJ_CAUSE_IMSI_UNKNOWN", "not known to the home network", 2},
+      NamedWords{"KNAS_MM_REJ_CAUSE_ILLEGAL_MS", "identity or authentication failed", 3},
+      NamedWords{"KNAS_MM_REJ_CAUSE_IMSI_UNKNOWN_IN_VLR", "not known to the visited network", 4},
+      NamedWords{"KNAS_MM_REJ_CAUSE_IMEI_NOT_ACCEPTED", "IMEI not accepted", 5},
+      NamedWords{"KNAS_MM_REJ_CAUSE_ILLEGAL_ME", "the equipment is on a barred list", 6},
+      NamedWords{"KNAS_MM_REJ_CAUSE_GPRS_SERVICES_NOT_ALLOWED", "packet service not allowed", 7},
+      NamedWords{"KNAS_MM_REJ_CAUSE_GPRS_AND_NON_GPRS_SERVICES_NOT_ALLOWED", "no service allowed",
+                 8},
+      NamedWords{"KNAS_MM_REJ_CAUSE_MS_IDENTITY_NOT_DERIVED_BY_NW",
+                 "the network could not derive the identity", 9},
+      NamedWords{"KNAS_MM_REJ_CAUSE_IMPLICITLY_DET", "detached by the network", 10},
+      NamedWords{"KNAS_MM_REJ_CAUSE_PLMN_NOT_ALLOWED", "network not allowed", 11},
+      NamedWords{"KNAS_MM_REJ_CAUSE_LA_NOT_ALLOWED", "location area not allowed", 12},
+      NamedWords{"KNAS_MM_REJ_CAUSE_ROM_NOT_ALLOWED_IN_LA",
+                 "roaming not allowed in this location area", 13},
+      NamedWords{"KNAS_MM_REJ_CAUSE_GPRS_NOT_ALLOWED_IN_PLMN",
+                 "packet service not allowed in this network", 14},
+      NamedWords{"KNAS_MM_REJ_CAUSE_NO_SUITABLE_CELL_IN_LA",
+                 "no suitable cell in this location area", 15},
+      NamedWords{"KNAS_MM_REJ_CAUSE_MSC_OUT_OF_REACH", "switching centre out of reach for now", 16},
+      NamedWords{"KNAS_MM_REJ_CAUSE_NW_FAILURE", "network failure", 17},
+      NamedWords{"KNAS_MM_REJ_CAUSE_MAC_FAILURE", "authentication code wrong (MAC failure)", 20},
+      NamedWords{"KNAS_MM_REJ_CAUSE_SYNCH_FAILURE", "authentication out of step (synch failure)",
+                 21},
+      NamedWords{"KNAS_MM_REJ_CAUSE_CONGESTION", "congestion", 22},
+      NamedWords{"KNAS_MM_REJ_CAUSE_GSM_AUTH_UNACCEPTABLE", "GSM authentication unacceptable", 23},
+      NamedWords{"KNAS_MM_REJ_CAUSE_CSG_NOT_AUTHORIZED",
+                 "not authorized for this closed subscriber group", 25},
+      NamedWords{"KNAS_MM_REJ_CAUSE_SERVICE_OPTION_NOT_SUPPORTED", "service not supported", 32},
+      NamedWords{"KNAS_MM_REJ_CAUSE_REQ_SERVICE_OPTION_NOT_SUBSCRIBED", "service not subscribed",
+                 33},
+      NamedWords{"KNAS_MM_REJ_CAUSE_SERVICE_OPTION_TEMPORARILY_OUT_OF_ORDER",
+                 "service out of order for now", 34},
+      NamedWords{"KNAS_MM_REJ_CAUSE_CALL_NOT_IDENTIFIED", "call cannot be identified", 38},
+      NamedWords{"KNAS_MM_REJ_CAUSE_NO_PDP_CONTEXT_ACTIVATED", "no packet connection active", 40},
+      NamedWords{"KNAS_MM_REJ_CAUSE_RETRY_UPON_ENTRY_TO_NEW_CELL", "retry in a new cell", 63},
+
+      NamedWords{"EMM_CAUSE_NO_CAUSE", "", 0},
+      NamedWords{"EMM_CAUSE_IMSI_UNKNOWN_IN_HSS", "not known to the home network", 2},
+      NamedWords{"EMM_CAUSE_ILLEGAL_UE", "identity or authentication failed", 3},
+      NamedWords{"EMM_CAUSE_IMEI_NOT_ACCEPTED", "IMEI not accepted", 5},
+      NamedWords{"EMM_CAUSE_ILLEGAL_ME", "the equipment is on a barred list", 6},
+      NamedWords{"EMM_CAUSE_EPS_SERVICES_NOT_ALLOWED", "LTE service not allowed", 7},
+      NamedWords{"EMM_CAUSE_EPS_SERVICES_AND_NON_EPS_SERVICES_NOT_ALLOWED", "no service allowed",
+                 8},
+      NamedWords{"EMM_CAUSE_UE_IDENTITY_CANNOT_BE_DERIVED_BY_NETWORK",
+                 "the network could not derive the identity", 9},
+      NamedWords{"EMM_CAUSE_IMPLICITLY_DETACHED", "detached by the network", 10},
+      NamedWords{"EMM_CAUSE_PLMN_NOT_ALLOWED", "network not allowed", 11},
+      NamedWords{"EMM_CAUSE_TRACKING_AREA_NOT_ALLOWED", "tracking area not allowed", 12},
+      NamedWords{"EMM_CAUSE_ROAMING_NOT_ALLOWED_IN_THIS_TRACKING_AREA",
+                 "roaming not allowed in this tracking area", 13},
+      NamedWords{"EMM_CAUSE_EPS_SERVICES_NOT_ALLOWED_IN_THIS_PLMN",
+                 "LTE service not allowed in this network", 14},
+      NamedWords{"EMM_CAUSE_NO_SUITABLE_CELLS_IN_TRACKING_AREA",
+                 "no suitable cell in this tracking area", 15},
+      NamedWords{"EMM_CAUSE_MSC_TEMPORARILY_NOT_REACHABLE", "switching centre out of reach for now",
+                 16},
+      NamedWords{"EMM_CAUSE_NETWORK_FAILURE", "network failure", 17},
+      NamedWords{"EMM_CAUSE_CS_DOMAIN_NOT_AVAILABLE", "no circuit-switched service", 18},
+      NamedWords{"EMM_CAUSE_ESM_FAILURE", "session management failed", 19},
+      NamedWords{"EMM_CAUSE_MAC_FAILURE", "authentication code wrong (MAC failure)", 20},
+      NamedWords{"EMM_CAUSE_SYNCH_FAILURE", "authentication out of step (synch failure)", 21},
+      NamedWords{"EMM_CAUSE_CONGESTION", "congestion", 22},
+      NamedWords{"EMM_CAUSE_UE_SECURITY_CAPABILITY_MISMATCH", "security capabilities do not match",
+                 23},
+      NamedWords{"EMM_CAUSE_SECURITY_MODE_REJECTED_UNSPECIFIED", "security mode rejected", 24},
+      NamedWords{"EMM_CAUSE_NOT_AUTHORIZED_FOR_THIS_CSG",
+                 "not authorized for this closed subscriber group", 25},
+      NamedWords{"EMM_CAUSE_NON_EPS_AUTHENTICATION_UNACCEPTABLE",
+                 "authentication of another technology unacceptable", 26},
+      NamedWords{"EMM_CAUSE_REQUESTED_SERVICE_OPTION_NOT_AUTHORIZED_IN_THIS_PLMN",
+                 "service not authorized in this network", 35},
+      NamedWords{"EMM_CAUSE_CS_DOMAIN_TEMPORARILY_NOT_AVAILABLE",
+                 "no circuit-switched service for now", 39},
+      NamedWords{"EMM_CAUSE_NO_EPS_BEARER_CONTEXT_ACTIVATED", "no packet connection active", 40},
+
+      NamedWords{"KNAS_MM_REG_PROC_LOCATION_AREA_UPDATE", "location area update"},
+      NamedWords{"KNAS_MM_REG_PROC_ATTACH", "attach"},
+      NamedWords{"KNAS_MM_REG_PROC_ROUTING_AREA_UPDATE", "routing area update"},
+      NamedWords{"KNAS_MM_REG_PROC_COMBINED_RAU", "combined routing area update"},
+      NamedWords{"KNAS_MM_REG_PROC_COMBINED_ATTACH", "combined attach"},
+      NamedWords{"KNAS_MM_REG_PROC_NW_DETACH", "detach by the network"},
+      NamedWords{"KNAS_MM_REG_PROC_SERVICE_REQ", "service request"},
+      NamedWords{"KNAS_MM_REG_PROC_NW_ABORT", "abort by the network"},
+      NamedWords{"KNAS_MM_REG_PROC_TRACKING_AREA_UPDATE", "tracking area update"},
+      NamedWords{"KNAS_MM_REG_PROC_COMBINED_TAU", "combined tracking area update"},
+      NamedWords{"KNAS_MM_REG_PROC_PROC_NONE", ""},
+      NamedWords{"EMM_PROC_NO_PROC", ""},
+      NamedWords{"EMM_PROC_ATTACH", "attach"},
+      NamedWords{"EMM_PROC_ATTACH_COMB", "combined attach"},
+      NamedWords{"EMM_PROC_EMERGENCY_ATTACH", "emergency attach"},
+      NamedWords{"EMM_PROC_TAU", "tracking area update"},
+      NamedWords{"EMM_PROC_TAU_COMB", "combined tracking area update"},
+      NamedWords{"EMM_PROC_PERIODIC_TAU", "periodic tracking area update"},
+      NamedWords{"EMM_PROC_SERV_REQ", "service request"},
+
+      NamedWords{"KNAS_MM_PROC_FAILURE_CAUSE_NONE", ""},
+      NamedWords{"KNAS_MM_PROC_FAILURE_CAUSE_LOWER_LAYER_FAILURE", "the radio connection failed"},
+      NamedWords{"KNAS_MM_PROC_FAILURE_CAUSE_ACCESS_BARRED", "access is barred"},
+      NamedWords{"KNAS_MM_PROC_FAILURE_CAUSE_LIMITED_SERVICE", "only limited service"},
+      NamedWords{"KNAS_MM_PROC_FAILURE_CAUSE_PAGE_NOT_EXPECTED", "paged when no page was due"},
+      NamedWords{"KNAS_MM_PROC_FAILURE_CAUSE_T3210_EXPIRY", "no answer to the location update"},
+      NamedWords{"KNAS_MM_PROC_FAILURE_CAUSE_T3240_EXPIRY",
+                 "connection not released by the network"},
+      NamedWords{"KNAS_MM_PROC_FAILURE_CAUSE_DETACH_INITIATED", "the phone is detaching"},
+      NamedWords{"KNAS_MM_PROC_FAILURE_CAUSE_PS_SUSPENDED", "packet service is suspended"},
+      NamedWords{"KNAS_MM_PROC_FAILURE_CAUSE_SERV_REQ_THROTTLING", "service requests held back"},
+      NamedWords{"KNAS_MM_PROC_FAILURE_CAUSE_T3317_EXPIRY", "no answer to the service request"},
+      NamedWords{"KNAS_MM_PROC_FAILURE_CAUSE_REJECTED_BY_NW", "rejected by the network"},
+      NamedWords{"KNAS_MM_PROC_FAILURE_CAUSE_NW_AUTH_REJ",
+                 "the network rejected the authentication"},
+      NamedWords{"KNAS_MM_PROC_FAILURE_CAUSE_INVALID_IE", "a message had an invalid element"},
+      NamedWords{"KNAS_MM_PROC_FAILURE_CAUSE_TIMEOUT", "no answer in time"},
+      NamedWords{"KNAS_MM_PROC_FAILURE_CAUSE_OTHER", "another failure"},
+  };
+  std::ranges::sort(rows, {}, &NamedWords::name);
+  return rows;
+}();
+
+static_assert(std::ranges::adjacent_find(kWords, {}, &NamedWords::name) == kWords.end());
+
+}  // namespace
+
+std::span<const NamedWords> registrationWords() { return kWords; }
+
+}  // namespace qel
