@@ -6,6 +6,7 @@
 #include <string>
 
 #include "base/DescriptorSink.h"
+#include "base/DroppedOutput.h"
 #include "base/FatalError.h"
 #include "base/Rendering.h"
 #include "base/SystemLogSink.h"
@@ -15,7 +16,10 @@ namespace {
 
 using Sink = std::shared_ptr<LogSink>;
 
-void flushStandardOutput() { standardOutput().flush(); }
+constinit thread_local unsigned dropping = 0;
+
+Sink& standardOutputSlot();
+void flushStandardOutput() { standardOutputSlot()->flush(); }
 
 Sink* makeStandardOutputSlot() {
   std::atexit(flushStandardOutput);
@@ -45,7 +49,13 @@ void LogSink::writeEvent(std::string_view text, const Dictionary& event) {
   write(line);
 }
 
-LogSink& standardOutput() { return *standardOutputSlot(); }
+DroppedOutput::DroppedOutput() { ++dropping; }
+DroppedOutput::~DroppedOutput() { --dropping; }
+
+LogSink& standardOutput() {
+  static auto& none = *new NullSink();
+  return dropping == 0 ? *standardOutputSlot() : none;
+}
 LogSink& systemLog() { return *systemLogSlot(); }
 void setStandardOutput(Sink sink) { standardOutputSlot() = orNull(std::move(sink)); }
 void setSystemLog(Sink sink) { systemLogSlot() = orNull(std::move(sink)); }

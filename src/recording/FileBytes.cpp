@@ -31,11 +31,12 @@ std::unique_ptr<FileBytes> FileBytes::open(const std::string& path, std::string&
     error = std::strerror(EISDIR);
     return nullptr;
   }
-  return std::unique_ptr<FileBytes>(new FileBytes(descriptor));
+  const auto size = S_ISREG(status.st_mode) ? static_cast<std::uint64_t>(status.st_size) : 0;
+  return std::unique_ptr<FileBytes>(new FileBytes(descriptor, size));
 }
 
-FileBytes::FileBytes(int descriptor)
-    : _descriptor(descriptor), _in(kChunkBytes), _out(kChunkBytes) {
+FileBytes::FileBytes(int descriptor, std::uint64_t size)
+    : _descriptor(descriptor), _size(size), _in(kChunkBytes), _out(kChunkBytes) {
   constexpr int kGzipOnly = 15 + 16;
   if (::inflateInit2(&_stream, kGzipOnly) != Z_OK) fatalError("out of memory for decompression");
 }
@@ -53,10 +54,16 @@ void FileBytes::fill() {
   const ssize_t count = ::read(_descriptor, _in.data() + kept, _in.size() - kept);
   _left = {_in.data(), kept + static_cast<std::size_t>(std::max<ssize_t>(count, 0))};
   _fileEnded = count <= 0;
+  if (count > 0) _taken += static_cast<std::uint64_t>(count);
   if (count < 0) {
     _error = std::strerror(errno);
     _end = End::failed;
   }
+}
+
+float FileBytes::share() const {
+  if (_size == 0) return 0;
+  return static_cast<float>(std::min(_taken, _size)) / static_cast<float>(_size);
 }
 
 // Whether what comes next is the beginning of a gzip stream, or of a part of one.

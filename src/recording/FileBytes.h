@@ -36,16 +36,20 @@ class FileBytes {
   End end() const { return *_end; }
   // After `failed`.
   const std::string& error() const { return _error; }
+  // How much of the file was read, from 0 to 1; 0 where that cannot be told, as of a pipe.
+  float share() const;
 
  private:
   using Chunk = std::vector<char>;
 
-  explicit FileBytes(int descriptor);
+  FileBytes(int descriptor, std::uint64_t size);
   std::string_view inflated();
   void fill();
   bool startsStream();
 
   const int _descriptor;
+  const std::uint64_t _size;  // of the file when it was opened; 0 where it has none
+  std::uint64_t _taken = 0;
   Chunk _in;
   std::string_view _left;  // of what was read from the file
   bool _fileEnded = false;

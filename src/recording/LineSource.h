@@ -33,6 +33,9 @@ class LineSource {
   std::string error() const;
   bool errorIsDamage() const { return _bytes->end() == FileBytes::End::damaged; }
 
+  // How much of the file was read, from 0 to 1.
+  float share() const { return _bytes->share(); }
+
  private:
   explicit LineSource(std::unique_ptr<FileBytes> bytes) : _bytes(std::move(bytes)) {}
   // False at the end of the file, or on failure.

@@ -40,6 +40,8 @@ class RecordingReader {
   const std::optional<std::string>& cutOff() const { return _cutOff; }
   // Lines passed over with BadLines::skip.
   std::uint64_t skippedLines() const { return _skippedLines; }
+  // How much of the file was read, from 0 to 1; 0 where that cannot be told.
+  float share() const { return _lines->share(); }
   // Number of the line read last, from 1.
   std::uint64_t lineNumber() const { return _lineNumber; }
 

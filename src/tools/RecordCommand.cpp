@@ -12,17 +12,20 @@
 #include <string>
 
 #include "base/FileContent.h"
+#include "capture/RecordConnection.h"
+#include "capture/Recorder.h"
+#include "tesk/bus/BusConnector.h"
 #include "tools/Commands.h"
 #include "tools/MainLoop.h"
-#include "tools/RecordConnection.h"
 #include "tools/RecordProgress.h"
-#include "tools/Recorder.h"
 #include "tools/Service.h"
 #include "tools/ToolError.h"
 
 namespace qel::tools {
 namespace {
 
+using capture::RecordConnection;
+using capture::Recorder;
 using Clock = MainLoop::Clock;
 using Seconds = std::chrono::duration<double>;
 using namespace std::chrono_literals;
@@ -124,14 +127,16 @@ void run(const Options& options) {
   RecordProgress progress;
   const auto start = Clock::now();
   std::unique_ptr<RecordConnection> connection;
-  connection = std::make_unique<RecordConnection>(
-      options.bus, std::move(configuration),
-      [&recorder](std::string_view eventName, const tesk::Message& event) {
-        recorder.take(eventName, event);
-      },
+  const auto connector = tesk::bus::makeBusConnector(
+      {options.bus},
       serviceObserver([&progress](const std::string& text) { progress.say(text); },
                       [&connection] { connection->begin(); }),
       loop.answerWaits());
+  connection = std::make_unique<RecordConnection>(
+      *connector, capture::kConsoleRecorder, options.bus, std::move(configuration),
+      [&recorder](std::string_view eventName, const tesk::Message& event) {
+        recorder.take(eventName, event);
+      });
   const auto begun = connection->begin();
   if (begun.code != 0) failWithoutService(begun.message);
   recordOn(options, loop, recorder, progress, start);

@@ -1,15 +1,16 @@
-// How a recording goes on, for people.
+// How a piece of work goes on, for people.
 #pragma once
 
 #include <chrono>
 #include <string>
 
-#include "tools/Recorder.h"
+#include "capture/Recorder.h"
 
 namespace qel::tools {
 
 // Such as "1204 events, 96.3 kB, 0:02:07".
-std::string progressText(const Recorder::Progress& progress, std::chrono::seconds duration);
+std::string progressText(const capture::Recorder::Progress& progress,
+                         std::chrono::seconds duration);
 
 // One line on standard error that is written over again and again; nothing when that is no
 // terminal. Main thread only.

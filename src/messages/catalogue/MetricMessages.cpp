@@ -15,8 +15,12 @@ namespace {
 
 template <class Message>
 constexpr MetricMessage row(std::uint32_t identifier) {
-  return {identifier, Message::kClassName, decodeMessage<Message>, Message::dictionaryWithData,
-          Message::isReadable};
+  return {identifier,
+          Message::kClassName,
+          decodeMessage<Message>,
+          Message::dictionaryWithData,
+          Message::isReadable,
+          &ShapeOf<Message>::kShape};
 }
 
 constexpr std::array<MetricMessage, 30> kMetricMessages = {

@@ -8,6 +8,7 @@
 #include <string_view>
 
 #include "base/Bytes.h"
+#include "messages/runtime/MessageShape.h"
 #include "messages/runtime/PBCodable.h"
 
 namespace qel {
@@ -32,6 +33,7 @@ struct MetricMessage {
   DecodeMessage decode;
   DescribePayload describe;
   CheckPayload isReadable;
+  const MessageShape* shape;
 };
 
 // The 30 metrics whose payload has a message class.

@@ -12,7 +12,7 @@
 #include "recording/privacy/IdentityHider.h"
 #include "tesk/Message.h"
 
-namespace qel::tools {
+namespace qel::capture {
 
 // Any thread. Each event is written before take() returns: a disk that is slow holds the event
 // stream up, and the service counts what is lost by it.
@@ -22,6 +22,7 @@ class Recorder {
     std::uint64_t events = 0;
     std::uint64_t bytes = 0;
     std::uint64_t filesFinished = 0;
+    std::uint64_t marks = 0;
     std::uint64_t unrecordable = 0;  // events without a form in a recording, or undecodable
     std::uint64_t stripped = 0;      // events recorded without a value of unknown meaning
   };
@@ -32,6 +33,8 @@ class Recorder {
 
   // An event of the stream of that name, received now. Other streams are no part of a recording.
   void take(std::string_view eventName, const tesk::Message& event);
+  // Sets a mark now. False when it could not be written: see error().
+  bool mark();
   // To be called every second or so. False when nothing more can be recorded: see error().
   bool tend();
   // Ends the recording. False when it is not whole.
@@ -49,6 +52,7 @@ class Recorder {
   const std::unique_ptr<IdentityHider> _hider;
   const Clock& _clock;
   std::uint64_t _shapeless = 0;
+  std::uint64_t _marks = 0;
 };
 
-}  // namespace qel::tools
+}  // namespace qel::capture

@@ -1,12 +1,13 @@
-#include "tools/Recorder.h"
+#include "capture/Recorder.h"
 
 #include <chrono>
 #include <utility>
 
 #include "recording/EventLine.h"
+#include "recording/Mark.h"
 #include "tesk/Constants.h"
 
-namespace qel::tools {
+namespace qel::capture {
 namespace {
 
 using std::chrono::steady_clock;
@@ -33,6 +34,13 @@ void Recorder::take(std::string_view eventName, const tesk::Message& event) {
   if (isRecordable(recorded)) _recording->write(recorded, steady_clock::now());
 }
 
+bool Recorder::mark() {
+  const std::lock_guard lock(_mutex);
+  if (!_recording->write(markEvent(_clock.nowMs(), _marks + 1), steady_clock::now())) return false;
+  ++_marks;
+  return true;
+}
+
 bool Recorder::tend() {
   const std::lock_guard lock(_mutex);
   return _recording->tend(steady_clock::now());
@@ -46,8 +54,12 @@ bool Recorder::close() {
 Recorder::Progress Recorder::progress() const {
   const std::lock_guard lock(_mutex);
   const std::uint64_t formless = _shapeless + _recording->eventsLeftOut();
-  return {_recording->events(), _recording->bytes(), _recording->filesFinished(),
-          formless + (_hider ? _hider->undecodable() : 0), _hider ? _hider->stripped() : 0};
+  return {_recording->events(),
+          _recording->bytes(),
+          _recording->filesFinished(),
+          _marks,
+          formless + (_hider ? _hider->undecodable() : 0),
+          _hider ? _hider->stripped() : 0};
 }
 
 std::string Recorder::error() const {
@@ -60,4 +72,4 @@ int Recorder::errorNumber() const {
   return _recording->errorNumber();
 }
 
-}  // namespace qel::tools
+}  // namespace qel::capture
