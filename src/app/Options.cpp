@@ -9,6 +9,7 @@
 #include <map>
 
 #include "base/TerminalText.h"
+#include "bus/BusAddress.h"
 
 namespace qel {
 namespace {
@@ -36,6 +37,7 @@ std::optional<Options> parseOptions(int argc, const char* const* argv, int& exit
   line.add_option("--bus", options.bus,
                   "where the baseband manager service is: system, session or a bus address")
       ->type_name("BUS")
+      ->check([](const std::string& name) { return bus::faultOfBusName(name); })
       ->capture_default_str()
       ->excludes(source);
   line.add_option("--theme", theme, "system, light or dark, for this run")

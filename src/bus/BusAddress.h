@@ -4,6 +4,7 @@
 #include <sdbus-c++/IConnection.h>
 #include <memory>
 #include <string>
+#include <string_view>
 
 namespace qel::bus {
 
@@ -11,6 +12,10 @@ namespace qel::bus {
 struct BusAddress {
   std::string name = "system";
 };
+
+// Whether the text is one of these, though there need be no such bus. For whoever takes it from a
+// command line; empty, or one line why it is none.
+std::string faultOfBusName(std::string_view name);
 
 // A new connection. Throws sdbus::Error when there is no such bus.
 std::unique_ptr<sdbus::IConnection> connectTo(const BusAddress& address);

@@ -71,10 +71,10 @@ TEST_F(Viewer, tellsItsVersionAndItsOptions) {
 
 TEST_F(Viewer, saysInOneLineWhatIsWrongWithItsCall) {
   const std::vector<std::vector<std::string>> wrongCalls = {
-      {"--nonsense"},         {"extra"},
-      {"--theme", "pink"},    {"--source"},
-      {"--source", "radio"},  {"--source", "simulated,seed=x"},
-      {"--event-log", "some"}};
+      {"--nonsense"},          {"extra"},
+      {"--theme", "pink"},     {"--source"},
+      {"--source", "radio"},   {"--source", "simulated,seed=x"},
+      {"--event-log", "some"}, {"--bus", "nonsense"}};
   for (const auto& wrong : wrongCalls) {
     const Outcome outcome = start(wrong);
     EXPECT_EQ(outcome.exitCode, 64) << wrong.back();
