@@ -1,16 +1,19 @@
 // qelctl screen and screens: category tables after a recording, drawn by the viewer's controller.
 
 #include <CLI/CLI.hpp>
+#include <algorithm>
 #include <memory>
 #include <optional>
 #include <string>
 
 #include "base/LogSink.h"
 #include "base/Rendering.h"
+#include "base/TerminalText.h"
 #include "tools/Commands.h"
 #include "tools/RecordingFeed.h"
 #include "tools/ScreenDrawing.h"
 #include "ui/kit/TableSnapshot.h"
+#include "ui/screens/CategoryTable.h"
 #include "ui/screens/QelViewItems.h"
 
 namespace qel::tools {
@@ -42,6 +45,22 @@ std::string asJson(const std::string& technology, const std::string& category) {
       Dictionary{{"key", technology + " " + category}, {"sections", std::move(sections)}});
 }
 
+bool isTable(const Options& options) {
+  const auto& menu = QelViewItems::shared().firstLevelViewItems;
+  const auto names = menu.find(options.technology);
+  if (names != menu.end() && std::ranges::count(names->second, options.category) > 0) return true;
+  const std::string key = options.technology + " " + options.category;
+  const auto knows = [&key](Routine routine) { return findCategory(key, routine) != nullptr; };
+  return knows(Routine::sections) || knows(Routine::rows) || knows(Routine::cells);
+}
+
+// It is drawn all the same: "Come back later" stands for every name.
+void tellOfUnknownTable(const Options& options) {
+  if (isTable(options)) return;
+  complain("qelctl", "no table is named \"" + options.technology + " " + options.category +
+                         "\"; qelctl screens FILE draws all there are");
+}
+
 void printTable(const Options& options, Output& output) {
   const TableSnapshot table = draw(options.technology, options.category);
   for (const std::string& line : tableLines(options.technology + " " + options.category, table)) {
@@ -60,6 +79,7 @@ void addScreenCommand(CLI::App& app, Action& chosen) {
     chosen = [options](Output& output) {
       setStandardOutput(nullptr);
       feedRecording(options->recording);
+      tellOfUnknownTable(*options);
       if (options->json) {
         output.line(asJson(options->technology, options->category));
       } else {

@@ -163,6 +163,19 @@ TEST(QelctlScreen, asksToComeBackLaterForAKeyThatNoRoutineKnows) {
             "[[\"Come back later\", \"Come back later\"]]}]}\n");
 }
 
+// A name that no table has was answered like a table without values, and nothing else was said.
+TEST(QelctlScreen, saysWhenNoTableHasThatName) {
+  const TemporaryRecording recording(kTriggerLine);
+  const Outcome unknown = qelctl({"screen", "--json", recording.path(), "LTE", "TX Power"});
+  EXPECT_EQ(unknown.exitCode, 0);
+  EXPECT_NE(unknown.out.find("[[\"Come back later\", \"Come back later\"]]"), std::string::npos);
+  EXPECT_EQ(
+      unknown.err,
+      "qelctl: no table is named \"LTE TX Power\"; qelctl screens FILE draws all there are\n");
+  EXPECT_EQ(qelctl({"screen", recording.path(), "LTE", "Tx Power"}).err, "");
+  EXPECT_EQ(qelctl({"screen", recording.path(), "Device Info", "IMSI"}).err, "");
+}
+
 TEST(QelctlScreens, drawsEveryCategoryOfTheMenuInItsOrder) {
   for (const std::string& content : {std::string(), rrcState(3) + txPower(3)}) {
     const TemporaryRecording recording(content);
