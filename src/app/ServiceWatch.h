@@ -4,6 +4,7 @@
 #include <QtCore/QPointer>
 #include <memory>
 #include <string>
+#include <utility>
 
 #include "tesk/bus/BusConnector.h"
 #include "ui/quick/Navigation.h"
@@ -15,6 +16,9 @@ namespace qel {
 // answers.
 class ServiceWatch final : public std::enable_shared_from_this<ServiceWatch> {
  public:
+  // On which bus the service is looked for.
+  explicit ServiceWatch(std::string bus = "system") : _bus(std::move(bus)) {}
+
   // What the bus connection is to call; it may outlive the watch.
   tesk::bus::ReachabilityObserver observer();
 
@@ -25,6 +29,7 @@ class ServiceWatch final : public std::enable_shared_from_this<ServiceWatch> {
   void change(bool reachable, const std::string& why);
   void show();
 
+  const std::string _bus;
   QPointer<Navigation> _navigation;
   bool _reachable = false;
   QString _since;  // time of the loss; empty when there was none

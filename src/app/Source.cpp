@@ -38,7 +38,7 @@ Source::~Source() {
 
 int Source::open(const Options& options) {
   if (!options.source.empty()) return openWithin(options.source);
-  _watch = std::make_shared<ServiceWatch>();
+  _watch = std::make_shared<ServiceWatch>(options.bus);
   const auto patience = options.selfTest ? std::optional(kPatienceOfASelfTest) : std::nullopt;
   _connector = std::make_shared<ClosingConnector>(tesk::bus::makeBusConnector(
       {options.bus}, _watch->observer(),

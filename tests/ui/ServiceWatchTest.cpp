@@ -135,10 +135,14 @@ TEST_F(ServiceWatchTest, everyReasonHasItsOwnNotice) {
     tell(false, why);
     return window->navigation().notice().toStdString();
   };
-  EXPECT_EQ(noticeFor(tesk::bus::kNotThere), "Baseband manager not reachable");
-  EXPECT_EQ(
-      noticeFor(tesk::bus::kNoPermission),
-      "Baseband manager not reachable: no permission. Members of the group baseband have it.");
+  EXPECT_EQ(noticeFor(tesk::bus::kNotThere),
+            "Baseband manager not reachable: it is not installed. Install the package basebandd.");
+  EXPECT_EQ(noticeFor(tesk::bus::kNotStarted),
+            "Baseband manager not running: it could not be started. Its log says why: journalctl "
+            "-u basebandd");
+  EXPECT_EQ(noticeFor(tesk::bus::kNoPermission),
+            "Baseband manager not reachable: no permission. Members of the group baseband have "
+            "it: join it, then log in again.");
   EXPECT_EQ(noticeFor(tesk::bus::kTooManyClients),
             "Baseband manager has too many clients: waiting for a place.");
   EXPECT_EQ(noticeFor(tesk::bus::kNoAnswer), "Baseband manager does not answer");
@@ -148,6 +152,16 @@ TEST_F(ServiceWatchTest, everyReasonHasItsOwnNotice) {
   EXPECT_EQ(window->navigation().notice(), QString());
   tell(false, tesk::bus::kNoAnswer);
   EXPECT_TRUE(window->navigation().notice().startsWith("Baseband manager does not answer since "));
+}
+
+// On any other bus than the system's nothing starts the service by itself.
+TEST_F(ServiceWatchTest, aBusWithoutTheServiceIsNotCalledAMissingPackage) {
+  watch = std::make_shared<ServiceWatch>("session");
+  openWindow();
+  tell(false, tesk::bus::kNotThere);
+  EXPECT_EQ(window->navigation().notice(),
+            QStringLiteral("Baseband manager not reachable: it is not running on this bus. Start "
+                           "basebandd there."));
 }
 
 // A service that was too busy was said to be not reachable.

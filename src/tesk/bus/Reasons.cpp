@@ -27,11 +27,21 @@ constexpr std::array kReasons = {
     Reason{"org.freedesktop.DBus.Error.UnknownObject", kRefused},
 };
 
+// What the bus says, or the service manager through it, when a service does not come up.
+constexpr std::array kStartsOfFailedStarts = {"org.freedesktop.DBus.Error.Spawn.",
+                                              "org.freedesktop.systemd1."};
+
+bool isFailedStart(const std::string& errorName) {
+  return std::ranges::any_of(kStartsOfFailedStarts,
+                             [&](const char* start) { return errorName.starts_with(start); });
+}
+
 }  // namespace
 
 std::string_view reasonOf(const sdbus::Error& error) {
   const auto found = std::ranges::find(kReasons, error.getName(), &Reason::errorName);
-  return found == kReasons.end() ? kNotThere : found->words;
+  if (found != kReasons.end()) return found->words;
+  return isFailedStart(error.getName()) ? kNotStarted : kNotThere;
 }
 
 bool isNotRegistered(const sdbus::Error& error) {

@@ -12,6 +12,9 @@ inline constexpr std::string_view kTheService = "baseband manager service ";
 
 inline constexpr std::string_view kNoBus = "no message bus";
 inline constexpr std::string_view kNotThere = "baseband manager service not reachable";
+// The bus knows how to start it, and could not.
+inline constexpr std::string_view kNotStarted =
+    "baseband manager service not running and could not be started";
 inline constexpr std::string_view kNoPermission =
     "no permission to use the baseband manager service (is the user in group baseband?)";
 inline constexpr std::string_view kTooManyClients = "baseband manager service has too many clients";
