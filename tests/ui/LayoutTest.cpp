@@ -70,6 +70,7 @@ TEST_P(Layout, nameAndValueNeverOverlap) {
 TEST_P(Layout, theLineAboutTheModemFitsAboveTheChoices) {
   const char* line = "No modem: the chosen one is not there";
   window.navigation().setCondition(line);
+  QMetaObject::invokeMethod(window.list(), "positionViewAtEnd");  // it scrolls with the list
   window.settle();
   ASSERT_TRUE(window.find(line));
   EXPECT_FALSE(window.find(line)->property("truncated").toBool());
@@ -78,6 +79,42 @@ TEST_P(Layout, theLineAboutTheModemFitsAboveTheChoices) {
   EXPECT_GE(area(line).top(), area("Test modem").bottom() - 0.5);
   EXPECT_LE(area(line).bottom(), area("System").top() + 0.5);
   EXPECT_LE(area("System").bottom(), GetParam().height());
+}
+
+// In a low window it covered the last technology.
+TEST_P(Layout, theFootOfTheFirstScreenCoversNoTechnology) {
+  QMetaObject::invokeMethod(window.list(), "positionViewAtIndex", Q_ARG(int, 3), Q_ARG(int, 4));
+  window.settle();
+  ASSERT_TRUE(window.find("GSM"));
+  EXPECT_LE(area("GSM").bottom(), GetParam().height());
+  EXPECT_TRUE(!window.find("Test modem") || area("Test modem").top() >= area("GSM").bottom());
+}
+
+// It was set larger than the room for it, and then broken.
+TEST_P(Layout, aTitleThatFitsOnOneLineStandsOnOne) {
+  ASSERT_TRUE(window.open("GSM", "Connected Serv Cell Meas"));
+  EXPECT_EQ(window.find("Connected Serv Cell Meas")->property("lineCount").toInt(), 1);
+}
+
+TEST_P(Layout, whatHasNotComeYetStandsInTheMiddleOfItsRow) {
+  ASSERT_TRUE(window.open("Device Info", "IMSI"));
+  const QRectF row = window.row(0)->mapRectToScene(window.row(0)->boundingRect());
+  EXPECT_NEAR(area("Come back later").center().y(), row.center().y(), 1);
+  EXPECT_NEAR(area("Come back later").center().x(), row.center().x(), 1);
+}
+
+TEST(Desktop, contentStaysNarrowEnoughToRead) {
+  const Window window;
+  window.window().resize(1600, 900);
+  window.store().myLTERRCStateDict = {{"short", "value"}};
+  ASSERT_TRUE(window.open("LTE", "RRC State"));
+  const QQuickItem* name = window.find("short");
+  const QQuickItem* value = window.find("value");
+  ASSERT_TRUE(name && value);
+  const qreal left = name->mapToScene(QPointF(0, 0)).x();
+  const qreal right = value->mapToScene(QPointF(value->width(), 0)).x();
+  EXPECT_LE(right - left, 640);
+  EXPECT_NEAR(left, 1600 - right, 1) << "in the middle";
 }
 
 INSTANTIATE_TEST_SUITE_P(Sizes, Layout,
@@ -121,6 +158,20 @@ TEST(Motion, aTapDuringTheWayBackOpensTheNextScreen) {
   EXPECT_EQ(window.top().title(), "GSM");
   EXPECT_EQ(window.navigation().rowCount(), 2);
   EXPECT_TRUE(QTest::qWaitFor([&window] { return window.shows("Idle Config"); }));
+}
+
+// Two taps on "LTE" opened "RRC State", which slid under the finger.
+TEST(Motion, aSecondTapWhileTheScreenSlidesInIsIgnored) {
+  const Window window(true);
+  ASSERT_TRUE(window.tap("LTE"));
+  for (int i = 0; i < 5; ++i) {
+    QTest::mouseClick(&window.window(), Qt::LeftButton, Qt::NoModifier, QPoint(100, 90), 20);
+  }
+  EXPECT_EQ(window.navigation().depth(), 2);
+  EXPECT_TRUE(QTest::qWaitFor([&window] {
+    QTest::mouseClick(&window.window(), Qt::LeftButton, Qt::NoModifier, QPoint(100, 90), 50);
+    return window.navigation().depth() == 3;
+  })) << "a tap on a screen that rests counts";
 }
 
 TEST(Motion, aDragFromTheLeftEdgeGoesBack) {

@@ -43,7 +43,7 @@ TEST(WindowTest, aTapGoesFromTechnologyToCategoryToFields) {
   ASSERT_TRUE(window.tap("RRC State"));
   EXPECT_EQ(window.navigation().depth(), 3);
   EXPECT_EQ(window.texts(),
-            (Strings{"LTE", "RRC State", "state", "KLTE_RRC_STATE_CONNECTED", "cause", "3"}));
+            (Strings{"RRC State", "LTE", "state", "KLTE_RRC_STATE_CONNECTED", "cause", "3"}));
   EXPECT_EQ(window.warnings(), 0);
 }
 
@@ -135,7 +135,34 @@ TEST(WindowTest, anEmptyListSaysWhatWillAppear) {
   const Window window;
   window.store().myLTE.CAStatusList.clear();
   ASSERT_TRUE(window.open("LTE", "CA Status"));
-  EXPECT_EQ(window.texts().size(), 3U) << "back, title and one sentence";
+  EXPECT_EQ(window.texts().size(), 3U) << "title, technology and one sentence";
+}
+
+// It once read "Entries of LTE LTE Neighbor Cell Meas".
+TEST(WindowTest, aTitleThatNamesItsTechnologyDoesSoOnceInASentence) {
+  const Window window;
+  window.store().myLTE.EutraNbrsMeas.clear();
+  ASSERT_TRUE(window.open("LTE", "LTE Neighbor Cell Meas"));
+  EXPECT_TRUE(
+      window.shows("The last report of LTE Neighbor Cell Meas lists nothing. The next one that "
+                   "lists something appears here."));
+}
+
+// Three screens read "Serving Cell Info".
+TEST(WindowTest, theTechnologyStandsUnderEveryCategorysTitle) {
+  const Window window;
+  for (const char* technology : {"LTE", "UMTS", "GSM"}) {
+    ASSERT_TRUE(window.open(technology, "Serving Cell Info"));
+    EXPECT_EQ(window.texts()[0], "Serving Cell Info");
+    EXPECT_EQ(window.texts()[1], technology);
+  }
+}
+
+TEST(WindowTest, aBlankValueIsADash) {
+  const Window window;
+  window.store().myLTERRCStateDict = {{"cause", ""}, {"state", "idle"}};
+  ASSERT_TRUE(window.open("LTE", "RRC State"));
+  EXPECT_EQ(window.texts(), (Strings{"RRC State", "LTE", "cause", "\u2013", "state", "idle"}));
 }
 
 TEST(WindowTest, arrowsMoveTheFocusAndEnterOpens) {

@@ -11,22 +11,18 @@ Item {
 
     readonly property string sentence: hasRows
         ? qsTr("The fields of %1 appear here with the first report of the modem.").arg(subject)
-        : qsTr("The last report lists nothing here. Entries of %1 appear with the next report that has some.").arg(subject)
-    readonly property string subject: technology === "" ? title : technology + " " + title
+        : qsTr("The last report of %1 lists nothing. The next one that lists something appears here.").arg(subject)
+    // A title may name the technology itself.
+    readonly property bool namesItself: technology === "" || title.startsWith(technology + " ")
+    readonly property string subject: namesItself ? title : technology + " " + title
 
     height: label.height + 4 * Theme.margin
 
-    Text {
+    NothingYet {
         id: label
         y: 2 * Theme.margin
-        x: Theme.margin
-        width: parent.width - 2 * Theme.margin
+        x: Theme.inset(empty.width)
+        width: empty.width - 2 * x
         text: empty.sentence
-        textFormat: Text.PlainText
-        color: Theme.secondary
-        font.pointSize: Theme.valueSize
-        horizontalAlignment: Text.AlignHCenter
-        wrapMode: Text.Wrap
-        lineHeight: 1.25
     }
 }

@@ -26,13 +26,13 @@ Item {
     ]
     // As much room beside the names as the width leaves.
     readonly property real sidePadding: {
-        const left = width - 2 * Theme.margin - names.advanceWidth;
+        const left = Math.min(width, Theme.contentWidth) - 2 * Theme.margin - names.advanceWidth;
         return Math.max(4, Math.min(Theme.margin, left / (2 * choices.length)));
     }
 
     component Line: Text {
-        x: Theme.margin
-        width: parent.width - 2 * Theme.margin
+        x: Theme.inset(parent.width)
+        width: parent.width - 2 * x
         bottomPadding: 4
         visible: text !== ""
         textFormat: Text.PlainText

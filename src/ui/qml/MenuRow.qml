@@ -9,7 +9,8 @@ Tappable {
     required text
     required property TableModel table
 
-    readonly property bool isCurrent: ListView.isCurrentItem && (ListView.view?.activeFocus ?? false)
+    readonly property real inset: Theme.inset(width)
+    readonly property bool isCurrent: ListView.isCurrentItem && ((ListView.view as RowList)?.keysHere ?? false)
 
     width: ListView.view?.width ?? 0
     implicitHeight: Math.max(Theme.touch + 8, Math.round(label.implicitHeight) + 2 * Theme.padding)
@@ -39,7 +40,7 @@ Tappable {
                 left: parent.left
                 right: parent.right
                 bottom: parent.bottom
-                leftMargin: Theme.margin
+                leftMargin: row.inset
             }
         }
         FocusRing {
@@ -53,7 +54,7 @@ Tappable {
             left: parent.left
             right: chevron.left
             verticalCenter: parent.verticalCenter
-            leftMargin: Theme.margin
+            leftMargin: row.inset
             rightMargin: Theme.padding
         }
         text: row.text
@@ -66,7 +67,7 @@ Tappable {
         id: chevron
         anchors {
             right: parent.right
-            rightMargin: Theme.margin
+            rightMargin: row.inset
             verticalCenter: parent.verticalCenter
         }
     }

@@ -20,7 +20,7 @@ Rectangle {
             left: parent.left
             right: parent.right
             verticalCenter: parent.verticalCenter
-            margins: Theme.margin
+            margins: Theme.inset(bar.width)
         }
         text: bar.text
         textFormat: Text.PlainText

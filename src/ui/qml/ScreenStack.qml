@@ -11,7 +11,15 @@ FocusScope {
 
     readonly property int target: navigation.depth - 1
     property real position: 0
+    property int shown: -1
     readonly property bool moving: slide.running || edge.active
+    // What shows each kind of screen, loaded when the first of its kind comes.
+    readonly property var faces: ({
+        table: "TableScreen.qml",
+        signals: "SignalsScreen.qml",
+        happenings: "HappeningsScreen.qml",
+        recordings: "RecordingsScreen.qml"
+    })
 
     function glide(): void {
         slide.stop();
@@ -28,7 +36,13 @@ FocusScope {
             glide();
     }
 
-    onTargetChanged: glide()
+    onTargetChanged: {
+        const isFirst = shown < 0;
+        shown = target;
+        glide();
+        if (!isFirst && Theme.guardMs > 0)
+            guard.restart();
+    }
 
     Keys.onPressed: event => {
         const isBack = event.key === Qt.Key_Escape || event.key === Qt.Key_Back
@@ -52,8 +66,14 @@ FocusScope {
         model: stack.navigation
 
         // qmllint disable unqualified
-        TableScreen {
+        Loader {
             required property int index
+            required property string kind
+            required property string title
+            required property string subtitle
+            required property string previousTitle
+            // Null for a page.
+            required property TableModel table
             readonly property real away: index - stack.position
 
             width: stack.width
@@ -63,15 +83,29 @@ FocusScope {
             visible: away > -1 && away < 1
             focus: index === stack.target
             enabled: focus && !edge.active
-            notice: stack.navigation.notice
-            condition: stack.navigation.condition
-            source: stack.source
-            loss: stack.navigation.loss
-            storyboard: stack.navigation.storyboard
-            isFirst: index === 0
-            onBack: stack.navigation.back()
+            Component.onCompleted: setSource(stack.faces[kind], Object.assign({
+                navigation: stack.navigation,
+                isFirst: index === 0,
+                title: title,
+                subtitle: subtitle,
+                previousTitle: previousTitle,
+                focus: true
+            }, table ? { table: table, source: stack.source } : {}))
         }
         // qmllint enable unqualified
+    }
+
+    // Taps on what slides are meant for what was there before.
+    MouseArea {
+        anchors.fill: parent
+        z: 999
+        enabled: stack.moving || guard.running
+        visible: enabled
+        Accessible.ignored: true
+    }
+    Timer {
+        id: guard
+        interval: Theme.guardMs
     }
 
     Item {

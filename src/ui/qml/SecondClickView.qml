@@ -1,23 +1,27 @@
 import QtQuick
 import Qelwatch.Ui
 
-// A field and its value: side by side when both fit on one line, else one above the other. A text
-// that is its own value is a notice to the reader.
-Rectangle {
+// A field and its value: side by side when both fit on one line, else one above the other. A row
+// that only stands for what has not come yet says so quietly, and is no field.
+Tappable {
     id: row
 
-    required property string text
+    required property int index
+    required text
     required property string detail
     required property bool notice
     required property int changes
+    required property TableModel table
 
-    readonly property int inner: width - 2 * Theme.margin
-    readonly property bool sideBySide: name.implicitWidth + Theme.margin + value.implicitWidth <= inner
-    readonly property bool isCurrent: ListView.isCurrentItem && (ListView.view?.activeFocus ?? false)
+    readonly property bool isCurrent: ListView.isCurrentItem && ((ListView.view as RowList)?.keysHere ?? false)
 
     width: ListView.view?.width ?? 0
-    height: Math.max(Theme.touch, texts.height + 2 * Theme.padding)
-    color: notice ? Theme.noticeGround : Theme.row
+    // Alone it looks as a table without rows does.
+    height: !notice ? Math.max(Theme.touch, texts.height + 2 * Theme.padding)
+          : ListView.view?.count === 1 ? nothing.height + 4 * Theme.margin
+          : Math.max(Theme.touch, nothing.height + Theme.padding)
+
+    onTapped: table.choose(index)
 
     // A row that comes into sight is not one that changed.
     Component.onCompleted: fade.complete()
@@ -28,10 +32,18 @@ Rectangle {
     }
 
     Accessible.role: Accessible.ListItem
-    Accessible.name: notice ? text : text + ": " + detail
-    Accessible.focusable: true
+    Accessible.name: notice ? text : text + ": " + (texts.blank ? qsTr("empty") : detail)
     Accessible.focused: isCurrent
 
+    Rectangle {
+        anchors.fill: parent
+        color: row.notice ? Theme.page : Theme.row
+    }
+    Rectangle {
+        anchors.fill: parent
+        color: Theme.pressTint
+        visible: row.down && !row.notice
+    }
     Rectangle {
         id: tint
 
@@ -53,52 +65,32 @@ Rectangle {
         }
     }
 
-    Item {
+    FieldTexts {
         id: texts
-
-        readonly property int spacing: 4
-
-        x: Theme.margin
+        x: Theme.inset(row.width)
         y: Math.round((row.height - height) / 2)
-        width: row.inner
-        height: Math.ceil(row.notice ? name.height
-                        : row.sideBySide ? Math.max(name.height, value.height)
-                        : name.height + spacing + value.height)
-
-        Text {
-            id: name
-            y: row.sideBySide ? value.baselineOffset - baselineOffset : 0
-            width: row.sideBySide && !row.notice ? implicitWidth : parent.width
-            text: Theme.breakable(row.text)
-            textFormat: Text.PlainText
-            color: row.notice ? Theme.noticeText : Theme.secondary
-            font.pointSize: Theme.nameSize
-            wrapMode: Text.Wrap
-            Accessible.ignored: true
-        }
-        Text {
-            id: value
-            y: row.sideBySide ? 0 : name.height + texts.spacing
-            width: parent.width
-            visible: !row.notice
-            horizontalAlignment: row.sideBySide ? Text.AlignRight : Text.AlignLeft
-            text: Theme.breakable(row.detail)
-            textFormat: Text.PlainText
-            color: Theme.value
-            font.family: Theme.fixedFamily
-            font.pointSize: Theme.valueSize
-            wrapMode: Text.Wrap
-            Accessible.ignored: true
-        }
+        width: row.width - 2 * x
+        visible: !row.notice
+        name: row.notice ? "" : row.text
+        value: row.notice ? "" : row.detail
     }
-
+    NothingYet {
+        id: nothing
+        x: Theme.inset(row.width)
+        anchors.verticalCenter: parent.verticalCenter
+        width: row.width - 2 * x
+        visible: row.notice
+        text: row.notice ? row.text : ""
+        Accessible.ignored: true
+    }
     Hairline {
         anchors {
             left: parent.left
             right: parent.right
             bottom: parent.bottom
-            leftMargin: Theme.margin
+            leftMargin: Theme.inset(row.width)
         }
+        visible: !row.notice
     }
     FocusRing {
         visible: row.isCurrent && Appearance.keyboardInUse

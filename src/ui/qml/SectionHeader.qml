@@ -21,8 +21,8 @@ Rectangle {
             left: parent.left
             right: parent.right
             bottom: parent.bottom
-            leftMargin: Theme.margin
-            rightMargin: Theme.margin
+            leftMargin: Theme.inset(header.width)
+            rightMargin: Theme.inset(header.width)
             bottomMargin: Theme.padding / 2
         }
         text: header.section

@@ -1,55 +1,28 @@
 import QtQuick
 import Qelwatch.Ui
 
-// One screen: its bar, what there is to say to the reader, and its table.
-FocusScope {
+// A screen that is one table.
+Screen {
     id: screen
 
     required property TableModel table
-    property string notice
-    property string condition
     property string source
-    property string loss
-    required property InterfaceDescription storyboard
-    property bool isFirst
 
-    signal back
-
-    Accessible.role: Accessible.Pane
-    Accessible.name: table.title
-
-    Rectangle {
-        anchors.fill: parent
-        color: Theme.page
-    }
-    // The edge of a screen that slides over another.
-    Hairline {
-        anchors {
-            right: parent.left
-            top: parent.top
-            bottom: parent.bottom
-        }
-        width: Theme.hairline
-    }
+    atTop: list.atTop
 
     TableList {
         id: list
-        anchors {
-            top: noticeBar.bottom
-            bottom: footer.top
-            left: parent.left
-            right: parent.right
-        }
+        anchors.fill: parent
         model: screen.table
-        storyboard: screen.storyboard
+        storyboard: screen.navigation.storyboard
         focus: true
         visible: !emptyText.visible
+        footer: screen.isFirst ? firstFooter : null
     }
-
     EmptyText {
         id: emptyText
         anchors {
-            top: list.top
+            top: parent.top
             left: parent.left
             right: parent.right
         }
@@ -58,42 +31,16 @@ FocusScope {
         technology: screen.table.previousTitle
         hasRows: screen.table.count > 0
     }
+    Component {
+        id: firstFooter
 
-    NoticeBar {
-        id: noticeBar
-        anchors {
-            top: bar.bottom
-            left: parent.left
-            right: parent.right
+        // qmllint disable unqualified
+        FirstScreenFooter {
+            width: list.width
+            source: screen.source
+            condition: screen.navigation.condition
+            loss: screen.navigation.loss
         }
-        text: screen.notice
-    }
-
-    ScreenBar {
-        id: bar
-        anchors {
-            top: parent.top
-            left: parent.left
-            right: parent.right
-        }
-        title: screen.table.title
-        previousTitle: screen.table.previousTitle
-        hasBack: !screen.isFirst
-        hairline: !list.atTop
-        onBack: screen.back()
-    }
-
-    FirstScreenFooter {
-        id: footer
-        anchors {
-            bottom: parent.bottom
-            left: parent.left
-            right: parent.right
-        }
-        height: screen.isFirst ? implicitHeight : 0
-        visible: screen.isFirst
-        source: screen.source
-        condition: screen.condition
-        loss: screen.loss
+        // qmllint enable unqualified
     }
 }

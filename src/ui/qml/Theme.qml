@@ -15,6 +15,12 @@ QtObject {
     readonly property color accent: dark ? "#5CD6CB" : "#005F5B"
     readonly property color noticeGround: dark ? "#3A2C05" : "#FFF4D6"
     readonly property color noticeText: dark ? "#FFD98A" : "#5C3D00"
+    readonly property color error: dark ? "#FF9A9A" : "#A3121F"
+
+    // How good a level is; never without the word.
+    readonly property color good: dark ? "#5FD39A" : "#006B3C"
+    readonly property color fair: dark ? "#F0C75E" : "#7A5B00"
+    readonly property color poor: dark ? "#FF9A9A" : "#A3121F"
 
     // The accent laid thinly over a row.
     readonly property color pressTint: Qt.alpha(accent, 0.12)
@@ -29,11 +35,20 @@ QtObject {
     readonly property int margin: 16
     readonly property int padding: 12
     readonly property int touch: 48
+    // Lines longer than that are hard to follow on a desktop.
+    readonly property int contentWidth: 640
     readonly property int hairline: 1
 
     readonly property int pressMs: 80
+    // A second tap so soon after a screen came was meant for the screen before.
+    readonly property int guardMs: Appearance.reducedMotion ? 0 : 300
     readonly property int slideMs: Appearance.reducedMotion ? 0 : 200
     readonly property int changeMs: Appearance.reducedMotion ? 0 : 600
+
+    // From the left edge of something so wide to where its content begins, and to where it ends.
+    function inset(width: real): real {
+        return margin + Math.max(0, Math.round((width - contentWidth) / 2));
+    }
 
     // A long name may break after each of its underscores.
     function breakable(text: string): string {

@@ -23,12 +23,14 @@ class Navigation : public QAbstractListModel, public QQmlParserStatus {
   Q_PROPERTY(qel::InterfaceDescription* storyboard MEMBER _storyboard NOTIFY storyboardChanged)
   Q_PROPERTY(int depth READ depth NOTIFY depthChanged)
   Q_PROPERTY(qel::TableModel* top READ top NOTIFY depthChanged)
+  Q_PROPERTY(QString topKind READ topKind NOTIFY depthChanged)
   Q_PROPERTY(QString notice READ notice WRITE setNotice NOTIFY noticeChanged)
   Q_PROPERTY(QString loss READ loss WRITE setLoss NOTIFY lossChanged)
   Q_PROPERTY(QString condition READ condition WRITE setCondition NOTIFY conditionChanged)
 
  public:
-  enum Role { tableRole = Qt::UserRole + 1 };
+  // A screen is a table, or a page of the kind that it was opened by; `table` is then null.
+  enum Role { tableRole = Qt::UserRole + 1, kindRole, titleRole, subtitleRole, previousTitleRole };
 
   explicit Navigation(QObject* parent = nullptr);
   ~Navigation() override;
@@ -45,7 +47,10 @@ class Navigation : public QAbstractListModel, public QQmlParserStatus {
 
   // Screens on the stack; the list may still hold more that were left.
   int depth() const { return _depth; }
+  // The table in sight; null while a page is.
   TableModel* top() const;
+  // "table", or which page is in sight.
+  QString topKind() const;
 
   // A line for the reader under the title of every screen; empty: none.
   QString notice() const { return _notice; }
@@ -59,6 +64,9 @@ class Navigation : public QAbstractListModel, public QQmlParserStatus {
   void setCondition(const QString& condition);
 
   Q_INVOKABLE void back();
+  // Puts a page on the stack: "signals", "happenings" or "recordings". One that is on it already is
+  // gone back to; any other name is passed over.
+  Q_INVOKABLE void open(const QString& page);
   Q_INVOKABLE void settle();
 
  signals:
@@ -71,11 +79,18 @@ class Navigation : public QAbstractListModel, public QQmlParserStatus {
  private:
   void follow(const TableModel* table, IndexPath indexPath);
   void stackChanged();
-  void show(const std::shared_ptr<TableViewController>& controller);
+  void show(const std::shared_ptr<ViewController>& controller);
 
   InterfaceDescription* _storyboard = nullptr;
   std::shared_ptr<RootNavigationController> _controller;
-  std::vector<TableModel*> _screens;  // children
+  struct Screen {
+    QString kind;
+    QString title;
+    QString subtitle;  // the technology of a category; empty: none
+    QString previousTitle;
+    TableModel* table = nullptr;  // a child
+  };
+  std::vector<Screen> _screens;
   int _depth = 0;
   QString _notice;
   QString _loss;

@@ -1,0 +1,6 @@
+import QtQuick
+
+// A list whose rows know whether the keyboard is on them.
+ListView {
+    property bool keysHere: false
+}

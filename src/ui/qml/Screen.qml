@@ -1,0 +1,66 @@
+import QtQuick
+import Qelwatch.Ui
+
+// What every screen has: its ground, its bar, the notice under that, and its content below.
+FocusScope {
+    id: screen
+
+    required property string title
+    required property string subtitle
+    required property string previousTitle
+    required property Navigation navigation
+    required property bool isFirst
+    property bool atTop: true
+    default property alias content: content.data
+    property alias actions: bar.actions
+
+    Accessible.role: Accessible.Pane
+    Accessible.name: title
+
+    Rectangle {
+        anchors.fill: parent
+        color: Theme.page
+    }
+    // The edge of a screen that slides over another.
+    Hairline {
+        anchors {
+            right: parent.left
+            top: parent.top
+            bottom: parent.bottom
+        }
+        width: Theme.hairline
+    }
+    FocusScope {
+        id: content
+        anchors {
+            top: noticeBar.bottom
+            bottom: parent.bottom
+            left: parent.left
+            right: parent.right
+        }
+        focus: true
+    }
+    NoticeBar {
+        id: noticeBar
+        anchors {
+            top: bar.bottom
+            left: parent.left
+            right: parent.right
+        }
+        text: screen.navigation.notice
+    }
+    ScreenBar {
+        id: bar
+        anchors {
+            top: parent.top
+            left: parent.left
+            right: parent.right
+        }
+        title: screen.title
+        subtitle: screen.subtitle
+        previousTitle: screen.previousTitle
+        hasBack: !screen.isFirst
+        hairline: !screen.atTop
+        onBack: screen.navigation.back()
+    }
+}
