@@ -163,6 +163,19 @@ std::vector<JournalEntry> Journal::of(std::int64_t metric, std::uint64_t fromMs,
   return entries;
 }
 
+void Journal::visit(std::uint64_t fromMs, std::uint64_t toMs,
+                    const std::function<void(const JournalEntry&)>& visit) const {
+  const auto first =
+      std::ranges::lower_bound(_chunks, fromMs, {}, [](const Chunk& chunk) { return chunk.toMs; });
+  for (auto chunk = first; chunk != _chunks.end() && chunk->fromMs <= toMs; ++chunk) {
+    for (std::size_t position = 0; position < chunk->size;) {
+      const Place place = read(*chunk, position);
+      if (place.receivedMs > toMs) return;
+      if (place.receivedMs >= fromMs) visit(entry(*chunk, place));
+    }
+  }
+}
+
 std::vector<JournalEntry> Journal::newest(std::int64_t metric, std::uint64_t atMs,
                                           std::size_t most) const {
   std::vector<JournalEntry> entries;

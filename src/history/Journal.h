@@ -4,6 +4,7 @@
 #include <array>
 #include <cstdint>
 #include <deque>
+#include <functional>
 #include <memory>
 #include <optional>
 #include <vector>
@@ -37,6 +38,9 @@ class Journal {
 
   // Those of one metric within both times, oldest first.
   std::vector<JournalEntry> of(std::int64_t metric, std::uint64_t fromMs, std::uint64_t toMs) const;
+  // Calls `visit` for all within both times, oldest first.
+  void visit(std::uint64_t fromMs, std::uint64_t toMs,
+             const std::function<void(const JournalEntry&)>& visit) const;
   // The newest of one metric that is not after this time.
   std::optional<JournalEntry> last(std::int64_t metric, std::uint64_t atMs) const;
   // The newest of all that is not after this time.

@@ -25,6 +25,7 @@ void addStatusCommand(CLI::App& app, Action& chosen);
 void addLiveCommand(CLI::App& app, Action& chosen, const bool& verbose);
 void addRecordCommand(CLI::App& app, Action& chosen);
 void addImportCommand(CLI::App& app, Action& chosen);
+void addExportCommand(CLI::App& app, Action& chosen);
 void addDiagReportCommand(CLI::App& app, Action& chosen);
 
 }  // namespace qel::tools

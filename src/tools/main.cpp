@@ -53,6 +53,7 @@ int main(int argc, char* argv[]) {
   tools::addLiveCommand(app, chosen, verbose);
   tools::addRecordCommand(app, chosen);
   tools::addImportCommand(app, chosen);
+  tools::addExportCommand(app, chosen);
   tools::addDiagReportCommand(app, chosen);
 
   try {

@@ -1,0 +1,83 @@
+#include "export/Exporter.h"
+
+#include <limits>
+#include <utility>
+
+#include "export/HappeningTable.h"
+#include "messages/catalogue/KBBMetricUtility.h"
+#include "messages/catalogue/TagLog.h"
+#include "recording/Mark.h"
+
+namespace qel {
+namespace {
+
+// All of them: none may go before it is written.
+History::Limits limitsOfHistory() {
+  History::Limits limits;
+  limits.mostHappenings = std::numeric_limits<std::size_t>::max();
+  return limits;
+}
+
+const MetricMessage* messageOf(const Dictionary& event) {
+  const Value* metric = event.find(kRecordedMetricKey);
+  const auto identifier = metric ? metric->asInt64() : std::nullopt;
+  if (!identifier || *identifier < kMetricEventBase || *identifier > kMetricEventBase + 0xFFFF) {
+    return nullptr;
+  }
+  return findMetricMessage(static_cast<std::uint32_t>(*identifier - kMetricEventBase));
+}
+
+}  // namespace
+
+Exporter::Exporter(TableSink& sink, IdentityHider* hider)
+    : _sink(sink), _hider(hider), _history(limitsOfHistory()), _dispatcher(&_history) {}
+
+bool Exporter::report(const RecordedEvent& event) {
+  const MetricMessage* message = messageOf(event.entries);
+  if (!message) {
+    ++_counts.without;
+    return true;
+  }
+  const Value* payload = event.entries.find(kRecordedPayloadKey);
+  const Bytes* bytes = payload ? payload->asBytes() : nullptr;
+  const CountedTagLines tagLines;
+  auto record = message->describe(bytes ? ByteView(*bytes) : ByteView());
+  if (!record) return true;
+  const MetricTable& table = _tables.try_emplace(message->identifier, *message).first->second;
+  ++_counts.events;
+  return table.rows(event.timeMs, std::move(*record), [&](const TableRow& row) {
+    ++_counts.rows;
+    return _sink.put(table.table(), row);
+  });
+}
+
+bool Exporter::tellHappenings() {
+  const auto& happenings = _history.happenings();
+  for (; _happeningsTold < happenings.size(); ++_happeningsTold) {
+    if (!_sink.put(happeningTable(), rowOf(happenings[_happeningsTold]))) return false;
+  }
+  return true;
+}
+
+bool Exporter::take(RecordedEvent event) {
+  if (_hider && !_hider->hide(event)) return true;
+  if (event.kind == RecordedKind::metric) {
+    if (!report(event)) return false;
+    _dispatcher.take(event.entries, event.timeMs);
+  } else if (const auto mark = markOf(event)) {
+    Happening happening;
+    happening.timeMs = event.timeMs;
+    happening.kind = HappeningKind::mark;
+    happening.text = markText(*mark);
+    _history.add(std::move(happening));
+  }
+  return tellHappenings();
+}
+
+bool Exporter::finish() {
+  _counts.tables = _tables.size();
+  _counts.happenings = _happeningsTold;
+  return _sink.make(happeningTable()) && _sink.finish();
+}
+
+}  // namespace qel

@@ -1,0 +1,62 @@
+#include "history/recorded/RecordingDigest.h"
+
+#include <sys/stat.h>
+
+#include <algorithm>
+#include <array>
+#include <limits>
+#include <utility>
+
+#include "metrics/MetricValidator.h"
+
+namespace qel {
+namespace {
+
+constexpr std::size_t kMostCells = 65536;
+constexpr std::array kServingCellMetrics = {MetricValidator::K_LTE_SCELL_INFO,
+                                            MetricValidator::K_UMTS_SCELL_INFO,
+                                            MetricValidator::K_GSM_SCELL_INFO};
+
+std::uint64_t orNone(const std::optional<std::uint32_t>& number) {
+  return number ? *number : std::numeric_limits<std::uint64_t>::max();
+}
+
+}  // namespace
+
+std::unique_ptr<RecordingDigest> RecordingDigest::open(const std::string& path,
+                                                       RecordingFault& fault) {
+  struct stat status {};
+  if (::stat(path.c_str(), &status) == 0 && !S_ISREG(status.st_mode)) {
+    fault = {RecordingFault::Kind::notOpened, path + ": no regular file"};
+    return nullptr;
+  }
+  auto reader = RecordingReader::open(path, RecordingReader::BadLines::skip, fault);
+  if (!reader) return nullptr;
+  return std::unique_ptr<RecordingDigest>(new RecordingDigest(std::move(reader)));
+}
+
+RecordingDigest::RecordingDigest(std::unique_ptr<RecordingReader> reader)
+    : _reader(std::move(reader)), _dispatcher(&_history) {}
+
+void RecordingDigest::take(const RecordedEvent& event) {
+  if (_events++ == 0) _beginMs = _endMs = event.timeMs;
+  _endMs = std::max(_endMs, event.timeMs);
+  const Value* metric = event.entries.find(kRecordedMetricKey);
+  if (!metric || !std::ranges::count(kServingCellMetrics, metric->asInt64())) return;
+  if (!QuietDispatcher::isReadable(event.entries)) return;
+  _dispatcher.take(event.entries, _endMs);
+  const auto cell = _history.servingCell(_endMs);
+  if (!cell || _cells.size() >= kMostCells) return;
+  _cells.emplace(cell->technology, orNone(cell->channel), orNone(cell->code), orNone(cell->cellId));
+}
+
+bool RecordingDigest::readOn(std::size_t events) {
+  for (; events > 0; --events) {
+    const auto event = _reader->next();
+    if (!event) return false;
+    take(*event);
+  }
+  return true;
+}
+
+}  // namespace qel

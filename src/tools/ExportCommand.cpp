@@ -1,0 +1,173 @@
+// qelctl export: a recording as tables, for spreadsheets and databases.
+
+#include <CLI/CLI.hpp>
+#include <cerrno>
+#include <chrono>
+#include <csignal>
+#include <cstring>
+#include <memory>
+#include <optional>
+#include <string>
+
+#include "export/CsvSink.h"
+#include "export/Exporter.h"
+#include "export/SqliteSink.h"
+#include "recording/RecordingReader.h"
+#include "tools/Commands.h"
+#include "tools/RecordProgress.h"
+#include "tools/RecordingFeed.h"
+#include "tools/StopSignals.h"
+#include "tools/ToolError.h"
+
+namespace qel::tools {
+namespace {
+
+using std::chrono::steady_clock;
+
+constexpr const char* kCsv = "csv";
+constexpr const char* kSqlite = "sqlite";
+
+struct Options {
+  RecordingOptions recording;
+  std::string format;
+  std::string out;
+  bool keepIdentities = false;
+  bool force = false;
+};
+
+std::unique_ptr<TableSink> begin(const Options& options) {
+  std::string error;
+  std::unique_ptr<TableSink> sink;
+  if (options.format == kCsv) {
+    sink = CsvSink::create(options.out, options.force, error);
+  } else {
+    sink = SqliteSink::create(options.out, options.force, error);
+  }
+  if (sink) return sink;
+  const bool isThere =
+      error.ends_with(std::strerror(EEXIST)) || error.ends_with(std::strerror(ENOTEMPTY));
+  throw ToolError(EX_IOERR, error + (isThere ? " (--force replaces what is there)" : ""));
+}
+
+// What a reader tells besides events, and what came of it.
+class Run {
+ public:
+  explicit Run(const Options& options) : _options(options) {}
+
+  // 0, or the signal that ended it.
+  int all();
+
+ private:
+  std::unique_ptr<RecordingReader> open() const;
+  void take(RecordedEvent event);
+  void look();
+  void summarize(const Exporter::Counts& counts);
+
+  const Options& _options;
+  RecordProgress _progress;
+  const std::unique_ptr<RecordingReader> _reader = open();
+  const std::unique_ptr<TableSink> _sink = begin(_options);
+  std::optional<IdentityHider> _hider;
+  std::optional<Exporter> _exporter;
+  const StopSignals _signals{StopSignals::Waiting::fails};
+  steady_clock::time_point _shownAt = steady_clock::now();
+  std::uint64_t _undecodable = 0;
+};
+
+std::unique_ptr<RecordingReader> Run::open() const {
+  using BadLines = RecordingReader::BadLines;
+  RecordingFault fault;
+  auto reader = RecordingReader::open(
+      _options.recording.file, _options.recording.skipBad ? BadLines::skip : BadLines::fail, fault);
+  if (!reader) throw ToolError(fault.exitCode(), fault.message);
+  return reader;
+}
+
+void Run::take(RecordedEvent event) {
+  if (event.kind == RecordedKind::metric && !QuietDispatcher::isReadable(event.entries)) {
+    ++_undecodable;
+    if (_options.recording.skipBad) return;
+    throw ToolError(EX_DATAERR,
+                    _options.recording.file + ":" + std::to_string(_reader->lineNumber()),
+                    "the payload of metric " +
+                        std::to_string(*event.entries.find(kRecordedMetricKey)->asInt64()) +
+                        " cannot be decoded (--skip-bad passes over it)");
+  }
+  if (!_exporter->take(std::move(event))) throw ToolError(EX_IOERR, _sink->error());
+}
+
+void Run::look() {
+  constexpr auto kPause = std::chrono::milliseconds(250);
+  const auto now = steady_clock::now();
+  if (now < _shownAt + kPause) return;
+  _shownAt = now;
+  _progress.show("exporting " + _options.recording.file + ": " +
+                 std::to_string(static_cast<int>(100 * _reader->share())) + " %");
+}
+
+void Run::summarize(const Exporter::Counts& counts) {
+  std::string text = _options.out + ": " + std::to_string(counts.events) + " events in " +
+                     std::to_string(counts.tables) + " tables, " +
+                     std::to_string(counts.happenings) + " happenings";
+  if (counts.without > 0) {
+    text += ", " + std::to_string(counts.without) + " events without a message class left out";
+  }
+  if (_undecodable > 0)
+    text += ", " + std::to_string(_undecodable) + " undecodable events left out";
+  if (_reader->cutOff()) _progress.say(*_reader->cutOff());
+  if (_reader->skippedLines() > 0) {
+    _progress.say(_options.recording.file +
+                  ": bad lines skipped: " + std::to_string(_reader->skippedLines()));
+  }
+  _progress.say(text + (_options.keepIdentities ? ", identities kept" : ", identities hidden"));
+}
+
+int Run::all() {
+  if (!_options.keepIdentities) _hider.emplace(Pseudonyms::random());
+  _exporter.emplace(*_sink, _hider ? &*_hider : nullptr);
+  while (_signals.arrived() == 0) {
+    auto event = _reader->next();
+    if (!event) break;
+    take(std::move(*event));
+    look();
+  }
+  if (_signals.arrived() != 0) return _signals.arrived();
+  if (_reader->fault()) throw ToolError(_reader->fault()->exitCode(), _reader->fault()->message);
+  if (!_exporter->finish()) throw ToolError(EX_IOERR, _sink->error());
+  summarize(_exporter->counts());
+  return 0;
+}
+
+// A signal ends the program as it would have, but with nothing left behind.
+void run(const Options& options) {
+  const int signal = Run(options).all();
+  if (signal != 0) std::raise(signal);
+}
+
+}  // namespace
+
+void addExportCommand(CLI::App& app, Action& chosen) {
+  auto* command = app.add_subcommand(
+      "export", "Write a recording as tables (CSV or SQLite), with identities hidden");
+  command->footer(
+      "One file or table a message class, in the units of the screens, with times in UTC; an "
+      "entry\n"
+      "of a list is a row. Beside them \"happenings\". Subscriber and temporary identities, SIM "
+      "file\n"
+      "contents and addresses are replaced by pseudonyms; cells and areas stay.");
+  const auto options = std::make_shared<Options>();
+  addRecordingOptions(*command, options->recording);
+  command->add_option("--format", options->format, "csv or sqlite")
+      ->required()
+      ->type_name("FORMAT")
+      ->check(CLI::IsMember({kCsv, kSqlite}).description(""));
+  command->add_option("--out", options->out, "Folder of the CSV files, or database")
+      ->required()
+      ->type_name("DIR|FILE");
+  command->add_flag("--keep-identities", options->keepIdentities, "Write them as they are");
+  command->add_flag("--force", options->force,
+                    "Replace the database, or the CSV files in the folder");
+  command->callback([options, &chosen] { chosen = [options](Output&) { run(*options); }; });
+}
+
+}  // namespace qel::tools
