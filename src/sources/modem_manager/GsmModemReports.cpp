@@ -1,8 +1,8 @@
 // The metrics of a modem on GSM.
 #include "messages/gsm.h"
-#include "sources/Bands.h"
+#include "radio/Bands.h"
+#include "radio/Levels.h"
 #include "sources/Filling.h"
-#include "sources/Levels.h"
 #include "sources/modem_manager/CellFilling.h"
 #include "sources/modem_manager/ModemReports.h"
 

@@ -1,9 +1,9 @@
 // The metrics of a modem on LTE.
 #include "messages/lte_neighbours.h"
 #include "messages/lte_serving.h"
-#include "sources/Bands.h"
+#include "radio/Bands.h"
+#include "radio/Levels.h"
 #include "sources/Filling.h"
-#include "sources/Levels.h"
 #include "sources/modem_manager/CellFilling.h"
 #include "sources/modem_manager/ModemReports.h"
 

@@ -1,5 +1,6 @@
 // What the phone reports on GSM.
 #include "messages/gsm.h"
+#include "radio/Bands.h"
 #include "sources/simulated/Random.h"
 #include "sources/simulated/Reports.h"
 
@@ -74,7 +75,7 @@ std::optional<Bytes> gsmScellInfo(const PhoneView& view, std::uint64_t timeMs) {
   message.setMnc(kMnc);
   message.setLac(cell.area);
   message.setCellId(cell.cellId);
-  message.setGsmBand(kBandGsm900);
+  message.setGsmBand(kGsm900E);
   message.setArfcn(cell.channel);
   message.setBsic(cell.code);
   message.setState(dedicated(view) ? kGsmDedicated : kGsmNotDedicated);
@@ -97,7 +98,7 @@ std::optional<Bytes> gsmIdleConfig(const PhoneView& view, std::uint64_t timeMs) 
   message.setDtxFromBs(1);
   message.setRadioLinkTimeout(24);
   message.setMultibRep(0);
-  message.setGsmBand(kBandGsm900);
+  message.setGsmBand(kGsm900E);
   message.setAccessTech(0);
   message.setTypeOfCurChan(0);
   message.setMsTxpwr(kHighestPowerLevel);
@@ -147,7 +148,7 @@ std::optional<Bytes> gsmCallMeasurement(const PhoneView& view, std::uint64_t tim
   }
   message.setCsRxlevSub(rxlevIndex(levelDbm));
   message.setCsRxqualSub(qualityOf(levelDbm));
-  message.setScellBand(kBandGsm900);
+  message.setScellBand(kGsm900E);
   return message.data();
 }
 

@@ -3,7 +3,7 @@
 #include <array>
 #include <vector>
 
-#include "sources/simulated/WireCodes.h"
+#include "radio/Bands.h"
 
 namespace qel::sources {
 namespace {
@@ -15,9 +15,9 @@ constexpr std::array kLayers = {
     Layer{lte, 1300, 3, 122, 5, 1815, 24, 0.4, 6, -122, 14, 12, 8},
     Layer{lte, 6300, 20, 139, 3, 806, 24, 0.4, 5, -122, 14, 8, 6},
     Layer{lte, 2850, 7, 126, 5, 2630, 23, 0.3, 4, -120, 30, 30, 6},
-    Layer{umts, 10713, 1, kBandUmtsI, 0, 2142.6, 42, 0.5, 3, -115, 10, 6, 5},
-    Layer{umts, 3011, 8, kBandUmtsVIII, 0, 942.2, 40, 0.5, 3, -115, 10, 6, 5},
-    Layer{gsm, 0, 900, kBandGsm900, 0, 945, 51, 1.0, 1, -106, 10, 6, 0},
+    Layer{umts, 10713, 1, kUmtsI, 0, 2142.6, 42, 0.5, 3, -115, 10, 6, 5},
+    Layer{umts, 3011, 8, kUmtsVIII, 0, 942.2, 40, 0.5, 3, -115, 10, 6, 5},
+    Layer{gsm, 0, 900, kGsm900E, 0, 945, 51, 1.0, 1, -106, 10, 6, 0},
 };
 
 // Which layers a mast carries, as bits in the order above.

@@ -5,9 +5,9 @@
 #include <span>
 #include <string_view>
 
-namespace qel::sources {
+#include "radio/Technology.h"
 
-enum class Technology : std::uint8_t { lte, umts, gsm };
+namespace qel::sources {
 
 // The home network, of the range kept for tests (23.003; ITU-T E.212).
 inline constexpr std::uint32_t kMcc = 1;

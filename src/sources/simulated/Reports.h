@@ -7,7 +7,7 @@
 #include <vector>
 
 #include "base/Bytes.h"
-#include "sources/Levels.h"
+#include "radio/Levels.h"
 #include "sources/simulated/Phone.h"
 #include "sources/simulated/RadioScene.h"
 

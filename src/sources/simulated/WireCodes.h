@@ -81,11 +81,6 @@ enum PdpTypeCode : std::int32_t {
 
 enum SecondaryCarrierCode : std::int32_t { kSccDeactivated = 1, kSccActivated = 2 };
 
-// Of SystemBand.
-inline constexpr std::int32_t kBandGsm900 = 44;
-inline constexpr std::int32_t kBandUmtsI = 80;
-inline constexpr std::int32_t kBandUmtsVIII = 87;
-
 inline constexpr std::int32_t kEmmCsPsMode1 = 2;
 inline constexpr std::int32_t kHspaBoth = 3;
 inline constexpr std::int32_t kFrameFdd = 0;

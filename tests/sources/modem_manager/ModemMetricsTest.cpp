@@ -7,7 +7,7 @@
 #include "messages/nas.h"
 #include "messages/sim.h"
 #include "messages/wcdma.h"
-#include "sources/Bands.h"
+#include "radio/Bands.h"
 #include "sources/Metrics.h"
 #include "sources/modem_manager/ModemWorld.h"
 

@@ -6,7 +6,7 @@
 #include "messages/lte_serving.h"
 #include "messages/nas.h"
 #include "messages/sim.h"
-#include "sources/Bands.h"
+#include "radio/Bands.h"
 #include "sources/modem_manager/ModemReleases.h"
 #include "support/RecordingSink.h"
 

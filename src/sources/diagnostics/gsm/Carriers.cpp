@@ -3,7 +3,7 @@
 #include <algorithm>
 #include <array>
 
-#include "sources/Bands.h"
+#include "radio/Bands.h"
 
 namespace qel::diagnostics {
 namespace {
@@ -16,11 +16,11 @@ struct Channels {
 };
 
 constexpr std::array kChannels = {
-    Channels{8, 0, 0, sources::kGsm900E},        Channels{8, 1, 124, sources::kGsm900P},
-    Channels{8, 955, 974, sources::kGsm900R},    Channels{8, 975, 1023, sources::kGsm900E},
-    Channels{9, 512, 885, sources::kGsmDcs1800}, Channels{10, 512, 810, sources::kGsmPcs1900},
-    Channels{11, 128, 251, sources::kGsm850},    Channels{12, 259, 293, sources::kGsm450},
-    Channels{12, 306, 340, sources::kGsm480},
+    Channels{8, 0, 0, kGsm900E},        Channels{8, 1, 124, kGsm900P},
+    Channels{8, 955, 974, kGsm900R},    Channels{8, 975, 1023, kGsm900E},
+    Channels{9, 512, 885, kGsmDcs1800}, Channels{10, 512, 810, kGsmPcs1900},
+    Channels{11, 128, 251, kGsm850},    Channels{12, 259, 293, kGsm450},
+    Channels{12, 306, 340, kGsm480},
 };
 
 }  // namespace

@@ -1,8 +1,8 @@
 #include "sources/diagnostics/gsm/GsmReports.h"
 
 #include "messages/gsm.h"
+#include "radio/Levels.h"
 #include "sources/Filling.h"
-#include "sources/Levels.h"
 
 namespace qel::diagnostics {
 namespace {
@@ -105,7 +105,7 @@ std::optional<Bytes> gsmIdleLevelReport(const Picture& picture, std::uint64_t ti
   KCellularGsmIdleScellMeasurement message;
   message.setTimestamp(timeMs);
   set(message, &KCellularGsmIdleScellMeasurement::setScellArfcn, level->arfcn);
-  message.setIdleRxlevDBm(sources::rounded(level->dbm));
+  message.setIdleRxlevDBm(rounded(level->dbm));
   return message.data();
 }
 
@@ -152,7 +152,7 @@ std::optional<Bytes> gsmNeighboursReport(const Picture& picture, std::uint64_t t
     auto entry = std::make_shared<GsmNcellMeas>();
     entry->setArfcn(cell.arfcn);
     set(*entry, &GsmNcellMeas::setBsic, cell.bsic);
-    entry->setRxlev(sources::rxlevIndex(cell.levelDbm));
+    entry->setRxlev(rxlevIndex(cell.levelDbm));
     message.addGsmNcellMeas(entry);
   }
   return message.data();

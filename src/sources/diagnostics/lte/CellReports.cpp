@@ -4,9 +4,9 @@
 
 #include "messages/lte_neighbours.h"
 #include "messages/lte_serving.h"
-#include "sources/Bands.h"
+#include "radio/Bands.h"
+#include "radio/Levels.h"
 #include "sources/Filling.h"
-#include "sources/Levels.h"
 #include "sources/diagnostics/lte/Bandwidth.h"
 
 namespace qel::diagnostics {
@@ -18,7 +18,7 @@ using sources::set;
 constexpr std::int32_t kConfigured = 1;
 constexpr std::int32_t kActivated = 2;
 
-std::int32_t hundredths(double value) { return sources::rounded(value * 100); }
+std::int32_t hundredths(double value) { return rounded(value * 100); }
 
 // Of each quantity by itself the best antenna's, as the modem combines them.
 void setLevels(const LteAntennas& antennas, SecondaryComponentCarrier& entry) {
@@ -129,10 +129,10 @@ std::optional<Bytes> lteNeighbours(const Picture& picture, std::uint64_t timeMs)
     entry->setNbrPhysCellId(neighbour.cell.pci);
     if (neighbour.cell.earfcn != kUnknownEarfcn) {
       entry->setNbrEarfcn(neighbour.cell.earfcn);
-      set(*entry, &EgwErrcNbrEutraMeas::setFreqBandInd, sources::lteBandOf(neighbour.cell.earfcn));
+      set(*entry, &EgwErrcNbrEutraMeas::setFreqBandInd, lteBandOf(neighbour.cell.earfcn));
     }
-    set(*entry, &EgwErrcNbrEutraMeas::setNbrRsrp, neighbour.rsrpDbm, sources::rsrpIndex);
-    set(*entry, &EgwErrcNbrEutraMeas::setNbrRsrq, neighbour.rsrqDb, sources::rsrqIndex);
+    set(*entry, &EgwErrcNbrEutraMeas::setNbrRsrp, neighbour.rsrpDbm, rsrpIndex);
+    set(*entry, &EgwErrcNbrEutraMeas::setNbrRsrq, neighbour.rsrqDb, rsrqIndex);
     message.addMeasNbrEutra(entry);
     any = true;
   }

@@ -2,7 +2,7 @@
 
 #include <algorithm>
 
-#include "sources/Bands.h"
+#include "radio/Bands.h"
 #include "sources/Metrics.h"
 #include "sources/diagnostics/lte/Bandwidth.h"
 
@@ -32,7 +32,7 @@ std::optional<std::uint32_t> codeOf(const std::optional<unsigned>& blocks) {
 }
 
 std::optional<std::uint32_t> bandOf(const std::optional<std::uint32_t>& earfcn) {
-  return earfcn ? sources::lteBandOf(*earfcn) : std::nullopt;
+  return earfcn ? lteBandOf(*earfcn) : std::nullopt;
 }
 
 SecondaryCarrier carrierOf(const SecondaryCell& cell) {

@@ -3,13 +3,12 @@
 #include <memory>
 
 #include "messages/lte_serving.h"
+#include "radio/Levels.h"
 #include "sources/Filling.h"
-#include "sources/Levels.h"
 
 namespace qel::diagnostics {
 namespace {
 
-using sources::rounded;
 using sources::set;
 
 // The list's places are the antennas: one that received nothing keeps its place, empty.
@@ -20,8 +19,8 @@ void addReceivers(const LteAntennas& antennas, KCellularLteServingCellMeasuremen
     auto receiver = std::make_shared<RxInfo>();
     if (const auto& antenna = antennas[i]) {
       receiver->setRssi(rounded(antenna->rssiDbm));
-      receiver->setRsrpRange(sources::rsrpIndex(antenna->rsrpDbm));
-      receiver->setRsrqRange(sources::rsrqIndex(antenna->rsrqDb));
+      receiver->setRsrpRange(rsrpIndex(antenna->rsrpDbm));
+      receiver->setRsrqRange(rsrqIndex(antenna->rsrqDb));
       if (antenna->snrDb) receiver->setSnr(rounded(*antenna->snrDb));
     }
     message.addRxInfo(receiver);
@@ -32,8 +31,8 @@ void addReceivers(const LteAntennas& antennas, KCellularLteServingCellMeasuremen
 void addTogether(const LteLevel& level, KCellularLteServingCellMeasurement& message) {
   auto receiver = std::make_shared<RxInfo>();
   if (level.rssiDbm) receiver->setRssi(rounded(*level.rssiDbm));
-  receiver->setRsrpRange(sources::rsrpIndex(level.rsrpDbm));
-  receiver->setRsrqRange(sources::rsrqIndex(level.rsrqDb));
+  receiver->setRsrpRange(rsrpIndex(level.rsrpDbm));
+  receiver->setRsrqRange(rsrqIndex(level.rsrqDb));
   message.addRxInfo(receiver);
 }
 

@@ -4,7 +4,7 @@
 #include <memory>
 
 #include "messages/lte_serving.h"
-#include "sources/Bands.h"
+#include "radio/Bands.h"
 #include "sources/Filling.h"
 #include "sources/Metrics.h"
 #include "sources/diagnostics/lte/Bandwidth.h"
@@ -87,7 +87,7 @@ std::shared_ptr<NbrEutra> entryOf(const EutraCarrier& carrier) {
   set(*entry, &NbrEutra::setThresXHighQ, carrier.threshXHighQDb);
   set(*entry, &NbrEutra::setThresXLowQ, carrier.threshXLowQDb);
   set(*entry, &NbrEutra::setPriority, carrier.priority);
-  if (const auto band = sources::lteBandOf(carrier.earfcn)) {
+  if (const auto band = lteBandOf(carrier.earfcn)) {
     entry->setFrameType(isTdd(*band) ? kTdd : kFdd);
     entry->setBand(*band);
   }

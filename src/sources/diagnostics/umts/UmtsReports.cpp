@@ -6,16 +6,13 @@
 #include "messages/lte_neighbours.h"
 #include "messages/lte_serving.h"
 #include "messages/wcdma.h"
-#include "sources/Bands.h"
+#include "radio/Bands.h"
+#include "radio/Levels.h"
 #include "sources/Filling.h"
-#include "sources/Levels.h"
 
 namespace qel::diagnostics {
 namespace {
 
-using sources::ecnoIndex;
-using sources::rounded;
-using sources::rscpIndex;
 using sources::set;
 
 std::int32_t packetAccess(const UmtsPacketAccess& access) {
@@ -55,7 +52,7 @@ void add(const UmtsGsmNeighbour& cell, KCellularWcdmaNbrCellMeas& message) {
   auto entry = std::make_shared<GsmCellMeasResult>();
   entry->setArfcn(cell.arfcn);
   set(*entry, &GsmCellMeasResult::setBsic, cell.bsic);
-  entry->setRxlev(sources::rxlevIndex(cell.levelDbm));
+  entry->setRxlev(rxlevIndex(cell.levelDbm));
   message.addMeasGsmResult(entry);
 }
 
@@ -123,7 +120,7 @@ std::optional<Bytes> umtsCell(const Picture& picture, std::uint64_t timeMs) {
   }
   message.setLac(cell->areaCode);
   message.setCellId(cell->cellId);
-  set(message, &KCellularWcdmaCellInfo::setWcdmaBand, sources::umtsBandOf(cell->uarfcn));
+  set(message, &KCellularWcdmaCellInfo::setWcdmaBand, umtsBandOf(cell->uarfcn));
   message.setDlUarfcn(cell->uarfcn);
   message.setPsc(cell->scramblingCode);
   if (const auto& access = picture.umts.broadcast.packetAccess)

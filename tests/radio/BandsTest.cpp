@@ -1,4 +1,4 @@
-#include "sources/Bands.h"
+#include "radio/Bands.h"
 
 #include <gtest/gtest.h>
 
@@ -6,8 +6,6 @@
 
 namespace qel {
 namespace {
-
-using namespace sources;
 
 struct Span {
   std::uint32_t first;

@@ -5,7 +5,7 @@
 #include <cmath>
 #include <cstdint>
 
-namespace qel::sources {
+namespace qel {
 
 inline std::int32_t rounded(double value) { return static_cast<std::int32_t>(std::lround(value)); }
 
@@ -19,4 +19,4 @@ inline std::uint32_t rscpIndex(double dbm) { return index(dbm + 116, 91); }     
 inline std::uint32_t ecnoIndex(double db) { return index((db + 24.5) * 2, 49); }  // 25.133, 9.1.2.3
 inline std::uint32_t rxlevIndex(double dbm) { return index(dbm + 110, 63); }      // 45.008, 8.1.4
 
-}  // namespace qel::sources
+}  // namespace qel

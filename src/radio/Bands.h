@@ -3,10 +3,11 @@
 
 #include <cstdint>
 #include <optional>
+#include <string>
 
-#include "sources/simulated/WireCodes.h"
+#include "radio/Technology.h"
 
-namespace qel::sources {
+namespace qel {
 
 // Of SystemBand, those that a channel can be found to lie in.
 enum SystemBandCode : std::int32_t {
@@ -14,19 +15,19 @@ enum SystemBandCode : std::int32_t {
   kGsm480 = 41,
   kGsm750 = 42,
   kGsm850 = 43,
-  kGsm900E = kBandGsm900,
+  kGsm900E = 44,
   kGsm900P = 45,
   kGsm900R = 46,
   kGsmDcs1800 = 47,
   kGsmPcs1900 = 48,
-  kUmtsI = kBandUmtsI,
+  kUmtsI = 80,
   kUmtsII = 81,
   kUmtsIII = 82,
   kUmtsIV = 83,
   kUmtsV = 84,
   kUmtsVI = 85,
   kUmtsVII = 86,
-  kUmtsVIII = kBandUmtsVIII,
+  kUmtsVIII = 87,
   kUmtsIX = 88,
   kUmtsXI = 90,
   kUmtsXIX = 91,
@@ -44,4 +45,9 @@ std::optional<std::int32_t> umtsBandOf(std::uint32_t uarfcn);
 // of the two, and else nothing does.
 std::optional<std::int32_t> gsmBandOf(std::uint32_t arfcn, std::optional<std::uint32_t> mcc = {});
 
-}  // namespace qel::sources
+// In words, by the downlink channel: "band 20", "band VIII", "GSM 900", "DCS 1800". Empty where the
+// channel does not decide it.
+std::string bandText(Technology technology, std::uint32_t channel,
+                     std::optional<std::uint32_t> mcc = {});
+
+}  // namespace qel
