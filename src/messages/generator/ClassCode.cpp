@@ -116,7 +116,8 @@ void printHeader(Printer& printer, const FileDescriptor& file) {
       "file", file.name());
   for (int i = 0; i < file.dependency_count(); ++i) {
     const FileDescriptor& used = *file.dependency(i);
-    if (used.message_type_count() + used.enum_type_count() > 0) {
+    const bool ofOptions = used.extension_count() > 0;
+    if (!ofOptions && used.message_type_count() + used.enum_type_count() > 0) {
       printer.Print("#include \"messages/$stem$.h\"\n", "stem", stem(used));
     }
   }

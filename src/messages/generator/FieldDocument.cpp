@@ -1,9 +1,7 @@
 #include "messages/generator/FieldDocument.h"
 
-#include <google/protobuf/descriptor.pb.h>
-#include <google/protobuf/unknown_field_set.h>
-
 #include "messages/generator/Comments.h"
+#include "messages/generator/Facts.h"
 #include "messages/generator/Names.h"
 
 namespace qel::generator {
@@ -22,11 +20,15 @@ constexpr std::string_view kHead =
     "\n"
     "- **No.**: the field number on the wire.\n"
     "- **Key**: the field's key in the dictionary form.\n"
+    "- **Label**: what the field sheet calls it.\n"
     "- **Accessor**: the name of the getter, from which the other accessors are made.\n"
     "- **Type**: how the value is encoded. All integers are varints, those of `sint32` "
     "ZigZag-coded;\n"
     "  an enumeration travels as an `int32`.\n"
     "- **Repeated**: `packed` for a packed run of values, `list` for one field an element.\n"
+    "- **Shown in**: the unit in which the tables show it.\n"
+    "- **Travels as**: how it stands in the payload, where the tables show something else.\n"
+    "- **Range**: of the values as they are shown.\n"
     "\n"
     "Numbers such as \"36.331, clause 5.3\" name the 3GPP TS of that number.\n";
 
@@ -82,28 +84,25 @@ std::string code(std::string_view text) {
   return out + '`';
 }
 
-// "Metric 19972." The option is an extension that the generator is built without, so its number
-// is read as an unknown field.
-std::string metricOf(const Descriptor& message) {
-  constexpr int kMetricOption = 50101;
-  const auto& options = message.options();
-  const auto& unknown = options.GetReflection()->GetUnknownFields(options);
-  for (int i = 0; i < unknown.field_count(); ++i) {
-    if (unknown.field(i).number() == kMetricOption) {
-      return "Metric " + std::to_string(unknown.field(i).varint()) + ". ";
-    }
-  }
-  return "Only inside other messages. ";
+// "Metric 19972."
+std::string metricText(const Descriptor& message) {
+  const unsigned metric = metricOf(message);
+  return metric == 0 ? "Only inside other messages. " : "Metric " + std::to_string(metric) + ". ";
 }
 
 std::string messageSection(const Descriptor& message) {
   std::string out = "\n### " + message.name() + "\n\n";
-  out += metricOf(message) + paragraphs(textOf(message)) + "\n\n";
-  out += "| No. | Key | Accessor | Type | Repeated | Meaning |\n|---|---|---|---|---|---|\n";
+  out += metricText(message) + paragraphs(textOf(message)) + "\n\n";
+  out +=
+      "| No. | Key | Label | Accessor | Type | Repeated | Shown in | Travels as | Range | Meaning "
+      "|\n"
+      "|---|---|---|---|---|---|---|---|---|---|\n";
   for (int i = 0; i < message.field_count(); ++i) {
     const FieldDescriptor& field = *message.field(i);
-    out += row({std::to_string(field.number()), code(field.name()), code(propertyName(field)),
-                typeOf(field), repetitionOf(field), textOf(field)});
+    const Facts facts = factsOf(field);
+    out += row({std::to_string(field.number()), code(field.name()), facts.label,
+                code(propertyName(field)), typeOf(field), repetitionOf(field), facts.unit,
+                facts.raw, rangeText(facts), textOf(field)});
   }
   return out;
 }

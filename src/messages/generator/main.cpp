@@ -1,6 +1,7 @@
 // protoc plugin: from a schema, the message classes of this system. For each x.proto it writes x.h
 // and x.cpp; the rules of the codec are not here but in messages/runtime. With the parameter
-// "document" it writes fields.md instead, the table of the fields of all schemas.
+// "document" it writes fields.md instead, the table of the fields of all schemas, and with "facts"
+// FieldFacts.cpp, what the program itself knows of them.
 
 #include <google/protobuf/compiler/code_generator.h>
 #include <google/protobuf/compiler/plugin.h>
@@ -11,6 +12,7 @@
 #include <vector>
 
 #include "messages/generator/ClassCode.h"
+#include "messages/generator/FactsCode.h"
 #include "messages/generator/FieldDocument.h"
 #include "messages/generator/Names.h"
 
@@ -34,12 +36,17 @@ class MessageGenerator final : public CodeGenerator {
  public:
   bool GenerateAll(const std::vector<const FileDescriptor*>& schemas, const std::string& parameter,
                    GeneratorContext* context, std::string* error) const override {
-    if (parameter != "document") {
-      return CodeGenerator::GenerateAll(schemas, parameter, context, error);
+    if (parameter == "document") {
+      write(*context, "fields.md",
+            [&](Printer& printer) { printer.PrintRaw(fieldDocument(schemas)); });
+      return true;
     }
-    write(*context, "fields.md",
-          [&](Printer& printer) { printer.PrintRaw(fieldDocument(schemas)); });
-    return true;
+    if (parameter == "facts") {
+      write(*context, "FieldFacts.cpp",
+            [&](Printer& printer) { printer.PrintRaw(factsCode(schemas)); });
+      return true;
+    }
+    return CodeGenerator::GenerateAll(schemas, parameter, context, error);
   }
 
   bool Generate(const FileDescriptor* schema, const std::string&, GeneratorContext* context,
