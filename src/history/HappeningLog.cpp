@@ -11,6 +11,7 @@ void HappeningLog::add(Happening happening, std::uint64_t atMs) {
   if (_happenings.size() <= _most) return;
   _happenings.pop_front();
   _atMs.pop_front();
+  ++_gone;
 }
 
 void HappeningLog::add(const Report& report, HappeningKind kind,

@@ -28,11 +28,13 @@ class HappeningLog {
            std::string text);
 
   const std::deque<Happening>& all() const { return _happenings; }
+  std::uint64_t gone() const { return _gone; }
   // How many are not after this time.
   std::size_t until(std::uint64_t atMs) const;
 
  private:
   std::size_t _most;
+  std::uint64_t _gone = 0;
   std::deque<Happening> _happenings;
   std::deque<std::uint64_t> _atMs;  // of each
 };

@@ -153,6 +153,8 @@ std::uint64_t History::version() const { return _state->version; }
 
 const std::deque<Happening>& History::happenings() const { return _state->happenings.all(); }
 
+std::uint64_t History::happeningsGone() const { return _state->happenings.gone(); }
+
 std::size_t History::happeningsUntil(std::uint64_t atMs) const {
   return _state->happenings.until(atMs);
 }

@@ -59,6 +59,8 @@ class History final : public MetricObserver {
 
   // Oldest first; a page counts from the end.
   const std::deque<Happening>& happenings() const;
+  // How many older ones went: the number of the first one here, counted from 0 of all ever.
+  std::uint64_t happeningsGone() const;
   // How many of them are not after this time.
   std::size_t happeningsUntil(std::uint64_t atMs) const;
 

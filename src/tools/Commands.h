@@ -19,6 +19,7 @@ void addDecodeCommand(CLI::App& app, Action& chosen);
 void addReplayCommand(CLI::App& app, Action& chosen);
 void addStoreCommand(CLI::App& app, Action& chosen);
 void addScreenCommands(CLI::App& app, Action& chosen);
+void addHappeningsCommand(CLI::App& app, Action& chosen);
 void addMetricsCommand(CLI::App& app, Action& chosen);
 void addStatusCommand(CLI::App& app, Action& chosen);
 // `verbose` is read when the subcommand runs.

@@ -12,14 +12,8 @@ namespace {
 
 ToolError asError(const RecordingFault& fault) { return {fault.exitCode(), fault.message}; }
 
-}  // namespace
-
-void addRecordingOptions(CLI::App& command, RecordingOptions& options) {
-  command.add_option("FILE", options.file, "Recording (.jsonl or .jsonl.gz)")->required();
-  command.add_flag("--skip-bad", options.skipBad, "Count and skip lines that are no event");
-}
-
-void feedRecording(const RecordingOptions& options, const std::function<void()>& afterEach) {
+void feed(const RecordingOptions& options, RecordedClock& clock,
+          const std::function<void()>& afterEach) {
   using BadLines = RecordingReader::BadLines;
   RecordingFault notOpened;
   const auto reader = RecordingReader::open(
@@ -27,6 +21,7 @@ void feedRecording(const RecordingOptions& options, const std::function<void()>&
   if (!reader) throw asError(notOpened);
   MetricValidator& validator = *MetricValidator::shared();
   while (auto event = reader->next()) {
+    clock.set(event->timeMs);
     const std::optional dictionary = std::move(event->entries);
     if (event->kind == RecordedKind::metric) {
       validator.metricsDidUpdate(dictionary);
@@ -41,6 +36,36 @@ void feedRecording(const RecordingOptions& options, const std::function<void()>&
     complain("qelctl",
              options.file + ": bad lines skipped: " + std::to_string(reader->skippedLines()));
   }
+}
+
+// Ends with the feeding, whatever ends that.
+class Observing {
+ public:
+  Observing(MetricObserver& observer, const Clock& clock) {
+    MetricValidator::shared()->setObserver(&observer, clock);
+  }
+  ~Observing() { MetricValidator::shared()->setObserver(nullptr); }
+  Observing(const Observing&) = delete;
+  Observing& operator=(const Observing&) = delete;
+};
+
+}  // namespace
+
+void addRecordingOptions(CLI::App& command, RecordingOptions& options) {
+  command.add_option("FILE", options.file, "Recording (.jsonl or .jsonl.gz)")->required();
+  command.add_flag("--skip-bad", options.skipBad, "Count and skip lines that are no event");
+}
+
+void feedRecording(const RecordingOptions& options, const std::function<void()>& afterEach) {
+  RecordedClock clock;
+  feed(options, clock, afterEach);
+}
+
+void feedRecording(const RecordingOptions& options, MetricObserver& observer,
+                   const std::function<void()>& afterEach) {
+  RecordedClock clock;
+  const Observing observing(observer, clock);
+  feed(options, clock, afterEach);
 }
 
 }  // namespace qel::tools

@@ -1,8 +1,15 @@
 // Recordings into the dispatcher, for the subcommands that work on a file.
 #pragma once
 
+#include <cstdint>
 #include <functional>
 #include <string>
+
+#include "base/Clock.h"
+
+namespace qel {
+class MetricObserver;
+}
 
 namespace CLI {
 class App;
@@ -18,9 +25,22 @@ struct RecordingOptions {
 // FILE and --skip-bad.
 void addRecordingOptions(CLI::App& command, RecordingOptions& options);
 
+// The time of reception of the event in hand, as the recording has it.
+class RecordedClock final : public Clock {
+ public:
+  void set(std::uint64_t timeMs) { _timeMs = timeMs; }
+  std::uint64_t nowMs() const override { return _timeMs; }
+
+ private:
+  std::uint64_t _timeMs = 0;
+};
+
 // Feeds the whole recording to the one dispatcher of the process, without waiting, and calls
 // `afterEach` after each event. A recording that cannot be read is a ToolError; one that was cut
 // off at its end, and lines skipped, are said on standard error.
 void feedRecording(const RecordingOptions& options, const std::function<void()>& afterEach = {});
+// The same, with an observer of the dispatcher, which is told the times of the recording.
+void feedRecording(const RecordingOptions& options, MetricObserver& observer,
+                   const std::function<void()>& afterEach = {});
 
 }  // namespace qel::tools

@@ -48,6 +48,7 @@ int main(int argc, char* argv[]) {
   tools::addReplayCommand(app, chosen);
   tools::addStoreCommand(app, chosen);
   tools::addScreenCommands(app, chosen);
+  tools::addHappeningsCommand(app, chosen);
   tools::addMetricsCommand(app, chosen);
   tools::addStatusCommand(app, chosen);
   tools::addLiveCommand(app, chosen, verbose);
