@@ -16,14 +16,14 @@ constexpr std::uint64_t kOneFailureMs = 2000;
 // A cell that is come to so soon after a failure was not chosen as usual.
 constexpr std::uint64_t kAfterFailureMs = 5000;
 
-// 36.331, clause 5.3.11.3: out of sync, random access, retransmissions.
-constexpr std::array<std::string_view, 6> kLinkFailures = {
-    "KLTE_RRC_CAUSE_REL_T310_EXP",
-    "KLTE_RRC_CAUSE_REL_RND_ACC",
-    "KLTE_RRC_CAUSE_REL_MAX_RLC_RETRANS",
-    "KLTE_RRC_CAUSE_REEST_OTHER_FAIL_T310_EXP",
-    "KLTE_RRC_CAUSE_REEST_OTHER_FAIL_RND_ACC",
-    "KLTE_RRC_CAUSE_REEST_OTHER_FAIL_MAX_RLC_RETX",
+// 36.331, clause 5.3.11.3.
+constexpr std::array kLinkFailures = {
+    NamedWords{"KLTE_RRC_CAUSE_REL_T310_EXP", "out of sync, T310 ended"},
+    NamedWords{"KLTE_RRC_CAUSE_REL_RND_ACC", "random access problem"},
+    NamedWords{"KLTE_RRC_CAUSE_REL_MAX_RLC_RETRANS", "most RLC retransmissions made"},
+    NamedWords{"KLTE_RRC_CAUSE_REEST_OTHER_FAIL_T310_EXP", "out of sync, T310 ended"},
+    NamedWords{"KLTE_RRC_CAUSE_REEST_OTHER_FAIL_RND_ACC", "random access problem"},
+    NamedWords{"KLTE_RRC_CAUSE_REEST_OTHER_FAIL_MAX_RLC_RETX", "most RLC retransmissions made"},
 };
 
 bool isAnyOf(std::string_view name, std::initializer_list<std::string_view> names) {
@@ -54,9 +54,9 @@ struct RadioFollower::StateChange {
   const Value* state;
   const Value* cause;
   Connection connection;
-  bool isInUse;    // the phone has, or asks for, a connection there
-  bool isLeft;     // the technology is not in use
-  bool isFailure;  // of the radio link
+  bool isInUse;                             // the phone has, or asks for, a connection there
+  bool isLeft;                              // the technology is not in use
+  std::optional<std::string_view> failure;  // of the radio link, why
 };
 
 std::optional<Technology> RadioFollower::inUse() const {
@@ -87,6 +87,7 @@ void RadioFollower::followCell(const Report& report, HappeningLog& log) {
   const auto cell = reportedCell(report.metric, report.record);
   if (!cell) return;
   use(cell->technology, report, log);
+  if (_linkFailedMs && report.atMs - *_linkFailedMs > kAfterFailureMs) _linkFailedMs.reset();
   const Connection before = rrcOf(cell->technology).connection;
   if (cell->technology == Technology::gsm) {
     const std::string state = textAt(report.record, "state");
@@ -106,7 +107,6 @@ void RadioFollower::followCell(const Report& report, HappeningLog& log) {
     happening.from = std::exchange(_lastCell, cell);
     happening.to = cell;
     log.add(std::move(happening), report.atMs);
-    if (_linkFailedMs && report.atMs - *_linkFailedMs > kAfterFailureMs) _linkFailedMs.reset();
   }
   const auto* known = _servingCell.newest();
   if (!known || !isTheSameReport(*known, *cell)) _servingCell.set(report.atMs, cell);
@@ -132,14 +132,14 @@ void RadioFollower::followState(const StateChange& change, const Report& report,
   Rrc& known = rrcOf(change.technology);
   std::string state = cellText(*change.state);
   std::string cause = change.cause ? cellText(*change.cause) : std::string();
-  const bool isNew = state != known.state || (change.isFailure && cause != known.cause);
+  const bool isNew = state != known.state || change.failure;
   if (isNew) {
     const std::string why = wordsOf(change.cause, "cause");
     std::string text(nameOf(change.technology));
     text += " RRC: " + wordsOf(change.state, "state");
     if (!why.empty()) text += ", " + why;
     log.add(report, HappeningKind::rrc, change.technology, std::move(text));
-    if (change.isFailure) addLinkFailure(change.technology, why, report, log);
+    if (change.failure) addLinkFailure(change.technology, *change.failure, report, log);
   }
   known = {std::move(state), std::move(cause), change.connection};
   if (change.isLeft) leave(change.technology, report);
@@ -155,9 +155,15 @@ void RadioFollower::followLteState(const Report& report, HappeningLog& log) {
                                                              : Connection::unknown;
   const bool isInUse =
       isAnyOf(name, {"KLTE_RRC_STATE_CONNECTED", "KLTE_RRC_STATE_ATMPT_CONNECTION"});
-  followState({Technology::lte, state, cause, connection, isInUse, name == "KLTE_RRC_STATE_NULL",
-               std::ranges::find(kLinkFailures, why) != kLinkFailures.end()},
-              report, log);
+  const auto found = std::ranges::find(kLinkFailures, why, &NamedWords::name);
+  // The cause of a failure stays in the reports until the connection ends.
+  const Rrc& known = rrcOf(Technology::lte);
+  const bool hasFailed = found != kLinkFailures.end() &&
+                         (why != known.cause || known.connection == Connection::dedicated);
+  const auto failure = hasFailed ? std::optional(found->words) : std::nullopt;
+  followState(
+      {Technology::lte, state, cause, connection, isInUse, name == "KLTE_RRC_STATE_NULL", failure},
+      report, log);
 }
 
 void RadioFollower::followUmtsState(const Report& report, HappeningLog& log) {
@@ -177,8 +183,10 @@ void RadioFollower::followUmtsState(const Report& report, HappeningLog& log) {
                                                                             : Connection::unknown;
   const Value* cause = report.record.find(isOver ? "release_cause" : "establishment_cause");
   const bool isLeft = name == "KWCDMA_RRC_CONN_STATE_INACTIVE";
+  const bool hasFailed = isFailure && name != rrcOf(Technology::umts).state;
+  const auto failure = hasFailed ? std::optional<std::string_view>("") : std::nullopt;
   followState(
-      {Technology::umts, state, isLeft ? nullptr : cause, connection, isInUse, isLeft, isFailure},
+      {Technology::umts, state, isLeft ? nullptr : cause, connection, isInUse, isLeft, failure},
       report, log);
 }
 
