@@ -46,7 +46,9 @@ class RecordingsFolder {
   // Takes a recording out of the list, or back into it. Empty, or one line why not.
   std::string hide(const std::string& name) const;
   std::string restore(const std::string& name) const;
-  // Those that are hidden are gone after it.
+  // It is gone after this.
+  void drop(const std::string& name) const;
+  // And so are those that are hidden.
   void dropHidden() const;
 
  private:

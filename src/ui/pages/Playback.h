@@ -88,6 +88,8 @@ class Playback {
  private:
   void openOn();
   void show();
+  void moveTo(std::uint64_t timeMs);
+  void playOn();
   void park();
   void unpark();
   void describe();
@@ -101,6 +103,7 @@ class Playback {
   std::unique_ptr<RecordedHistory> _opening;
   std::string _openingName;
   std::unique_ptr<RecordedHistory> _recorded;
+  std::string _name;
   std::shared_ptr<MetricValidator> _parked;  // takes live events while a recording is open
   std::uint64_t _momentMs = 0;
   TimePoint _movedAt;

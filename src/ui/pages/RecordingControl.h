@@ -73,7 +73,7 @@ class RecordingControl {
   std::function<void()> _onChanged;
   std::string _fileName;
   TimePoint _begun;
-  std::uint64_t _marks = 0;
+  std::uint64_t _room = 0;  // bytes that it may have
   std::unique_ptr<capture::Recorder> _recorder;
   std::unique_ptr<capture::RecordConnection> _connection;
   RecordingControlView _view;

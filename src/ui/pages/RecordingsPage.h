@@ -59,6 +59,7 @@ class RecordingsPage {
 
  private:
   struct Known;
+  bool beginDigest();
   void describe();
   void changed();
 

@@ -1,0 +1,134 @@
+#include "ui/pages/RecordingControl.h"
+
+#include <algorithm>
+#include <utility>
+
+#include "base/Amounts.h"
+
+namespace qel {
+namespace {
+
+using namespace std::chrono_literals;
+using capture::RecordConnection;
+using capture::Recorder;
+
+constexpr auto kPause = 1s;
+
+constexpr const char* kHidden =
+    "Hidden: subscriber and temporary identities, SIM files and addresses. Cells, areas, networks "
+    "and times stay: a recording tells where the phone was, and when.";
+
+std::string counted(std::uint64_t count, const std::string& what) {
+  return std::to_string(count) + " " + what + (count == 1 ? "" : "s");
+}
+
+}  // namespace
+
+RecordingControl::RecordingControl(RecordingsFolder folder, Way way, const Clock& clock, Now now)
+    : _folder(std::move(folder)), _way(std::move(way)), _clock(clock), _now(std::move(now)) {
+  _view.hiddenText = kHidden;
+}
+
+RecordingControl::~RecordingControl() {
+  _onChanged = nullptr;
+  stop();
+}
+
+void RecordingControl::changed() {
+  describe();
+  if (_onChanged) _onChanged();
+}
+
+void RecordingControl::start() {
+  if (_recorder) return;
+  _view.outcome.clear();
+  begin();
+  changed();
+}
+
+bool RecordingControl::begin() {
+  const auto name = _folder.nameForNew(_clock.nowMs(), _view.outcome);
+  if (!name) return false;
+  RecordingLimits limits;
+  _room = _folder.limits().bytes - std::min(_folder.limits().bytes, _folder.bytes());
+  auto recording = RotatingRecording::create(
+      _folder.pathOf(*name), limits, RotatingRecording::Existing::refused, _now(), _view.outcome);
+  if (!recording) return false;
+  auto hider = std::make_unique<IdentityHider>(Pseudonyms::random());
+  _recorder = std::make_unique<Recorder>(std::move(recording), std::move(hider), _clock);
+  _connection = std::make_unique<RecordConnection>(
+      *_way.connector, capture::kViewersRecorder, _way.bus, _way.configuration,
+      [recorder = _recorder.get()](std::string_view eventName, const tesk::Message& event) {
+        recorder->take(eventName, event);
+      });
+  _fileName = *name;
+  _begun = _now();
+  const tesk::CommandResult begun = _connection->begin();
+  if (begun.code == 0) return true;
+  finish("Nothing can be recorded: " + begun.message);
+  return false;
+}
+
+void RecordingControl::mark() {
+  if (!_recorder) return;
+  if (!_recorder->mark()) finish(_recorder->error());
+  changed();
+}
+
+void RecordingControl::stop() {
+  if (!_recorder) return;
+  finish("");
+  changed();
+}
+
+// Without a reason it ends because somebody wanted it to. What holds nothing is not kept.
+void RecordingControl::finish(const std::string& why) {
+  const std::uint64_t lost = _connection->end();
+  _connection.reset();
+  const bool isWhole = _recorder->close();
+  const Recorder::Progress progress = _recorder->progress();
+  std::string outcome = why.empty() ? "" : why + ". ";
+  if (!isWhole && why.empty()) outcome = _recorder->error() + ". ";
+  if (progress.events == 0) {
+    outcome += "Nothing was recorded";
+    _folder.drop(_fileName);
+  } else {
+    outcome += "Kept as " + _fileName + ": " + counted(progress.events, "event");
+    if (lost > 0) outcome += ", " + counted(lost, "more event") + " came too fast to be recorded";
+  }
+  _view.outcome = outcome;
+  _recorder.reset();
+  _fileName.clear();
+}
+
+void RecordingControl::serviceCameBack() {
+  if (_connection) _connection->begin();
+}
+
+std::optional<std::chrono::milliseconds> RecordingControl::untilNextTick() const {
+  if (!_recorder) return std::nullopt;
+  return kPause;
+}
+
+void RecordingControl::tick() {
+  if (!_recorder) return;
+  if (!_recorder->tend()) {
+    finish(_recorder->error());
+  } else if (_recorder->progress().bytes >= _room) {
+    finish("Recordings take up the " + sizeText(_folder.limits().bytes) + " that they may");
+  }
+  changed();
+}
+
+void RecordingControl::describe() {
+  _view.isRecording = _recorder != nullptr;
+  _view.text.clear();
+  _view.markText.clear();
+  if (!_recorder) return;
+  const Recorder::Progress progress = _recorder->progress();
+  _view.text = durationText(std::chrono::floor<std::chrono::seconds>(_now() - _begun)) + ", " +
+               counted(progress.events, "event") + ", " + sizeText(progress.bytes);
+  if (progress.marks > 0) _view.markText = "Mark " + std::to_string(progress.marks);
+}
+
+}  // namespace qel
