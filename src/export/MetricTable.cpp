@@ -7,13 +7,11 @@
 #include "base/Rendering.h"
 #include "base/Utf8.h"
 #include "export/IsoTime.h"
-#include "export/Units.h"
+#include "messages/catalogue/FieldFacts.h"
 #include "messages/catalogue/KBBMetricUtility.h"
 
 namespace qel {
 namespace {
-
-constexpr std::string_view kTimeOfTheModem = "timestamp";
 
 const Rewrite* rewriteOf(std::span<const Rewrite> rewrites, std::string_view key) {
   const auto found =
@@ -30,15 +28,24 @@ bool makesFraction(const Rewrite& rewrite) {
          rewrite.kind == Rewrite::Kind::bandwidth;
 }
 
-ColumnType typeOf(const FieldShape& field, const Rewrite* rewrite) {
+// Milliseconds since 1970.
+bool isTime(const FieldFacts* facts) { return facts && facts->form == FieldForm::time; }
+
+// A value that the dispatcher does not turn into the unit of the tables stays as it travels.
+std::string unitOf(const FieldFacts* facts, const Rewrite* rewrite) {
+  if (!facts || isTime(facts)) return "";
+  return std::string(rewrite || facts->raw.empty() ? facts->unit : facts->raw);
+}
+
+ColumnType typeOf(const FieldShape& field, const FieldFacts* facts, const Rewrite* rewrite) {
   if (field.kind == FieldKind::bytes) return ColumnType::bytes;
   const bool isNumber = field.kind == FieldKind::integer || field.kind == FieldKind::boolean;
-  if (!isNumber || field.key.view() == kTimeOfTheModem) return ColumnType::text;
+  if (!isNumber || isTime(facts)) return ColumnType::text;
   return rewrite && makesFraction(*rewrite) ? ColumnType::real : ColumnType::integer;
 }
 
-Value cellOf(const Value& value, bool isTime) {
-  if (isTime && value.asUInt64()) return isoTime(*value.asUInt64());
+Value cellOf(const Value& value, bool asTime) {
+  if (asTime && value.asUInt64()) return isoTime(*value.asUInt64());
   if (const auto truth = value.asBoolean()) return *truth ? 1 : 0;
   if (const auto text = value.asText()) return withReplacements(*text);
   if (value.asList() || value.asDictionary()) return jsonText(value);
@@ -68,7 +75,7 @@ std::optional<std::size_t> MetricTable::find(const std::string& name, std::size_
 
 std::size_t MetricTable::addColumn(Column column, const Scope& scope) {
   const bool isEntry = !scope.list.empty();
-  const auto there = isEntry ? find(column.name, _firstOfEntries) : std::nullopt;
+  const auto there = isEntry ? find(column.name, _firstOfEntries + 2) : std::nullopt;
   if (there) {
     const Column& other = _table.columns[*there];
     if (other.type == column.type && other.unit == column.unit) return *there;
@@ -80,6 +87,7 @@ std::size_t MetricTable::addColumn(Column column, const Scope& scope) {
 
 MetricTable::Places MetricTable::addFields(const MessageShape& shape, const Scope& scope) {
   const bool isReport = scope.list.empty() && scope.prefix.empty();
+  const MessageFacts* all = findMessageFacts(shape.className);
   Places places;
   for (const FieldShape& field : shape.fields) {
     if (field.kind == FieldKind::messageList && isReport) continue;
@@ -90,9 +98,10 @@ MetricTable::Places MetricTable::addFields(const MessageShape& shape, const Scop
       continue;
     }
     const Rewrite* rewrite = rewriteOf(scope.rewrites, field.key);
-    const auto column = addColumn(
-        {name, typeOf(field, rewrite), unitOf(shape.className, field.key, rewrite)}, scope);
-    places.push_back({field.key, column, field.key.view() == kTimeOfTheModem});
+    const FieldFacts* facts = all ? all->find(field.key) : nullptr;
+    const auto column =
+        addColumn({name, typeOf(field, facts, rewrite), unitOf(facts, rewrite)}, scope);
+    places.push_back({field.key, column, isTime(facts)});
   }
   return places;
 }
