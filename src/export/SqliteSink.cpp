@@ -58,7 +58,10 @@ void bind(sqlite3_stmt* statement, int place, const Value& value) {
     // As its shortest text says: a float's own digits go on beyond what it tells.
     sqlite3_bind_double(statement, place, std::strtod(jsonText(value).c_str(), nullptr));
   } else if (const Bytes* bytes = value.asBytes()) {
-    sqlite3_bind_blob64(statement, place, bytes->data(), bytes->size(), SQLITE_TRANSIENT);
+    // Without data there would be nothing instead of no bytes.
+    sqlite3_bind_blob64(statement, place,
+                        bytes->empty() ? "" : static_cast<const void*>(bytes->data()),
+                        bytes->size(), SQLITE_TRANSIENT);
   } else if (value.isNull()) {
     sqlite3_bind_null(statement, place);
   } else {
