@@ -1,0 +1,204 @@
+#include "history/recorded/RecordedHistory.h"
+
+#include <gtest/gtest.h>
+#include <sys/stat.h>
+
+#include <random>
+
+#include "base/LogSink.h"
+#include "base/Rendering.h"
+#include "recording/Mark.h"
+#include "support/RecordedLines.h"
+
+namespace qel::testing {
+namespace {
+
+std::string textOf(const EntryList& list) {
+  return jsonText(Value(List(list.begin(), list.end())));
+}
+
+// Everything that a store holds.
+std::vector<std::string> contentOf(const MetricStore& store) {
+  std::vector<std::string> content;
+  for (const DispatchRow& row : dispatchTable()) {
+    const auto& slot = store.*row.slot;
+    content.push_back(slot ? jsonText(*slot) : "nothing");
+  }
+  const LTE& lte = store.myLTE;
+  const UMTS& umts = store.myUMTS;
+  const GSM& gsm = store.myGSM;
+  for (const EntryList* list : {&lte.EutraNbrs,
+                                &lte.RsrpRsrqSinr,
+                                &lte.TxPower,
+                                &lte.EutraNbrsMeas,
+                                &lte.UtraNbrsMeas,
+                                &lte.GeraNbrsMeas,
+                                &lte.CAStatusList,
+                                &lte.MMCommonInfo,
+                                &umts.rXInfo,
+                                &umts.TxPower,
+                                &umts.eUtraNbrs,
+                                &umts.utraNbrs,
+                                &umts.geraNbrs,
+                                &umts.eUtraNbrMeas,
+                                &umts.utraNbrMeas,
+                                &umts.geraNbrMeas,
+                                &gsm.eUtraNbrMeas,
+                                &gsm.utraNbrMeas,
+                                &gsm.geraNbrMeas,
+                                &store.myCommon.activeBearer,
+                                &store.myCommon.simContents}) {
+    content.push_back(textOf(*list));
+  }
+  content.push_back(jsonText(lte.SelReselCellInfo));
+  content.push_back(jsonText(umts.SelReselCellInfo));
+  content.push_back(jsonText(lte.IMSI));
+  return content;
+}
+
+std::vector<RecordedEvent> eventsOf(const std::string& path) {
+  RecordingFault fault;
+  const auto reader = RecordingReader::open(path, RecordingReader::BadLines::fail, fault);
+  std::vector<RecordedEvent> events;
+  while (auto event = reader->next()) events.push_back(std::move(*event));
+  return events;
+}
+
+// What the dispatcher makes of all events up to that time, one after the other.
+std::vector<std::string> contentAt(const std::vector<RecordedEvent>& events, std::uint64_t timeMs) {
+  setStandardOutput(nullptr);
+  setSystemLog(nullptr);
+  const auto validator = MetricValidator::create(nullptr);
+  for (const RecordedEvent& event : events) {
+    if (event.timeMs > timeMs) break;
+    if (event.kind == RecordedKind::metric) validator->processMetric(event.entries);
+  }
+  return contentOf(*validator);
+}
+
+std::unique_ptr<RecordedHistory> opened(const std::string& path,
+                                        const RecordedHistory::Limits& limits = {}) {
+  RecordingFault fault;
+  auto history = RecordedHistory::open(path, fault, limits);
+  EXPECT_TRUE(history) << fault.message;
+  while (history->readOn(100)) {
+  }
+  return history;
+}
+
+TEST(RecordedHistory, holdsTheStoreAsItWasAtAnyMoment) {
+  const auto events = eventsOf(QEL_SIMULATED_DRIVE);
+  RecordedHistory::Limits limits;
+  limits.eventsBetween = 50;
+  limits.checkpoints = 6;  // so that they are thinned several times
+  const auto history = opened(QEL_SIMULATED_DRIVE, limits);
+  EXPECT_EQ(history->beginMs(), events.front().timeMs);
+  EXPECT_EQ(history->endMs(), events.back().timeMs);
+  EXPECT_EQ(history->events(), events.size());
+  std::mt19937_64 engine(1);
+  std::uniform_int_distribution<std::uint64_t> moments(history->beginMs(), history->endMs());
+  for (int i = 0; i < 40; ++i) {
+    const std::uint64_t moment = moments(engine);
+    EXPECT_EQ(contentOf(history->storeAt(moment)), contentAt(events, moment)) << moment;
+    EXPECT_EQ(contentOf(history->storeAt(moment + 300)), contentAt(events, moment + 300));
+  }
+  for (const std::uint64_t moment : {std::uint64_t{0}, history->beginMs(), history->endMs(),
+                                     history->endMs() + 1000, history->beginMs() - 1}) {
+    EXPECT_EQ(contentOf(history->storeAt(moment)), contentAt(events, moment)) << moment;
+  }
+}
+
+TEST(RecordedHistory, saysNothingWhileItReadsAndJumps) {
+  struct Counting final : LogSink {
+    void write(std::string_view) override { ++lines; }
+    std::size_t lines = 0;
+  };
+  const auto output = std::make_shared<Counting>();
+  const auto log = std::make_shared<Counting>();
+  setStandardOutput(output);
+  setSystemLog(log);
+  const auto history = opened(QEL_SIMULATED_DRIVE);
+  history->storeAt(history->endMs());
+  EXPECT_EQ(output->lines, 0U);
+  EXPECT_EQ(log->lines, 0U);
+  standardOutput().write("after it");
+  EXPECT_EQ(output->lines, 1U);
+  setStandardOutput(nullptr);
+  setSystemLog(nullptr);
+}
+
+TEST(RecordedHistory, tellsHowFarItIs) {
+  RecordingFault fault;
+  const auto history = RecordedHistory::open(QEL_SIMULATED_DRIVE, fault);
+  float before = 0;
+  EXPECT_EQ(history->progress(), 0);
+  while (history->readOn(500)) {
+    EXPECT_GE(history->progress(), before);
+    EXPECT_LE(history->progress(), 1);
+    before = history->progress();
+  }
+  EXPECT_EQ(history->progress(), 1);
+}
+
+TEST(RecordedHistory, goesFromHappeningToHappening) {
+  const TemporaryFolder folder;
+  const auto history =
+      opened(folder.file("a.jsonl", lineOf(lteCell(1000, 1)) + lineOf(lteCell(2000, 1)) +
+                                        lineOf(markEvent(2500, 1)) + lineOf(lteCell(3000, 2))));
+  ASSERT_EQ(history->history().happenings().size(), 3U);
+  EXPECT_EQ(history->history().happenings()[1].kind, HappeningKind::mark);
+  EXPECT_EQ(history->history().happenings()[1].text, "Mark 1");
+  EXPECT_EQ(history->nextHappening(0), 1000U);
+  EXPECT_EQ(history->nextHappening(1000), 2500U);
+  EXPECT_EQ(history->nextHappening(2500), 3000U);
+  EXPECT_EQ(history->nextHappening(3000), std::nullopt);
+  EXPECT_EQ(history->previousHappening(3000), 2500U);
+  EXPECT_EQ(history->previousHappening(2499), 1000U);
+  EXPECT_EQ(history->previousHappening(1000), std::nullopt);
+  EXPECT_EQ(history->previousHappening(0), std::nullopt);
+}
+
+TEST(RecordedHistory, leavesBadLinesAndReportsOutAndSaysSo) {
+  const TemporaryFolder folder;
+  const std::string bad = "nonsense\n";
+  const auto damaged = metricEvent(1500, MetricValidator::K_LTE_RRC_STATE, Bytes{0x08});
+  const auto history = opened(folder.file("a.jsonl", lineOf(lteCell(1000, 1)) + bad + bad +
+                                                         lineOf(damaged) + lineOf(lteCell(900, 2)) +
+                                                         lineOf(lteCell(2000, 3)).substr(0, 40)));
+  EXPECT_EQ(history->events(), 2U);
+  EXPECT_EQ(history->endMs(), 1000U);
+  EXPECT_EQ(history->notes(),
+            (std::vector<std::string>{
+                "It was cut off at its end", "2 lines are no events and are left out",
+                "1 report cannot be decoded and is left out",
+                "Its clock went back 1 time: what came then stands at the time before"}));
+}
+
+TEST(RecordedHistory, opensOfATooLargeRecordingWhatItCanHold) {
+  const TemporaryFolder folder;
+  std::string lines;
+  for (unsigned i = 0; i < 20000; ++i) lines += lineOf(lteCell(1000 + i, i % 500));
+  RecordedHistory::Limits limits;
+  limits.bytes = 100'000;
+  const auto history = opened(folder.file("a.jsonl", lines), limits);
+  EXPECT_GT(history->events(), 1000U);
+  EXPECT_LT(history->events(), 20000U);
+  ASSERT_EQ(history->notes().size(), 1U);
+  EXPECT_TRUE(history->notes()[0].starts_with("Too large to be opened whole"))
+      << history->notes()[0];
+  EXPECT_EQ(history->progress(), 1);
+}
+
+TEST(RecordedHistory, opensFilesOnly) {
+  const TemporaryFolder folder;
+  const std::string pipe = folder.path() + "/pipe.jsonl";
+  ASSERT_EQ(::mkfifo(pipe.c_str(), 0600), 0);
+  for (const std::string& path : {pipe, folder.path(), folder.path() + "/none"}) {
+    RecordingFault fault;
+    EXPECT_FALSE(RecordedHistory::open(path, fault));
+    EXPECT_TRUE(fault.message.starts_with(path + ": ")) << fault.message;
+  }
+}
+
+}  // namespace
+}  // namespace qel::testing
