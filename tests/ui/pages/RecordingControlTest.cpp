@@ -86,8 +86,9 @@ TEST_F(RecordingControlTest, hidesIdentitiesAndSaysSo) {
   control.start();
   send(event);
   control.stop();
-  ASSERT_EQ(recorded().size(), 1U);
-  const Bytes& kept = *recorded()[0].entries.find(kRecordedPayloadKey)->asBytes();
+  const auto events = recorded();
+  ASSERT_EQ(events.size(), 1U);
+  const Bytes& kept = *events[0].entries.find(kRecordedPayloadKey)->asBytes();
   EXPECT_NE(kept, message.data());
   EXPECT_TRUE(KCellularMmCommonInfo::initWithData(kept)->hasImsi());
 }
