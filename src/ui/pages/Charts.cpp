@@ -15,13 +15,13 @@ std::vector<Run> thinnedAll(std::vector<Run> runs, const ChartFrame& frame) {
   return runs;
 }
 
-// Good and fair, and as far again beyond either where the axis reaches.
+// Good and fair, and as far again beyond either where such values are.
 std::vector<AxisLabel> axisLabels(const Chart& chart) {
   const QuantityFacts& facts = factsOf(chart.quantity);
   const float width = facts.good - facts.fair;
   std::vector<AxisLabel> labels;
   for (const float value : {facts.fair - width, facts.fair, facts.good, facts.good + width}) {
-    if (value <= chart.lowest || value >= chart.highest) continue;
+    if (value <= facts.lowest || value >= facts.highest) continue;
     const Grade grade = gradeOf(chart.quantity, value);
     labels.push_back({value, figureText(value), grade, std::string(nameOf(grade))});
   }
@@ -29,17 +29,10 @@ std::vector<AxisLabel> axisLabels(const Chart& chart) {
 }
 
 void fitAxis(Chart& chart) {
-  const QuantityFacts& facts = factsOf(chart.quantity);
-  chart.lowest = facts.lowest;
-  chart.highest = facts.highest;
-  for (const Curve& curve : chart.curves) {
-    for (const Run& run : curve.runs) {
-      for (const Point& point : run) {
-        chart.lowest = std::min(chart.lowest, point.value);
-        chart.highest = std::max(chart.highest, point.value);
-      }
-    }
-  }
+  Axis axis = usualAxis(chart.quantity);
+  for (const Curve& curve : chart.curves) axis = widened(axis, curve.runs);
+  chart.lowest = axis.lowest;
+  chart.highest = axis.highest;
 }
 
 void addNeighbours(const ChartFrame& frame, const std::vector<Neighbour>& neighbours,
@@ -83,6 +76,23 @@ Chart makeChart(const ChartFrame& frame, Quantity quantity,
 }
 
 }  // namespace
+
+Axis usualAxis(Quantity quantity) {
+  const QuantityFacts& facts = factsOf(quantity);
+  const float width = facts.good - facts.fair;
+  return {std::max(facts.lowest, facts.fair - 2 * width),
+          std::min(facts.highest, facts.good + 2 * width)};
+}
+
+Axis widened(Axis axis, const std::vector<Run>& runs) {
+  for (const Run& run : runs) {
+    for (const Point& point : run) {
+      axis.lowest = std::min(axis.lowest, point.value);
+      axis.highest = std::max(axis.highest, point.value);
+    }
+  }
+  return axis;
+}
 
 std::string labelOf(const Neighbour& neighbour) {
   if (neighbour.code) {

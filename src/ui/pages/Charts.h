@@ -20,6 +20,14 @@ struct ChartFrame {
 // in the chart of their technology's level.
 std::vector<Chart> chartsOf(const ChartFrame& frame, const std::vector<Neighbour>& neighbours);
 
+// The ends of an axis: about the thresholds of quality, and as much wider as values need it.
+struct Axis {
+  float lowest = 0;
+  float highest = 0;
+};
+Axis usualAxis(Quantity quantity);
+Axis widened(Axis axis, const std::vector<Run>& runs);
+
 // "PCI 123", or the channel of a cell whose code is not known.
 std::string labelOf(const Neighbour& neighbour);
 std::string idOf(const Neighbour& neighbour);

@@ -146,19 +146,13 @@ NowLine connectionLine(const NowPage& page) {
 }
 
 void setSparkline(const Viewpoint& viewpoint, Quantity quantity, NowPage& page) {
-  const QuantityFacts& facts = factsOf(quantity);
   page.runsToMs = viewpoint.nowMs;
   page.runsFromMs = viewpoint.nowMs - std::min(viewpoint.nowMs, kGlanceMs);
-  page.lowest = facts.lowest;
-  page.highest = facts.highest;
-  const Series& series = viewpoint.history->series(quantity);
-  for (const Run& run : series.between(page.runsFromMs, page.runsToMs)) {
-    page.runs.push_back(thinned(run, page.runsFromMs, page.runsToMs, kSparkColumns));
-    for (const Point& point : page.runs.back()) {
-      page.lowest = std::min(page.lowest, point.value);
-      page.highest = std::max(page.highest, point.value);
-    }
-  }
+  page.runs = viewpoint.history->series(quantity).between(page.runsFromMs, page.runsToMs);
+  for (Run& run : page.runs) run = thinned(run, page.runsFromMs, page.runsToMs, kSparkColumns);
+  const Axis axis = widened(usualAxis(quantity), page.runs);
+  page.lowest = axis.lowest;
+  page.highest = axis.highest;
 }
 
 Reading take(const Viewpoint& viewpoint, Quantity quantity, std::optional<float>& value,
