@@ -20,8 +20,10 @@ void addReplayCommand(CLI::App& app, Action& chosen);
 void addStoreCommand(CLI::App& app, Action& chosen);
 void addScreenCommands(CLI::App& app, Action& chosen);
 void addHappeningsCommand(CLI::App& app, Action& chosen);
+void addPageCommands(CLI::App& app, Action& chosen);
 void addMetricsCommand(CLI::App& app, Action& chosen);
 void addStatusCommand(CLI::App& app, Action& chosen);
+void addWatchCommand(CLI::App& app, Action& chosen);
 // `verbose` is read when the subcommand runs.
 void addLiveCommand(CLI::App& app, Action& chosen, const bool& verbose);
 void addRecordCommand(CLI::App& app, Action& chosen);

@@ -14,14 +14,15 @@
 #include "base/DescriptorSink.h"
 #include "base/SystemLogSink.h"
 #include "base/TerminalText.h"
+#include "metrics/MetricValidator.h"
 #include "recording/privacy/EventLog.h"
 #include "tools/Commands.h"
+#include "tools/LiveConnection.h"
 #include "tools/LossReport.h"
 #include "tools/MainLoop.h"
 #include "tools/ScreenDrawing.h"
 #include "tools/Service.h"
 #include "tools/ToolError.h"
-#include "ui/screens/RootNavigationController.h"
 
 namespace qel::tools {
 namespace {
@@ -33,9 +34,6 @@ struct Options {
   std::string loggedEvents = "none";
   std::vector<std::string> screen;  // technology and category, or empty
 };
-
-// What the viewer's start does, again each time: configuration, delivery, SIM files.
-void startAsTheViewerDoes() { std::make_shared<RootNavigationController>()->loadViewIfNeeded(); }
 
 // A table that is drawn anew when it has changed, at most once a second.
 class LiveTable {
@@ -117,17 +115,14 @@ void run(const Options& options, bool verbose, Output& output) {
   loop.watchStandardOutput();
   findResources();
   configurationFile();
-  requireService(options.bus);
   output.goOnWithoutReader();
   setStandardOutput(options.screen.empty() ? std::shared_ptr<LogSink>(output.sink()) : nullptr);
   const auto say = [](const std::string& text) { complain("qelctl", text); };
-  tesk::setConnector(tesk::bus::makeBusConnector(
-      {options.bus}, serviceObserver(say, startAsTheViewerDoes), loop.answerWaits()));
-  const auto& wrapper = TeskWrapper::sharedInstance();
+  connectToService({.bus = options.bus, .say = say}, loop);
+  const auto& wrapper = MetricValidator::shared()->mySharedTeskInstance;
   LossReport loss(say);
   wrapper->setLossObserver(
       [&loss](std::uint64_t dropped) { loss.note(dropped, LossReport::Clock::now()); });
-  startAsTheViewerDoes();
   if (options.screen.empty()) {
     showLines(loop, output);
   } else {

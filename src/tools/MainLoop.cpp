@@ -4,7 +4,6 @@
 #include <unistd.h>
 
 #include <algorithm>
-#include <array>
 #include <atomic>
 #include <cstdint>
 #include <limits>
@@ -67,8 +66,9 @@ bool MainLoop::isStopping() const { return _signals.arrived() != 0 || _outputClo
 bool MainLoop::runOnce(std::optional<Clock::time_point> until) {
   if (isStopping()) return false;
   // A pipe without a reader answers though nothing is asked of it.
-  std::array<pollfd, 2> waited = {
-      {{_signals.wakeUp().descriptor(), POLLIN, 0}, {_watchesOutput ? STDOUT_FILENO : -1, 0, 0}}};
+  std::vector<pollfd> waited = {{_signals.wakeUp().descriptor(), POLLIN, 0},
+                                {_watchesOutput ? STDOUT_FILENO : -1, 0, 0}};
+  for (const int input : _inputs) waited.push_back({input, POLLIN, 0});
   ::poll(waited.data(), waited.size(), _more ? 0 : waitUntil(until));
   _outputClosed = (waited[1].revents & (POLLERR | POLLHUP)) != 0;
   _signals.wakeUp().clear();

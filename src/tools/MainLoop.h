@@ -3,6 +3,7 @@
 
 #include <chrono>
 #include <optional>
+#include <vector>
 
 #include "tesk/bus/BusConnector.h"
 #include "tools/StopSignals.h"
@@ -22,6 +23,9 @@ class MainLoop {
   // Ends the loop, too, when nobody reads what goes to standard output any more.
   void watchStandardOutput() { _watchesOutput = true; }
 
+  // Wakes up, too, when there is something to read.
+  void watchInput(int descriptor) { _inputs.push_back(descriptor); }
+
   // Waits for work of the main queue, at most until that time, and does one item of it. False when
   // the program is to end.
   bool runOnce(std::optional<Clock::time_point> until);
@@ -36,6 +40,7 @@ class MainLoop {
   bool isStopping() const;
 
   StopSignals _signals;
+  std::vector<int> _inputs;
   bool _watchesOutput = false;
   bool _outputClosed = false;
   bool _more = true;  // work may have come before this loop

@@ -3,8 +3,6 @@
 #include <CLI/CLI.hpp>
 
 #include "base/TerminalText.h"
-#include "history/History.h"
-#include "history/MarkHappening.h"
 #include "metrics/MetricValidator.h"
 #include "recording/RecordingReader.h"
 #include "tools/ToolError.h"
@@ -14,7 +12,7 @@ namespace {
 
 ToolError asError(const RecordingFault& fault) { return {fault.exitCode(), fault.message}; }
 
-void feed(const RecordingOptions& options, RecordedClock& clock, History* history,
+void feed(const RecordingOptions& options, RecordedClock& clock,
           const std::function<void()>& afterEach) {
   using BadLines = RecordingReader::BadLines;
   RecordingFault notOpened;
@@ -24,8 +22,6 @@ void feed(const RecordingOptions& options, RecordedClock& clock, History* histor
   MetricValidator& validator = *MetricValidator::shared();
   while (auto event = reader->next()) {
     clock.set(event->timeMs);
-    if (auto mark = history ? happeningOfMark(*event) : std::nullopt)
-      history->add(std::move(*mark));
     const std::optional dictionary = std::move(event->entries);
     if (event->kind == RecordedKind::metric) {
       validator.metricsDidUpdate(dictionary);
@@ -62,14 +58,14 @@ void addRecordingOptions(CLI::App& command, RecordingOptions& options) {
 
 void feedRecording(const RecordingOptions& options, const std::function<void()>& afterEach) {
   RecordedClock clock;
-  feed(options, clock, nullptr, afterEach);
+  feed(options, clock, afterEach);
 }
 
-void feedRecording(const RecordingOptions& options, History& history,
+void feedRecording(const RecordingOptions& options, MetricObserver& observer,
                    const std::function<void()>& afterEach) {
   RecordedClock clock;
-  const Observing observing(history, clock);
-  feed(options, clock, &history, afterEach);
+  const Observing observing(observer, clock);
+  feed(options, clock, afterEach);
 }
 
 }  // namespace qel::tools

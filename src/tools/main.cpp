@@ -49,6 +49,8 @@ int main(int argc, char* argv[]) {
   tools::addStoreCommand(app, chosen);
   tools::addScreenCommands(app, chosen);
   tools::addHappeningsCommand(app, chosen);
+  tools::addPageCommands(app, chosen);
+  tools::addWatchCommand(app, chosen);
   tools::addMetricsCommand(app, chosen);
   tools::addStatusCommand(app, chosen);
   tools::addLiveCommand(app, chosen, verbose);

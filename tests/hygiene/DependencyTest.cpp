@@ -48,6 +48,7 @@ const std::vector<std::pair<std::string, std::vector<std::string>>> kForeign = {
     {"nlohmann/", {"src/recording/", "src/tools/"}},
     {"CLI/", {"src/tools/", "src/app/", "src/service/daemon/"}},
     {"sqlite3.h", {"src/export/"}},
+    {"curses.h", {"src/tools/watch/"}},
     {"zlib.h", {"src/recording/"}},
 };
 
