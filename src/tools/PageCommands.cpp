@@ -89,7 +89,9 @@ class LivePage {
     const bool isInPlace = !_options.json && ::isatty(STDOUT_FILENO) == 1;
     std::string text = isInPlace ? "\x1B[H\x1B[2J" : "";
     if (!isInPlace && !_options.json && !_printed.empty()) text = "\n";
-    for (const std::string& line : lines) text += forTerminal(line) + "\n";
+    for (std::size_t i = 0; i < lines.size(); ++i) {
+      text += (i == 0 ? "" : "\n") + forTerminal(lines[i]);
+    }
     _output.draw(text);
   }
 

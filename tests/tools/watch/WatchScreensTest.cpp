@@ -1,0 +1,190 @@
+// qelctl watch as a person sees it: real keys, real screens.
+
+#include <gtest/gtest.h>
+
+#include "messages/lte_rrc.h"
+#include "messages/lte_serving.h"
+#include "metrics/MetricValidator.h"
+#include "tools/Qelctl.h"
+#include "tools/RunningQelctl.h"
+#include "tools/watch/Tmux.h"
+
+namespace qel::testing {
+namespace {
+
+using V = MetricValidator;
+
+std::string at(std::uint64_t timeMs, std::string line) {
+  return line.replace(line.find("\"time_ms\": 1,"), 13,
+                      "\"time_ms\": " + std::to_string(timeMs) + ",");
+}
+
+std::string cellLine(std::uint32_t pci) {
+  KCellularLteScellInfo cell;
+  cell.setPhyCellId(pci);
+  cell.setDlFreq(1300);
+  cell.setCellId((4660U << 8U) + pci);
+  cell.setTrackingAreaCode(4711);
+  cell.setNumMncDigits(2);
+  cell.setSelPlmnMcc(1);
+  cell.setSelPlmnMnc(1);
+  return metricLine(V::K_LTE_SCELL_INFO, cell);
+}
+
+std::string signalLine(std::int32_t rsrp) {
+  auto average = std::make_shared<RsrpRsrqSinr>();
+  average->setRsrp0(rsrp);
+  KCellularLteRsrpRsrqSinr report;
+  report.setAvgValues(average);
+  return metricLine(V::K_LTE_RSRP_RSRQ_SINR, report);
+}
+
+std::string stateLine() {
+  KCellularLteRrcState state;
+  state.setState(1);
+  return metricLine(V::K_LTE_RRC_STATE, state);
+}
+
+constexpr std::uint64_t kStart = 1'800'000'000'000;  // 08:00 UTC
+
+// Two cells and three levels within a minute.
+std::string drive() {
+  return at(kStart, cellLine(1)) + at(kStart, stateLine()) + at(kStart, signalLine(-90)) +
+         at(kStart + 1000, signalLine(-90)) + at(kStart + 30'000, cellLine(2)) +
+         at(kStart + 60'000, signalLine(-120));
+}
+
+class WatchScreens : public ::testing::Test {
+ protected:
+  const TemporaryRecording recording{drive(), "drive.jsonl"};
+  const std::string program = "env TZ=UTC0 LC_ALL=C.UTF-8 " QEL_QELCTL " watch ";
+
+  static ::testing::AssertionResult becomes(const Tmux& terminal, const std::string& text) {
+    if (eventually([&] { return terminal.shows(text); })) return ::testing::AssertionSuccess();
+    return ::testing::AssertionFailure() << "no \"" << text << "\" on\n" << terminal.screen();
+  }
+};
+
+TEST_F(WatchScreens, showTheCellAboveTheMenu) {
+  const Tmux terminal(80, 24, program + recording.path());
+  ASSERT_TRUE(becomes(terminal, "LTE band 3, 1815.0 MHz"));
+  for (const char* text : {"Operator 001-01", "EARFCN 1300", "TAC 4711", "RSRP", "good", "LTE",
+                           "UMTS", "GSM", "Signals", "Happenings", "Recordings"}) {
+    EXPECT_TRUE(terminal.shows(text)) << text << " is not on\n" << terminal.screen();
+  }
+}
+
+TEST_F(WatchScreens, moveToTheMomentOfTheNextHappening) {
+  const Tmux terminal(80, 24, program + recording.path());
+  ASSERT_TRUE(becomes(terminal, "PCI 1,"));
+  terminal.press("n");
+  ASSERT_TRUE(becomes(terminal, "PCI 2,"));
+  terminal.press("p");
+  EXPECT_TRUE(becomes(terminal, "PCI 1,"));
+}
+
+TEST_F(WatchScreens, openPagesByLetterAndLeaveThemWithEscape) {
+  const Tmux terminal(80, 24, program + recording.path());
+  ASSERT_TRUE(becomes(terminal, "PCI 1,"));
+  terminal.press("s");
+  EXPECT_TRUE(becomes(terminal, "LTE RSRP"));
+  EXPECT_TRUE(becomes(terminal, "-95  good"));
+  terminal.press("h");
+  EXPECT_TRUE(becomes(terminal, "Friday, 15 January 2027"));
+  terminal.press("r");
+  EXPECT_TRUE(becomes(terminal, "d delete"));
+  terminal.press("Escape");
+  EXPECT_TRUE(becomes(terminal, "Operator 001-01"));
+}
+
+TEST_F(WatchScreens, filterHappeningsByKind) {
+  const Tmux terminal(80, 24, program + recording.path());
+  ASSERT_TRUE(becomes(terminal, "PCI 1,"));
+  terminal.press("n");
+  ASSERT_TRUE(becomes(terminal, "PCI 2,"));
+  terminal.press("h");
+  ASSERT_TRUE(becomes(terminal, "All kinds"));
+  EXPECT_TRUE(terminal.shows("Connection"));
+  terminal.press("Right");
+  ASSERT_TRUE(becomes(terminal, "Cell only"));
+  EXPECT_FALSE(terminal.shows("Connection"));
+  EXPECT_TRUE(terminal.shows("PCI 2"));
+  terminal.press("a");
+  EXPECT_TRUE(becomes(terminal, "All kinds"));
+}
+
+TEST_F(WatchScreens, leadToACategoryTableAsTheWindowDoes) {
+  const Tmux terminal(80, 24, program + recording.path());
+  ASSERT_TRUE(becomes(terminal, "PCI 1,"));
+  terminal.press("Down");
+  terminal.press("Enter");
+  ASSERT_TRUE(becomes(terminal, "Serving Cell Info"));
+  terminal.press("Down");
+  terminal.press("Enter");
+  ASSERT_TRUE(becomes(terminal, "KLTE_RRC_STATE_IDLE"));
+  EXPECT_TRUE(terminal.shows("RRC State"));
+  terminal.press("Escape");
+  EXPECT_TRUE(becomes(terminal, "Serving Cell Info"));
+  terminal.press("Escape");
+  EXPECT_TRUE(becomes(terminal, "Operator 001-01"));
+}
+
+TEST_F(WatchScreens, tellOfATerminalThatIsTooSmallAndGoOnInALargerOne) {
+  const Tmux terminal(80, 24, program + recording.path());
+  ASSERT_TRUE(becomes(terminal, "PCI 1,"));
+  terminal.resize(60, 20);
+  EXPECT_TRUE(becomes(terminal, "The terminal has 60x20 characters; 80x24 are needed."));
+  terminal.resize(100, 30);
+  EXPECT_TRUE(becomes(terminal, "Operator 001-01"));
+}
+
+TEST_F(WatchScreens, giveBackTheScreenThatWasThere) {
+  const Tmux terminal(80, 24,
+                      "echo before; " + program + recording.path() + "; echo ended $?; cat");
+  ASSERT_TRUE(becomes(terminal, "PCI 1,"));
+  EXPECT_FALSE(terminal.shows("before"));
+  terminal.press("q");
+  ASSERT_TRUE(becomes(terminal, "ended 0"));
+  EXPECT_TRUE(terminal.shows("before"));
+  EXPECT_FALSE(terminal.shows("Operator"));
+}
+
+TEST_F(WatchScreens, goOnAfterTheShellStoppedThem) {
+  const Tmux terminal(80, 24, "env PS1='shell> ' bash --norc --noprofile -i");
+  ASSERT_TRUE(becomes(terminal, "shell>"));
+  terminal.press(program + recording.path());
+  terminal.press("Enter");
+  ASSERT_TRUE(becomes(terminal, "PCI 1,"));
+  terminal.press("C-z");
+  ASSERT_TRUE(becomes(terminal, "Stopped"));
+  EXPECT_FALSE(terminal.shows("Operator 001-01"));
+  terminal.press("fg");
+  terminal.press("Enter");
+  ASSERT_TRUE(becomes(terminal, "Operator 001-01"));
+  terminal.press("n");
+  EXPECT_TRUE(becomes(terminal, "PCI 2,"));
+  terminal.press("q");
+  EXPECT_TRUE(becomes(terminal, "shell>"));
+}
+
+TEST_F(WatchScreens, showASimulatedModemWithoutAnyService) {
+  const Tmux terminal(80, 24, program + "--source simulated,speed=20");
+  EXPECT_TRUE(becomes(terminal, "Simulated modem"));
+  EXPECT_TRUE(becomes(terminal, "Operator 001-01"));
+}
+
+TEST_F(WatchScreens, sayWhatIsMissingWhenThereIsNoService) {
+  const Tmux terminal(80, 24, program + "--bus unix:path=/nowhere/bus");
+  EXPECT_TRUE(becomes(terminal, "no message bus"));
+  terminal.press("s");
+  EXPECT_TRUE(becomes(terminal, "No level was reported"));
+}
+
+TEST_F(WatchScreens, needNeitherColourNorAKnownCharacterSet) {
+  const Tmux terminal(80, 24,
+                      "env TERM=vt100 LC_ALL=C TZ=UTC0 " QEL_QELCTL " watch " + recording.path());
+  EXPECT_TRUE(becomes(terminal, "good ████·"));
+}
+
+}  // namespace
+}  // namespace qel::testing
