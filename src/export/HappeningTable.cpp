@@ -4,7 +4,7 @@
 #include <optional>
 #include <string_view>
 
-#include "export/IsoTime.h"
+#include "base/IsoTime.h"
 
 namespace qel {
 namespace {

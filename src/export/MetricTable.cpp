@@ -4,9 +4,9 @@
 #include <iterator>
 #include <utility>
 
+#include "base/IsoTime.h"
 #include "base/Rendering.h"
 #include "base/Utf8.h"
-#include "export/IsoTime.h"
 #include "messages/catalogue/FieldFacts.h"
 #include "messages/catalogue/KBBMetricUtility.h"
 

@@ -13,8 +13,8 @@
 
 namespace qel {
 
-// One of the pairs under the value. `id` names it in JSON; those of decoded forms begin with
-// "decoded".
+// One of the pairs under the value. `id` names it: "meaning", "range", "clause", "raw",
+// "hexadecimal", "decoded" (as many as there are), "age", "source".
 struct SheetLine {
   std::string id;
   std::string label;

@@ -2,10 +2,22 @@
 
 namespace qel {
 
+namespace {
+
+Grade gradeBy(float good, float fair, float value) {
+  if (value >= good) return Grade::good;
+  return value >= fair ? Grade::fair : Grade::poor;
+}
+
+}  // namespace
+
 Grade gradeOf(Quantity quantity, float value) {
   const QuantityFacts& facts = factsOf(quantity);
-  if (value >= facts.good) return Grade::good;
-  return value >= facts.fair ? Grade::fair : Grade::poor;
+  return gradeBy(facts.good, facts.fair, value);
+}
+
+Grade gradeOf(const QualityScale& scale, float value) {
+  return gradeBy(scale.good, scale.fair, value);
 }
 
 std::string_view nameOf(Grade grade) {

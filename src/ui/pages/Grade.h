@@ -5,6 +5,7 @@
 #include <string_view>
 
 #include "history/Quantity.h"
+#include "messages/catalogue/FieldFacts.h"
 
 namespace qel {
 
@@ -13,6 +14,7 @@ enum class Grade : std::uint8_t { unknown, poor, fair, good };
 inline constexpr int kGradeSteps = 5;
 
 Grade gradeOf(Quantity quantity, float value);
+Grade gradeOf(const QualityScale& scale, float value);
 // "good", "fair", "poor"; empty while unknown.
 std::string_view nameOf(Grade grade);
 // 1 to 5: poor has the first two, fair the third, good the last two.

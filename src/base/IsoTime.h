@@ -1,4 +1,4 @@
-// Points in time for spreadsheets and databases.
+// Points in time for people, spreadsheets and databases.
 #pragma once
 
 #include <cstdint>

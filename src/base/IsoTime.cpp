@@ -1,4 +1,4 @@
-#include "export/IsoTime.h"
+#include "base/IsoTime.h"
 
 #include <array>
 #include <chrono>
