@@ -21,6 +21,7 @@ void addStoreCommand(CLI::App& app, Action& chosen);
 void addScreenCommands(CLI::App& app, Action& chosen);
 void addHappeningsCommand(CLI::App& app, Action& chosen);
 void addPageCommands(CLI::App& app, Action& chosen);
+void addFieldCommand(CLI::App& app, Action& chosen);
 void addMetricsCommand(CLI::App& app, Action& chosen);
 void addStatusCommand(CLI::App& app, Action& chosen);
 void addWatchCommand(CLI::App& app, Action& chosen);

@@ -51,6 +51,7 @@ int main(int argc, char* argv[]) {
   tools::addHappeningsCommand(app, chosen);
   tools::addPageCommands(app, chosen);
   tools::addWatchCommand(app, chosen);
+  tools::addFieldCommand(app, chosen);
   tools::addMetricsCommand(app, chosen);
   tools::addStatusCommand(app, chosen);
   tools::addLiveCommand(app, chosen, verbose);
