@@ -126,6 +126,47 @@ TEST_F(TableModelTest, aTextThatIsItsOwnValueIsANotice) {
   EXPECT_EQ(at(1, TableModel::noticeRole), "false");
 }
 
+TEST_F(TableModelTest, aFieldThatIsCalledLikeItsValueIsNoNotice) {
+  table->sections = {{"PDP 0", {{"apn", "apn"}, {"Come back later", "Come back later"}}}};
+  EXPECT_EQ(at(0, TableModel::noticeRole), "false");
+  EXPECT_EQ(at(1, TableModel::noticeRole), "true");
+}
+
+// A table whose sections may be empty.
+class SectionedTable final : public testing::FakeTable {
+ public:
+  std::string_view cellOfEmptySection() const override { return "SecondClickView"; }
+};
+
+TEST_F(TableModelTest, aSectionWithoutFieldsKeepsItsTitle) {
+  table = testing::makeScreen<SectionedTable>();
+  table->sections = {{"LTE 0", {}}, {"LTE 1", {{"rsrp", "-86"}}}, {std::nullopt, {}}};
+  ASSERT_EQ(model().rowCount(), 2);
+  EXPECT_EQ(at(0, TableModel::sectionTitleRole), "LTE 0");
+  EXPECT_EQ(at(0, TableModel::textRole), "");
+  EXPECT_EQ(at(0, TableModel::detailRole), "");
+  EXPECT_EQ(at(0, TableModel::noticeRole), "false");
+  EXPECT_EQ(at(1, TableModel::sectionTitleRole), "LTE 1");
+
+  ModelLog log(model());
+  table->sections[0].rows = {{"rsrp", "-99"}};
+  table->tableView()->reloadData();
+  EXPECT_EQ(log.take(), (Strings{"out 0-0", "in 0-0"}));
+  EXPECT_EQ(at(0, TableModel::textRole), "rsrp");
+}
+
+TEST_F(TableModelTest, aTableOfSectionsWithoutFieldsIsNotBlank) {
+  table = testing::makeScreen<SectionedTable>();
+  table->sections = {{"LTE 0", {}}};
+  EXPECT_FALSE(model().isBlank());
+  EXPECT_EQ(model().cellIdentifier(), "SecondClickView");
+  std::vector<IndexPath> chosen;
+  QObject::connect(&model(), &TableModel::chosen,
+                   [&chosen](IndexPath indexPath) { chosen.push_back(indexPath); });
+  model().choose(0);
+  EXPECT_TRUE(chosen.empty()) << "there is no field to open";
+}
+
 TEST_F(TableModelTest, withoutAnyTextIsBlank) {
   table->sections.clear();
   EXPECT_TRUE(model().isBlank());

@@ -37,7 +37,7 @@ struct FakeSection {
 };
 
 // Shows what the test put in `sections`.
-class FakeTable final : public TableViewController {
+class FakeTable : public TableViewController {
  public:
   std::vector<FakeSection> sections;
   std::vector<std::string> calls;

@@ -4,6 +4,7 @@
 #include <memory>
 #include <optional>
 #include <string>
+#include <string_view>
 
 #include "ui/kit/IndexPath.h"
 #include "ui/kit/TableView.h"
@@ -24,6 +25,8 @@ class TableViewController : public ViewController {
   virtual std::optional<std::string> titleForHeaderInSection(int /*section*/) { return {}; }
   virtual int numberOfRowsInSection(int section) = 0;
   virtual TableViewCell& cellForRowAtIndexPath(IndexPath indexPath) = 0;
+  // What a face shows under the title of a section without rows: the prototype of an empty cell.
+  virtual std::string_view cellOfEmptySection() const { return {}; }
   virtual double heightForRowAtIndexPath(IndexPath /*indexPath*/) { return kAutomaticDimension; }
   virtual double estimatedHeightForRowAtIndexPath(IndexPath /*indexPath*/) {
     return kAutomaticDimension;

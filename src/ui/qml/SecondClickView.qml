@@ -32,7 +32,7 @@ Tappable {
     }
 
     Accessible.role: Accessible.ListItem
-    Accessible.name: notice ? text : text + ": " + (texts.blank ? qsTr("empty") : detail)
+    Accessible.name: notice ? text : (text ? text + ": " : "") + (texts.blank ? qsTr("empty") : detail)
     Accessible.focused: isCurrent
 
     Rectangle {

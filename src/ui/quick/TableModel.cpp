@@ -5,16 +5,21 @@
 #include <utility>
 
 #include "ui/kit/RowDiff.h"
+#include "ui/screens/Placeholders.h"
 
 namespace qel {
 namespace {
+
+constexpr int kNoRow = -1;  // of the cell of an empty section
 
 QString shown(const std::optional<std::string>& text) {
   return text ? QString::fromStdString(*text) : QString();
 }
 
-// A text that stands for its own value is no field but a word to the reader.
-bool isNotice(const RowSnapshot& cell) { return cell.text && cell.text == cell.detail; }
+// What stands in for values is no field but a word to the reader.
+bool isNotice(const RowSnapshot& cell) {
+  return cell.text && cell.detail && isPlaceholder(*cell.text, *cell.detail);
+}
 
 }  // namespace
 
@@ -67,19 +72,26 @@ QHash<int, QByteArray> TableModel::roleNames() const {
 QString TableModel::title() const { return QString::fromStdString(_controller->title()); }
 
 bool TableModel::isBlank() const {
-  return std::none_of(_rows.begin(), _rows.end(),
-                      [](const Row& row) { return row.cell.text || row.cell.detail; });
+  return std::none_of(_rows.begin(), _rows.end(), [](const Row& row) {
+    return row.cell.text || row.cell.detail || row.indexPath.row == kNoRow;
+  });
 }
 
 void TableModel::choose(int row) {
   if (row < 0 || row >= count()) return;
+  if (_rows[static_cast<std::size_t>(row)].indexPath.row == kNoRow) return;
   emit chosen(_rows[static_cast<std::size_t>(row)].indexPath);
 }
 
-std::vector<TableModel::Row> TableModel::rowsOf(TableSnapshot snapshot) {
+// A section with a title and no rows keeps its title over an empty cell.
+std::vector<TableModel::Row> TableModel::rowsOf(TableSnapshot snapshot) const {
+  const std::string emptyCell(_controller->cellOfEmptySection());
   std::vector<Row> rows;
   int sectionIndex = 0;
   for (SectionSnapshot& section : snapshot.sections) {
+    if (section.rows.empty() && section.title && !emptyCell.empty()) {
+      rows.push_back({{sectionIndex, kNoRow}, section.title, {emptyCell, {}, {}}});
+    }
     int rowIndex = 0;
     for (RowSnapshot& cell : section.rows) {
       rows.push_back({{sectionIndex, rowIndex++}, section.title, std::move(cell)});

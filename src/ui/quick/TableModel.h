@@ -47,10 +47,10 @@ class TableModel final : public QAbstractListModel {
   // The prototype that the rows are made from; the last one known while there are no rows.
   QString cellIdentifier() const { return _cellIdentifier; }
   int count() const { return static_cast<int>(_rows.size()); }
-  // Is there no text at all in any row?
+  // Is there no text at all in any row, and no section to show?
   bool isBlank() const;
 
-  // The user chose this row.
+  // The user chose this row. The cell of an empty section cannot be chosen.
   Q_INVOKABLE void choose(int row);
 
  signals:
@@ -65,7 +65,7 @@ class TableModel final : public QAbstractListModel {
     int changes = 0;  // of its detail text since it came
   };
 
-  static std::vector<Row> rowsOf(TableSnapshot snapshot);
+  std::vector<Row> rowsOf(TableSnapshot snapshot) const;
   static bool isSame(const Row& a, const Row& b);
 
   void draw();

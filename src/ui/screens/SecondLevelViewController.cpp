@@ -9,12 +9,13 @@
 #include "ui/kit/RunLoop.h"
 #include "ui/screens/CategoryTable.h"
 #include "ui/screens/Indexing.h"
+#include "ui/screens/Placeholders.h"
 
 namespace qel {
 namespace {
 
 constexpr std::chrono::seconds kRefreshInterval{5};
-constexpr std::string_view kCellWithoutCategory = "Come back later";
+constexpr std::string_view kCell = "SecondClickView";
 // The one category whose missing record is worth a line.
 constexpr std::string_view kServingCellKey = "LTE Serving Cell Info";
 constexpr std::string_view kServingCellMissing = "You are screwed";
@@ -66,12 +67,11 @@ int SecondLevelViewController::numberOfRowsInSection(int section) {
 }
 
 TableViewCell& SecondLevelViewController::cellForRowAtIndexPath(IndexPath indexPath) {
-  TableViewCell& cell =
-      requiredTableView().dequeueReusableCellWithIdentifier("SecondClickView", indexPath);
+  TableViewCell& cell = requiredTableView().dequeueReusableCellWithIdentifier(kCell, indexPath);
   const Category* category = findCategory(categoryKey(), Routine::cells);
   if (!category) {
-    show(cell.textLabel, std::string(kCellWithoutCategory));
-    show(cell.detailTextLabel, std::string(kCellWithoutCategory));
+    show(cell.textLabel, std::string(kTableUnknown));
+    show(cell.detailTextLabel, std::string(kTableUnknown));
     return cell;
   }
   const Dictionary* record = category->recordOfSection(*myMetricValidator, indexPath.section);
@@ -82,6 +82,8 @@ TableViewCell& SecondLevelViewController::cellForRowAtIndexPath(IndexPath indexP
   show(cell.detailTextLabel, cellText(entry.value));
   return cell;
 }
+
+std::string_view SecondLevelViewController::cellOfEmptySection() const { return kCell; }
 
 double SecondLevelViewController::heightForRowAtIndexPath(IndexPath /*indexPath*/) {
   return kAutomaticDimension;

@@ -4,6 +4,7 @@
 #include <memory>
 #include <optional>
 #include <string>
+#include <string_view>
 
 #include "metrics/MetricValidator.h"
 #include "ui/kit/TableViewController.h"
@@ -29,6 +30,7 @@ class SecondLevelViewController final : public TableViewController {
   std::optional<std::string> titleForHeaderInSection(int section) override;
   int numberOfRowsInSection(int section) override;
   TableViewCell& cellForRowAtIndexPath(IndexPath indexPath) override;
+  std::string_view cellOfEmptySection() const override;
   double heightForRowAtIndexPath(IndexPath indexPath) override;
   double estimatedHeightForRowAtIndexPath(IndexPath indexPath) override;
 
