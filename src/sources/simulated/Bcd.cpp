@@ -2,6 +2,8 @@
 
 #include <string>
 
+#include "radio/Networks.h"
+
 namespace qel::sources {
 namespace {
 
@@ -37,10 +39,8 @@ Bytes encodedImsi(std::string_view digits) {
 }
 
 Bytes encodedPlmn(std::uint32_t mcc, std::uint32_t mnc, std::uint32_t mncDigits) {
-  const std::uint32_t lastMnc = mncDigits == 3 ? mnc % 10 : kFiller;
-  const std::uint32_t firstMnc = mncDigits == 3 ? mnc / 10 : mnc;
-  return {pair(mcc / 100, mcc / 10 % 10), pair(mcc % 10, lastMnc),
-          pair(firstMnc / 10, firstMnc % 10)};
+  const auto network = networkOf(mcc, mnc, mncDigits);
+  return network ? bytesOf(*network).value_or(Bytes()) : Bytes();
 }
 
 }  // namespace qel::sources

@@ -14,7 +14,7 @@ Bytes swappedDigits(std::string_view digits);
 Bytes encodedImsi(std::string_view digits);
 
 // Country and network code in three bytes (24.008, clause 10.5.1.3); a two-digit network code is
-// filled with F.
+// filled with F. Empty for codes beyond 999.
 Bytes encodedPlmn(std::uint32_t mcc, std::uint32_t mnc, std::uint32_t mncDigits);
 
 }  // namespace qel::sources

@@ -18,6 +18,7 @@ namespace qel {
 namespace {
 
 constexpr std::uint64_t kCurveMs = 10 * 60 * 1000;
+constexpr std::uint64_t kShortestAgeMs = 5 * 1000;  // ages are told in steps of it
 
 // The row of a table and where its value comes from.
 struct Row {
@@ -132,7 +133,8 @@ void addAge(FieldSheet& sheet, const Viewpoint& viewpoint, const Report& report,
             const TimeZone& zone) {
   const std::uint64_t received = report.entry.receivedMs;
   const std::uint64_t age = viewpoint.nowMs - std::min(viewpoint.nowMs, received);
-  add(sheet, "age", "Age", durationText(age) + ", since " + secondText(received, zone));
+  const std::string text = age < kShortestAgeMs ? "just now" : durationText(age);
+  add(sheet, "age", "Age", text + ", since " + secondText(received, zone));
   if (viewpoint.isLive) sheet.changesAtMs = received + nextDurationMs(age);
 }
 
