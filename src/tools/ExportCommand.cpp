@@ -49,7 +49,11 @@ std::unique_ptr<TableSink> begin(const Options& options) {
   throw ToolError(EX_IOERR, error + (isThere ? " (--force replaces what is there)" : ""));
 }
 
-// What a reader tells besides events, and what came of it.
+std::string counted(std::uint64_t count, const std::string& what) {
+  return std::to_string(count) + " " + what + (count == 1 ? "" : "s");
+}
+
+// One export, from the file to what is in its place.
 class Run {
  public:
   explicit Run(const Options& options) : _options(options) {}
@@ -106,14 +110,13 @@ void Run::look() {
 }
 
 void Run::summarize(const Exporter::Counts& counts) {
-  std::string text = _options.out + ": " + std::to_string(counts.events) + " events in " +
-                     std::to_string(counts.tables) + " tables, " +
-                     std::to_string(counts.happenings) + " happenings";
+  std::string text = _options.out + ": " + counted(counts.events, "event") + " in " +
+                     counted(counts.tables, "table") + ", " +
+                     counted(counts.happenings, "happening");
   if (counts.without > 0) {
-    text += ", " + std::to_string(counts.without) + " events without a message class left out";
+    text += ", " + counted(counts.without, "event") + " without a message class left out";
   }
-  if (_undecodable > 0)
-    text += ", " + std::to_string(_undecodable) + " undecodable events left out";
+  if (_undecodable > 0) text += ", " + counted(_undecodable, "undecodable event") + " left out";
   if (_reader->cutOff()) _progress.say(*_reader->cutOff());
   if (_reader->skippedLines() > 0) {
     _progress.say(_options.recording.file +
