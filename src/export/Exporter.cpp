@@ -1,22 +1,14 @@
 #include "export/Exporter.h"
 
-#include <limits>
 #include <utility>
 
 #include "export/HappeningTable.h"
+#include "history/MarkHappening.h"
 #include "messages/catalogue/KBBMetricUtility.h"
 #include "messages/catalogue/TagLog.h"
-#include "recording/Mark.h"
 
 namespace qel {
 namespace {
-
-// All of them: none may go before it is written.
-History::Limits limitsOfHistory() {
-  History::Limits limits;
-  limits.mostHappenings = std::numeric_limits<std::size_t>::max();
-  return limits;
-}
 
 const MetricMessage* messageOf(const Dictionary& event) {
   const Value* metric = event.find(kRecordedMetricKey);
@@ -30,7 +22,7 @@ const MetricMessage* messageOf(const Dictionary& event) {
 }  // namespace
 
 Exporter::Exporter(TableSink& sink, IdentityHider* hider)
-    : _sink(sink), _hider(hider), _history(limitsOfHistory()), _dispatcher(&_history) {}
+    : _sink(sink), _hider(hider), _dispatcher(&_history) {}
 
 bool Exporter::report(const RecordedEvent& event) {
   const MetricMessage* message = messageOf(event.entries);
@@ -53,8 +45,9 @@ bool Exporter::report(const RecordedEvent& event) {
 
 bool Exporter::tellHappenings() {
   const auto& happenings = _history.happenings();
-  for (; _happeningsTold < happenings.size(); ++_happeningsTold) {
-    if (!_sink.put(happeningTable(), rowOf(happenings[_happeningsTold]))) return false;
+  const std::uint64_t gone = _history.happeningsGone();
+  for (; _happeningsTold < gone + happenings.size(); ++_happeningsTold) {
+    if (!_sink.put(happeningTable(), rowOf(happenings[_happeningsTold - gone]))) return false;
   }
   return true;
 }
@@ -64,12 +57,8 @@ bool Exporter::take(RecordedEvent event) {
   if (event.kind == RecordedKind::metric) {
     if (!report(event)) return false;
     _dispatcher.take(event.entries, event.timeMs);
-  } else if (const auto mark = markOf(event)) {
-    Happening happening;
-    happening.timeMs = event.timeMs;
-    happening.kind = HappeningKind::mark;
-    happening.text = markText(*mark);
-    _history.add(std::move(happening));
+  } else if (auto mark = happeningOfMark(event)) {
+    _history.add(std::move(*mark));
   }
   return tellHappenings();
 }

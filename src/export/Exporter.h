@@ -45,7 +45,7 @@ class Exporter {
   std::map<std::uint32_t, MetricTable> _tables;
   History _history;
   QuietDispatcher _dispatcher;
-  std::size_t _happeningsTold = 0;
+  std::uint64_t _happeningsTold = 0;
   Counts _counts;
 };
 

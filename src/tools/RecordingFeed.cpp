@@ -3,6 +3,8 @@
 #include <CLI/CLI.hpp>
 
 #include "base/TerminalText.h"
+#include "history/History.h"
+#include "history/MarkHappening.h"
 #include "metrics/MetricValidator.h"
 #include "recording/RecordingReader.h"
 #include "tools/ToolError.h"
@@ -12,7 +14,7 @@ namespace {
 
 ToolError asError(const RecordingFault& fault) { return {fault.exitCode(), fault.message}; }
 
-void feed(const RecordingOptions& options, RecordedClock& clock,
+void feed(const RecordingOptions& options, RecordedClock& clock, History* history,
           const std::function<void()>& afterEach) {
   using BadLines = RecordingReader::BadLines;
   RecordingFault notOpened;
@@ -22,6 +24,8 @@ void feed(const RecordingOptions& options, RecordedClock& clock,
   MetricValidator& validator = *MetricValidator::shared();
   while (auto event = reader->next()) {
     clock.set(event->timeMs);
+    if (auto mark = history ? happeningOfMark(*event) : std::nullopt)
+      history->add(std::move(*mark));
     const std::optional dictionary = std::move(event->entries);
     if (event->kind == RecordedKind::metric) {
       validator.metricsDidUpdate(dictionary);
@@ -58,14 +62,14 @@ void addRecordingOptions(CLI::App& command, RecordingOptions& options) {
 
 void feedRecording(const RecordingOptions& options, const std::function<void()>& afterEach) {
   RecordedClock clock;
-  feed(options, clock, afterEach);
+  feed(options, clock, nullptr, afterEach);
 }
 
-void feedRecording(const RecordingOptions& options, MetricObserver& observer,
+void feedRecording(const RecordingOptions& options, History& history,
                    const std::function<void()>& afterEach) {
   RecordedClock clock;
-  const Observing observing(observer, clock);
-  feed(options, clock, afterEach);
+  const Observing observing(history, clock);
+  feed(options, clock, &history, afterEach);
 }
 
 }  // namespace qel::tools

@@ -8,7 +8,7 @@
 #include "base/Clock.h"
 
 namespace qel {
-class MetricObserver;
+class History;
 }
 
 namespace CLI {
@@ -39,8 +39,8 @@ class RecordedClock final : public Clock {
 // `afterEach` after each event. A recording that cannot be read is a ToolError; one that was cut
 // off at its end, and lines skipped, are said on standard error.
 void feedRecording(const RecordingOptions& options, const std::function<void()>& afterEach = {});
-// The same, with an observer of the dispatcher, which is told the times of the recording.
-void feedRecording(const RecordingOptions& options, MetricObserver& observer,
+// The same, with a history of it, which is told the times of the recording and its marks.
+void feedRecording(const RecordingOptions& options, History& history,
                    const std::function<void()>& afterEach = {});
 
 }  // namespace qel::tools

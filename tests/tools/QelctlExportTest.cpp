@@ -67,6 +67,15 @@ TEST(QelctlExport, tellsWhatHappenedAndWhatWasMarked) {
   EXPECT_EQ(tables.at("happenings").rows, std::vector<ExportedRow>{expected});
 }
 
+TEST(QelctlHappenings, tellsMarks) {
+  const TemporaryRecording recording(eventLine(markEvent(1500000000000, 7)) + "\n");
+  const Outcome outcome = qelctl({"happenings", recording.path(), "--json"});
+  const auto line = nlohmann::json::parse(outcome.out);
+  EXPECT_EQ(line["kind"], "mark");
+  EXPECT_EQ(line["text"], "Mark 7");
+  EXPECT_EQ(line["time_ms"], 1500000000000);
+}
+
 TEST(QelctlExport, tellsTheHappeningsThatHappeningsTells) {
   const Folder folder;
   ASSERT_EQ(

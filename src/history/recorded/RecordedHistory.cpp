@@ -7,8 +7,8 @@
 #include <utility>
 
 #include "base/TimeZone.h"
+#include "history/MarkHappening.h"
 #include "history/recorded/QuietDispatcher.h"
-#include "recording/Mark.h"
 
 namespace qel {
 namespace {
@@ -111,12 +111,9 @@ void RecordedHistory::State::take(RecordedEvent event) {
   ++eventsSince;
   if (event.kind == RecordedKind::metric) {
     writer.take(event.entries, timeMs);
-  } else if (const auto mark = markOf(event)) {
-    Happening happening;
-    happening.timeMs = timeMs;
-    happening.kind = HappeningKind::mark;
-    happening.text = markText(*mark);
-    history.add(std::move(happening));
+  } else if (auto mark = happeningOfMark(event)) {
+    mark->timeMs = timeMs;
+    history.add(std::move(*mark));
   }
 }
 
