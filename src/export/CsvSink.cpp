@@ -4,9 +4,11 @@
 #include <unistd.h>
 
 #include <algorithm>
+#include <array>
 #include <cerrno>
 #include <cstring>
 #include <filesystem>
+#include <fstream>
 #include <string_view>
 #include <system_error>
 
@@ -40,6 +42,14 @@ std::string headOf(const Table& table) {
     appendCell(line, column.unit.empty() ? column.name : column.name + " [" + column.unit + "]");
   }
   return line + "\r\n";
+}
+
+// Whether the file is a table of an export: others begin otherwise.
+bool isTable(const std::string& path) {
+  constexpr std::string_view kBegin = "time_utc";
+  std::array<char, kBegin.size()> begin{};
+  std::ifstream(path, std::ios::binary).read(begin.data(), begin.size());
+  return std::string_view(begin.data(), begin.size()) == kBegin;
 }
 
 }  // namespace
@@ -113,6 +123,7 @@ bool CsvSink::dropOthers() {
     const bool isOurs = std::ranges::any_of(
         _files, [&path](const auto& file) { return file.second->part.path() == path; });
     if (isOurs || entry.path().extension() != kEnding || !entry.is_regular_file(code)) continue;
+    if (!isTable(path)) continue;
     if (::unlink(path.c_str()) == 0) continue;
     _error = path + ": " + std::strerror(errno);
     return false;

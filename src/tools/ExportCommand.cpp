@@ -16,6 +16,7 @@
 #include "tools/Commands.h"
 #include "tools/RecordProgress.h"
 #include "tools/RecordingFeed.h"
+#include "tools/SameFile.h"
 #include "tools/StopSignals.h"
 #include "tools/ToolError.h"
 
@@ -36,6 +37,9 @@ struct Options {
 };
 
 std::unique_ptr<TableSink> begin(const Options& options) {
+  if (isSameFile(options.recording.file, options.out)) {
+    throw ToolError(EX_USAGE, options.out, "is the recording itself");
+  }
   std::string error;
   std::unique_ptr<TableSink> sink;
   if (options.format == kCsv) {
@@ -105,8 +109,11 @@ void Run::look() {
   const auto now = steady_clock::now();
   if (now < _shownAt + kPause) return;
   _shownAt = now;
-  _progress.show("exporting " + _options.recording.file + ": " +
-                 std::to_string(static_cast<int>(100 * _reader->share())) + " %");
+  // Of a pipe nobody knows how long it is.
+  const float share = _reader->share();
+  _progress.show(_options.recording.file + ": " +
+                 (share > 0 ? std::to_string(static_cast<int>(100 * share)) + " %"
+                            : counted(_exporter->counts().events, "event")));
 }
 
 void Run::summarize(const Exporter::Counts& counts) {
@@ -168,8 +175,7 @@ void addExportCommand(CLI::App& app, Action& chosen) {
       ->required()
       ->type_name("DIR|FILE");
   command->add_flag("--keep-identities", options->keepIdentities, "Write them as they are");
-  command->add_flag("--force", options->force,
-                    "Replace the database, or the CSV files in the folder");
+  command->add_flag("--force", options->force, "Replace the database, or the tables in the folder");
   command->callback([options, &chosen] { chosen = [options](Output&) { run(*options); }; });
 }
 

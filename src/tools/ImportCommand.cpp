@@ -1,6 +1,5 @@
 // qelctl import: what a diagnostics port sent, into a recording.
 
-#include <sys/stat.h>
 #include <unistd.h>
 
 #include <CLI/CLI.hpp>
@@ -18,6 +17,7 @@
 #include "tools/Commands.h"
 #include "tools/MetricThinning.h"
 #include "tools/PacketList.h"
+#include "tools/SameFile.h"
 #include "tools/ToolError.h"
 
 namespace qel::tools {
@@ -50,13 +50,6 @@ void check(const RawLog& log) {
   if (!fault.message.empty()) throw ToolError(fault.exitCode, fault.message);
   if (log.frames().frames > 0) return;
   throw ToolError(EX_DATAERR, log.name(), "no frame of a diagnostics port in it");
-}
-
-bool isSameFile(const std::string& one, const std::string& other) {
-  struct stat first {};
-  struct stat second {};
-  return ::stat(one.c_str(), &first) == 0 && ::stat(other.c_str(), &second) == 0 &&
-         first.st_dev == second.st_dev && first.st_ino == second.st_ino;
 }
 
 std::unique_ptr<RecordingWriter> begin(const Options& options) {

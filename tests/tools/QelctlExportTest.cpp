@@ -136,11 +136,14 @@ TEST(QelctlExport, replacesNothingUnlessItIsForced) {
     EXPECT_EQ(qelctl(words).exitCode, 0);
   }
   // What an export before left is no part of this one.
-  std::ofstream(folder / "out/KCellularMmContext.csv") << "time_utc\r\n";
+  std::ofstream(folder / "out/KCellularMmContext.csv") << "time_utc,timestamp\r\n";
+  std::ofstream(folder / "out/expenses.csv") << "date,amount\r\n";
   ASSERT_EQ(
       qelctl({"export", recording.path(), "--format", "csv", "--out", folder / "out", "--force"})
           .exitCode,
       0);
+  EXPECT_TRUE(fs::exists(folder / "out/expenses.csv")) << "of somebody else";
+  fs::remove(folder / "out/expenses.csv");
   EXPECT_EQ(readCsv(folder / "out").size(), 2U);
 }
 
@@ -192,6 +195,24 @@ TEST(QelctlExport, leavesNothingBehindWhenItIsInterrupted) {
   }
 }
 
+TEST(QelctlExport, showsOnATerminalHowFarItIs) {
+  const Folder folder;
+  const std::string pipe = folder / "pipe.jsonl";
+  ASSERT_EQ(::mkfifo(pipe.c_str(), 0600), 0);
+  RunningQelctl running({"export", pipe, "--format", "csv", "--out", folder / "out"},
+                        RunningQelctl::Streams::terminal);
+  std::ofstream writer(pipe);
+  const auto isShown = [&] {
+    writer << neighbours() << std::flush;
+    return running.out().find(pipe + ": ") != std::string::npos;
+  };
+  EXPECT_TRUE(eventually(isShown));
+  writer.close();
+  EXPECT_EQ(running.waitForEnd(), 0);
+  EXPECT_NE(running.out().find(" in 1 table, 0 happenings, identities hidden"), std::string::npos)
+      << running.out();
+}
+
 TEST(QelctlExport, refusesWhatItCannotDo) {
   const TemporaryRecording recording(neighbours());
   const Folder folder;
@@ -207,8 +228,12 @@ TEST(QelctlExport, refusesWhatItCannotDo) {
             74);
   EXPECT_EQ(exitCodeOf({"export", recording.path(), "--format", "sqlite", "--out", folder / "a/b"}),
             74);
-  EXPECT_EQ(exitCodeOf({"export", recording.path(), "--format", "csv", "--out", recording.path()}),
-            74);
+  for (const char* format : {"csv", "sqlite"}) {
+    EXPECT_EQ(exitCodeOf({"export", recording.path(), "--format", format, "--out", recording.path(),
+                          "--force"}),
+              64);
+  }
+  EXPECT_EQ(contentOf(recording.path()), neighbours());
 }
 
 }  // namespace

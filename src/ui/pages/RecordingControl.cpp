@@ -24,6 +24,18 @@ std::string counted(std::uint64_t count, const std::string& what) {
 
 }  // namespace
 
+// The service is waited for as long as this lives.
+class RecordingControl::Talk {
+ public:
+  explicit Talk(RecordingControl& control) : _control(control) { _control._isTalking = true; }
+  ~Talk() { _control._isTalking = false; }
+  Talk(const Talk&) = delete;
+  Talk& operator=(const Talk&) = delete;
+
+ private:
+  RecordingControl& _control;
+};
+
 RecordingControl::RecordingControl(RecordingsFolder folder, Way way, const Clock& clock, Now now)
     : _folder(std::move(folder)), _way(std::move(way)), _clock(clock), _now(std::move(now)) {
   _view.hiddenText = kHidden;
@@ -40,9 +52,10 @@ void RecordingControl::changed() {
 }
 
 void RecordingControl::start() {
-  if (_recorder) return;
+  if (_recorder || _isTalking) return;
   _view.outcome.clear();
-  begin();
+  _isToStop = false;
+  if (begin() && _isToStop) finish("");
   changed();
 }
 
@@ -63,27 +76,41 @@ bool RecordingControl::begin() {
       });
   _fileName = *name;
   _begun = _now();
-  const tesk::CommandResult begun = _connection->begin();
+  return connect();
+}
+
+bool RecordingControl::connect() {
+  changed();
+  tesk::CommandResult begun;
+  {
+    const Talk talk(*this);
+    begun = _connection->begin();
+  }
   if (begun.code == 0) return true;
   finish("Nothing can be recorded: " + begun.message);
   return false;
 }
 
 void RecordingControl::mark() {
-  if (!_recorder) return;
+  if (!_recorder || _isTalking) return;
   if (!_recorder->mark()) finish(_recorder->error());
   changed();
 }
 
 void RecordingControl::stop() {
-  if (!_recorder) return;
+  _isToStop = true;
+  if (!_recorder || _isTalking) return;
   finish("");
   changed();
 }
 
 // Without a reason it ends because somebody wanted it to. What holds nothing is not kept.
 void RecordingControl::finish(const std::string& why) {
-  const std::uint64_t lost = _connection->end();
+  std::uint64_t lost = 0;
+  {
+    const Talk talk(*this);
+    lost = _connection->end();
+  }
   _connection.reset();
   const bool isWhole = _recorder->close();
   const Recorder::Progress progress = _recorder->progress();
@@ -102,7 +129,13 @@ void RecordingControl::finish(const std::string& why) {
 }
 
 void RecordingControl::serviceCameBack() {
-  if (_connection) _connection->begin();
+  if (!_connection || _isTalking) return;
+  _isToStop = false;
+  {
+    const Talk talk(*this);
+    _connection->begin();
+  }
+  if (_isToStop) stop();
 }
 
 std::optional<std::chrono::milliseconds> RecordingControl::untilNextTick() const {
@@ -111,7 +144,7 @@ std::optional<std::chrono::milliseconds> RecordingControl::untilNextTick() const
 }
 
 void RecordingControl::tick() {
-  if (!_recorder) return;
+  if (!_recorder || _isTalking) return;
   if (!_recorder->tend()) {
     finish(_recorder->error());
   } else if (_recorder->progress().bytes >= _room) {

@@ -26,7 +26,8 @@ struct RecordingControlView {
 };
 
 // Main thread only. Records over a connection of its own, so that nothing is missing that the
-// screens leave out. Identities are always hidden.
+// screens leave out. Identities are always hidden. What is called while the service is waited for,
+// which may let the window live on, is ignored; a stop is done afterwards.
 class RecordingControl {
  public:
   using TimePoint = std::chrono::steady_clock::time_point;
@@ -61,7 +62,9 @@ class RecordingControl {
   const std::string& fileName() const { return _fileName; }
 
  private:
+  class Talk;
   bool begin();
+  bool connect();
   void finish(const std::string& why);
   void describe();
   void changed();
@@ -74,6 +77,8 @@ class RecordingControl {
   std::string _fileName;
   TimePoint _begun;
   std::uint64_t _room = 0;  // bytes that it may have
+  bool _isTalking = false;  // to the service
+  bool _isToStop = false;   // once it does no more
   std::unique_ptr<capture::Recorder> _recorder;
   std::unique_ptr<capture::RecordConnection> _connection;
   RecordingControlView _view;

@@ -121,6 +121,23 @@ TEST_F(RecordingControlTest, asksAgainWhenTheServiceIsBack) {
   EXPECT_EQ(service->calls[0], tesk::kCommandAddConfiguration);
 }
 
+// While the service is waited for, the window handles taps.
+TEST_F(RecordingControlTest, stopsOnceTheServiceHasAnswered) {
+  service->answer = [this](std::string_view) {
+    EXPECT_TRUE(control.view().isRecording);
+    control.stop();
+    control.start();
+    control.mark();
+    control.tick();
+    control.serviceCameBack();
+    return tesk::CommandResult{};
+  };
+  control.start();
+  EXPECT_FALSE(control.view().isRecording);
+  EXPECT_EQ(control.view().outcome, "Nothing was recorded");
+  EXPECT_EQ(service->clients.size(), 1U);
+}
+
 TEST_F(RecordingControlTest, endsWholeAtTheLimitOfTheFolder) {
   RecordingsFolder::Limits limits;
   limits.bytes = 1500;
