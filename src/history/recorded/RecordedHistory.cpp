@@ -13,6 +13,7 @@
 namespace qel {
 namespace {
 
+constexpr std::uint64_t kEndOfTime = 253402300799999;  // of the year 9999
 constexpr std::size_t kAll = std::numeric_limits<std::size_t>::max();
 
 // Everything stays: it is bounded by what is read at all.
@@ -102,7 +103,7 @@ void RecordedHistory::State::keepCheckpoint() {
 
 void RecordedHistory::State::take(RecordedEvent event) {
   if (event.timeMs < endMs) ++timesBack;
-  const std::uint64_t timeMs = std::max(event.timeMs, endMs);
+  const std::uint64_t timeMs = std::clamp(event.timeMs, endMs, kEndOfTime);
   if (events == 0) beginMs = timeMs;
   // Between two milliseconds, so that a moment has all its events or none.
   if (eventsSince >= limits.eventsBetween && timeMs > endMs) keepCheckpoint();
@@ -175,6 +176,7 @@ const History& RecordedHistory::history() const { return _state->history; }
 
 const MetricStore& RecordedHistory::storeAt(std::uint64_t timeMs) {
   State& state = *_state;
+  timeMs = std::min(timeMs, kEndOfTime);
   const auto after = std::ranges::upper_bound(state.checkpoints, timeMs, {}, &Checkpoint::fromMs);
   const Checkpoint& before = *(after == state.checkpoints.begin() ? after : after - 1);
   if (timeMs + 1 < state.playedToMs || before.fromMs > state.playedToMs) {

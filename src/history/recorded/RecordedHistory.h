@@ -35,7 +35,8 @@ class RecordedHistory {
   // How much of the file has been read, from 0 to 1.
   float progress() const;
 
-  // Once all is read. Times are of reception; one that goes back counts as the one before it.
+  // Once all is read. Times are of reception; one that goes back counts as the one before it, one
+  // beyond the year 9999 as its end.
   std::uint64_t beginMs() const;  // of the first event; 0 for an empty recording
   std::uint64_t endMs() const;
   std::uint64_t events() const;

@@ -3,6 +3,7 @@
 #include <gtest/gtest.h>
 #include <sys/stat.h>
 
+#include <limits>
 #include <random>
 
 #include "base/LogSink.h"
@@ -172,6 +173,26 @@ TEST(RecordedHistory, leavesBadLinesAndReportsOutAndSaysSo) {
                 "It was cut off at its end", "2 lines are no events and are left out",
                 "1 report cannot be decoded and is left out",
                 "Its clock went back 1 time: what came then stands at the time before"}));
+}
+
+TEST(RecordedHistory, holdsTheStoreWhateverTheClockSaid) {
+  const TemporaryFolder folder;
+  constexpr auto kLast = std::numeric_limits<std::uint64_t>::max();
+  std::string lines;
+  for (const std::uint64_t time :
+       {std::uint64_t{0}, std::uint64_t{5}, kLast - 1, std::uint64_t{7}, kLast}) {
+    lines += lineOf(lteCell(time, static_cast<std::uint32_t>(time % 400)));
+  }
+  RecordedHistory::Limits limits;
+  limits.eventsBetween = 1;
+  const auto history = opened(folder.file("a.jsonl", lines), limits);
+  const auto cellAt = [&history](std::uint64_t timeMs) {
+    return *history->storeAt(timeMs).myLTESCellInfoDict->find("phy_cell_id")->asUInt64();
+  };
+  EXPECT_EQ(cellAt(kLast), kLast % 400);
+  EXPECT_EQ(cellAt(6), 5U);
+  EXPECT_EQ(cellAt(history->endMs()), kLast % 400);
+  EXPECT_EQ(cellAt(0), 0U);
 }
 
 TEST(RecordedHistory, opensOfATooLargeRecordingWhatItCanHold) {
