@@ -15,6 +15,7 @@
 #include "tools/RecordingFeed.h"
 #include "tools/ToolError.h"
 #include "ui/pages/FieldSheet.h"
+#include "ui/pages/Words.h"
 #include "ui/screens/CategoryTable.h"
 
 namespace qel::tools {
@@ -81,7 +82,8 @@ std::string curveText(const FieldSheet& sheet) {
       most = std::max(most, point.value);
     }
   }
-  return std::to_string(count) + " values from " + cellText(least) + " to " + cellText(most);
+  if (count == 1) return "one value, " + figureText(least);
+  return std::to_string(count) + " values from " + figureText(least) + " to " + figureText(most);
 }
 
 void print(const FieldSheet& sheet, Output& output) {

@@ -36,7 +36,7 @@ TEST_F(QelctlField, TellsAllOfAFieldToPeople) {
   EXPECT_EQ(lines[0], "Power of the control channel (pucch_tx_power)");
   EXPECT_EQ(lines[1], "LTE, Tx Power, TxPowerInfo 1");
   EXPECT_EQ(lines[3], "Value            8 dBm");
-  EXPECT_EQ(lines.back(), "Last 10 minutes  2 values from 7.0 to 8.0");
+  EXPECT_EQ(lines.back(), "Last 10 minutes  2 values from 7 to 8");
 }
 
 TEST_F(QelctlField, TellsTheSameToScripts) {

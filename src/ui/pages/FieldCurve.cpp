@@ -9,7 +9,7 @@
 namespace qel {
 namespace {
 
-constexpr std::size_t kMostReports = 4096;
+constexpr std::size_t kMostReports = 16384;
 
 // As the table would show it; nothing for what is no number.
 std::optional<float> shownNumber(const FieldOrigin& origin, std::string_view field,

@@ -16,7 +16,7 @@ bool hasCurve(const FieldFacts& facts);
 
 // What the reports kept within both times say of the field, in the unit of the tables, of the same
 // entry: `part` is its newest, `section` its place. A report without it is a gap. At most the
-// newest 4,096 reports are looked at.
+// newest 16,384 reports are looked at.
 std::vector<Run> fieldCurve(const Journal& journal, const FieldOrigin& origin,
                             std::string_view field, const Dictionary& part, int section,
                             std::uint64_t fromMs, std::uint64_t toMs);

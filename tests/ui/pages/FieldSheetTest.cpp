@@ -167,6 +167,20 @@ TEST_F(FieldSheetTest, endsItsCurveAtTheMoment) {
   EXPECT_FALSE(told->changesAtMs);
 }
 
+TEST_F(FieldSheetTest, looksAtTheNewestReportsAloneWhereThereAreVeryMany) {
+  constexpr std::uint64_t kReports = 20'000;
+  for (std::uint64_t i = 0; i < kReports; ++i) {
+    scene.at(i * 25);
+    scene.neighbour(200, -98);
+    scene.reportNeighbours();
+  }
+  const auto told = sheet("LTE Neighbor Cell Meas", "nbr_rsrp");
+  ASSERT_TRUE(told);
+  ASSERT_EQ(told->curve.size(), 1U);
+  EXPECT_EQ(told->curve[0].size(), 16'384U);
+  EXPECT_EQ(told->curve[0].back().timeMs, kStartMs + (kReports - 1) * 25);
+}
+
 TEST_F(FieldSheetTest, isNoneForAnythingThatIsNoField) {
   const Viewpoint viewpoint = scene.viewpoint();
   const auto at = [&](const char* technology, const char* category, int section, int row) {
