@@ -121,5 +121,21 @@ TEST_F(ConditionOnTheBus, IsFollowedByTheClientLibrary) {
   EXPECT_TRUE(becomesLine("No modem"));
 }
 
+TEST_F(ConditionOnTheBus, IsFollowedWithItsWordForPrograms) {
+  std::mutex mutex;
+  std::string state;
+  const auto connector =
+      tesk::bus::makeBusConnector({bus.address()}, {}, {}, [&](const tesk::bus::Condition& told) {
+        const std::lock_guard lock(mutex);
+        state = told.state;
+      });
+  const auto transport = connector->connect("viewer", [](std::string_view, tesk::Message) {});
+  transport->eventsOn();
+  EXPECT_TRUE(becomes([&] {
+    const std::lock_guard lock(mutex);
+    return state == "no-modem-manager";
+  }));
+}
+
 }  // namespace
 }  // namespace qel::testing
