@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <charconv>
 
+#include "tools/watch/FieldView.h"
 #include "tools/watch/Rows.h"
 #include "ui/kit/Storyboard.h"
 #include "ui/screens/QelViewItems.h"
@@ -127,7 +128,16 @@ std::unique_ptr<View> ScreenView::open(const std::string& rowId) {
   if (followRow(_navigation, TerminalStoryboard(), *place)) {
     return std::make_unique<ScreenView>(_navigation, _desk);
   }
-  return nullptr;
+  return openField(*place);
+}
+
+std::unique_ptr<View> ScreenView::openField(IndexPath place) {
+  const auto category = std::dynamic_pointer_cast<SecondLevelViewController>(_screen);
+  if (!category) return nullptr;
+  auto view = std::make_unique<FieldView>(
+      _desk, FieldPlace{category->firstSelection.value_or(""),
+                        category->seguedThroughRow.value_or(""), place.section, place.row});
+  return view->isThere() ? std::move(view) : nullptr;
 }
 
 }  // namespace qel::watch

@@ -38,6 +38,7 @@ class ScreenView final : public View {
 
  private:
   void redraw();
+  std::unique_ptr<View> openField(IndexPath place);
 
   NavigationController& _navigation;
   Desk& _desk;

@@ -173,6 +173,31 @@ TEST_F(WatchScreens, showASimulatedModemWithoutAnyService) {
   EXPECT_TRUE(becomes(terminal, "Operator 001-01"));
 }
 
+TEST_F(WatchScreens, tellThatARecordingThatIsTheSourceHasEnded) {
+  const Tmux terminal(80, 24, program + "--source recording:" + recording.path() + ",speed=1000");
+  EXPECT_TRUE(becomes(terminal, "drive.jsonl, ended"));
+  EXPECT_TRUE(becomes(terminal, "PCI 2,"));
+}
+
+TEST_F(WatchScreens, openTheSheetOfAField) {
+  const Tmux terminal(100, 30, program + recording.path());
+  ASSERT_TRUE(becomes(terminal, "PCI 1,"));
+  terminal.press("Down");
+  terminal.press("Enter");
+  ASSERT_TRUE(becomes(terminal, "Serving Cell Info"));
+  terminal.press("Down");
+  terminal.press("Down");
+  terminal.press("Enter");
+  ASSERT_TRUE(becomes(terminal, "phy_cell_id"));
+  terminal.press("Down");
+  terminal.press("Enter");
+  ASSERT_TRUE(becomes(terminal, "0 to 262143"));
+  EXPECT_TRUE(terminal.shows("1815.0 MHz down"));
+  EXPECT_TRUE(terminal.shows("0x514"));
+  terminal.press("Escape");
+  EXPECT_TRUE(becomes(terminal, "tracking_area_code"));
+}
+
 TEST_F(WatchScreens, sayWhatIsMissingWhenThereIsNoService) {
   const Tmux terminal(80, 24, program + "--bus unix:path=/nowhere/bus");
   EXPECT_TRUE(becomes(terminal, "no message bus"));
