@@ -1,17 +1,20 @@
-// Recording from the viewer, over the very connection that it has with --source simulated.
+// Recording from the viewer, over the connections that it really has.
 
 #include <gtest/gtest.h>
 
 #include <chrono>
+#include <optional>
 #include <set>
 #include <thread>
 
 #include "base/FileContent.h"
 #include "base/LogSink.h"
+#include "bus/ServiceProcess.h"
 #include "recording/Mark.h"
 #include "recording/RecordingReader.h"
 #include "service/InProcessConnector.h"
 #include "support/RecordedLines.h"
+#include "tesk/bus/ServiceStatus.h"
 #include "ui/pages/RecordingControl.h"
 
 namespace qel::testing {
@@ -19,26 +22,38 @@ namespace {
 
 using namespace std::chrono_literals;
 
-TEST(ViewerRecording, holdsWhatTheModemReportsBesideTheViewer) {
-  setSystemLog(nullptr);
-  const TemporaryFolder folder;
+class ViewerRecording : public ::testing::Test {
+ protected:
+  ViewerRecording() { setSystemLog(nullptr); }
+
+  RecordingControl::Way way(std::shared_ptr<tesk::Connector> connector) const {
+    return {std::move(connector), std::nullopt, contentOfFile(QEL_CONFIGURATION, 4096)};
+  }
+  // Waits until so many events are recorded, a minute at most.
+  static bool records(RecordingControl& control, int events) {
+    const auto end = std::chrono::steady_clock::now() + 60s;
+    while (std::chrono::steady_clock::now() < end) {
+      control.tick();
+      const std::string& text = control.view().text;
+      if (std::stoi(text.substr(text.find(", ") + 2)) >= events) return true;
+      std::this_thread::sleep_for(20ms);
+    }
+    return false;
+  }
+
+  TemporaryFolder folder;
+};
+
+TEST_F(ViewerRecording, holdsWhatTheModemReportsBesideTheViewer) {
   sources::SourceError error;
   const auto connector = service::makeInProcessConnector("simulated,speed=20", error);
   ASSERT_TRUE(connector) << error.message;
-  const Bytes configuration = contentOfFile(QEL_CONFIGURATION, 4096);
-  ASSERT_FALSE(configuration.empty());
-  RecordingControl control{RecordingsFolder(folder.path()),
-                           {connector, std::nullopt, configuration}};
+  RecordingControl control{RecordingsFolder(folder.path()), way(connector)};
   control.start();
   ASSERT_TRUE(control.view().isRecording) << control.view().outcome;
   const std::string path = folder.path() + "/" + control.fileName();
   control.mark();
-  const auto end = std::chrono::steady_clock::now() + 60s;
-  const auto isEnough = [&control] {
-    control.tick();
-    return std::stoi(control.view().text.substr(control.view().text.find(", ") + 2)) > 300;
-  };
-  while (!isEnough() && std::chrono::steady_clock::now() < end) std::this_thread::sleep_for(20ms);
+  EXPECT_TRUE(records(control, 300)) << control.view().text;
   control.stop();
 
   RecordingFault fault;
@@ -54,10 +69,36 @@ TEST(ViewerRecording, holdsWhatTheModemReportsBesideTheViewer) {
     }
   }
   EXPECT_FALSE(reader->fault());
-  EXPECT_GT(events, 300U);
+  EXPECT_GE(events, 300U);
   EXPECT_EQ(marks, 1U);
   EXPECT_GT(metrics.size(), 10U);
   EXPECT_TRUE(metrics.contains(MetricValidator::K_SIM_FILE_INFO)) << "asked for at the beginning";
+}
+
+TEST_F(ViewerRecording, goesOnWhenTheServiceOnTheBusComesBack) {
+  const PrivateBus bus;
+  std::optional<ServiceProcess> service(std::in_place, bus, "simulated,speed=20");
+  ASSERT_TRUE(Client(bus, "first").waitForReachable(true));
+  Client watch(bus, "watch");
+  RecordingControl control{RecordingsFolder(folder.path()),
+                           way(tesk::bus::makeBusConnector({bus.address()}))};
+  control.start();
+  ASSERT_TRUE(control.view().isRecording) << control.view().outcome;
+  EXPECT_TRUE(records(control, 50)) << control.view().text;
+  service.reset();
+  ASSERT_TRUE(watch.waitForReachable(false));
+  service.emplace(bus, "simulated,speed=20");
+  ASSERT_TRUE(watch.waitForReachable(true));
+  control.serviceCameBack();
+  control.tick();
+  const std::string before = control.view().text;
+  EXPECT_TRUE(records(control, std::stoi(before.substr(before.find(", ") + 2)) + 50)) << before;
+  control.stop();
+  EXPECT_TRUE(control.view().outcome.starts_with("Kept as ")) << control.view().outcome;
+  std::string why;
+  const auto status = tesk::bus::readServiceStatus({bus.address()}, why);
+  ASSERT_TRUE(status) << why;
+  EXPECT_TRUE(status->configurations.empty()) << "nothing is asked for any more";
 }
 
 }  // namespace
