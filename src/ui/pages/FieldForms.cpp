@@ -305,9 +305,13 @@ std::string joined(const Parts& parts) {
 // An entry a part, counted from 0 as sections are.
 Parts partsOfList(const MessageFacts& message, const List& list) {
   Parts parts;
-  for (std::size_t i = 0; i < list.size(); ++i) {
+  for (std::size_t i = 0; i < std::min(list.size(), kMostFieldParts); ++i) {
     const Dictionary* record = list[i].asDictionary();
-    if (record) parts.push_back({std::to_string(i), joined(partsOfMessage(message, *record))});
+    const std::string text = record ? joined(partsOfMessage(message, *record)) : std::string();
+    parts.push_back({std::to_string(i), text.empty() ? "empty" : text});
+  }
+  if (list.size() > parts.size()) {
+    parts.push_back({"And", std::to_string(list.size() - parts.size()) + " more"});
   }
   return parts;
 }

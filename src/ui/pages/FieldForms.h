@@ -1,6 +1,9 @@
 // What a value of a field stands for, beyond its number or bytes.
 #pragma once
 
+#include <cstddef>
+#include <cstdint>
+#include <optional>
 #include <string>
 #include <vector>
 
@@ -23,6 +26,9 @@ struct RawField {
   const MessageFacts& message;
   const Dictionary& record;
 };
+
+// Of the entries of a list; how many more there are is said.
+inline constexpr std::size_t kMostFieldParts = 64;
 
 // The value split or decoded: what there is to tell, else nothing. A field that holds messages has
 // a part for each of their fields, or for each entry of a list.

@@ -63,6 +63,20 @@ TEST(FieldForms, openAreasAndTemporaryIdentities) {
             "MME group: 32769 (0x8001); MME code: 1 (0x01); M-TMSI: 3221225474 (0xc0000002)");
 }
 
+TEST(FieldForms, sayHowManyEntriesOfALongListAreLeftOut) {
+  List areas;
+  for (std::uint32_t code = 0; code < 100; ++code) areas.emplace_back(Dictionary{{"tac", code}});
+  areas[1] = Dictionary();
+  const MessageFacts& message = *findMessageFacts("KCellularEmmContext");
+  const Dictionary record = {{"tai_list", areas}};
+  const auto parts =
+      partsOf({*message.find("tai_list"), *record.find("tai_list"), message, record});
+  ASSERT_EQ(parts.size(), kMostFieldParts + 1);
+  EXPECT_EQ(parts[1], (FieldPart{"1", "empty"}));
+  EXPECT_EQ(parts[63], (FieldPart{"63", "Tracking area code 63 (0x3f)"}));
+  EXPECT_EQ(parts[64], (FieldPart{"And", "36 more"}));
+}
+
 TEST(FieldForms, readIdentitiesAddressesAndFiles) {
   const Bytes imsi = {8, 0x09, 0x10, 0x10, 0x32, 0x54, 0x76, 0x98, 0x00};
   EXPECT_EQ(partsIn("KCellularMmCommonInfo", "imsi", {{"imsi", imsi}}), "Digits: 001012345678900");
