@@ -4,7 +4,9 @@
 #include <sys/stat.h>
 
 #include <limits>
+#include <map>
 #include <random>
+#include <set>
 
 #include "base/LogSink.h"
 #include "base/Rendering.h"
@@ -65,16 +67,21 @@ std::vector<RecordedEvent> eventsOf(const std::string& path) {
   return events;
 }
 
-// What the dispatcher makes of all events up to that time, one after the other.
-std::vector<std::string> contentAt(const std::vector<RecordedEvent>& events, std::uint64_t timeMs) {
+// What the dispatcher makes of all events up to each of these times, one after the other.
+std::map<std::uint64_t, std::vector<std::string>> contentsAt(
+    const std::vector<RecordedEvent>& events, const std::set<std::uint64_t>& times) {
   setStandardOutput(nullptr);
   setSystemLog(nullptr);
   const auto validator = MetricValidator::create(nullptr);
-  for (const RecordedEvent& event : events) {
-    if (event.timeMs > timeMs) break;
-    if (event.kind == RecordedKind::metric) validator->processMetric(event.entries);
+  std::map<std::uint64_t, std::vector<std::string>> contents;
+  auto event = events.begin();
+  for (const std::uint64_t time : times) {
+    for (; event != events.end() && event->timeMs <= time; ++event) {
+      if (event->kind == RecordedKind::metric) validator->processMetric(event->entries);
+    }
+    contents[time] = contentOf(*validator);
   }
-  return contentOf(*validator);
+  return contents;
 }
 
 std::unique_ptr<RecordedHistory> opened(const std::string& path,
@@ -97,15 +104,16 @@ TEST(RecordedHistory, holdsTheStoreAsItWasAtAnyMoment) {
   EXPECT_EQ(history->endMs(), events.back().timeMs);
   EXPECT_EQ(history->events(), events.size());
   std::mt19937_64 engine(1);
-  std::uniform_int_distribution<std::uint64_t> moments(history->beginMs(), history->endMs());
-  for (int i = 0; i < 40; ++i) {
-    const std::uint64_t moment = moments(engine);
-    EXPECT_EQ(contentOf(history->storeAt(moment)), contentAt(events, moment)) << moment;
-    EXPECT_EQ(contentOf(history->storeAt(moment + 300)), contentAt(events, moment + 300));
+  std::uniform_int_distribution<std::uint64_t> anyMoment(history->beginMs(), history->endMs());
+  std::vector<std::uint64_t> jumps = {0, history->endMs() + 1000, history->beginMs() - 1,
+                                      history->endMs(), history->beginMs()};
+  for (int i = 0; i < 60; ++i) {
+    const std::uint64_t moment = anyMoment(engine);
+    jumps.insert(jumps.end(), {moment, moment + 300, moment + 300});
   }
-  for (const std::uint64_t moment : {std::uint64_t{0}, history->beginMs(), history->endMs(),
-                                     history->endMs() + 1000, history->beginMs() - 1}) {
-    EXPECT_EQ(contentOf(history->storeAt(moment)), contentAt(events, moment)) << moment;
+  const auto expected = contentsAt(events, {jumps.begin(), jumps.end()});
+  for (const std::uint64_t moment : jumps) {
+    EXPECT_EQ(contentOf(history->storeAt(moment)), expected.at(moment)) << moment;
   }
 }
 
