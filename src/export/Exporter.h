@@ -3,8 +3,6 @@
 
 #include <cstdint>
 #include <map>
-#include <memory>
-#include <set>
 
 #include "export/MetricTable.h"
 #include "export/Table.h"

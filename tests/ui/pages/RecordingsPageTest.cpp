@@ -110,7 +110,7 @@ TEST_F(RecordingsPageTest, saysWhatIsWrongWithAFile) {
   }
 }
 
-TEST(RecordingsFolder, begetsNoMoreThanItMayHold) {
+TEST(RecordingsFolder, beginsNoMoreThanItMayHold) {
   const TemporaryFolder folder;
   RecordingsFolder::Limits limits;
   limits.files = 2;
