@@ -1,7 +1,9 @@
 // qelctl now and signals, on recordings of known content and live.
 
 #include <csignal>
+#include <map>
 #include <nlohmann/json.hpp>
+#include <set>
 
 #include "messages/lte_neighbours.h"
 #include "messages/lte_serving.h"
@@ -140,6 +142,35 @@ TEST(QelctlSignals, listsNeighboursForPeople) {
   const std::string text = qelctl({"signals", recording.path()}).out;
   EXPECT_NE(text.find("10 minutes to 08:01:00"), std::string::npos) << text;
   EXPECT_NE(text.find("  LTE PCI 200     EARFCN 1300    -99 dBm"), std::string::npos) << text;
+}
+
+// Times of the changes of cell within a technology, of a whole drive.
+std::multiset<std::uint64_t> cellChanges(const std::string& drive) {
+  std::multiset<std::uint64_t> times;
+  for (const auto& line : linesOf(qelctl({"happenings", drive, "--json", "--kind", "cell"}).out)) {
+    const Json change = Json::parse(line);
+    const bool isMove = !change["from"].is_null() && !change["to"].is_null() &&
+                        change["from"]["technology"] == change["to"]["technology"];
+    if (isMove) times.insert(change["time_ms"].get<std::uint64_t>());
+  }
+  return times;
+}
+
+TEST(QelctlSignals, marksEveryChangeOfCellOfADriveAndNoOther) {
+  const std::string drive = QEL_RAW_LOGS "/../simulated_drive.jsonl.gz";
+  const Json signals = Json::parse(qelctl({"signals", drive, "--json", "--span", "86400"}).out);
+  std::multiset<std::uint64_t> marked;
+  std::map<std::string, int> letters;
+  for (const Json& mark : signals["marks"]) {
+    const std::string letter = mark["letter"];
+    ++letters[letter];
+    if (letter == "H" || letter == "R") marked.insert(mark["time_ms"].get<std::uint64_t>());
+  }
+  EXPECT_EQ(marked, cellChanges(drive));
+  EXPECT_GT(letters["H"], 10);
+  EXPECT_GT(letters["R"], 5);
+  EXPECT_GT(letters["C"], 50);
+  EXPECT_EQ(letters["T"], 4);  // to UMTS, to GSM, and both ways back
 }
 
 class QelctlLivePages : public WithService {
