@@ -4,6 +4,7 @@
 
 #include "tools/watch/Blocks.h"
 #include "tools/watch/Rows.h"
+#include "ui/pages/Charts.h"
 #include "ui/pages/Words.h"
 
 namespace qel::watch {
@@ -13,15 +14,19 @@ constexpr std::size_t kAxisColumns = 12;
 constexpr std::size_t kChartLines = 7;
 constexpr double kCloser = 0.5;
 
+// High enough for the serving cell; what lies below the axis has the lowest block.
 BlockFrame frameOf(const SignalsPage& page, const Chart& chart, Size size) {
-  return {page.fromMs, page.toMs, chart.lowest, chart.highest,
+  Axis axis = usualAxis(chart.quantity);
+  const Curve& last = chart.curves.back();
+  if (last.isServing) axis.highest = widened(axis, last.runs).highest;
+  return {page.fromMs, page.toMs, axis.lowest, axis.highest,
           static_cast<std::size_t>(size.columns) - kAxisColumns};
 }
 
 // The label of the threshold that lies within a line of the chart; else blank.
-std::string axisText(const Chart& chart, std::size_t line) {
-  const float height = (chart.highest - chart.lowest) / static_cast<float>(kChartLines);
-  const float bottom = chart.highest - static_cast<float>(line + 1) * height;
+std::string axisText(const Chart& chart, const BlockFrame& frame, std::size_t line) {
+  const float height = (frame.highest - frame.lowest) / static_cast<float>(kChartLines);
+  const float bottom = frame.highest - static_cast<float>(line + 1) * height;
   for (const AxisLabel& label : chart.labels) {
     if (label.value < bottom || label.value >= bottom + height) continue;
     return padded(label.text, 5) + padded(label.word, kAxisColumns - 5);
@@ -89,7 +94,7 @@ Sheet SignalsView::sheet(Size size) {
   if (const Chart* chart = chartNamed(page, _chart)) {
     addChart(page, *chart, size, sheet);
     for (const Chart& other : page.charts) {
-      if (other.id == chart->id || other.curves.empty()) continue;
+      if (other.id == chart->id || !other.curves.back().isServing) continue;
       sheet.rows.push_back(
           captioned(other.title, sparkline(other.curves.back().runs, frameOf(page, other, size)),
                     Style::plain));
@@ -114,7 +119,7 @@ void SignalsView::addChart(const SignalsPage& page, const Chart& chart, Size siz
   const std::vector<Run> none;
   for (std::size_t line = 0;
        std::string & text : bars(serving.isServing ? serving.runs : none, frame, kChartLines)) {
-    sheet.rows.push_back(captioned(axisText(chart, line++), std::move(text), Style::accent));
+    sheet.rows.push_back(captioned(axisText(chart, frame, line++), std::move(text), Style::accent));
   }
   if (_readAtMs) {
     std::string cursor(frame.columns, ' ');
