@@ -34,6 +34,10 @@ struct Frequencies {
 Frequencies lteFrequencies(std::uint32_t earfcn);
 std::optional<Frequency> lteUplinkFrequency(std::uint32_t earfcn);
 
+// What an operating band spans, "1805.0 to 1880.0 MHz down, 1710.0 to 1785.0 MHz up"; one span
+// where both ways share it. Empty for a number that no band has.
+std::string lteBandSpan(std::uint32_t band);
+
 // By the downlink UARFCN (25.101, clauses 5.3.1 and 5.4).
 Frequencies umtsFrequencies(std::uint32_t uarfcn);
 

@@ -1,3 +1,4 @@
+#include <algorithm>
 #include <array>
 
 #include "radio/Bands.h"
@@ -109,6 +110,13 @@ constexpr std::array kBands = {
     LteBand{106, 70656, 70705, 9350, 134292, 134341, 8960},
 };
 
+// From the lower edge of the first channel to the upper one of the last.
+std::string spanText(std::int32_t first, std::uint32_t channels) {
+  const Frequency end{first + static_cast<std::int32_t>(channels)};
+  const std::string begin = Frequency{first}.text();
+  return begin.substr(0, begin.find(' ')) + " to " + end.text();
+}
+
 const LteBand* withDown(std::uint32_t channel) {
   for (const LteBand& band : kBands) {
     if (band.hasDown(channel)) return &band;
@@ -137,6 +145,15 @@ Frequencies lteFrequencies(std::uint32_t earfcn) {
   const std::uint32_t paired = earfcn - band->first + band->upFirst;
   return {.down = Frequency{band->downAt(earfcn)},
           .up = band->hasUp(paired) ? std::optional(Frequency{band->upAt(paired)}) : std::nullopt};
+}
+
+std::string lteBandSpan(std::uint32_t band) {
+  const auto found = std::ranges::find(kBands, band, &LteBand::band);
+  if (found == kBands.end()) return {};
+  const std::string down = spanText(found->down, found->last - found->first + 1);
+  if (found->up == 0) return down + " down";
+  if (found->up == found->down) return down;
+  return down + " down, " + spanText(found->up, found->upLast - found->upFirst + 1) + " up";
 }
 
 std::optional<Frequency> lteUplinkFrequency(std::uint32_t earfcn) {

@@ -60,6 +60,16 @@ TEST(LteFrequencies, ofTheTwoWaysLieOneDistanceApart) {
   }
 }
 
+TEST(LteBandSpans, reachFromEdgeToEdge) {
+  EXPECT_EQ(lteBandSpan(3), "1805.0 to 1880.0 MHz down, 1710.0 to 1785.0 MHz up");
+  EXPECT_EQ(lteBandSpan(20), "791.0 to 821.0 MHz down, 832.0 to 862.0 MHz up");
+  EXPECT_EQ(lteBandSpan(66), "2110.0 to 2200.0 MHz down, 1710.0 to 1780.0 MHz up");
+  EXPECT_EQ(lteBandSpan(29), "717.0 to 728.0 MHz down");
+  EXPECT_EQ(lteBandSpan(38), "2570.0 to 2620.0 MHz");
+  EXPECT_EQ(lteBandSpan(15), "");
+  EXPECT_EQ(lteBandSpan(0), "");
+}
+
 TEST(UmtsFrequencies, areAFifthOfTheNumberOverTheOffset) {
   EXPECT_EQ(umtsFrequencies(10562).text(), "2112.4 MHz down, 1922.4 MHz up");
   EXPECT_EQ(umtsFrequencies(10838).text(), "2167.6 MHz down, 1977.6 MHz up");

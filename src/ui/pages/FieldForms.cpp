@@ -93,6 +93,11 @@ Parts uplinkEarfcn(const RawField& field) {
   return frequency ? part("Frequency", frequency->text() + " up") : Parts{};
 }
 
+Parts lteBand(const RawField& field) {
+  const auto band = number(field);
+  return band ? part("Spans", lteBandSpan(*band)) : Parts{};
+}
+
 Parts uarfcn(const RawField& field) {
   const auto channel = number(field);
   return channel ? channelParts(Technology::umts, *channel) : Parts{};
@@ -245,6 +250,7 @@ constexpr std::array kForms = {
     Form{FieldForm::uplinkEarfcn, uplinkEarfcn},
     Form{FieldForm::uarfcn, uarfcn},
     Form{FieldForm::arfcn, arfcn},
+    Form{FieldForm::lteBand, lteBand},
     Form{FieldForm::lteBandwidth, lteBandwidth},
     Form{FieldForm::rsrpIndex, rsrpIndex},
     Form{FieldForm::rsrqIndex, rsrqIndex},

@@ -27,6 +27,8 @@ TEST(FieldForms, splitCellIdentities) {
 TEST(FieldForms, turnChannelsIntoFrequencies) {
   EXPECT_EQ(partsIn("KCellularLteScellInfo", "dl_freq", {{"dl_freq", 1575U}}),
             "Frequencies: 1842.5 MHz down, 1747.5 MHz up; Lies in: band 3");
+  EXPECT_EQ(partsIn("KCellularLteScellInfo", "freq_band_ind", {{"freq_band_ind", 38U}}),
+            "Spans: 2570.0 to 2620.0 MHz");
   EXPECT_EQ(partsIn("KCellularLteScellInfo", "ul_freq", {{"ul_freq", 19575U}}),
             "Frequency: 1747.5 MHz up");
   EXPECT_EQ(partsIn("KCellularWcdmaCellInfo", "dl_uarfcn", {{"dl_uarfcn", 10562U}}),
