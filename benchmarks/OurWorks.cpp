@@ -9,6 +9,7 @@
 #include "MemorySink.h"
 #include "base/Rendering.h"
 #include "base/TimeZone.h"
+#include "history/History.h"
 #include "messages/catalogue/KBBMetricUtility.h"
 #include "messages/catalogue/MetricMessages.h"
 #include "metrics/MetricValidator.h"
@@ -98,13 +99,49 @@ Dictionary eventOf(const Payload& payload) {
           {"kKeyPayload", payload.bytes}};
 }
 
-Step eventOurs(const std::vector<Payload>& payloads) {
+namespace {
+
+std::vector<std::optional<Dictionary>> eventsOf(const std::vector<Payload>& payloads) {
   std::vector<std::optional<Dictionary>> events;
   for (const Payload& payload : payloads) events.emplace_back(eventOf(payload));
+  return events;
+}
+
+// Ten milliseconds later at every look.
+class SteppingClock final : public Clock {
+ public:
+  std::uint64_t nowMs() const override { return _nowMs += 10; }
+
+ private:
+  mutable std::uint64_t _nowMs = kMixStartMs;
+};
+
+// A history in use: it has to let the oldest go.
+struct Followed {
+  Followed() { validator->setObserver(&history, clock); }
+
+  SteppingClock clock;
+  History history;
+  std::shared_ptr<MetricValidator> validator = MetricValidator::create(nullptr);
+};
+
+}  // namespace
+
+Step eventOurs(const std::vector<Payload>& payloads) {
   setStandardOutput(std::make_shared<MemorySink>());
-  return [events, validator = MetricValidator::create(nullptr)](std::size_t i) {
-    validator->metricsDidUpdate(events[i]);
-  };
+  return [events = eventsOf(payloads), validator = MetricValidator::create(nullptr)](
+             std::size_t i) { validator->metricsDidUpdate(events[i]); };
+}
+
+Step eventWithHistory(const std::vector<Payload>& payloads) {
+  constexpr std::size_t kTenMinutes = 60'000;
+  setStandardOutput(std::make_shared<MemorySink>());
+  const auto followed = std::make_shared<Followed>();
+  const auto events = eventsOf(payloads);
+  for (std::size_t i = 0; i < 2 * kTenMinutes; ++i) {
+    followed->validator->metricsDidUpdate(events[i % events.size()]);
+  }
+  return [events, followed](std::size_t i) { followed->validator->metricsDidUpdate(events[i]); };
 }
 
 }  // namespace qel::bench

@@ -12,6 +12,8 @@ Step encodeOurs(const std::vector<Payload>& payloads);
 Step textOurs(const std::vector<Payload>& payloads);
 Step timeOurs(const std::vector<Payload>& payloads);
 Step eventOurs(const std::vector<Payload>& payloads);
+// The same with a history that listens, at 100 events a second.
+Step eventWithHistory(const std::vector<Payload>& payloads);
 
 // A metric event as the service sends it.
 Dictionary eventOf(const Payload& payload);

@@ -59,6 +59,8 @@ std::vector<Work> works() {
   add("time text, warm", "ours", timeOurs);
   add("one metric event", "libprotobuf, std::map, streams", eventStock);
   add("one metric event", "ours", eventOurs);
+  add("one metric event, and what is kept of it", "ours without history", eventOurs);
+  add("one metric event, and what is kept of it", "ours with history", eventWithHistory);
 
   for (const auto& payloads : mixByMetric()) {
     const auto name = findMetricMessage(payloads.front().metric)->className;

@@ -1,32 +1,110 @@
 #include "history/HappeningLog.h"
 
 #include <algorithm>
+#include <string_view>
 #include <utility>
 
-namespace qel {
+#include "base/Rendering.h"
+#include "history/Words.h"
 
-void HappeningLog::add(Happening happening, std::uint64_t atMs) {
-  _happenings.push_back(std::move(happening));
-  _atMs.push_back(atMs);
-  if (_happenings.size() <= _most) return;
-  _happenings.pop_front();
-  _atMs.pop_front();
-  ++_gone;
+namespace qel {
+namespace {
+
+std::string connectionText(Technology technology, const ToldConnection& told) {
+  std::string text(nameOf(technology));
+  text += " RRC: " + wordsOf(&told.state, "state");
+  const std::string why = told.cause.isNull() ? "" : wordsOf(&told.cause, "cause");
+  if (!why.empty()) text += ", " + why;
+  return text;
 }
 
-void HappeningLog::add(const Report& report, HappeningKind kind,
-                       std::optional<Technology> technology, std::string text) {
+std::string movedText(const Happening& happening) {
+  if (!happening.from) return "On " + textOf(*happening.to);
+  const std::string_view start = happening.move == CellMove::handover      ? "Handover from "
+                                 : happening.move == CellMove::reselection ? "Reselected from "
+                                                                           : "From ";
+  return std::string(start) + textOf(*happening.from) + " to " + textOf(*happening.to);
+}
+
+void append(std::string& text, std::string_view word, const std::string& what) {
+  if (what.empty()) return;
+  text += text.empty() ? ": " : ", ";
+  (text += word) += what;
+}
+
+std::string orNothing(const Value& value) { return value.isNull() ? "" : qel::cellText(value); }
+
+// By numbers and name alone: an address is nobody's business.
+std::string bearerText(const ToldEntry& entry) {
+  std::string text;
+  append(text, "", std::string(entry.name.view()));
+  append(text, "", wordsOf(entry.type.isNull() ? nullptr : &entry.type, "type"));
+  if (entry.name.view().empty()) append(text, "number ", orNothing(entry.numbers[0]));
+  return (entry.hasCome ? "Connection up" : "Connection down") + text;
+}
+
+std::string carrierText(const ToldEntry& entry) {
+  std::string text;
+  append(text, "PCI ", orNothing(entry.numbers[1]));
+  append(text, "EARFCN ", orNothing(entry.numbers[2]));
+  append(text, "band ", orNothing(entry.type));
+  if (text.empty()) append(text, "number ", orNothing(entry.numbers[0]));
+  return (entry.hasCome ? "Carrier added" : "Carrier removed") + text;
+}
+
+}  // namespace
+
+void HappeningLog::add(Happening happening, std::uint64_t atMs) {
+  all();
+  _worded.push_back(std::move(happening));
+  _wordedAt.push_back(atMs);
+  if (++_count > _most) dropOldest();
+}
+
+void HappeningLog::dropOldest() {
+  --_count;
+  ++_gone;
+  if (_worded.empty()) {
+    _unworded.pop_front();
+  } else {
+    _worded.pop_front();
+    _wordedAt.pop_front();
+  }
+}
+
+Happening HappeningLog::worded(const Unworded& unworded) {
   Happening happening;
-  happening.timeMs = report.timeMs;
-  happening.kind = kind;
-  happening.technology = technology;
-  happening.metric = report.metric;
-  happening.text = std::move(text);
-  add(std::move(happening), report.atMs);
+  happening.timeMs = unworded.timeMs;
+  happening.kind = unworded.kind;
+  happening.technology = unworded.technology;
+  happening.metric = unworded.metric;
+  if (const auto* text = std::get_if<std::string>(&unworded.told)) {
+    happening.text = *text;
+  } else if (const auto* connection = std::get_if<ToldConnection>(&unworded.told)) {
+    happening.text = connectionText(*unworded.technology, *connection);
+  } else if (const auto* entry = std::get_if<ToldEntry>(&unworded.told)) {
+    const bool isBearer = unworded.kind == HappeningKind::bearer;
+    happening.text = isBearer ? bearerText(*entry) : carrierText(*entry);
+  } else if (const auto* cell = std::get_if<ToldCell>(&unworded.told)) {
+    if (cell->from) happening.from = cell->from->asCell();
+    happening.to = cell->to.asCell();
+    happening.move = cell->move;
+    happening.text = movedText(happening);
+  }
+  return happening;
+}
+
+const std::deque<Happening>& HappeningLog::all() const {
+  for (; !_unworded.empty(); _unworded.pop_front()) {
+    _wordedAt.push_back(_unworded.front().atMs);
+    _worded.push_back(worded(_unworded.front()));
+  }
+  return _worded;
 }
 
 std::size_t HappeningLog::until(std::uint64_t atMs) const {
-  return static_cast<std::size_t>(std::ranges::upper_bound(_atMs, atMs) - _atMs.begin());
+  all();
+  return static_cast<std::size_t>(std::ranges::upper_bound(_wordedAt, atMs) - _wordedAt.begin());
 }
 
 }  // namespace qel

@@ -22,6 +22,58 @@ using V = MetricValidator;
 constexpr std::uint64_t kListsTogetherMs = 10'000;
 constexpr std::size_t kDistancesOfPeriod = 8;
 
+// What follows from reports of a metric, besides its place in the journal.
+enum class Handling : std::uint8_t {
+  none,
+  cell,
+  lteState,
+  umtsState,
+  registration,
+  bearers,
+  carriers,
+};
+
+Handling handlingOf(std::int64_t metric) {
+  switch (metric) {
+    case V::K_LTE_SCELL_INFO:
+    case V::K_UMTS_SCELL_INFO:
+    case V::K_GSM_SCELL_INFO:
+      return Handling::cell;
+    case V::K_LTE_RRC_STATE:
+      return Handling::lteState;
+    case V::K_UMTS_RRC_STATE:
+      return Handling::umtsState;
+    case V::K_LTE_EMM_CTXT:
+    case V::K_CELLULAR_MM_CTXT:
+    case V::K_CELLULAR_GMM_CTXT:
+      return Handling::registration;
+    case V::K_CELLULAR_ACTIVE_BEARER:
+      return Handling::bearers;
+    case V::K_LTE_CA_STATUS:
+      return Handling::carriers;
+    default:
+      return Handling::none;
+  }
+}
+
+// By the place of a metric in the dispatch table.
+struct Way {
+  static constexpr std::uint8_t kNone = 255;
+  Handling handling = Handling::none;
+  std::uint8_t serving = kNone;  // for the reader of serving values
+};
+using Ways = std::array<Way, ReportTimes::kMetrics>;
+
+Ways waysOf(std::span<const DispatchRow> rows) {
+  Ways ways;
+  for (std::size_t i = 0; i < rows.size(); ++i) {
+    ways.at(i).handling = handlingOf(rows[i].identifier);
+    const auto place = ServingReader::placeOf(rows[i].identifier);
+    if (place) ways.at(i).serving = static_cast<std::uint8_t>(*place);
+  }
+  return ways;
+}
+
 std::string durationText(std::uint64_t ms) {
   const std::uint64_t seconds = ms / 1000;
   if (seconds < 60) return std::to_string(seconds) + " s";
@@ -34,12 +86,11 @@ std::string durationText(std::uint64_t ms) {
 }  // namespace
 
 struct History::State {
-  explicit State(const Limits& itsLimits)
-      : limits(itsLimits),
-        happenings(itsLimits.mostHappenings),
-        radio(itsLimits.mostHappenings),
-        journal(itsLimits.journal) {
-    series.fill(Series(itsLimits.series));
+  explicit State(const Limits& limits)
+      : happenings(limits.mostHappenings), radio(limits.mostHappenings), journal(limits.journal) {
+    for (Series& one : series) one = Series(limits.series);
+    for (const DispatchRow& row : dispatchTable()) journal.know(row);
+    journal.know(lteServingMeasurementRow());
   }
 
   // The time that counts: one that goes back is the last one.
@@ -47,11 +98,16 @@ struct History::State {
     ++version;
     return latestMs = std::max(latestMs, receivedMs);
   }
-  void note(std::size_t metric, std::uint64_t receivedMs, std::uint64_t atMs);
-  void follow(const Report& report);
-  void plot(std::int64_t metric, const Dictionary& record, std::uint64_t atMs);
+  void addGap(std::uint64_t silenceMs, std::uint64_t receivedMs, std::uint64_t atMs);
+  void follow(const Report& report, Handling handling);
+  // Apart from what is done for every report, of which there are many.
+  [[gnu::noinline]] void follow(const StoredMetric& metric, std::uint64_t atMs, Handling handling) {
+    follow({metric.row.identifier, metric.record, metric.receivedMs, atMs}, handling);
+  }
+  void plot(std::size_t place, const Dictionary& record, std::uint64_t atMs);
 
-  Limits limits;
+  const DispatchRow* const rows = dispatchTable().data();
+  const Ways ways = waysOf(dispatchTable());
   std::uint64_t version = 0;
   std::uint64_t latestMs = 0;
   HappeningLog happenings;
@@ -60,50 +116,48 @@ struct History::State {
   ListFollower lists;
   ReportTimes times;
   Journal journal;
+  ServingReader serving;
   std::array<Series, kQuantities.size()> series;
 };
 
-void History::State::note(std::size_t metric, std::uint64_t receivedMs, std::uint64_t atMs) {
-  const auto gap = times.note(metric, atMs);
-  if (!gap) return;
+void History::State::addGap(std::uint64_t silenceMs, std::uint64_t receivedMs, std::uint64_t atMs) {
   Happening happening;
   happening.timeMs = receivedMs;
   happening.kind = HappeningKind::gap;
-  happening.text = "Nothing was reported for " + durationText(*gap);
+  happening.text = "Nothing was reported for " + durationText(silenceMs);
   happenings.add(std::move(happening), atMs);
   for (Series& one : series) one.interrupt();
 }
 
-void History::State::follow(const Report& report) {
-  switch (report.metric) {
-    case V::K_LTE_SCELL_INFO:
-    case V::K_UMTS_SCELL_INFO:
-    case V::K_GSM_SCELL_INFO:
-      return radio.followCell(report, happenings);
-    case V::K_LTE_RRC_STATE:
-      return radio.followLteState(report, happenings);
-    case V::K_UMTS_RRC_STATE:
-      return radio.followUmtsState(report, happenings);
-    case V::K_LTE_EMM_CTXT:
-    case V::K_CELLULAR_MM_CTXT:
-    case V::K_CELLULAR_GMM_CTXT:
-      return registration.follow(report, happenings);
-    case V::K_CELLULAR_ACTIVE_BEARER:
-      return lists.followBearers(report, happenings);
-    case V::K_LTE_CA_STATUS:
-      return lists.followCarriers(report, happenings);
-    default:
+void History::State::follow(const Report& report, Handling handling) {
+  switch (handling) {
+    case Handling::none:
+      break;
+    case Handling::cell:
+      radio.followCell(report, happenings);
+      break;
+    case Handling::lteState:
+      radio.followLteState(report, happenings);
+      break;
+    case Handling::umtsState:
+      radio.followUmtsState(report, happenings);
+      break;
+    case Handling::registration:
+      registration.follow(report, happenings);
+      break;
+    case Handling::bearers:
+      lists.followBearers(report, happenings);
+      break;
+    case Handling::carriers:
+      lists.followCarriers(report, happenings);
       break;
   }
-  plot(report.metric, report.record, report.atMs);
 }
 
-void History::State::plot(std::int64_t metric, const Dictionary& record, std::uint64_t atMs) {
-  if (!hasServingValues(metric)) return;
-  const ServingValues values = servingValues(metric, record);
-  for (std::size_t i = 0; i < values.size(); ++i) {
-    if (values[i]) series[i].add(atMs, *values[i]);
-  }
+inline void History::State::plot(std::size_t place, const Dictionary& record, std::uint64_t atMs) {
+  serving.read(place, record, [&](Quantity quantity, float value) {
+    series.data()[static_cast<std::size_t>(quantity)].add(atMs, value);
+  });
 }
 
 History::History() : History(Limits()) {}
@@ -113,10 +167,14 @@ History::~History() = default;
 void History::metricWasStored(const StoredMetric& metric) {
   State& state = *_state;
   const std::uint64_t atMs = state.arrive(metric.receivedMs);
-  const auto number = static_cast<std::size_t>(&metric.row - dispatchTable().data());
-  state.note(number, metric.receivedMs, atMs);
-  state.journal.add(metric.row, atMs, metric.payload);
-  state.follow({metric.row.identifier, metric.record, metric.receivedMs, atMs});
+  const auto number = static_cast<std::size_t>(&metric.row - state.rows);
+  const std::uint64_t silenceMs = state.times.note(number, atMs);
+  if (silenceMs != 0) [[unlikely]]
+    state.addGap(silenceMs, metric.receivedMs, atMs);
+  state.journal.add(number, atMs, metric.payload);
+  const Way way = state.ways.data()[number];
+  if (way.serving != Way::kNone) state.plot(way.serving, metric.record, atMs);
+  if (way.handling != Handling::none) state.follow(metric, atMs, way.handling);
 }
 
 void History::metricWasPassedOver(const PassedMetric& metric) {
@@ -131,9 +189,12 @@ void History::metricWasPassedOver(const PassedMetric& metric) {
     const DispatchRow& row = lteServingMeasurementRow();
     const auto record = row.describe(metric.payload);
     if (!record) return;
-    state.note(dispatchTable().size(), metric.receivedMs, atMs);
-    state.journal.add(row, atMs, metric.payload);
-    state.plot(metric.identifier, *record, atMs);
+    const std::size_t number = dispatchTable().size();
+    const std::uint64_t silenceMs = state.times.note(number, atMs);
+    if (silenceMs != 0) state.addGap(silenceMs, metric.receivedMs, atMs);
+    state.journal.add(number, atMs, metric.payload);
+    static const std::size_t kPlace = *ServingReader::placeOf(kLteServingMeasurement);
+    state.plot(kPlace, *record, atMs);
   } else {
     state.times.noteOther(atMs);
   }
@@ -165,7 +226,7 @@ const Series& History::series(Quantity quantity) const {
 
 std::optional<Cell> History::servingCell(std::uint64_t atMs) const {
   const auto* cell = _state->radio.servingCell().at(atMs);
-  return cell ? *cell : std::nullopt;
+  return cell && *cell ? std::optional((*cell)->asCell()) : std::nullopt;
 }
 
 std::optional<Technology> History::technology(std::uint64_t atMs) const {
@@ -241,8 +302,8 @@ std::optional<std::uint64_t> History::periodMs(std::int64_t metric, std::uint64_
 }
 
 std::optional<std::uint64_t> History::lastReceivedMs(std::uint64_t atMs) const {
-  const auto last = _state->times.lastMs();
-  return last && *last <= atMs ? last : _state->journal.lastMs(atMs);
+  const std::uint64_t last = _state->times.lastMs();
+  return last != 0 && last <= atMs ? std::optional(last) : _state->journal.lastMs(atMs);
 }
 
 const Journal& History::journal() const { return _state->journal; }

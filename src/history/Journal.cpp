@@ -8,20 +8,7 @@
 namespace qel {
 namespace {
 
-// The head of an entry: milliseconds since the chunk's begin, then row and size in one.
-constexpr std::size_t kHeadBytes = 4;
-constexpr std::uint64_t kMostOffsetMs = 0xFFFF;
-constexpr unsigned kSizeBits = 11;
-constexpr std::size_t kLongSize = (1U << kSizeBits) - 1;  // the size follows in four bytes
-constexpr std::size_t kLongBytes = 4;
-
 constexpr std::size_t kChunkBytes = 32 * 1024;
-
-template <class Number>
-std::uint8_t* put(std::uint8_t* out, Number number) {
-  std::memcpy(out, &number, sizeof number);
-  return out + sizeof number;
-}
 
 template <class Number>
 Number take(const std::uint8_t* content, std::size_t& position) {
@@ -33,30 +20,25 @@ Number take(const std::uint8_t* content, std::size_t& position) {
 
 }  // namespace
 
-void Journal::add(const DispatchRow& row, std::uint64_t receivedMs, ByteView payload) {
-  receivedMs = _lastMs = std::max(receivedMs, _lastMs);
-  const std::size_t place = placeOf(row);
+void Journal::addElsewhere(std::size_t number, ByteView payload) {
   const bool isLong = payload.size() >= kLongSize;
   const std::size_t size = kHeadBytes + (isLong ? kLongBytes : 0) + payload.size();
-  Chunk& chunk = chunkFor(receivedMs, size);
-  const std::size_t shortSize = isLong ? kLongSize : payload.size();
-  std::uint8_t* out = chunk.content.get() + chunk.size;
-  out = put(out, static_cast<std::uint16_t>(receivedMs - chunk.fromMs));
-  out = put(out, static_cast<std::uint16_t>(place << kSizeBits | shortSize));
-  if (isLong) out = put(out, static_cast<std::uint32_t>(payload.size()));
-  if (!payload.empty()) std::memcpy(out, payload.data(), payload.size());
-  chunk.size += size;
-  chunk.toMs = receivedMs;
-  chunk.rows |= 1U << place;
-  _newestIn[place] = chunk.number;
+  if (!_newest || !_newest->hasRoom(_lastMs, size)) beginChunk(_lastMs, size);
+  if (!isLong) return put(number, payload);
+  const auto length = static_cast<std::uint32_t>(payload.size());
+  putHead(number, kLongSize);
+  putBytes({reinterpret_cast<const std::uint8_t*>(&length), sizeof length});
+  putBytes(payload);
 }
 
-std::size_t Journal::placeOf(const DispatchRow& row) {
-  for (std::size_t i = 0; i < kMostRows; ++i) {
-    if (!_rows[i]) _rows[i] = &row;
-    if (_rows[i] == &row) return i;
+std::size_t Journal::know(const DispatchRow& row) {
+  auto found = std::ranges::find(_rows, &row);
+  if (found == _rows.end()) {
+    found = std::ranges::find(_rows, nullptr);
+    if (found == _rows.end()) fatalError("a journal of more metrics than there are");
+    *found = &row;
   }
-  fatalError("a journal of more metrics than there are");
+  return static_cast<std::size_t>(found - _rows.begin());
 }
 
 std::optional<std::size_t> Journal::find(std::int64_t metric) const {
@@ -66,21 +48,10 @@ std::optional<std::size_t> Journal::find(std::int64_t metric) const {
   return std::nullopt;
 }
 
-// The newest chunk, or a new one where its time or its room has come to an end.
-Journal::Chunk& Journal::chunkFor(std::uint64_t receivedMs, std::size_t size) {
-  if (!_chunks.empty()) {
-    Chunk& newest = _chunks.back();
-    const bool isInTime = receivedMs - newest.fromMs <= kMostOffsetMs;
-    if (isInTime && newest.size + size <= newest.capacity) return newest;
-    closeNewest();
-  }
-  begin(receivedMs, size);
-  return _chunks.back();
-}
-
-// Gives back the room that it did not fill.
+// Gives back the room that it did not fill, if that is worth it.
 void Journal::closeNewest() {
   Chunk& chunk = _chunks.back();
+  if (chunk.size > chunk.capacity / 8 * 7) return;
   auto exact = std::make_unique_for_overwrite<std::uint8_t[]>(chunk.size);
   std::memcpy(exact.get(), chunk.content.get(), chunk.size);
   _bytes -= chunk.capacity - chunk.size;
@@ -88,7 +59,8 @@ void Journal::closeNewest() {
   chunk.content = std::move(exact);
 }
 
-void Journal::begin(std::uint64_t receivedMs, std::size_t size) {
+void Journal::beginChunk(std::uint64_t receivedMs, std::size_t size) {
+  if (_newest) closeNewest();
   const std::size_t capacity = std::max(kChunkBytes, size);
   const auto isOld = [&](const Chunk& chunk) {
     return _limits.ageMs > 0 && receivedMs - chunk.toMs > _limits.ageMs;
@@ -99,11 +71,13 @@ void Journal::begin(std::uint64_t receivedMs, std::size_t size) {
   _bytes += capacity;
   _chunks.push_back({_nextNumber++, receivedMs, receivedMs, 0, 0, capacity,
                      std::make_unique_for_overwrite<std::uint8_t[]>(capacity)});
+  _newest = &_chunks.back();
 }
 
 void Journal::dropOldest() {
   const Chunk& chunk = _chunks.front();
-  for (std::size_t position = 0; position < chunk.size;) {
+  const bool hasNewest = std::ranges::find(_newestIn, chunk.number) != _newestIn.end();
+  for (std::size_t position = 0; hasNewest && position < chunk.size;) {
     const Place place = read(chunk, position);
     if (_newestIn[place.row] != chunk.number) continue;
     const auto* payload = chunk.content.get() + place.begin;
@@ -116,10 +90,10 @@ void Journal::dropOldest() {
 Journal::Place Journal::read(const Chunk& chunk, std::size_t& position) {
   const std::uint8_t* content = chunk.content.get();
   Place place;
-  place.receivedMs = chunk.fromMs + take<std::uint16_t>(content, position);
-  const auto head = take<std::uint16_t>(content, position);
-  place.row = head >> kSizeBits;
-  place.size = head & kLongSize;
+  const auto head = take<std::uint32_t>(content, position);
+  place.receivedMs = chunk.fromMs + (head & kLongestMs);
+  place.row = head >> (kTimeBits + kSizeBits);
+  place.size = head >> kTimeBits & kLongSize;
   if (place.size == kLongSize) place.size = take<std::uint32_t>(content, position);
   place.begin = position;
   position += place.size;

@@ -1,8 +1,10 @@
 // The payloads of the last minutes, as they came.
 #pragma once
 
+#include <algorithm>
 #include <array>
 #include <cstdint>
+#include <cstring>
 #include <deque>
 #include <functional>
 #include <memory>
@@ -32,9 +34,24 @@ class Journal {
 
   Journal() = default;
   explicit Journal(const Limits& limits) : _limits(limits) {}
+  Journal(const Journal&) = delete;
+  Journal& operator=(const Journal&) = delete;
 
-  // No more than 32 different rows, which live as long as the journal.
-  void add(const DispatchRow& row, std::uint64_t receivedMs, ByteView payload);
+  // Makes a metric known and answers its number, from 0. No more than 32 different ones, whose rows
+  // live as long as the journal.
+  std::size_t know(const DispatchRow& row);
+  void add(std::size_t number, std::uint64_t receivedMs, ByteView payload) {
+    _lastMs = std::max(receivedMs, _lastMs);
+    const bool isShort = payload.size() < kLongSize;
+    if (!isShort || !_newest || !_newest->hasRoom(_lastMs, kHeadBytes + payload.size()))
+        [[unlikely]] {
+      return addElsewhere(number, payload);
+    }
+    put(number, payload);
+  }
+  void add(const DispatchRow& row, std::uint64_t receivedMs, ByteView payload) {
+    add(know(row), receivedMs, payload);
+  }
 
   // Those of one metric within both times, oldest first.
   std::vector<JournalEntry> of(std::int64_t metric, std::uint64_t fromMs, std::uint64_t toMs) const;
@@ -53,6 +70,13 @@ class Journal {
 
  private:
   static constexpr std::size_t kMostRows = 32;
+  // The head of an entry: milliseconds since the chunk's begin, size, row.
+  static constexpr std::size_t kHeadBytes = 4;
+  static constexpr unsigned kTimeBits = 16;
+  static constexpr unsigned kSizeBits = 11;
+  static constexpr std::uint64_t kLongestMs = (1U << kTimeBits) - 1;  // that a chunk covers
+  static constexpr std::size_t kLongSize = (1U << kSizeBits) - 1;  // the size follows in four bytes
+  static constexpr std::size_t kLongBytes = 4;
 
   // A run of entries: each a head of four bytes (and four more for a long payload) and its payload.
   struct Chunk {
@@ -63,6 +87,10 @@ class Journal {
     std::size_t size = 0;
     std::size_t capacity = 0;
     std::unique_ptr<std::uint8_t[]> content;
+
+    bool hasRoom(std::uint64_t atMs, std::size_t more) const {
+      return atMs - fromMs <= kLongestMs && size + more <= capacity;
+    }
   };
   // The last one of a row whose chunk has gone.
   struct Kept {
@@ -76,11 +104,32 @@ class Journal {
     std::uint64_t receivedMs = 0;
   };
 
-  std::size_t placeOf(const DispatchRow& row);
   std::optional<std::size_t> find(std::int64_t metric) const;
-  Chunk& chunkFor(std::uint64_t receivedMs, std::size_t size);
+  // Of the time that was set last.
+  void addElsewhere(std::size_t number, ByteView payload);
+  void put(std::size_t number, ByteView payload) {
+    putHead(number, payload.size());
+    putBytes(payload);
+  }
+  void putHead(std::size_t number, std::size_t size) {
+    const std::uint64_t head = (_lastMs - _newest->fromMs) | (number << kSizeBits | size)
+                                                                 << kTimeBits;
+    const auto bytes = static_cast<std::uint32_t>(head);
+    std::memcpy(_newest->content.get() + _newest->size, &bytes, sizeof bytes);
+    _newest->size += sizeof bytes;
+    _newest->toMs = _lastMs;
+    _newest->rows |= 1U << number;
+    _newestIn.data()[number] = _newest->number;
+  }
+  void putBytes(ByteView bytes) {
+    if (!bytes.empty()) {
+      std::memcpy(_newest->content.get() + _newest->size, bytes.data(), bytes.size());
+    }
+    _newest->size += bytes.size();
+  }
+
+  void beginChunk(std::uint64_t receivedMs, std::size_t size);
   void closeNewest();
-  void begin(std::uint64_t receivedMs, std::size_t size);
   void dropOldest();
   static Place read(const Chunk& chunk, std::size_t& position);
   static std::vector<Place> placesOf(const Chunk& chunk, std::size_t row, std::uint64_t fromMs,
@@ -94,6 +143,7 @@ class Journal {
   std::array<std::uint64_t, kMostRows> _newestIn{};  // number of the chunk
   std::array<std::optional<Kept>, kMostRows> _kept;
   std::deque<Chunk> _chunks;
+  Chunk* _newest = nullptr;  // the last of them
   std::uint64_t _nextNumber = 1;
   std::uint64_t _lastMs = 0;
   std::size_t _bytes = 0;

@@ -1,11 +1,10 @@
 #include "history/RadioFollower.h"
 
 #include <algorithm>
-#include <string_view>
+#include <span>
+#include <string>
 #include <utility>
 
-#include "base/Rendering.h"
-#include "history/ReportedCell.h"
 #include "history/Words.h"
 
 namespace qel {
@@ -26,50 +25,46 @@ constexpr std::array kLinkFailures = {
     NamedWords{"KLTE_RRC_CAUSE_REEST_OTHER_FAIL_MAX_RLC_RETX", "most RLC retransmissions made"},
 };
 
-bool isAnyOf(std::string_view name, std::initializer_list<std::string_view> names) {
-  return std::ranges::find(names, name) != names.end();
-}
+constexpr std::string_view kRadioLinkFailure = "KWCDMA_RRC_CONN_STATE_RADIO_LINK_FAILURE";
 
-std::string textAt(const Dictionary& record, std::string_view key) {
-  const Value* value = record.find(key);
-  return value ? cellText(*value) : std::string();
-}
-
-std::string movedText(const Cell& from, const Cell& to, CellMove move) {
-  const std::string_view start = move == CellMove::handover      ? "Handover from "
-                                 : move == CellMove::reselection ? "Reselected from "
-                                                                 : "From ";
-  return std::string(start) + textOf(from) + " to " + textOf(to);
-}
-
-bool isTheSameReport(const std::optional<Cell>& a, const Cell& b) {
-  return a && a->isSameAs(b) && a->area == b.area && a->mcc == b.mcc && a->mnc == b.mnc;
+std::string_view nameIn(const Value* value) {
+  return value ? value->asText().value_or(std::string_view()) : std::string_view();
 }
 
 }  // namespace
 
-// What an RRC report says, whatever the technology.
+// What a state says about the phone, where it says any of it.
+struct RadioFollower::StateFacts {
+  enum class Use : std::uint8_t { untold, inUse, left };
+  enum class Channel : std::uint8_t { untold, none, dedicated };
+
+  std::string_view name;
+  Use use = Use::untold;  // of the technology: by a connection, or the wish for one
+  Channel channel = Channel::untold;
+  bool isOver = false;  // there is a cause of release, of those that tell two causes
+
+  static const StateFacts& of(std::span<const StateFacts> states, std::string_view name) {
+    static constexpr StateFacts kUntold = {""};
+    const auto found = std::ranges::find(states, name, &StateFacts::name);
+    return found == states.end() ? kUntold : *found;
+  }
+};
+
 struct RadioFollower::StateChange {
   Technology technology;
   const Value* state;
   const Value* cause;
-  Connection connection;
-  bool isInUse;                             // the phone has, or asks for, a connection there
-  bool isLeft;                              // the technology is not in use
-  std::optional<std::string_view> failure;  // of the radio link, why
+  const StateFacts& facts;
+  std::optional<std::string_view> failure;  // of the radio link, and why
 };
 
-std::optional<Technology> RadioFollower::inUse() const {
-  const auto* technology = _technology.newest();
-  return technology ? *technology : std::nullopt;
-}
-
 void RadioFollower::use(Technology technology, const Report& report, HappeningLog& log) {
-  if (inUse() == technology) return;
+  if (_inUse == technology) return;
+  _inUse = technology;
   if (_lastTechnology && *_lastTechnology != technology) {
-    log.add(report, HappeningKind::technology, technology,
-            "Changed from " + std::string(nameOf(*_lastTechnology)) + " to " +
-                std::string(nameOf(technology)));
+    log.tellText(report, HappeningKind::technology, technology,
+                 "Changed from " + std::string(nameOf(*_lastTechnology)) + " to " +
+                     std::string(nameOf(technology)));
   }
   _lastTechnology = technology;
   _technology.set(report.atMs, technology);
@@ -78,116 +73,114 @@ void RadioFollower::use(Technology technology, const Report& report, HappeningLo
 }
 
 void RadioFollower::leave(Technology technology, const Report& report) {
-  if (inUse() != technology) return;
+  if (_inUse != technology) return;
+  _inUse.reset();
   _technology.set(report.atMs, std::nullopt);
   _servingCell.set(report.atMs, std::nullopt);
 }
 
 void RadioFollower::followCell(const Report& report, HappeningLog& log) {
-  const auto cell = reportedCell(report.metric, report.record);
+  const auto cell = _cells.read(report.metric, report.record);
   if (!cell) return;
   use(cell->technology, report, log);
   if (_linkFailedMs && report.atMs - *_linkFailedMs > kAfterFailureMs) _linkFailedMs.reset();
-  const Connection before = rrcOf(cell->technology).connection;
-  if (cell->technology == Technology::gsm) {
-    const std::string state = textAt(report.record, "state");
-    rrcOf(Technology::gsm).connection = state == "DEDICATED_STATE"       ? Connection::dedicated
-                                        : state == "NON_DEDICATED_STATE" ? Connection::none
-                                                                         : Connection::unknown;
-  }
-  if (!_lastCell || !_lastCell->isSameAs(*cell)) {
-    Happening happening;
-    happening.timeMs = report.timeMs;
-    happening.kind = HappeningKind::cell;
-    happening.technology = cell->technology;
-    happening.metric = report.metric;
-    happening.move = moveTo(*cell, before);
-    happening.text =
-        _lastCell ? movedText(*_lastCell, *cell, happening.move) : "On " + textOf(*cell);
-    happening.from = std::exchange(_lastCell, cell);
-    happening.to = cell;
-    log.add(std::move(happening), report.atMs);
+  const Rrc before = rrcOf(cell->technology);
+  if (cell->technology == Technology::gsm) followGsmChannel(report.record);
+  if (!_lastCell || !_lastCell->isSameCellAs(*cell)) {
+    const CellMove move = moveTo(*cell, before);
+    log.tell<ToldCell>(report, HappeningKind::cell, cell->technology, _lastCell, *cell, move);
+    _lastCell = cell;
   }
   const auto* known = _servingCell.newest();
-  if (!known || !isTheSameReport(*known, *cell)) _servingCell.set(report.atMs, cell);
+  if (!known || *known != cell) _servingCell.set(report.atMs, cell);
+}
+
+// GSM tells of the phone's channel in its reports of the cell.
+void RadioFollower::followGsmChannel(const Dictionary& record) {
+  const std::string_view state = nameIn(record.find("state"));
+  Rrc& rrc = rrcOf(Technology::gsm);
+  rrc.isDedicated = state == "DEDICATED_STATE";
+  rrc.isKnown = rrc.isDedicated || state == "NON_DEDICATED_STATE";
 }
 
 // Within one technology the connection tells them apart, unless it has just failed.
-CellMove RadioFollower::moveTo(const Cell& cell, Connection before) const {
-  const auto& rrc = _rrc[static_cast<std::size_t>(cell.technology)];
+CellMove RadioFollower::moveTo(const ReportedCell& cell, const Rrc& before) const {
+  const Rrc& now = _rrc[static_cast<std::size_t>(cell.technology)];
   if (!_lastCell || _lastCell->technology != cell.technology || _linkFailedMs) {
     return CellMove::unknown;
   }
-  if (before != rrc.connection) return CellMove::unknown;
-  if (before == Connection::dedicated) return CellMove::handover;
-  return before == Connection::none ? CellMove::reselection : CellMove::unknown;
+  const bool isAsBefore = before.isKnown && now.isKnown && before.isDedicated == now.isDedicated;
+  if (!isAsBefore) return CellMove::unknown;
+  return now.isDedicated ? CellMove::handover : CellMove::reselection;
 }
 
 void RadioFollower::followState(const StateChange& change, const Report& report,
                                 HappeningLog& log) {
+  using Use = StateFacts::Use;
+  using Channel = StateFacts::Channel;
   if (!change.state) return;
-  if (change.isInUse || !_lastTechnology) {
-    if (!change.isLeft) use(change.technology, report, log);
-  }
+  const StateFacts& facts = change.facts;
+  const bool isFirst = !_lastTechnology && facts.use != Use::left;
+  if (facts.use == Use::inUse || isFirst) use(change.technology, report, log);
   Rrc& known = rrcOf(change.technology);
-  std::string state = cellText(*change.state);
-  std::string cause = change.cause ? cellText(*change.cause) : std::string();
-  const bool isNew = state != known.state || change.failure;
-  if (isNew) {
-    const std::string why = wordsOf(change.cause, "cause");
-    std::string text(nameOf(change.technology));
-    text += " RRC: " + wordsOf(change.state, "state");
-    if (!why.empty()) text += ", " + why;
-    log.add(report, HappeningKind::rrc, change.technology, std::move(text));
+  Value cause = change.cause ? *change.cause : Value();
+  if (change.failure || *change.state != known.state) {
+    log.tell<ToldConnection>(report, HappeningKind::rrc, change.technology, *change.state, cause);
+    known.state = *change.state;
     if (change.failure) addLinkFailure(change.technology, *change.failure, report, log);
   }
-  known = {std::move(state), std::move(cause), change.connection};
-  if (change.isLeft) leave(change.technology, report);
+  known.cause = std::move(cause);
+  known.isKnown = facts.channel != Channel::untold;
+  known.isDedicated = facts.channel == Channel::dedicated;
+  if (facts.use == Use::left) leave(change.technology, report);
 }
 
 void RadioFollower::followLteState(const Report& report, HappeningLog& log) {
-  const Value* state = report.record.find("state");
-  const Value* cause = report.record.find("cause");
-  const auto name = state ? state->asText().value_or("") : "";
-  const auto why = cause ? cause->asText().value_or("") : "";
-  const auto connection = name == "KLTE_RRC_STATE_CONNECTED" ? Connection::dedicated
-                          : name == "KLTE_RRC_STATE_IDLE"    ? Connection::none
-                                                             : Connection::unknown;
-  const bool isInUse =
-      isAnyOf(name, {"KLTE_RRC_STATE_CONNECTED", "KLTE_RRC_STATE_ATMPT_CONNECTION"});
-  const auto found = std::ranges::find(kLinkFailures, why, &NamedWords::name);
-  // The cause of a failure stays in the reports until the connection ends.
-  const Rrc& known = rrcOf(Technology::lte);
-  const bool hasFailed = found != kLinkFailures.end() &&
-                         (why != known.cause || known.connection == Connection::dedicated);
-  const auto failure = hasFailed ? std::optional(found->words) : std::nullopt;
-  followState(
-      {Technology::lte, state, cause, connection, isInUse, name == "KLTE_RRC_STATE_NULL", failure},
-      report, log);
+  using Use = StateFacts::Use;
+  using Channel = StateFacts::Channel;
+  static constexpr std::array kStates = {
+      StateFacts{"KLTE_RRC_STATE_CONNECTED", Use::inUse, Channel::dedicated},
+      StateFacts{"KLTE_RRC_STATE_IDLE", Use::untold, Channel::none},
+      StateFacts{"KLTE_RRC_STATE_ATMPT_CONNECTION", Use::inUse},
+      StateFacts{"KLTE_RRC_STATE_NULL", Use::left},
+  };
+  const Value* state = _lteState.in(report.record);
+  const Value* cause = _lteCause.in(report.record);
+  const auto found = std::ranges::find(kLinkFailures, nameIn(cause), &NamedWords::name);
+  std::optional<std::string_view> failure;
+  if (state && found != kLinkFailures.end()) {
+    // The cause of a failure stays in the reports until the connection ends.
+    const Rrc& known = rrcOf(Technology::lte);
+    const bool hasEnded = known.isDedicated && *state != known.state;
+    if (*cause != known.cause || hasEnded) failure = found->words;
+  }
+  followState({Technology::lte, state, cause, StateFacts::of(kStates, nameIn(state)), failure},
+              report, log);
 }
 
 void RadioFollower::followUmtsState(const Report& report, HappeningLog& log) {
-  const Value* state = report.record.find("state");
-  const auto name = state ? state->asText().value_or("") : "";
-  const bool isFailure = name == "KWCDMA_RRC_CONN_STATE_RADIO_LINK_FAILURE";
-  const bool isOver =
-      isFailure || isAnyOf(name, {"KWCDMA_RRC_CONN_STATE_RELEASE", "KWCDMA_RRC_CONN_STATE_IDLE",
-                                  "KWCDMA_RRC_CONN_STATE_SCRI_SENT"});
-  const bool isInUse =
-      isAnyOf(name, {"KWCDMA_RRC_CONN_STATE_ESTABLISH", "KWCDMA_RRC_CONN_STATE_URA_PCH",
-                     "KWCDMA_RRC_CONN_STATE_CELL_PCH", "KWCDMA_RRC_CONN_STATE_CELL_FACH",
-                     "KWCDMA_RRC_CONN_STATE_CELL_DCH"});
+  using Use = StateFacts::Use;
+  using Channel = StateFacts::Channel;
   // On shared channels and between pages the phone itself chooses its cells.
-  const auto connection = name == "KWCDMA_RRC_CONN_STATE_CELL_DCH"          ? Connection::dedicated
-                          : name == "KWCDMA_RRC_CONN_STATE_IDLE" || isInUse ? Connection::none
-                                                                            : Connection::unknown;
-  const Value* cause = report.record.find(isOver ? "release_cause" : "establishment_cause");
-  const bool isLeft = name == "KWCDMA_RRC_CONN_STATE_INACTIVE";
-  const bool hasFailed = isFailure && name != rrcOf(Technology::umts).state;
-  const auto failure = hasFailed ? std::optional<std::string_view>("") : std::nullopt;
-  followState(
-      {Technology::umts, state, isLeft ? nullptr : cause, connection, isInUse, isLeft, failure},
-      report, log);
+  static constexpr std::array kStates = {
+      StateFacts{"KWCDMA_RRC_CONN_STATE_CELL_DCH", Use::inUse, Channel::dedicated},
+      StateFacts{"KWCDMA_RRC_CONN_STATE_CELL_FACH", Use::inUse, Channel::none},
+      StateFacts{"KWCDMA_RRC_CONN_STATE_CELL_PCH", Use::inUse, Channel::none},
+      StateFacts{"KWCDMA_RRC_CONN_STATE_URA_PCH", Use::inUse, Channel::none},
+      StateFacts{"KWCDMA_RRC_CONN_STATE_ESTABLISH", Use::inUse, Channel::none},
+      StateFacts{"KWCDMA_RRC_CONN_STATE_IDLE", Use::untold, Channel::none, true},
+      StateFacts{"KWCDMA_RRC_CONN_STATE_RELEASE", Use::untold, Channel::untold, true},
+      StateFacts{"KWCDMA_RRC_CONN_STATE_SCRI_SENT", Use::untold, Channel::untold, true},
+      StateFacts{kRadioLinkFailure, Use::untold, Channel::untold, true},
+      StateFacts{"KWCDMA_RRC_CONN_STATE_INACTIVE", Use::left},
+  };
+  const Value* state = report.record.find("state");
+  const StateFacts& facts = StateFacts::of(kStates, nameIn(state));
+  const Value* cause = report.record.find(facts.isOver ? "release_cause" : "establishment_cause");
+  const bool hasFailed = facts.name == kRadioLinkFailure && *state != rrcOf(Technology::umts).state;
+  followState({Technology::umts, state, facts.use == Use::left ? nullptr : cause, facts,
+               hasFailed ? std::optional<std::string_view>("") : std::nullopt},
+              report, log);
 }
 
 void RadioFollower::followLinkFailure(const Report& report, HappeningLog& log) {
@@ -202,7 +195,7 @@ void RadioFollower::addLinkFailure(Technology technology, std::string_view why,
   std::string text = "Radio link failure on ";
   text += nameOf(technology);
   if (!why.empty()) (text += ": ") += why;
-  log.add(report, HappeningKind::radioLinkFailure, technology, std::move(text));
+  log.tellText(report, HappeningKind::radioLinkFailure, technology, std::move(text));
 }
 
 }  // namespace qel

@@ -4,10 +4,11 @@
 #include <array>
 #include <cstdint>
 #include <optional>
-#include <string>
+#include <string_view>
 
-#include "history/Cell.h"
 #include "history/HappeningLog.h"
+#include "history/KnownPlace.h"
+#include "history/ReportedCell.h"
 #include "history/Timeline.h"
 
 namespace qel {
@@ -25,31 +26,36 @@ class RadioFollower {
   void followLinkFailure(const Report& report, HappeningLog& log);
 
   // Empty while the technology in use has reported none.
-  const Timeline<std::optional<Cell>>& servingCell() const { return _servingCell; }
+  const Timeline<std::optional<ReportedCell>>& servingCell() const { return _servingCell; }
   const Timeline<std::optional<Technology>>& technology() const { return _technology; }
 
  private:
-  enum class Connection : std::uint8_t { unknown, none, dedicated };
   // The RRC state of one technology as it was reported last.
   struct Rrc {
-    std::string state;
-    std::string cause;
-    Connection connection = Connection::unknown;
+    Value state;
+    Value cause;
+    bool isKnown = false;      // whether the phone had its own channel or none
+    bool isDedicated = false;  // had one: the network decides about its cell
   };
+  struct StateFacts;
   struct StateChange;
 
-  std::optional<Technology> inUse() const;
   void use(Technology technology, const Report& report, HappeningLog& log);
   void leave(Technology technology, const Report& report);
   void followState(const StateChange& change, const Report& report, HappeningLog& log);
   void addLinkFailure(Technology technology, std::string_view why, const Report& report,
                       HappeningLog& log);
-  CellMove moveTo(const Cell& cell, Connection before) const;
+  CellMove moveTo(const ReportedCell& cell, const Rrc& before) const;
+  void followGsmChannel(const Dictionary& record);
   Rrc& rrcOf(Technology technology) { return _rrc[static_cast<std::size_t>(technology)]; }
 
-  Timeline<std::optional<Cell>> _servingCell;
+  CellReader _cells;
+  KnownPlace _lteState{"state"};
+  KnownPlace _lteCause{"cause"};
+  Timeline<std::optional<ReportedCell>> _servingCell;
   Timeline<std::optional<Technology>> _technology;
-  std::optional<Cell> _lastCell;              // of any technology
+  std::optional<ReportedCell> _lastCell;  // of any technology
+  std::optional<Technology> _inUse;
   std::optional<Technology> _lastTechnology;  // that was in use
   std::array<Rrc, 3> _rrc;
   std::optional<std::uint64_t> _linkFailedMs;

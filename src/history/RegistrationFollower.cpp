@@ -24,12 +24,10 @@ constexpr std::array kDomains = {
     Domain{MetricValidator::K_CELLULAR_MM_CTXT, std::nullopt, "Calls of 2G and 3G"},
 };
 
-// The text of the value when it is another one than known, which it then is.
-bool isNew(const Value* value, std::string& known) {
-  if (!value) return false;
-  std::string text = cellText(*value);
-  if (text == known) return false;
-  known = std::move(text);
+// Whether the value is another one than known, which it then is.
+bool isNew(const Value* value, Value& known) {
+  if (!value || *value == known) return false;
+  known = *value;
   return true;
 }
 
@@ -59,25 +57,25 @@ void RegistrationFollower::follow(const Report& report, HappeningLog& log) {
   const Dictionary& record = report.record;
   const Value* status = record.find("reg_status");
   if (isNew(status, known.status)) {
-    log.add(report, HappeningKind::registration, domain->technology,
-            std::string(domain->name) + ": " + wordsOf(status, "status"));
+    log.tellText(report, HappeningKind::registration, domain->technology,
+                 std::string(domain->name) + ": " + wordsOf(status, "status"));
   }
   const Value* reject = record.find("reject_cause");
   if (isNew(reject, known.reject)) {
     const std::string cause = causeText(*reject);
     if (!cause.empty()) {
-      log.add(report, HappeningKind::reject, domain->technology,
-              rejectText(*domain, record, cause));
+      log.tellText(report, HappeningKind::reject, domain->technology,
+                   rejectText(*domain, record, cause));
     }
   }
   // A rejected procedure has failed too: its cause has been told.
   const Value* failure = record.find("proc_failure_cause");
   if (isNew(failure, known.failure) &&
-      known.failure != "KNAS_MM_PROC_FAILURE_CAUSE_REJECTED_BY_NW") {
+      failure->asText() != "KNAS_MM_PROC_FAILURE_CAUSE_REJECTED_BY_NW") {
     const std::string words = wordsOf(failure, "cause");
     if (!words.empty()) {
-      log.add(report, HappeningKind::registration, domain->technology,
-              std::string(domain->name) + ": failed, " + words);
+      log.tellText(report, HappeningKind::registration, domain->technology,
+                   std::string(domain->name) + ": failed, " + words);
     }
   }
 }

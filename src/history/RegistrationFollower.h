@@ -3,8 +3,8 @@
 
 #include <array>
 #include <cstdint>
-#include <string>
 
+#include "base/Value.h"
 #include "history/HappeningLog.h"
 
 namespace qel {
@@ -17,9 +17,9 @@ class RegistrationFollower {
 
  private:
   struct Known {
-    std::string status;
-    std::string reject;
-    std::string failure;
+    Value status;
+    Value reject;
+    Value failure;
   };
 
   std::array<Known, 3> _known;

@@ -1,32 +1,11 @@
 #include "history/ReportedCell.h"
 
 #include <algorithm>
-#include <array>
-#include <limits>
 
 #include "metrics/MetricValidator.h"
 
 namespace qel {
 namespace {
-
-struct CellKeys {
-  std::int64_t metric;
-  Technology technology;
-  Name channel;
-  Name code;
-  Name area;
-  Name mcc;
-  Name mnc;
-};
-
-constexpr std::array kCellKeys = {
-    CellKeys{MetricValidator::K_LTE_SCELL_INFO, Technology::lte, "dl_freq", "phy_cell_id",
-             "tracking_area_code", "sel_plmn_mcc", "sel_plmn_mnc"},
-    CellKeys{MetricValidator::K_UMTS_SCELL_INFO, Technology::umts, "dl_uarfcn", "psc", "lac", "mcc",
-             "mnc"},
-    CellKeys{MetricValidator::K_GSM_SCELL_INFO, Technology::gsm, "arfcn", "bsic", "lac", "mcc",
-             "mnc"},
-};
 
 struct CellWords {
   std::string_view code;
@@ -45,37 +24,66 @@ constexpr CellWords wordsOf(Technology technology) {
   return {};
 }
 
-std::optional<std::uint32_t> numberAt(const Dictionary& record, std::string_view key) {
-  const Value* value = record.find(key);
-  const auto number = value ? value->asUInt64() : std::nullopt;
-  if (!number || *number > std::numeric_limits<std::uint32_t>::max()) return std::nullopt;
-  return static_cast<std::uint32_t>(*number);
+std::optional<std::uint32_t> orNone(std::uint32_t number) {
+  return number == ReportedCell::kNone ? std::nullopt : std::optional(number);
 }
 
 // No code has more than three digits (23.003, clause 2.2).
-std::string digits(std::optional<std::uint32_t> number, std::size_t atLeast) {
+std::string digits(std::uint32_t number, std::size_t atLeast) {
   constexpr std::uint32_t kMost = 999;
-  if (!number || *number > kMost) return {};
-  std::string text = std::to_string(*number);
+  if (number > kMost) return {};
+  std::string text = std::to_string(number);
   if (text.size() < atLeast) text.insert(0, atLeast - text.size(), '0');
   return text;
 }
 
+std::uint32_t numberIn(const Dictionary& record, KnownPlace& place) {
+  const Value* value = place.in(record);
+  const auto number = value ? value->asUInt64() : std::nullopt;
+  return number && *number < ReportedCell::kNone ? static_cast<std::uint32_t>(*number)
+                                                 : ReportedCell::kNone;
+}
+
 }  // namespace
 
-std::optional<Cell> reportedCell(std::int64_t metric, const Dictionary& record) {
-  const auto keys = std::ranges::find(kCellKeys, metric, &CellKeys::metric);
-  if (keys == kCellKeys.end()) return std::nullopt;
+Cell ReportedCell::asCell() const {
   Cell cell;
-  cell.technology = keys->technology;
-  cell.channel = numberAt(record, keys->channel.view());
-  cell.code = numberAt(record, keys->code.view());
-  cell.cellId = numberAt(record, "cell_id");
-  if (!cell.channel && !cell.code && !cell.cellId) return std::nullopt;
-  cell.area = numberAt(record, keys->area.view());
-  cell.mcc = digits(numberAt(record, keys->mcc.view()), 3);
-  const std::size_t mncDigits = numberAt(record, "num_mnc_digits") == 3U ? 3 : 2;
-  cell.mnc = digits(numberAt(record, keys->mnc.view()), mncDigits);
+  cell.technology = technology;
+  cell.channel = orNone(channel);
+  cell.code = orNone(code);
+  cell.cellId = orNone(cellId);
+  cell.area = orNone(area);
+  cell.mcc = digits(mcc, 3);
+  cell.mnc = digits(mnc, hasThreeDigits ? 3 : 2);
+  return cell;
+}
+
+CellReader::CellReader()
+    : _places{
+          {MetricValidator::K_LTE_SCELL_INFO, Technology::lte, KnownPlace("dl_freq"),
+           KnownPlace("phy_cell_id"), KnownPlace("cell_id"), KnownPlace("tracking_area_code"),
+           KnownPlace("sel_plmn_mcc"), KnownPlace("sel_plmn_mnc"), KnownPlace("num_mnc_digits")},
+          {MetricValidator::K_UMTS_SCELL_INFO, Technology::umts, KnownPlace("dl_uarfcn"),
+           KnownPlace("psc"), KnownPlace("cell_id"), KnownPlace("lac"), KnownPlace("mcc"),
+           KnownPlace("mnc"), KnownPlace("num_mnc_digits")},
+          {MetricValidator::K_GSM_SCELL_INFO, Technology::gsm, KnownPlace("arfcn"),
+           KnownPlace("bsic"), KnownPlace("cell_id"), KnownPlace("lac"), KnownPlace("mcc"),
+           KnownPlace("mnc"), KnownPlace("num_mnc_digits")}} {}
+
+std::optional<ReportedCell> CellReader::read(std::int64_t metric, const Dictionary& record) {
+  const auto places = std::ranges::find(_places, metric, &Places::metric);
+  if (places == _places.end()) return std::nullopt;
+  ReportedCell cell;
+  cell.technology = places->technology;
+  cell.channel = numberIn(record, places->channel);
+  cell.code = numberIn(record, places->code);
+  cell.cellId = numberIn(record, places->cellId);
+  constexpr auto kNone = ReportedCell::kNone;
+  if (cell.channel == kNone && cell.code == kNone && cell.cellId == kNone) return std::nullopt;
+  cell.area = numberIn(record, places->area);
+  cell.mcc = numberIn(record, places->mcc);
+  cell.mnc = numberIn(record, places->mnc);
+  cell.hasThreeDigits = numberIn(record, places->mncDigits) == 3;
   return cell;
 }
 

@@ -6,65 +6,77 @@
 namespace qel {
 namespace {
 
-constexpr std::uint64_t kShortestSilenceMs = 5000;
 constexpr std::uint64_t kSilentDistances = 3;
 
 }  // namespace
 
-void Series::add(std::uint64_t timeMs, float value) {
-  const std::uint64_t last = _recent.empty() ? timeMs : _recent.back().timeMs();
-  timeMs = std::max(timeMs, last);
-  const std::uint64_t distance = timeMs - last;
-  if (distance > kShortestSilenceMs && isSilence(distance)) _isInterrupted = true;
-  if (distance > 0) {
-    constexpr std::uint64_t kMost = std::numeric_limits<std::uint32_t>::max();
-    _distancesMs[_distances++ % _distancesMs.size()] =
-        static_cast<std::uint32_t>(std::min(distance, kMost));
-  }
-  _recent.emplace_back(timeMs, value, _isInterrupted);
-  _isInterrupted = false;
-  while (_recent.size() > _limits.mostRecent ||
-         timeMs - _recent.front().timeMs() > _limits.recentMs) {
-    dropOldest();
-  }
+void Series::Row::beginChunk() {
+  Chunk& chunk = _chunks.emplace_back();
+  _next = chunk.data();
+  _end = _next + chunk.size();
 }
 
-// Before three distances are known nothing is usual, and five seconds are a silence.
+void Series::Row::dropFirstChunk() {
+  _chunks.pop_front();
+  _size -= kChunk;
+}
+
+std::size_t Series::Row::until(std::uint64_t timeMs) const {
+  std::size_t first = 0;
+  for (std::size_t count = _size; count > 0;) {
+    const std::size_t half = count / 2;
+    if ((*this)[first + half].timeMs() <= timeMs) {
+      first += half + 1;
+      count -= half + 1;
+    } else {
+      count = half;
+    }
+  }
+  return first;
+}
+
+void Series::turn(std::uint64_t timeMs) {
+  timeMs = std::max(timeMs, _lastMs);
+  const std::uint64_t distance = timeMs - _lastMs;
+  if (distance > kShortestSilenceMs && isSilence(distance)) _isInterrupted = true;
+  if (_isInterrupted || timeMs >= _mean.endMs) beginMean(timeMs);
+}
+
+// By the middle one of the last eight distances. Before three are known nothing is usual, and five
+// seconds are a silence.
 bool Series::isSilence(std::uint64_t distanceMs) const {
-  const std::size_t known = std::min<std::size_t>(_distances, _distancesMs.size());
+  std::array<std::uint64_t, 8> distances;
+  std::size_t known = 0;
+  for (std::size_t i = _recent.size(); i-- > 1 && known < distances.size();) {
+    const std::uint64_t distance = _recent[i].timeMs() - _recent[i - 1].timeMs();
+    if (distance > 0) distances[known++] = distance;
+  }
   if (known < 3) return true;
-  auto sorted = _distancesMs;
-  const auto middle = sorted.begin() + static_cast<std::ptrdiff_t>(known / 2);
-  std::nth_element(sorted.begin(), middle, sorted.begin() + static_cast<std::ptrdiff_t>(known));
+  const auto middle = distances.begin() + static_cast<std::ptrdiff_t>(known / 2);
+  std::nth_element(distances.begin(), middle,
+                   distances.begin() + static_cast<std::ptrdiff_t>(known));
   return distanceMs > kSilentDistances * *middle;
 }
 
-void Series::dropOldest() {
-  const Kept point = _recent.front();
-  _recent.pop_front();
-  if (_limits.dayMs == 0) return;
-  if (_mean.count > 0 && (point.begins() || point.timeMs() - _mean.fromMs >= _limits.dayStepMs)) {
-    finishMean();
+// The newest chunk stays.
+void Series::dropOld() {
+  const auto isTooMuch = [&] {
+    const bool isOld = _lastMs - _recent.firstChunk().back().timeMs() > _limits.recentMs;
+    return isOld || _recent.size() > _limits.mostRecent;
+  };
+  while (_recent.size() > Row::kChunk && isTooMuch()) _recent.dropFirstChunk();
+}
+
+void Series::beginMean(std::uint64_t timeMs) {
+  if (_mean.count > 0 && _limits.dayMs > 0) _day.push(_mean.point(_lastMs));
+  while (_day.size() > Row::kChunk && timeMs - _day.firstChunk().back().timeMs() > _limits.dayMs) {
+    _day.dropFirstChunk();
   }
-  if (_mean.count == 0) _mean = {point.timeMs(), 0, 0, 0, point.begins()};
-  _mean.toMs = point.timeMs();
-  _mean.sum += point.value;
-  ++_mean.count;
+  _mean = {timeMs, timeMs + _limits.dayStepMs, 0, 0, _isInterrupted};
 }
 
-Series::Kept Series::Mean::point() const {
-  return {fromMs + (toMs - fromMs) / 2, static_cast<float>(sum / count), begins};
-}
-
-void Series::finishMean() {
-  _day.push_back(_mean.point());
-  while (_day.back().timeMs() - _day.front().timeMs() > _limits.dayMs) _day.pop_front();
-  _mean.count = 0;
-}
-
-Series::Row::const_iterator Series::firstAfter(const Row& row, std::uint64_t timeMs) {
-  return std::upper_bound(row.begin(), row.end(), timeMs,
-                          [](std::uint64_t at, const Kept& point) { return at < point.timeMs(); });
+Series::Kept Series::Mean::point(std::uint64_t lastMs) const {
+  return {fromMs + (lastMs - fromMs) / 2, static_cast<float>(sum / count), begins};
 }
 
 std::vector<Run> Series::between(std::uint64_t fromMs, std::uint64_t toMs) const {
@@ -74,27 +86,23 @@ std::vector<Run> Series::between(std::uint64_t fromMs, std::uint64_t toMs) const
     if (runs.empty() || point.begins()) runs.emplace_back();
     runs.back().push_back({point.timeMs(), point.value});
   };
-  const auto appendRow = [&](const Row& row) {
-    const auto first = fromMs == 0 ? row.begin() : firstAfter(row, fromMs - 1);
-    std::for_each(first, std::max(first, firstAfter(row, toMs)), append);
+  const auto appendRow = [&](const Row& row, std::uint64_t untilMs) {
+    const std::size_t end = row.until(untilMs);
+    for (std::size_t i = fromMs == 0 ? 0 : row.until(fromMs - 1); i < end; ++i) append(row[i]);
   };
-  appendRow(_day);
-  if (_mean.count > 0) append(_mean.point());
-  appendRow(_recent);
+  // Means until the first point that is known itself.
+  if (_recent.size() > 0 && _recent[0].timeMs() > fromMs) {
+    appendRow(_day, std::min(toMs, _recent[0].timeMs() - 1));
+  }
+  appendRow(_recent, toMs);
   return runs;
 }
 
 std::optional<Point> Series::last(std::uint64_t atMs) const {
-  const auto before = [atMs](const Row& row) -> std::optional<Point> {
-    const auto after = firstAfter(row, atMs);
-    if (after == row.begin()) return std::nullopt;
-    return Point{std::prev(after)->timeMs(), std::prev(after)->value};
-  };
-  if (const auto point = before(_recent)) return point;
-  if (_mean.count > 0 && _mean.point().timeMs() <= atMs) {
-    return Point{_mean.point().timeMs(), _mean.point().value};
-  }
-  return before(_day);
+  const auto pointOf = [](const Kept& kept) { return Point{kept.timeMs(), kept.value}; };
+  if (const std::size_t count = _recent.until(atMs); count > 0) return pointOf(_recent[count - 1]);
+  if (const std::size_t count = _day.until(atMs); count > 0) return pointOf(_day[count - 1]);
+  return std::nullopt;
 }
 
 }  // namespace qel

@@ -1,10 +1,12 @@
 // The values of one quantity over time.
 #pragma once
 
+#include <algorithm>
 #include <array>
 #include <cstdint>
 #include <deque>
 #include <optional>
+#include <utility>
 #include <vector>
 
 namespace qel {
@@ -18,7 +20,8 @@ struct Point {
 using Run = std::vector<Point>;
 
 // Keeps every point of ten minutes and one (the mean) for every half minute of a day, or every
-// point of a whole recording; what is older goes. Times that go back are taken as the last one.
+// point of a whole recording; what is older goes, 64 points at a time. Times that go back are taken
+// as the last one.
 class Series {
  public:
   struct Limits {
@@ -30,8 +33,18 @@ class Series {
 
   Series() = default;
   explicit Series(const Limits& limits) : _limits(limits) {}
+  Series(Series&&) = default;
+  Series& operator=(Series&&) = default;
 
-  void add(std::uint64_t timeMs, float value);
+  void add(std::uint64_t timeMs, float value) {
+    const bool isUsual = timeMs - _lastMs <= kShortestSilenceMs && timeMs < _mean.endMs;
+    if (!isUsual || _isInterrupted) [[unlikely]]
+      turn(timeMs);
+    _lastMs = std::max(_lastMs, timeMs);
+    if (_recent.push({_lastMs, value, std::exchange(_isInterrupted, false)})) dropOld();
+    _mean.sum += value;
+    ++_mean.count;
+  }
   // Nothing is known from here on: the next point begins a run.
   void interrupt() { _isInterrupted = true; }
 
@@ -40,43 +53,76 @@ class Series {
   std::vector<Run> between(std::uint64_t fromMs, std::uint64_t toMs) const;
   // The newest point that is not after this time.
   std::optional<Point> last(std::uint64_t atMs) const;
-  bool empty() const { return _recent.empty() && _day.empty(); }
+  bool empty() const { return _recent.size() == 0 && _day.size() == 0; }
 
  private:
   // A point, and whether a run begins with it.
   struct Kept {
+    Kept() = default;
     Kept(std::uint64_t timeMs, float itsValue, bool begins)
         : stamp(timeMs << 1U | static_cast<std::uint64_t>(begins)), value(itsValue) {}
     std::uint64_t timeMs() const { return stamp >> 1U; }
     bool begins() const { return (stamp & 1U) != 0; }
-    std::uint64_t stamp;
-    float value;
+    std::uint64_t stamp = 0;
+    float value = 0;
   };
-  using Row = std::deque<Kept>;
+  // Points in chunks, all of which but the last one are full.
+  class Row {
+   public:
+    static constexpr std::size_t kChunk = 64;
+    using Chunk = std::array<Kept, kChunk>;
+
+    std::size_t size() const { return _size; }
+    const Kept& operator[](std::size_t i) const { return _chunks[i / kChunk][i % kChunk]; }
+    const Kept& back() const { return (*this)[_size - 1]; }
+    const Chunk& firstChunk() const { return _chunks.front(); }
+    // Answers whether a chunk was begun.
+    bool push(const Kept& point) {
+      const bool isFull = _next == _end;
+      if (isFull) [[unlikely]]
+        beginChunk();
+      *_next++ = point;
+      ++_size;
+      return isFull;
+    }
+    void dropFirstChunk();
+    // How many are not after this time.
+    std::size_t until(std::uint64_t timeMs) const;
+
+   private:
+    void beginChunk();
+
+    std::deque<Chunk> _chunks;
+    std::size_t _size = 0;
+    Kept* _next = nullptr;  // within the last chunk
+    Kept* _end = nullptr;
+  };
   // The mean of a half minute that is not over.
   struct Mean {
     std::uint64_t fromMs = 0;
-    std::uint64_t toMs = 0;  // of its last point
+    std::uint64_t endMs = 0;  // of the half minute
     double sum = 0;
     std::uint32_t count = 0;
     bool begins = false;
 
-    // Stands in the middle of its time.
-    Kept point() const;
+    // Stands in the middle of its points' time.
+    Kept point(std::uint64_t lastMs) const;
   };
 
-  static Row::const_iterator firstAfter(const Row& row, std::uint64_t timeMs);
+  static constexpr std::uint64_t kShortestSilenceMs = 5000;
+
+  // For a point that is not one of many.
+  void turn(std::uint64_t timeMs);
   bool isSilence(std::uint64_t distanceMs) const;
-  void dropOldest();
-  void finishMean();
+  void dropOld();
+  void beginMean(std::uint64_t timeMs);
 
   Limits _limits;
   Row _recent;
-  Row _day;
+  Row _day;  // of all points, those above too
   Mean _mean;
+  std::uint64_t _lastMs = 0;
   bool _isInterrupted = true;
-  std::array<std::uint32_t, 8> _distancesMs{};  // the last ones
-  std::uint32_t _distances = 0;                 // ever seen
 };
 
 }  // namespace qel
