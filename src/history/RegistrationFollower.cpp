@@ -5,7 +5,6 @@
 #include <string_view>
 #include <utility>
 
-#include "base/Rendering.h"
 #include "history/Words.h"
 #include "metrics/MetricValidator.h"
 
@@ -33,11 +32,8 @@ bool isNew(const Value* value, Value& known) {
 
 // "network not allowed (cause 11)"; empty: none.
 std::string causeText(const Value& cause) {
-  if (const auto number = cause.asInt64()) {
-    return *number == 0 ? std::string() : "cause " + std::to_string(*number);
-  }
   const NamedWords* words = wordsFor(cause.asText().value_or(""));
-  if (!words) return cellText(cause);
+  if (!words) return wordsOf(&cause, "cause");
   if (words->words.empty()) return {};
   return std::string(words->words) + " (cause " + std::to_string(words->number) + ")";
 }

@@ -156,12 +156,19 @@ const NamedWords* wordsFor(std::string_view name) {
   return words ? words : findIn(registrationWords(), name);
 }
 
+std::string_view numberWithoutName(std::string_view text) {
+  constexpr std::string_view kStart = "(unknown: ";
+  if (!text.starts_with(kStart) || !text.ends_with(')')) return {};
+  return text.substr(kStart.size(), text.size() - kStart.size() - 1);
+}
+
 std::string wordsOf(const Value* value, std::string_view what) {
   if (!value) return {};
   const auto name = value->asText();
   if (!name) return std::string(what) + ' ' + cellText(*value);
-  const NamedWords* words = wordsFor(*name);
-  return std::string(words ? words->words : *name);
+  if (const NamedWords* words = wordsFor(*name)) return std::string(words->words);
+  const std::string_view number = numberWithoutName(*name);
+  return number.empty() ? std::string(*name) : std::string(what) + ' ' + std::string(number);
 }
 
 }  // namespace qel

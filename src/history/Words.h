@@ -23,6 +23,9 @@ std::span<const NamedWords> registrationWords();
 // Nothing for a name that is not known.
 const NamedWords* wordsFor(std::string_view name);
 
+// The number of "(unknown: 12)", which records show for one that has no name; else empty.
+std::string_view numberWithoutName(std::string_view text);
+
 // The words of a record's value. A number without a name is itself, behind what it is one of:
 // "state 12". Empty: there is no such value.
 std::string wordsOf(const Value* value, std::string_view what);
