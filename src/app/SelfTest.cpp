@@ -48,6 +48,7 @@ SelfTest::~SelfTest() { qInstallMessageHandler(formerHandler); }
 bool SelfTest::run() {
   check();
   visitChildren();
+  for (const char* page : {"signals", "happenings", "recordings"}) visitPage(page);
   if (warnings > 0) fail(QString::number(warnings) + QStringLiteral(" warnings"));
   std::cerr << "qelwatch: self-test: " << _screens << " screens, " << _failures << " failures\n";
   return _failures == 0;
@@ -72,6 +73,16 @@ void SelfTest::visitChildren() {
     }
     _path.removeLast();
   }
+}
+
+void SelfTest::visitPage(const char* page) {
+  _path << QString::fromLatin1(page);
+  _navigation.open(_path.last());
+  if (_navigation.topKind() != _path.last()) fail(QStringLiteral("does not open"));
+  check();
+  _navigation.back();
+  if (!waitForFrame()) fail(QStringLiteral("is not left"));
+  _path.removeLast();
 }
 
 void SelfTest::check() {

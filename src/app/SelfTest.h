@@ -23,6 +23,7 @@ class SelfTest {
 
  private:
   void visitChildren();
+  void visitPage(const char* page);
   void check();
   bool waitForFrame();
   void fail(const QString& what);

@@ -4,18 +4,23 @@
 #include <QtCore/QLocale>
 #include <QtCore/QPointer>
 #include <chrono>
+#include <utility>
 
 #include "app/EventLoopWait.h"
+#include "base/FileContent.h"
 #include "base/TerminalText.h"
+#include "recording/RecordingsFolder.h"
 #include "service/InProcessConnector.h"
 #include "sources/diagnostics/port/PortName.h"
 #include "tesk/Transport.h"
+#include "ui/kit/ResourceBundle.h"
 
 namespace qel {
 namespace {
 
 const QString kRecording = QStringLiteral("recording:");
 constexpr std::chrono::milliseconds kPatienceOfASelfTest{5000};
+constexpr std::size_t kLargestConfiguration = 1024 * 1024;
 const QString kSimulated = QStringLiteral("simulated");
 const QString kDiagnostics = QStringLiteral("diag:");
 
@@ -37,12 +42,24 @@ Source::~Source() {
 }
 
 int Source::open(const Options& options) {
+  _book = std::make_shared<FeedBook>(options.source, options.bus);
   if (!options.source.empty()) return openWithin(options.source);
+  _bus = options.bus;
   _watch = std::make_shared<ServiceWatch>(options.bus);
   const auto patience = options.selfTest ? std::optional(kPatienceOfASelfTest) : std::nullopt;
+  const auto watch = [first = _book->reachability(), then = _watch->observer()](
+                         bool reachable, const std::string& why) {
+    first(reachable, why);
+    then(reachable, why);
+  };
+  const auto condition = [first = _book->condition(),
+                          then = _condition->observer()](const tesk::bus::Condition& told) {
+    first(told);
+    then(told.line);
+  };
   _connector = std::make_shared<ClosingConnector>(tesk::bus::makeBusConnector(
-      {options.bus}, _watch->observer(),
-      [patience] { return std::make_shared<EventLoopWait>(patience); }, _condition->observer()));
+      {options.bus}, watch, [patience] { return std::make_shared<EventLoopWait>(patience); },
+      condition));
   tesk::setConnector(_connector);
   return 0;
 }
@@ -50,10 +67,29 @@ int Source::open(const Options& options) {
 void Source::showIn(Navigation& navigation) {
   if (_watch) _watch->showIn(navigation);
   _condition->showIn(navigation);
-  const auto& wrapper = navigation.controller().myTeskWrapper;
-  wrapper->setLossObserver([window = QPointer(&navigation)](std::uint64_t dropped) {
-    if (window) window->setLoss(lossInWords(dropped));
+  Pages* pages = navigation.pages();
+  _book->setHistory(&pages->history());
+  _book->setObserver([book = _book.get(), pages = QPointer(pages)] {
+    if (pages) pages->setFeed(book->feed());
   });
+  pages->setFeed(_book->feed());
+  letRecord(*pages->recorder());
+  const auto& wrapper = navigation.controller().myTeskWrapper;
+  wrapper->setLossObserver([window = QPointer(&navigation), book = _book](std::uint64_t dropped) {
+    if (!window) return;
+    book->noteDropped(dropped);
+    window->setLoss(lossInWords(dropped));
+  });
+}
+
+// Without a folder for it or the configuration to ask for there is no recording.
+void Source::letRecord(RecorderModel& recorder) const {
+  const std::string folder = RecordingsFolder::usualPath();
+  const auto file = ResourceBundle::main().pathForResource("orb_test_lte", "deviceconfig");
+  Bytes configuration = file ? contentOfFile(*file, kLargestConfiguration) : Bytes();
+  if (folder.empty() || configuration.empty()) return;
+  RecordingControl::Way way{_connector, _bus, std::move(configuration)};
+  recorder.setControl(std::make_unique<RecordingControl>(RecordingsFolder(folder), std::move(way)));
 }
 
 int Source::openWithin(const std::string& source) {
@@ -64,7 +100,11 @@ int Source::openWithin(const std::string& source) {
     return error.exitCode;
   }
   service::ConditionBook& book = core->condition();
-  book.observe([&book, tell = _condition->observer()] { tell(inWords(book.current())); });
+  book.observe([&book, first = _book->condition(), then = _condition->observer()] {
+    const sources::SourceCondition current = book.current();
+    first({inWords(current), std::string(current.state), current.model});
+    then(inWords(current));
+  });
   _connector = std::make_shared<ClosingConnector>(service::makeInProcessConnector(std::move(core)));
   tesk::setConnector(_connector);
   return 0;

@@ -3,12 +3,14 @@
 
 #include <QtCore/QString>
 #include <memory>
+#include <optional>
 #include <string>
 
 #include "app/ClosingConnector.h"
 #include "app/ConditionLine.h"
 #include "app/Options.h"
 #include "app/ServiceWatch.h"
+#include "feed/FeedBook.h"
 
 namespace qel {
 
@@ -31,9 +33,12 @@ class Source {
 
  private:
   int openWithin(const std::string& source);
+  void letRecord(RecorderModel& recorder) const;
 
+  std::optional<std::string> _bus;  // nothing: a source within this process
   std::shared_ptr<ClosingConnector> _connector;
   const std::shared_ptr<ConditionLine> _condition = std::make_shared<ConditionLine>();
+  std::shared_ptr<FeedBook> _book;
   std::shared_ptr<ServiceWatch> _watch;  // of the service on the bus
 };
 

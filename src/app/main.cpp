@@ -74,8 +74,10 @@ void setAppearance(QQmlApplicationEngine& engine, const qel::Options& options) {
   if (options.selfTest) appearance->reduceMotion();
 }
 
-int runWindow(QQuickWindow& window, const qel::Options& options, qel::Source& source) {
+int runWindow(QQuickWindow& window, const qel::Options& options, qel::Source& source,
+              const qel::QuickRunLoop& runLoop) {
   auto* navigation = window.property("navigation").value<qel::Navigation*>();
+  QObject::connect(&runLoop, &qel::QuickRunLoop::worked, navigation->pages(), &qel::Pages::look);
   source.showIn(*navigation);
   if (options.selfTest) {
     return qel::SelfTest(window, *navigation).run() ? EXIT_SUCCESS : EXIT_FAILURE;
@@ -114,5 +116,5 @@ int main(int argc, char** argv) {
   QQuickWindow* window = loadWindow(engine, *options);
   if (!window) return EX_SOFTWARE;
   setAppearance(engine, *options);
-  return runWindow(*window, *options, source);
+  return runWindow(*window, *options, source, runLoop);
 }

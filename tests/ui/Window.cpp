@@ -58,6 +58,7 @@ Window::Window(bool animated, std::shared_ptr<FakeService> service)
   _navigation = _window->property("navigation").value<Navigation*>();
   _appearance =
       _engine->singletonInstance<Appearance*>(qmlTypeId("Qelwatch.Ui", 1, 0, "Appearance"));
+  QObject::connect(&_runLoop, &QuickRunLoop::worked, _navigation->pages(), &Pages::look);
   if (!animated) _appearance->reduceMotion();
   settle();
 }

@@ -10,6 +10,7 @@ int main(int argc, char** argv) {
   const QTemporaryDir home;
   qputenv("QT_QPA_PLATFORM", "offscreen");
   qputenv("XDG_CONFIG_HOME", home.path().toLocal8Bit());
+  qputenv("XDG_DATA_HOME", home.path().toLocal8Bit());
   qputenv("XDG_RUNTIME_DIR", home.path().toLocal8Bit());
   qputenv("DBUS_SESSION_BUS_ADDRESS", "unix:path=/nonexistent");
   QGuiApplication::setApplicationName(QStringLiteral("qelwatch"));

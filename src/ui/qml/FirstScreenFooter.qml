@@ -1,12 +1,14 @@
 import QtQuick
 import Qelwatch.Ui
 
-// Where the values come from, how it is with the modem, what is not shown, and the choice between
-// light and dark.
+// The ways to the pages, where the values come from and how they come, how it is with the modem, what
+// is not shown, and the choice between light and dark.
 Item {
     id: footer
 
+    required property Navigation navigation
     property string source
+    property string flow
     property string condition
     property string loss
 
@@ -55,6 +57,11 @@ Item {
         id: column
         width: parent.width
 
+        PageLinks {
+            x: Theme.inset(parent.width) - Theme.margin
+            width: parent.width - 2 * x
+            navigation: footer.navigation
+        }
         Line {
             topPadding: Theme.padding
             text: footer.source
@@ -62,6 +69,9 @@ Item {
         Line {
             text: footer.condition
             color: Theme.value
+        }
+        Line {
+            text: footer.flow
         }
         Line {
             text: footer.loss

@@ -22,9 +22,52 @@ Window {
     }
 
     ScreenStack {
-        anchors.fill: parent
-        focus: true
+        id: stack
+        anchors {
+            top: parent.top
+            left: parent.left
+            right: parent.right
+            bottom: playback.top
+        }
+        focus: !sheet.opened
         navigation: navigation
         source: window.source
+    }
+    Loader {
+        id: playback
+        anchors {
+            left: parent.left
+            right: parent.right
+            bottom: parent.bottom
+        }
+        height: (item as Item)?.implicitHeight ?? 0
+        active: (navigation.pages?.playback.opening ?? false) || (navigation.pages?.playback.opened ?? false)
+        // qmllint disable unqualified
+        sourceComponent: PlaybackBar {
+            playback: navigation.pages.playback
+        }
+        // qmllint enable unqualified
+    }
+    Loader {
+        id: sheet
+
+        readonly property bool opened: navigation.pages?.sheet.opened ?? false
+
+        anchors.fill: parent
+        // Made with the first field that is asked for, and kept.
+        active: false
+        focus: opened
+        onOpenedChanged: {
+            if (opened)
+                active = true;
+            else
+                stack.forceActiveFocus();
+        }
+        // qmllint disable unqualified
+        sourceComponent: FieldSheet {
+            sheet: navigation.pages.sheet
+            focus: true
+        }
+        // qmllint enable unqualified
     }
 }

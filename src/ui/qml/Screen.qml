@@ -12,7 +12,8 @@ FocusScope {
     required property bool isFirst
     property bool atTop: true
     default property alias content: content.data
-    property alias actions: bar.actions
+    // Whether a recording may begin here: a category's title needs the room.
+    property bool mayRecord: true
 
     Accessible.role: Accessible.Pane
     Accessible.name: title
@@ -59,8 +60,14 @@ FocusScope {
         title: screen.title
         subtitle: screen.subtitle
         previousTitle: screen.previousTitle
+        sourceState: screen.navigation.pages.freshness.bar
         hasBack: !screen.isFirst
         hairline: !screen.atTop
         onBack: screen.navigation.back()
+
+        RecordActions {
+            recorder: screen.navigation.pages.recorder
+            mayBegin: screen.mayRecord
+        }
     }
 }

@@ -13,6 +13,12 @@ FocusScope {
     property real position: 0
     property int shown: -1
     readonly property bool moving: slide.running || edge.active
+    // The same as in a terminal.
+    readonly property var pageKeys: ({
+        [Qt.Key_S]: "signals",
+        [Qt.Key_H]: "happenings",
+        [Qt.Key_R]: "recordings"
+    })
     // What shows each kind of screen, loaded when the first of its kind comes.
     readonly property var faces: ({
         table: "TableScreen.qml",
@@ -51,6 +57,11 @@ FocusScope {
         if (isBack && target > 0) {
             event.accepted = true;
             navigation.back();
+        }
+        const page = pageKeys[event.key];
+        if (page !== undefined && event.modifiers === Qt.NoModifier) {
+            event.accepted = true;
+            navigation.open(page);
         }
     }
 

@@ -10,6 +10,8 @@ Screen {
 
     atTop: list.atTop
 
+    mayRecord: isFirst
+
     TableList {
         id: list
         anchors.fill: parent
@@ -17,6 +19,7 @@ Screen {
         storyboard: screen.navigation.storyboard
         focus: true
         visible: !emptyText.visible
+        header: screen.isFirst ? firstHeader : null
         footer: screen.isFirst ? firstFooter : null
     }
     EmptyText {
@@ -32,14 +35,27 @@ Screen {
         hasRows: screen.table.count > 0
     }
     Component {
+        id: firstHeader
+
+        // qmllint disable unqualified
+        NowView {
+            width: list.width
+            now: screen.navigation.pages.now
+            onTapped: screen.navigation.open("signals")
+        }
+        // qmllint enable unqualified
+    }
+    Component {
         id: firstFooter
 
         // qmllint disable unqualified
         FirstScreenFooter {
             width: list.width
-            source: screen.source
+            navigation: screen.navigation
+            source: screen.navigation.pages.freshness.source || screen.source
+            flow: screen.navigation.pages.freshness.state
             condition: screen.navigation.condition
-            loss: screen.navigation.loss
+            loss: screen.navigation.loss || screen.navigation.pages.freshness.loss
         }
         // qmllint enable unqualified
     }

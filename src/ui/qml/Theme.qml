@@ -22,6 +22,8 @@ QtObject {
     readonly property color fair: dark ? "#F0C75E" : "#7A5B00"
     readonly property color poor: dark ? "#FF9A9A" : "#A3121F"
 
+    // Over what lies behind something that asks for all attention.
+    readonly property color shade: Qt.alpha("#000000", 0.45)
     // The accent laid thinly over a row.
     readonly property color pressTint: Qt.alpha(accent, 0.12)
 
@@ -30,6 +32,9 @@ QtObject {
     readonly property real valueSize: 12.75 * Appearance.textScale
     readonly property real nameSize: 10.5 * Appearance.textScale
     readonly property real headerSize: 9.75 * Appearance.textScale
+    readonly property real axisSize: 8.25 * Appearance.textScale
+    // Read from an arm's length.
+    readonly property real figureSize: 34 * Appearance.textScale
     readonly property string fixedFamily: Appearance.fixedFamily
 
     readonly property int margin: 16
@@ -38,6 +43,7 @@ QtObject {
     // Lines longer than that are hard to follow on a desktop.
     readonly property int contentWidth: 640
     readonly property int hairline: 1
+    readonly property real chartHeight: Math.round(150 + 40 * (Appearance.textScale - 1))
 
     readonly property int pressMs: 80
     // A second tap so soon after a screen came was meant for the screen before.
@@ -48,6 +54,10 @@ QtObject {
     // From the left edge of something so wide to where its content begins, and to where it ends.
     function inset(width: real): real {
         return margin + Math.max(0, Math.round((width - contentWidth) / 2));
+    }
+
+    function qualityColor(grade: string): color {
+        return grade === "good" ? good : grade === "fair" ? fair : grade === "poor" ? poor : secondary;
     }
 
     // A long name may break after each of its underscores.

@@ -57,6 +57,11 @@ void Navigation::componentComplete() {
   if (!first) fatalError("the interface description names no first screen");
   first->setTitle(_storyboard->initialTitle.toStdString());
   _controller = std::make_shared<RootNavigationController>(first);
+  _pages = new Pages(this);
+  emit pagesChanged();
+  connect(this, &Navigation::depthChanged, _pages,
+          [this] { _pages->setInSight(_depth == 1 ? QStringLiteral("first") : topKind()); });
+  connect(_pages, &Pages::momentChanged, this, &Navigation::drawAnew);
   _controller->setObserver([this] { stackChanged(); });
   stackChanged();
   // Its commands wait for the service, and the window has yet to be shown.
@@ -141,7 +146,22 @@ void Navigation::settle() {
 }
 
 void Navigation::follow(const TableModel* table, IndexPath indexPath) {
-  if (table == top()) followRow(*_controller, *_storyboard, indexPath);
+  if (table != top() || followRow(*_controller, *_storyboard, indexPath)) return;
+  const auto category =
+      std::dynamic_pointer_cast<SecondLevelViewController>(_controller->topViewController());
+  if (!category || !category->tableView()) return;
+  const TableViewCell* cell = category->tableView()->cellForRowAtIndexPath(indexPath);
+  if (!cell || !cell->textLabel) return;
+  _pages->sheet()->open({category->firstSelection.value_or(""),
+                         category->seguedThroughRow.value_or(""), indexPath.section, indexPath.row,
+                         cell->textLabel->text.value_or("")});
+}
+
+// At another moment of a recording the store holds other values.
+void Navigation::drawAnew() {
+  const auto table =
+      std::dynamic_pointer_cast<TableViewController>(_controller->topViewController());
+  if (table && table->tableView()) table->tableView()->reloadData();
 }
 
 void Navigation::stackChanged() {

@@ -9,6 +9,7 @@
 
 #include "ui/quick/InterfaceDescription.h"
 #include "ui/quick/TableModel.h"
+#include "ui/quick/pages/Pages.h"
 #include "ui/screens/RootNavigationController.h"
 
 namespace qel {
@@ -24,6 +25,7 @@ class Navigation : public QAbstractListModel, public QQmlParserStatus {
   Q_PROPERTY(int depth READ depth NOTIFY depthChanged)
   Q_PROPERTY(qel::TableModel* top READ top NOTIFY depthChanged)
   Q_PROPERTY(QString topKind READ topKind NOTIFY depthChanged)
+  Q_PROPERTY(qel::Pages* pages READ pages NOTIFY pagesChanged)
   Q_PROPERTY(QString notice READ notice WRITE setNotice NOTIFY noticeChanged)
   Q_PROPERTY(QString loss READ loss WRITE setLoss NOTIFY lossChanged)
   Q_PROPERTY(QString condition READ condition WRITE setCondition NOTIFY conditionChanged)
@@ -52,6 +54,9 @@ class Navigation : public QAbstractListModel, public QQmlParserStatus {
   // "table", or which page is in sight.
   QString topKind() const;
 
+  // What the pages show; null until the interface description is read.
+  Pages* pages() const { return _pages; }
+
   // A line for the reader under the title of every screen; empty: none.
   QString notice() const { return _notice; }
   void setNotice(const QString& notice);
@@ -72,12 +77,14 @@ class Navigation : public QAbstractListModel, public QQmlParserStatus {
  signals:
   void storyboardChanged();
   void depthChanged();
+  void pagesChanged();
   void noticeChanged();
   void lossChanged();
   void conditionChanged();
 
  private:
   void follow(const TableModel* table, IndexPath indexPath);
+  void drawAnew();
   void stackChanged();
   void show(const std::shared_ptr<ViewController>& controller);
 
@@ -92,6 +99,7 @@ class Navigation : public QAbstractListModel, public QQmlParserStatus {
   };
   std::vector<Screen> _screens;
   int _depth = 0;
+  Pages* _pages = nullptr;  // a child
   QString _notice;
   QString _loss;
   QString _condition;

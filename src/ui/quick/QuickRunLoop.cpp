@@ -52,6 +52,7 @@ QuickRunLoop::~QuickRunLoop() {
 
 void QuickRunLoop::customEvent(QEvent* /*event*/) {
   if (MainQueue::shared().drain(kBurst)) _doorbell->ring();
+  emit worked();
 }
 
 void QuickRunLoop::arm() {

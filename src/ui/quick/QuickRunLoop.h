@@ -10,9 +10,15 @@ namespace qel {
 // One, made in the GUI thread after the application object and gone before it. Work posted from
 // any thread is done in the GUI thread, in bursts short enough to keep the window alive.
 class QuickRunLoop final : public QObject {
+  Q_OBJECT
+
  public:
   QuickRunLoop();
   ~QuickRunLoop() override;
+
+ signals:
+  // Work of the main queue was done.
+  void worked();
 
  protected:
   void customEvent(QEvent* event) override;

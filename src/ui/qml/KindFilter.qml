@@ -1,0 +1,72 @@
+import QtQuick
+import Qelwatch.Ui
+
+// The kinds of happenings, of which any may be chosen; none chosen shows them all.
+ListView {
+    id: filter
+
+    required property HappeningsModel happenings
+
+    implicitHeight: Math.max(Theme.touch, Math.round(metrics.height) + 2 * Theme.padding)
+    orientation: ListView.Horizontal
+    boundsBehavior: Flickable.StopAtBounds
+    leftMargin: Theme.inset(width) - 8
+    rightMargin: leftMargin
+    spacing: 4
+    clip: true
+    model: happenings.kinds
+    Accessible.role: Accessible.List
+    Accessible.name: qsTr("Kinds to show")
+
+    TextMetrics {
+        id: metrics
+        text: "Hg"
+        font.pointSize: Theme.nameSize
+    }
+
+    // qmllint disable unqualified
+    delegate: Tappable {
+        id: choice
+
+        required property var row
+        readonly property bool chosen: filter.happenings.filtered && row.shown
+
+        width: Math.ceil(label.implicitWidth) + 24
+        height: filter.implicitHeight
+        text: row.name
+        activeFocusOnTab: true
+        onTapped: filter.happenings.toggle(row.kind)
+
+        Accessible.role: Accessible.CheckBox
+        Accessible.name: qsTr("%1, %2").arg(row.name).arg(row.count)
+        Accessible.checkable: true
+        Accessible.checked: chosen
+
+        Rectangle {
+            anchors {
+                fill: parent
+                topMargin: 8
+                bottomMargin: 8
+            }
+            radius: height / 2
+            color: choice.chosen ? Theme.accent : "transparent"
+            border {
+                width: 1
+                color: choice.chosen ? Theme.accent : Theme.separator
+            }
+        }
+        Text {
+            id: label
+            anchors.centerIn: parent
+            text: choice.row.name + " " + choice.row.count
+            textFormat: Text.PlainText
+            color: choice.chosen ? Theme.page : Theme.value
+            font.pointSize: Theme.nameSize
+            Accessible.ignored: true
+        }
+        FocusRing {
+            visible: choice.activeFocus && Appearance.keyboardInUse
+        }
+    }
+    // qmllint enable unqualified
+}

@@ -1,0 +1,82 @@
+import QtQuick
+import Qelwatch.Ui
+
+// The value large, its curve, and what is known of it in pairs.
+Column {
+    id: content
+
+    required property SheetModel sheet
+
+    spacing: Theme.padding
+
+    Text {
+        width: parent.width
+        text: content.sheet.label
+        textFormat: Text.PlainText
+        color: Theme.value
+        font.pointSize: Theme.titleSize
+        font.weight: Font.DemiBold
+        wrapMode: Text.Wrap
+        Accessible.role: Accessible.Heading
+        Accessible.name: text
+    }
+    Text {
+        width: parent.width
+        text: Theme.breakable(content.sheet.key + "  \u00B7  " + content.sheet.place)
+        textFormat: Text.PlainText
+        color: Theme.secondary
+        font.pointSize: Theme.headerSize
+        wrapMode: Text.Wrap
+    }
+    Flow {
+        width: parent.width
+        spacing: 8
+
+        Text {
+            width: Math.min(implicitWidth, parent.width)
+            text: Theme.breakable(content.sheet.value === "" ? "\u2013" : content.sheet.value)
+            textFormat: Text.PlainText
+            color: Theme.value
+            font.family: Theme.fixedFamily
+            font.pointSize: Theme.titleSize * 1.4
+            wrapMode: Text.Wrap
+        }
+        Text {
+            visible: text !== ""
+            text: content.sheet.unit
+            textFormat: Text.PlainText
+            color: Theme.secondary
+            font.pointSize: Theme.valueSize
+        }
+        Text {
+            visible: text !== ""
+            text: content.sheet.word
+            textFormat: Text.PlainText
+            color: Theme.qualityColor(text)
+            font.pointSize: Theme.valueSize
+            font.weight: Font.DemiBold
+        }
+    }
+    SheetCurve {
+        width: parent.width
+        height: visible ? 56 : 0
+        visible: content.sheet.hasCurve
+        sheet: content.sheet
+        color: Theme.accent
+    }
+    Repeater {
+        model: content.sheet.lines
+
+        // qmllint disable unqualified
+        FieldTexts {
+            required property var row
+
+            width: content.width
+            name: row.label
+            value: row.value
+            Accessible.role: Accessible.ListItem
+            Accessible.name: row.label + ": " + row.value
+        }
+        // qmllint enable unqualified
+    }
+}

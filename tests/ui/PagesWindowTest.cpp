@@ -1,0 +1,200 @@
+// The pages beside the tables, as a finger and a keyboard meet them.
+
+#include <gtest/gtest.h>
+
+#include <QtCore/QElapsedTimer>
+#include <QtGui/QClipboard>
+#include <QtGui/QGuiApplication>
+#include <QtTest/QTest>
+
+#include "messages/lte_rrc.h"
+#include "messages/lte_serving.h"
+#include "ui/Window.h"
+
+namespace qel {
+namespace {
+
+using testing::Window;
+
+template <typename Message>
+void report(std::int64_t identifier, const Message& message) {
+  MetricValidator::shared()->processMetric(
+      {{"kKeyMetricID", identifier}, {"kKeyPayload", message.data()}});
+}
+
+void reportCell(std::uint32_t pci) {
+  KCellularLteScellInfo info;
+  info.setPhyCellId(pci);
+  info.setDlFreq(1300);
+  info.setFreqBandInd(3);
+  info.setNumMncDigits(2);
+  info.setSelPlmnMcc(1);
+  info.setSelPlmnMnc(1);
+  report(MetricValidator::K_LTE_SCELL_INFO, info);
+}
+
+void reportLevel(std::int32_t rsrpDbm) {
+  auto average = std::make_shared<RsrpRsrqSinr>();
+  average->setRsrp0(rsrpDbm);
+  average->setRsrq0(-9);
+  average->setSinr0(20);
+  KCellularLteRsrpRsrqSinr signal;
+  signal.setAvgValues(average);
+  report(MetricValidator::K_LTE_RSRP_RSRQ_SINR, signal);
+}
+
+// What was reported is seen a moment later.
+bool comesToShow(const Window& window, const std::string& text) {
+  window.navigation().pages()->look();
+  return QTest::qWaitFor([&] {
+    window.settle();
+    return window.shows(text);
+  });
+}
+
+TEST(PagesInTheWindow, theFirstScreenShowsTheCellAndItsLevel) {
+  const Window window;
+  reportCell(123);
+  reportLevel(-86);
+  EXPECT_TRUE(comesToShow(window, "-86"));
+  EXPECT_TRUE(window.shows("good"));
+  EXPECT_TRUE(window.shows("PCI 123, EARFCN 1300"));
+  EXPECT_TRUE(window.shows("LTE 3"));
+  EXPECT_EQ(window.warnings(), 0);
+}
+
+TEST(PagesInTheWindow, aTapOnTheLevelOpensItsCurves) {
+  const Window window;
+  reportCell(123);
+  reportLevel(-86);
+  ASSERT_TRUE(comesToShow(window, "-86"));
+  ASSERT_TRUE(window.tap("-86"));
+  EXPECT_EQ(window.navigation().topKind(), "signals");
+  EXPECT_TRUE(window.shows("LTE RSRP"));
+  EXPECT_EQ(window.warnings(), 0);
+}
+
+TEST(PagesInTheWindow, everyPageHasAKeyAndAWord) {
+  const Window window;
+  const std::vector<std::tuple<Qt::Key, const char*, const char*>> pages = {
+      {Qt::Key_S, "Signals", "signals"},
+      {Qt::Key_H, "Happenings", "happenings"},
+      {Qt::Key_R, "Recordings", "recordings"}};
+  for (const auto& [key, word, kind] : pages) {
+    window.press(key);
+    EXPECT_EQ(window.navigation().topKind(), kind);
+    EXPECT_TRUE(window.shows(word));
+    window.press(Qt::Key_Escape);
+    EXPECT_EQ(window.navigation().depth(), 1);
+    ASSERT_TRUE(window.tap(word));
+    EXPECT_EQ(window.navigation().topKind(), kind);
+    window.press(Qt::Key_Escape);
+  }
+  EXPECT_EQ(window.warnings(), 0);
+}
+
+TEST(PagesInTheWindow, aPageThatIsOnTheStackIsGoneBackTo) {
+  const Window window;
+  window.press(Qt::Key_S);
+  window.press(Qt::Key_H);
+  EXPECT_EQ(window.navigation().depth(), 3);
+  window.press(Qt::Key_S);
+  EXPECT_EQ(window.navigation().depth(), 2);
+  EXPECT_EQ(window.navigation().topKind(), "signals");
+  window.navigation().open("nonsense");
+  EXPECT_EQ(window.navigation().depth(), 2);
+}
+
+TEST(PagesInTheWindow, happeningsAreFilteredByKind) {
+  const Window window;
+  reportCell(123);
+  KCellularLteRrcState state;
+  state.setState(3);
+  report(MetricValidator::K_LTE_RRC_STATE, state);
+  window.press(Qt::Key_H);
+  RowsModel* rows = window.navigation().pages()->happenings()->rows();
+  const int all = rows->count();
+  ASSERT_GE(all, 2);
+  EXPECT_TRUE(window.shows("Today"));
+  window.navigation().pages()->happenings()->toggle("cell");
+  EXPECT_EQ(rows->count(), 1);
+  window.navigation().pages()->happenings()->toggle("cell");
+  EXPECT_EQ(rows->count(), all);
+  EXPECT_EQ(window.warnings(), 0);
+}
+
+// An instrument on a battery: whoever looks at curves while nothing comes pays nothing.
+TEST(PagesInTheWindow, whileNothingComesNothingIsDrawn) {
+  const Window window;
+  reportCell(123);
+  reportLevel(-86);
+  window.press(Qt::Key_S);
+  ASSERT_TRUE(comesToShow(window, "LTE RSRP"));
+  QTest::qWait(700);
+  int frames = 0;
+  QObject::connect(&window.window(), &QQuickWindow::frameSwapped, [&frames] { ++frames; });
+  QTest::qWait(1500);
+  EXPECT_EQ(frames, 0);
+  reportLevel(-90);
+  window.navigation().pages()->look();
+  EXPECT_TRUE(QTest::qWaitFor([&frames] { return frames > 0; })) << "what comes is drawn";
+}
+
+TEST(PagesInTheWindow, curvesAreReadOffWithKeys) {
+  const Window window;
+  reportCell(123);
+  reportLevel(-86);
+  window.press(Qt::Key_S);
+  ASSERT_TRUE(comesToShow(window, "LTE RSRP"));
+  SignalsModel* curves = window.navigation().pages()->curves();
+  curves->readPrevious(0);
+  ASSERT_FALSE(curves->readOff().toMap().isEmpty());
+  EXPECT_EQ(curves->readOff().toMap()["values"].toList().first().toMap()["text"], "-86 dBm");
+  EXPECT_TRUE(curves->canZoomIn());
+  const auto before = curves->range().spanMs;
+  window.press(Qt::Key_Plus);
+  EXPECT_LT(curves->range().spanMs, before);
+  curves->stopReading();
+  EXPECT_TRUE(curves->readOff().toMap().isEmpty());
+}
+
+TEST(PagesInTheWindow, aTapOnAFieldOpensItsSheetAndEscapeClosesIt) {
+  const Window window;
+  reportCell(123);
+  ASSERT_TRUE(window.open("LTE", "Serving Cell Info"));
+  window.tap(*window.row(0));
+  const SheetModel* sheet = window.navigation().pages()->sheet();
+  ASSERT_TRUE(sheet->isOpen());
+  window.settle();
+  EXPECT_TRUE(window.shows(sheet->label().toStdString()));
+  sheet->copy();
+  EXPECT_TRUE(QGuiApplication::clipboard()->text().contains(sheet->label()));
+  window.press(Qt::Key_Escape);
+  EXPECT_FALSE(sheet->isOpen());
+  EXPECT_EQ(window.navigation().depth(), 3) << "the table stays";
+  window.press(Qt::Key_Escape);
+  EXPECT_EQ(window.navigation().depth(), 2);
+  EXPECT_EQ(window.warnings(), 0);
+}
+
+TEST(PagesInTheWindow, aRowThatIsNoFieldOpensNoSheet) {
+  const Window window;
+  ASSERT_TRUE(window.open("LTE", "EUTRA Neighbor Info"));
+  window.tap(*window.row(0));
+  EXPECT_FALSE(window.navigation().pages()->sheet()->isOpen());
+}
+
+TEST(PagesInTheWindow, theBarSaysThatNothingComes) {
+  const Window window;
+  Feed feed;
+  window.navigation().pages()->setFeed(feed);
+  window.settle();
+  EXPECT_TRUE(window.shows("Connected, no reports yet"));
+  feed.reach = Feed::Reach::notInstalled;
+  window.navigation().pages()->setFeed(feed);
+  window.settle();
+  EXPECT_TRUE(window.shows("Baseband manager: not installed"));
+}
+
+}  // namespace
+}  // namespace qel
