@@ -87,7 +87,10 @@ std::string durationText(std::uint64_t ms) {
 
 struct History::State {
   explicit State(const Limits& limits)
-      : happenings(limits.mostHappenings), radio(limits.mostHappenings), journal(limits.journal) {
+      : mostNeighbourReports(limits.mostNeighbourReports),
+        happenings(limits.mostHappenings),
+        radio(limits.mostHappenings),
+        journal(limits.journal) {
     for (Series& one : series) one = Series(limits.series);
     for (const DispatchRow& row : dispatchTable()) journal.know(row);
     journal.know(lteServingMeasurementRow());
@@ -106,6 +109,16 @@ struct History::State {
   }
   void plot(std::size_t place, const Dictionary& record, std::uint64_t atMs);
 
+  struct Measured {
+    std::uint64_t version;
+    std::uint64_t fromMs;
+    std::uint64_t toMs;
+    std::vector<Neighbour> cells;
+  };
+  const std::vector<Neighbour>& measured(std::uint64_t fromMs, std::uint64_t toMs);
+
+  const std::size_t mostNeighbourReports;
+  std::optional<Measured> neighbours;  // of the times asked for last
   const DispatchRow* const rows = dispatchTable().data();
   const Ways ways = waysOf(dispatchTable());
   std::uint64_t version = 0;
@@ -268,20 +281,36 @@ std::vector<Neighbour> History::neighbours(std::uint64_t atMs) const {
   return cells;
 }
 
-std::vector<Run> History::levels(const Neighbour& cell, std::uint64_t fromMs,
-                                 std::uint64_t toMs) const {
-  Series levels({.recentMs = kLatest, .mostRecent = ~std::size_t{0}});
+// The neighbours of all reports within both times, oldest first of each metric. Curves of several
+// of them are asked for in a row.
+const std::vector<Neighbour>& History::State::measured(std::uint64_t fromMs, std::uint64_t toMs) {
+  if (neighbours && neighbours->version == version && neighbours->fromMs == fromMs &&
+      neighbours->toMs == toMs) {
+    return neighbours->cells;
+  }
+  neighbours = Measured{version, fromMs, toMs, {}};
   for (const Technology technology : {Technology::lte, Technology::umts, Technology::gsm}) {
     for (const std::int64_t metric : neighbourMetrics(technology)) {
-      for (const JournalEntry& report : _state->journal.of(metric, fromMs, toMs)) {
-        for (const Neighbour& named : neighboursIn(report)) {
-          if (named.isSameCellAs(cell) && named.levelDbm) {
-            levels.add(named.timeMs, *named.levelDbm);
-          }
-        }
+      const auto reports = journal.of(metric, fromMs, toMs);
+      const std::size_t skipped = reports.size() - std::min(reports.size(), mostNeighbourReports);
+      for (std::size_t i = skipped; i < reports.size(); ++i) {
+        const auto named = neighboursIn(reports[i]);
+        neighbours->cells.insert(neighbours->cells.end(), named.begin(), named.end());
       }
     }
   }
+  return neighbours->cells;
+}
+
+std::vector<Run> History::levels(const Neighbour& cell, std::uint64_t fromMs,
+                                 std::uint64_t toMs) const {
+  std::vector<Neighbour> measured;
+  for (const Neighbour& named : _state->measured(fromMs, toMs)) {
+    if (named.isSameCellAs(cell) && named.levelDbm) measured.push_back(named);
+  }
+  std::ranges::stable_sort(measured, {}, &Neighbour::timeMs);
+  Series levels({.recentMs = kLatest, .mostRecent = ~std::size_t{0}});
+  for (const Neighbour& one : measured) levels.add(one.timeMs, *one.levelDbm);
   return levels.between(fromMs, toMs);
 }
 

@@ -41,8 +41,9 @@ class History final : public MetricObserver {
   struct Limits {
     Series::Limits series;
     Journal::Limits journal;
-    std::size_t mostHappenings = 10000;         // beyond them the oldest go
-    std::size_t mostNeighbourReports = 20'000;  // that curves of neighbours are made of
+    std::size_t mostHappenings = 10000;  // beyond them the oldest go
+    // Of a metric, that curves of neighbours are made of: the newest of the time asked for.
+    std::size_t mostNeighbourReports = 20'000;
   };
 
   History();

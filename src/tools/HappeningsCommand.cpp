@@ -1,7 +1,9 @@
-// qelctl happenings: what happened in a recording, as it happened.
+// qelctl happenings: what happened in a recording, or happens now.
 
 #include <CLI/CLI.hpp>
+#include <algorithm>
 #include <cstdint>
+#include <cstdlib>
 #include <memory>
 #include <optional>
 #include <string>
@@ -10,16 +12,22 @@
 #include "base/Rendering.h"
 #include "base/TerminalText.h"
 #include "base/TimeZone.h"
+#include "feed/FeedBook.h"
 #include "history/History.h"
+#include "metrics/MetricValidator.h"
 #include "tools/Commands.h"
 #include "tools/HappeningJson.h"
+#include "tools/LiveConnection.h"
 #include "tools/RecordingFeed.h"
+#include "tools/Service.h"
+#include "tools/ToolError.h"
 
 namespace qel::tools {
 namespace {
 
 struct Options {
   RecordingOptions recording;
+  std::string bus = "system";
   std::string kind;  // empty: all
   bool json = false;
 };
@@ -77,8 +85,7 @@ class Printer {
   std::uint64_t _next = 0;  // number of the first one that is not printed
 };
 
-void run(const Options& options, Output& output) {
-  setStandardOutput(nullptr);
+void readRecording(const Options& options, Output& output) {
   History history(kHappeningsAlone);
   Printer printer(options, output);
   feedRecording(options.recording, history, [&] {
@@ -87,12 +94,48 @@ void run(const Options& options, Output& output) {
   });
 }
 
+void followLive(const Options& options, Output& output) {
+  MainLoop loop;
+  loop.watchStandardOutput();
+  findResources();
+  configurationFile();
+  output.goOnWithoutReader();
+  auto& history = *new History(kHappeningsAlone);  // the connection outlives this function
+  const auto book = std::make_shared<FeedBook>("", options.bus);
+  book->setHistory(&history);
+  connectToService({.bus = options.bus,
+                    .say = [](const std::string& text) { complain("qelctl", text); },
+                    .reachability = book->reachability(),
+                    .condition = book->condition()},
+                   loop);
+  MetricValidator::shared()->setObserver(&history);  // no event has been taken yet
+  Printer printer(options, output);
+  while (loop.runOnce(output.flushWhenDue())) printer.printNew(history);
+  output.flush();
+  // The viewer's connection is never released; its threads must not see the process taken apart.
+  std::_Exit(EX_OK);
+}
+
+void run(const Options& options, Output& output) {
+  setStandardOutput(nullptr);
+  if (options.recording.file.empty()) {
+    followLive(options, output);
+  } else {
+    readRecording(options, output);
+  }
+}
+
 }  // namespace
 
 void addHappeningsCommand(CLI::App& app, Action& chosen) {
-  auto* command = app.add_subcommand("happenings", "Print what happened in a recording");
+  auto* command =
+      app.add_subcommand("happenings", "Print what happened in a recording, or what happens");
+  command->footer("Without FILE it follows the service until SIGINT or SIGTERM.");
   const auto options = std::make_shared<Options>();
   addRecordingOptions(*command, options->recording);
+  auto* file = command->get_option("FILE")->required(false);
+  addBusOption(*command, options->bus);
+  command->get_option("--bus")->excludes(file);
   command->add_flag("--json", options->json, "As JSON, one object a line");
   command->add_option("--kind", options->kind, "Those of one kind only")
       ->type_name("KIND")
