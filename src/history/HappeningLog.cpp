@@ -5,6 +5,7 @@
 #include <utility>
 
 #include "base/Rendering.h"
+#include "base/Utf8.h"
 #include "history/Words.h"
 
 namespace qel {
@@ -37,7 +38,7 @@ std::string orNothing(const Value& value) { return value.isNull() ? "" : qel::ce
 // By numbers and name alone: an address is nobody's business.
 std::string bearerText(const ToldEntry& entry) {
   std::string text;
-  append(text, "", std::string(entry.name.view()));
+  append(text, "", withReplacements(entry.name.view()));
   append(text, "", wordsOf(entry.type.isNull() ? nullptr : &entry.type, "type"));
   if (entry.name.view().empty()) append(text, "number ", orNothing(entry.numbers[0]));
   return (entry.hasCome ? "Connection up" : "Connection down") + text;

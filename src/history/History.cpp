@@ -101,7 +101,8 @@ struct History::State {
     ++version;
     return latestMs = std::max(latestMs, receivedMs);
   }
-  void addGap(std::uint64_t silenceMs, std::uint64_t receivedMs, std::uint64_t atMs);
+  // Before the report that ends it.
+  void addGap(std::uint64_t silenceMs, const Report& report);
   void follow(const Report& report, Handling handling);
   // Apart from what is done for every report, of which there are many.
   [[gnu::noinline]] void follow(const StoredMetric& metric, std::uint64_t atMs, Handling handling) {
@@ -133,12 +134,9 @@ struct History::State {
   std::array<Series, kQuantities.size()> series;
 };
 
-void History::State::addGap(std::uint64_t silenceMs, std::uint64_t receivedMs, std::uint64_t atMs) {
-  Happening happening;
-  happening.timeMs = receivedMs;
-  happening.kind = HappeningKind::gap;
-  happening.text = "Nothing was reported for " + durationText(silenceMs);
-  happenings.add(std::move(happening), atMs);
+void History::State::addGap(std::uint64_t silenceMs, const Report& report) {
+  happenings.tellText(report, HappeningKind::gap, std::nullopt,
+                      "Nothing was reported for " + durationText(silenceMs));
   for (Series& one : series) one.interrupt();
 }
 
@@ -183,7 +181,7 @@ void History::metricWasStored(const StoredMetric& metric) {
   const auto number = static_cast<std::size_t>(&metric.row - state.rows);
   const std::uint64_t silenceMs = state.times.note(number, atMs);
   if (silenceMs != 0) [[unlikely]]
-    state.addGap(silenceMs, metric.receivedMs, atMs);
+    state.addGap(silenceMs, {metric.row.identifier, metric.record, metric.receivedMs, atMs});
   state.journal.add(number, atMs, metric.payload);
   const Way way = state.ways.data()[number];
   if (way.serving != Way::kNone) state.plot(way.serving, metric.record, atMs);
@@ -193,23 +191,22 @@ void History::metricWasStored(const StoredMetric& metric) {
 void History::metricWasPassedOver(const PassedMetric& metric) {
   State& state = *_state;
   const std::uint64_t atMs = state.arrive(metric.receivedMs);
+  std::optional<Dictionary> record;
+  if (metric.identifier == kLteServingMeasurement) {
+    record = lteServingMeasurementRow().describe(metric.payload);
+  }
+  const std::size_t number = dispatchTable().size();
+  static const Dictionary kNothing;
+  const Report report = {metric.identifier, kNothing, metric.receivedMs, atMs};
+  const std::uint64_t silenceMs =
+      record ? state.times.note(number, atMs) : state.times.noteOther(atMs);
+  if (silenceMs != 0) state.addGap(silenceMs, report);
   if (metric.identifier == kLteLinkFailure) {
-    state.times.noteOther(atMs);
-    static const Dictionary kNothing;
-    state.radio.followLinkFailure({metric.identifier, kNothing, metric.receivedMs, atMs},
-                                  state.happenings);
-  } else if (metric.identifier == kLteServingMeasurement) {
-    const DispatchRow& row = lteServingMeasurementRow();
-    const auto record = row.describe(metric.payload);
-    if (!record) return;
-    const std::size_t number = dispatchTable().size();
-    const std::uint64_t silenceMs = state.times.note(number, atMs);
-    if (silenceMs != 0) state.addGap(silenceMs, metric.receivedMs, atMs);
+    state.radio.followLinkFailure(report, state.happenings);
+  } else if (record) {
     state.journal.add(number, atMs, metric.payload);
     static const std::size_t kPlace = *ServingReader::placeOf(kLteServingMeasurement);
     state.plot(kPlace, *record, atMs);
-  } else {
-    state.times.noteOther(atMs);
   }
 }
 

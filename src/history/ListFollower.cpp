@@ -7,8 +7,14 @@
 namespace qel {
 namespace {
 
-// An access point's name is no longer (23.003, clause 9).
-constexpr std::size_t kMostCharacters = 100;
+// At most as much as an access point's name has (23.003, clause 9), and no part of a character.
+std::string_view shortened(std::string_view name) {
+  constexpr std::size_t kMostBytes = 100;
+  if (name.size() <= kMostBytes) return name;
+  std::size_t end = kMostBytes;
+  while (end > 0 && (static_cast<unsigned char>(name[end]) & 0xC0U) == 0x80U) --end;
+  return name.substr(0, end);
+}
 
 Value numberIn(const Dictionary& entry, KnownPlace& place) {
   const Value* value = place.in(entry);
@@ -38,7 +44,7 @@ void ListFollower::read(Followed& followed, const Dictionary& record) {
       told.numbers[i] = numberIn(*entry, followed.numbers[i]);
     }
     const Value* name = followed.name.in(*entry);
-    if (name) told.name = name->asText().value_or("").substr(0, kMostCharacters);
+    if (name) told.name = shortened(name->asText().value_or(""));
     if (const Value* type = followed.type.in(*entry)) told.type = *type;
   }
 }

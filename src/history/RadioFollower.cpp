@@ -80,7 +80,7 @@ void RadioFollower::leave(Technology technology, const Report& report) {
 }
 
 void RadioFollower::followCell(const Report& report, HappeningLog& log) {
-  const auto cell = _cells.read(report.metric, report.record);
+  auto cell = _cells.read(report.metric, report.record);
   if (!cell) return;
   use(cell->technology, report, log);
   if (_linkFailedMs && report.atMs - *_linkFailedMs > kAfterFailureMs) _linkFailedMs.reset();
@@ -89,8 +89,10 @@ void RadioFollower::followCell(const Report& report, HappeningLog& log) {
   if (!_lastCell || !_lastCell->isSameCellAs(*cell)) {
     const CellMove move = moveTo(*cell, before);
     log.tell<ToldCell>(report, HappeningKind::cell, cell->technology, _lastCell, *cell, move);
-    _lastCell = cell;
+  } else {
+    cell->fillFrom(*_lastCell);
   }
+  _lastCell = cell;
   const auto* known = _servingCell.newest();
   if (!known || *known != cell) _servingCell.set(report.atMs, cell);
 }
@@ -120,7 +122,8 @@ void RadioFollower::followState(const StateChange& change, const Report& report,
   using Channel = StateFacts::Channel;
   if (!change.state) return;
   const StateFacts& facts = change.facts;
-  const bool isFirst = !_lastTechnology && facts.use != Use::left;
+  // Of a phone of which nothing is known, being idle there is something.
+  const bool isFirst = !_lastTechnology && facts.channel == Channel::none;
   if (facts.use == Use::inUse || isFirst) use(change.technology, report, log);
   Rrc& known = rrcOf(change.technology);
   Value cause = change.cause ? *change.cause : Value();

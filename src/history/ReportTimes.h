@@ -18,15 +18,17 @@ class ReportTimes {
   // all had been silent, if that was longer than three periods of a regular one and five seconds;
   // else 0.
   std::uint64_t note(std::size_t number, std::uint64_t atMs) {
-    const std::uint64_t silenceMs = atMs - _lastMs;
-    const bool isGap = silenceMs > kShortestGapMs && isTooLong(silenceMs);
-    _lastMs = atMs;
+    const std::uint64_t silenceMs = noteOther(atMs);
     Metric& metric = _metrics.data()[number];
     if (atMs - metric.lastMs >= kShortestMs) metric.note(atMs);
-    return isGap ? silenceMs : 0;
+    return silenceMs;
   }
-  // One of none of them.
-  void noteOther(std::uint64_t atMs) { _lastMs = atMs; }
+  // The same of a report that is none of them.
+  std::uint64_t noteOther(std::uint64_t atMs) {
+    const std::uint64_t silenceMs = silenceUntil(atMs);
+    _lastMs = atMs;
+    return silenceMs;
+  }
   // Silence before the next one means nothing.
   void forget() { _metrics = {}; }
 
@@ -50,6 +52,10 @@ class ReportTimes {
     std::array<std::uint32_t, kDistances> distancesMs{};
   };
 
+  std::uint64_t silenceUntil(std::uint64_t atMs) const {
+    const std::uint64_t silenceMs = atMs - _lastMs;
+    return silenceMs > kShortestGapMs && isTooLong(silenceMs) ? silenceMs : 0;
+  }
   static std::optional<std::uint64_t> regularPeriodMs(const Metric& metric);
   bool isTooLong(std::uint64_t silenceMs) const;
 

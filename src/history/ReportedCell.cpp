@@ -3,6 +3,7 @@
 #include <algorithm>
 
 #include "metrics/MetricValidator.h"
+#include "radio/Networks.h"
 
 namespace qel {
 namespace {
@@ -28,15 +29,6 @@ std::optional<std::uint32_t> orNone(std::uint32_t number) {
   return number == ReportedCell::kNone ? std::nullopt : std::optional(number);
 }
 
-// No code has more than three digits (23.003, clause 2.2).
-std::string digits(std::uint32_t number, std::size_t atLeast) {
-  constexpr std::uint32_t kMost = 999;
-  if (number > kMost) return {};
-  std::string text = std::to_string(number);
-  if (text.size() < atLeast) text.insert(0, atLeast - text.size(), '0');
-  return text;
-}
-
 std::uint32_t numberIn(const Dictionary& record, KnownPlace& place) {
   const Value* value = place.in(record);
   const auto number = value ? value->asUInt64() : std::nullopt;
@@ -53,9 +45,22 @@ Cell ReportedCell::asCell() const {
   cell.code = orNone(code);
   cell.cellId = orNone(cellId);
   cell.area = orNone(area);
-  cell.mcc = digits(mcc, 3);
-  cell.mnc = digits(mnc, hasThreeDigits ? 3 : 2);
+  const auto digits = mncDigits == 0 ? std::nullopt : std::optional<std::uint32_t>(mncDigits);
+  if (mcc == 0) return cell;  // no country has it
+  // A country may be known without the network.
+  if (const auto network = networkOf(mcc, mnc == kNone ? 0 : mnc, digits)) {
+    cell.mcc = network->mcc;
+    if (mnc != kNone) cell.mnc = network->mnc;
+  }
   return cell;
+}
+
+void ReportedCell::fillFrom(const ReportedCell& earlier) {
+  if (area == kNone) area = earlier.area;
+  if (mcc != kNone || mnc != kNone) return;
+  mcc = earlier.mcc;
+  mnc = earlier.mnc;
+  mncDigits = earlier.mncDigits;
 }
 
 CellReader::CellReader()
@@ -83,7 +88,8 @@ std::optional<ReportedCell> CellReader::read(std::int64_t metric, const Dictiona
   cell.area = numberIn(record, places->area);
   cell.mcc = numberIn(record, places->mcc);
   cell.mnc = numberIn(record, places->mnc);
-  cell.hasThreeDigits = numberIn(record, places->mncDigits) == 3;
+  const std::uint32_t digits = numberIn(record, places->mncDigits);
+  if (digits == 2 || digits == 3) cell.mncDigits = static_cast<std::uint8_t>(digits);
   return cell;
 }
 

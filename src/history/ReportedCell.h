@@ -18,7 +18,7 @@ struct ReportedCell {
   static constexpr std::uint32_t kNone = ~std::uint32_t{0};  // longer than any of them
 
   Technology technology = Technology::lte;
-  bool hasThreeDigits = false;  // of the network code
+  std::uint8_t mncDigits = 0;  // that the report says the network code has; 0: it does not
   std::uint32_t channel = kNone;
   std::uint32_t code = kNone;
   std::uint32_t cellId = kNone;
@@ -30,6 +30,8 @@ struct ReportedCell {
     return technology == other.technology && channel == other.channel && code == other.code &&
            cellId == other.cellId;
   }
+  // What it leaves out of area and network is that of an earlier report of the same cell.
+  void fillFrom(const ReportedCell& earlier);
   friend bool operator==(const ReportedCell&, const ReportedCell&) = default;
   Cell asCell() const;
 };

@@ -88,7 +88,8 @@ TEST(CellHappenings, writeNetworkCodesWithAllTheirDigits) {
   const std::vector<Case> cases = {
       {1, 1, 2U, "001", "01"},      {460, 0, 2U, "460", "00"}, {310, 4, 3U, "310", "004"},
       {310, 410, {}, "310", "410"}, {262, 2, {}, "262", "02"}, {262, 123, 2U, "262", "123"},
-      {310, 41, 9U, "310", "41"},   {1000, 1000, 3U, "", ""},
+      {310, 41, 9U, "310", "041"},  {1000, 1000, 3U, "", ""},  {310, 10, {}, "310", "010"},
+      {0, 0, 2U, "", ""},
   };
   for (const Case& one : cases) {
     Followed followed;
@@ -103,6 +104,26 @@ TEST(CellHappenings, writeNetworkCodesWithAllTheirDigits) {
     EXPECT_EQ(known->mcc, one.mccText);
     EXPECT_EQ(known->mnc, one.mncText) << one.mnc;
   }
+}
+
+TEST(CellHappenings, knowOfTheCellThatWasLeftWhatAnyOfItsReportsTold) {
+  Followed followed;
+  followed.feed(kStart, V::K_UMTS_SCELL_INFO, umtsCell(5));
+  KCellularWcdmaCellInfo more = umtsCell(5);
+  more.setLac(12102);
+  more.setMcc(208);
+  more.setMnc(10);
+  followed.feed(kStart + 1, V::K_UMTS_SCELL_INFO, more);
+  followed.feed(kStart + 2, V::K_UMTS_SCELL_INFO, umtsCell(5));
+  EXPECT_EQ(followed.history.servingCell(kStart + 2)->area, 12102U);
+  followed.feed(kStart + 3, V::K_UMTS_SCELL_INFO, umtsCell(6));
+  const auto cells = followed.happenings(Kind::cell);
+  ASSERT_EQ(cells.size(), 2U);
+  EXPECT_EQ(cells[1].from->area, 12102U);
+  EXPECT_EQ(cells[1].from->mcc, "208");
+  EXPECT_EQ(cells[1].from->mnc, "10");
+  EXPECT_FALSE(cells[1].to->area) << "nobody told that of the new one";
+  EXPECT_EQ(cells[1].to->mcc, "");
 }
 
 TEST(CellHappenings, keepTheTimeOfReceptionEvenWhereItGoesBack) {
@@ -159,6 +180,17 @@ TEST(TechnologyHappenings, takeALateEndOfAConnectionForNoChange) {
   followed.lteState(kStart + 3, 0);
   EXPECT_EQ(followed.history.technology(kStart + 3), Technology::umts);
   EXPECT_EQ(followed.texts(Kind::technology).size(), 1U);
+}
+
+TEST(TechnologyHappenings, knowNoneFromAStateThatSaysNothing) {
+  Followed followed;
+  KCellularWcdmaRrcConnectionState state;
+  state.setState(0);  // not known
+  followed.feed(kStart, V::K_UMTS_RRC_STATE, state);
+  EXPECT_FALSE(followed.history.technology(kStart));
+  followed.lteState(kStart + 1, 1);
+  EXPECT_EQ(followed.history.technology(kStart + 1), Technology::lte);
+  EXPECT_THAT(followed.texts(Kind::technology), IsEmpty());
 }
 
 TEST(TechnologyHappenings, knowNoneOnceTheOneInUseWasLeft) {

@@ -197,6 +197,17 @@ TEST(BearerHappenings, lookAtNoMoreThanSixtyFour) {
   EXPECT_EQ(texts[0], "Connection up: " + std::string(100, 'a') + ", IPv4 and IPv6");
 }
 
+TEST(BearerHappenings, areTextWhateverTheNameIs) {
+  Followed followed;
+  KCellularActivatedBearerContexts list;
+  list.addBearerContexts(bearer(1, std::string(99, 'a') + "\u00e9b"));  // cut within a character
+  list.addBearerContexts(bearer(2, "in\xFFternet"));
+  followed.feed(kStart, V::K_CELLULAR_ACTIVE_BEARER, list);
+  EXPECT_THAT(followed.texts(Kind::bearer),
+              ElementsAre("Connection up: " + std::string(99, 'a') + ", IPv4 and IPv6",
+                          "Connection up: in\uFFFDternet, IPv4 and IPv6"));
+}
+
 std::shared_ptr<SecondaryComponentCarrier> carrier(std::uint32_t pci, std::int32_t state) {
   auto one = std::make_shared<SecondaryComponentCarrier>();
   one->setIndex(1);

@@ -28,10 +28,20 @@ TEST(Silence, isAGapWhenARegularMetricStopsAndNothingElseComes) {
   EXPECT_THAT(followed.texts(Kind::gap), ElementsAre("Nothing was reported for 1 min 30 s"));
   const Happening gap = followed.happenings(Kind::gap)[0];
   EXPECT_EQ(gap.timeMs, kStart + 99'000);
-  EXPECT_EQ(gap.metric, 0);
+  EXPECT_EQ(gap.metric, MetricValidator::K_LTE_RSRP_RSRQ_SINR) << "the report that ended it";
   EXPECT_FALSE(gap.technology);
   const auto runs = followed.history.series(Quantity::lteRsrp).between(0, kStart + 99'000);
   EXPECT_EQ(runs.size(), 2U);
+}
+
+TEST(Silence, isAGapAlsoWhenAReportEndsItThatNobodyHandles) {
+  constexpr std::int64_t kNobodys = 3932160 + 4242;
+  Followed followed;
+  for (std::uint64_t i = 0; i < 10; ++i) measure(followed, kStart + 1000 * i);
+  followed.feed(kStart + 9000 + 60'000, kNobodys, Bytes());
+  measure(followed, kStart + 9000 + 60'200);
+  EXPECT_THAT(followed.texts(Kind::gap), ElementsAre("Nothing was reported for 1 min 0 s"));
+  EXPECT_EQ(followed.happenings(Kind::gap)[0].metric, kNobodys);
 }
 
 TEST(Silence, ofThreePeriodsOrFiveSecondsIsNone) {

@@ -55,6 +55,7 @@ Chart makeChart(const ChartFrame& frame, Quantity quantity,
   chart.title = chart.id;
   chart.unit = facts.unit;
   addNeighbours(frame, neighbours, chart);
+  const std::size_t others = chart.curves.size();
   auto runs = thinnedAll(
       frame.viewpoint.history->series(quantity).between(frame.fromMs, frame.toMs), frame);
   if (!runs.empty()) {
@@ -66,7 +67,6 @@ Chart makeChart(const ChartFrame& frame, Quantity quantity,
   Viewpoint end = frame.viewpoint;
   end.nowMs = frame.toMs;
   chart.newest = readingOf(end, quantity).reading;
-  const std::size_t others = chart.curves.size() - (runs.empty() ? 0 : 1);
   chart.spoken = chart.title + ", " + chart.newest.spoken;
   if (others > 0) {
     chart.spoken +=
