@@ -3,4 +3,8 @@ import QtQuick
 // A list whose rows know whether the keyboard is on them.
 ListView {
     property bool keysHere: false
+    // Has its reader left the top?
+    property bool left: false
+
+    onMovementEnded: left = !atYBeginning
 }

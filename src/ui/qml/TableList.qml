@@ -44,4 +44,13 @@ FocusScope {
     ListPlace {
         list: list
     }
+    // What stands above the rows may grow: who is at the top stays there.
+    Connections {
+        target: list.headerItem
+
+        function onHeightChanged(): void {
+            if (!list.left && list.currentIndex <= 0)
+                list.positionViewAtBeginning();
+        }
+    }
 }
