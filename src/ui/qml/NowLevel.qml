@@ -13,8 +13,13 @@ Column {
     spacing: 2
 
     Item {
+        id: top
+
+        readonly property bool fits:
+            figure.width + unit.width + quality.width + 2 * Theme.padding <= width
+
         width: parent.width
-        height: Math.max(figure.height, quality.height)
+        height: fits ? Math.max(figure.height, quality.height) : figure.height + quality.height + 8
 
         Text {
             id: figure
@@ -27,6 +32,7 @@ Column {
             Accessible.ignored: true
         }
         Text {
+            id: unit
             anchors {
                 left: figure.right
                 leftMargin: 6

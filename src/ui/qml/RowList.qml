@@ -4,7 +4,7 @@ import QtQuick
 ListView {
     property bool keysHere: false
     // Has its reader left the top?
-    property bool left: false
+    property bool scrolledAway: false
 
-    onMovementEnded: left = !atYBeginning
+    onMovementEnded: scrolledAway = !atYBeginning
 }

@@ -49,7 +49,7 @@ FocusScope {
         target: list.headerItem
 
         function onHeightChanged(): void {
-            if (!list.left && list.currentIndex <= 0)
+            if (!list.scrolledAway && list.currentIndex <= 0)
                 list.positionViewAtBeginning();
         }
     }
