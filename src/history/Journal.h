@@ -112,11 +112,11 @@ class Journal {
     putBytes(payload);
   }
   void putHead(std::size_t number, std::size_t size) {
-    const std::uint64_t head = (_lastMs - _newest->fromMs) | (number << kSizeBits | size)
-                                                                 << kTimeBits;
-    const auto bytes = static_cast<std::uint32_t>(head);
-    std::memcpy(_newest->content.get() + _newest->size, &bytes, sizeof bytes);
-    _newest->size += sizeof bytes;
+    const std::uint64_t what = number << kSizeBits | size;
+    const std::uint64_t when = _lastMs - _newest->fromMs;
+    const auto head = static_cast<std::uint32_t>(what << kTimeBits | when);
+    std::memcpy(_newest->content.get() + _newest->size, &head, sizeof head);
+    _newest->size += sizeof head;
     _newest->toMs = _lastMs;
     _newest->rows |= 1U << number;
     _newestIn.data()[number] = _newest->number;

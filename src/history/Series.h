@@ -38,8 +38,7 @@ class Series {
 
   void add(std::uint64_t timeMs, float value) {
     const bool isUsual = timeMs - _lastMs <= kShortestSilenceMs && timeMs < _mean.endMs;
-    if (!isUsual || _isInterrupted) [[unlikely]]
-      turn(timeMs);
+    if (!isUsual || _isInterrupted) turn(timeMs);
     _lastMs = std::max(_lastMs, timeMs);
     if (_recent.push({_lastMs, value, std::exchange(_isInterrupted, false)})) dropOld();
     _mean.sum += value;
@@ -79,8 +78,7 @@ class Series {
     // Answers whether a chunk was begun.
     bool push(const Kept& point) {
       const bool isFull = _next == _end;
-      if (isFull) [[unlikely]]
-        beginChunk();
+      if (isFull) beginChunk();
       *_next++ = point;
       ++_size;
       return isFull;
