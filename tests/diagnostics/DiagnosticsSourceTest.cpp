@@ -44,7 +44,7 @@ class DiagnosticsSourceTest : public ::testing::Test {
   DiagnosticsSource& begin(const std::string& wish = "", bool isMissed = true) {
     DiagnosticsWorld world;
     world.search = [ports = ports] { return std::make_unique<test::PlayedSearch>(ports); };
-    world.asleep = [this] { return std::chrono::milliseconds{asleepMs}; };
+    world.asleep = [asleepMs = asleepMs] { return std::chrono::milliseconds{*asleepMs}; };
     source =
         std::make_unique<DiagnosticsSource>(DiagnosticsChoice{wish, 1, isMissed}, world, timing);
     source->start(log, listeners);
@@ -70,7 +70,9 @@ class DiagnosticsSourceTest : public ::testing::Test {
   std::shared_ptr<test::PlayedPorts> ports = std::make_shared<test::PlayedPorts>();
   std::shared_ptr<test::SourceLog> log = std::make_shared<test::SourceLog>();
   std::shared_ptr<sources::ListenerSignal> listeners = std::make_shared<sources::ListenerSignal>();
-  std::atomic<std::int64_t> asleepMs = 0;
+  // The thread of a source that ended within its own event outlives the test: it shares this.
+  std::shared_ptr<std::atomic<std::int64_t>> asleepMs =
+      std::make_shared<std::atomic<std::int64_t>>(0);
   DiagnosticsTiming timing;
   qel::testing::CapturedSystemLog system;
   std::unique_ptr<DiagnosticsSource> source;
@@ -215,7 +217,7 @@ TEST_F(DiagnosticsSourceTest, LooksAtTheMasksAfterTheMachineSlept) {
     brain.forget();
     return 0;
   });
-  asleepMs = 60'000;
+  *asleepMs = 60'000;
   modem.send(Bytes{0x79, 0, 0});  // anything
   EXPECT_TRUE(tell(modem, 3));
 }
@@ -286,6 +288,9 @@ TEST_F(DiagnosticsSourceTest, MayBeDestroyedWithinAnEvent) {
   source->start(destroyer, listeners);
   ASSERT_TRUE(tell(modem, 3));
   EXPECT_TRUE(comesTrue([&] { return destroyer->done.load(); }));
+  EXPECT_TRUE(comesTrue([&] {  // its thread goes on until the modem is left
+    return modem.with([](ModemBrain& brain) { return !brain.sendsAnyLog(); });
+  }));
 }
 
 TEST_F(DiagnosticsSourceTest, ListensToARouter) {
