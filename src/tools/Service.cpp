@@ -9,7 +9,6 @@
 #include <utility>
 
 #include "base/DispatchQueue.h"
-#include "bus/BusAddress.h"
 #include "tesk/bus/Reasons.h"
 #include "tesk/bus/ServiceStatus.h"
 #include "tools/ToolError.h"
@@ -34,7 +33,6 @@ std::string withoutItsName(const std::string& why) {
 void addBusOption(CLI::App& command, std::string& bus) {
   command.add_option("--bus", bus, "Where the service is: system, session or a bus address")
       ->type_name("BUS")
-      ->check([](const std::string& name) { return bus::faultOfBusName(name); })
       ->capture_default_str();
 }
 
