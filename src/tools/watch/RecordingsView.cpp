@@ -1,6 +1,7 @@
 #include "tools/watch/RecordingsView.h"
 
 #include <algorithm>
+#include <chrono>
 
 #include "tools/watch/Rows.h"
 
@@ -11,7 +12,15 @@ RecordingsView::RecordingsView(Desk& desk)
   _page.refresh();
 }
 
+// A little between two frames, so that keys are heard.
+void RecordingsView::readOn() {
+  constexpr std::chrono::milliseconds kAtOnce{50};
+  const auto end = std::chrono::steady_clock::now() + kAtOnce;
+  while (_hasMoreToRead && std::chrono::steady_clock::now() < end) _hasMoreToRead = _page.work();
+}
+
 Sheet RecordingsView::sheet(Size size) {
+  readOn();
   Sheet sheet;
   sheet.title = "Recordings";
   sheet.keys = "up/down choose  Enter open  d delete  u undo  Escape back  q quit";

@@ -13,10 +13,14 @@ class RecordingsView final : public View {
   Sheet sheet(Size size) override;
   std::unique_ptr<View> open(const std::string& rowId) override;
   bool take(const KeyPress& press) override;
+  bool needsDrawing() const override { return _hasMoreToRead; }
 
  private:
+  void readOn();
+
   Desk& _desk;
   RecordingsPage _page;
+  bool _hasMoreToRead = true;
 };
 
 // What can be done with an open recording, wherever one is: true when the key meant that.

@@ -2,6 +2,9 @@
 
 #include <gtest/gtest.h>
 
+#include <filesystem>
+#include <fstream>
+
 #include "messages/lte_rrc.h"
 #include "messages/lte_serving.h"
 #include "metrics/MetricValidator.h"
@@ -196,6 +199,30 @@ TEST_F(WatchScreens, openTheSheetOfAField) {
   EXPECT_TRUE(terminal.shows("0x514"));
   terminal.press("Escape");
   EXPECT_TRUE(becomes(terminal, "tracking_area_code"));
+}
+
+TEST_F(WatchScreens, listRecordingsThatCanBeDeletedAndOpened) {
+  const std::string data = ::testing::TempDir() + "watch-data-" + std::to_string(::getpid());
+  const std::string folder = data + "/qelwatch/recordings";
+  std::filesystem::create_directories(folder);
+  std::ofstream(folder + "/drive.jsonl") << drive();
+  {
+    const Tmux terminal(100, 24,
+                        "env XDG_DATA_HOME=" + data + " " + program + "--source simulated");
+    ASSERT_TRUE(becomes(terminal, "Simulated modem"));
+    terminal.press("r");
+    ASSERT_TRUE(becomes(terminal, "1 recording,"));
+    EXPECT_TRUE(becomes(terminal, "2 cells"));
+    terminal.press("d");
+    ASSERT_TRUE(becomes(terminal, "0 recordings"));
+    terminal.press("u");
+    ASSERT_TRUE(becomes(terminal, "2 cells"));
+    terminal.press("Enter");
+    ASSERT_TRUE(becomes(terminal, "0:00:00 of 0:01:00"));
+    terminal.press("c");
+    EXPECT_TRUE(eventually([&] { return !terminal.shows("of 0:01:00"); }));
+  }
+  std::filesystem::remove_all(data);
 }
 
 TEST_F(WatchScreens, sayWhatIsMissingWhenThereIsNoService) {
