@@ -56,6 +56,7 @@ bool RecordingsView::take(const KeyPress& press) {
   }
   if (press.character != 'u') return false;
   _page.undo();
+  _hasMoreToRead = true;  // of what is there again
   return true;
 }
 

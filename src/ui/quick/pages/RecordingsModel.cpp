@@ -48,7 +48,10 @@ std::string RecordingsModel::pathOf(const QString& name) const {
 
 void RecordingsModel::remove(const QString& name) { _page.remove(name.toStdString()); }
 
-void RecordingsModel::undo() { _page.undo(); }
+void RecordingsModel::undo() {
+  _page.undo();
+  _work.start(std::chrono::milliseconds(0));  // of what is there again
+}
 
 void RecordingsModel::work() {
   if (_page.work()) _work.start(std::chrono::milliseconds(0));
