@@ -177,8 +177,9 @@ void Playback::playOn() {
 
 std::optional<std::chrono::milliseconds> Playback::untilNextTick() const {
   if (_opening) return 0ms;
-  if (_view.isPlaying) return kPauseOfPlaying;
-  return std::nullopt;
+  if (!_view.isPlaying) return std::nullopt;
+  return std::max(
+      0ms, std::chrono::ceil<std::chrono::milliseconds>(_movedAt + kPauseOfPlaying - _now()));
 }
 
 void Playback::tick() {

@@ -73,8 +73,8 @@ class Playback {
   void toNextHappening();
   void toPreviousHappening();
 
-  // When tick() is to be called next; nothing: there is nothing to do until somebody does
-  // something.
+  // How long it is, from now, until tick() is to be called; nothing: there is nothing to do until
+  // somebody does something.
   std::optional<std::chrono::milliseconds> untilNextTick() const;
   // Opens on for some milliseconds, or moves as far as the time that went by takes it.
   void tick();

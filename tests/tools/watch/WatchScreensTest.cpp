@@ -86,6 +86,16 @@ TEST_F(WatchScreens, moveToTheMomentOfTheNextHappening) {
   EXPECT_TRUE(becomes(terminal, "PCI 1,"));
 }
 
+TEST_F(WatchScreens, playOnWithoutAnyKey) {
+  const Tmux terminal(80, 24, program + recording.path());
+  ASSERT_TRUE(becomes(terminal, "PCI 1,"));
+  for (int i = 0; i < 5; ++i) terminal.press("f");  // 60 times as fast
+  terminal.press("Space");
+  EXPECT_TRUE(becomes(terminal, "PCI 2,"));
+  EXPECT_TRUE(becomes(terminal, "0:01:00 of 0:01:00"));
+  EXPECT_TRUE(becomes(terminal, "stands"));
+}
+
 TEST_F(WatchScreens, openPagesByLetterAndLeaveThemWithEscape) {
   const Tmux terminal(80, 24, program + recording.path());
   ASSERT_TRUE(becomes(terminal, "PCI 1,"));

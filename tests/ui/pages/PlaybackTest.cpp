@@ -148,6 +148,21 @@ TEST_F(PlaybackTest, playsAsFastAsItIsTold) {
   EXPECT_EQ(playback.untilNextTick(), std::nullopt);
 }
 
+TEST_F(PlaybackTest, isDueOnceItsPauseIsOver) {
+  openAll();
+  playback.play();
+  EXPECT_EQ(playback.untilNextTick(), 100ms);
+  now += 40ms;
+  EXPECT_EQ(playback.untilNextTick(), 60ms);
+  now += 60ms;
+  EXPECT_EQ(playback.untilNextTick(), 0ms);
+  now += 1s;
+  EXPECT_EQ(playback.untilNextTick(), 0ms) << "overdue";
+  playback.tick();
+  EXPECT_EQ(playback.momentMs(), 101'100U);
+  EXPECT_EQ(playback.untilNextTick(), 100ms);
+}
+
 TEST_F(PlaybackTest, losesNoTimeBetweenShortTicks) {
   openAll();
   playback.play();
