@@ -39,6 +39,7 @@ void tryInput(Input input) {
   const auto& event = std::get<RecordedEvent>(read);
   law(isSame(event, std::get<RecordedEvent>(generally)), "both ways read the same event");
   law(hasReadableForm(event), "what was read has a readable form");
+  law(event.timeMs <= kLastRecordedMs, "every time has a date");
   const std::string written = eventLine(event);
   law(written.find('\n') == std::string::npos, "an event is one line");
   const auto again = parseEventLine(written);

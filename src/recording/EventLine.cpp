@@ -31,6 +31,7 @@ std::optional<LineFault> readTime(const Dictionary& line, RecordedEvent& event) 
     return fault("\"time_ms\" is no unsigned integer");
   }
   event.timeMs = *time->asUInt64();
+  if (event.timeMs > kLastRecordedMs) return fault("\"time_ms\" is after the year 9999");
   return std::nullopt;
 }
 
@@ -91,8 +92,8 @@ std::variant<RecordedEvent, LineFault> parseEventLine(std::string_view line) {
 
 bool hasReadableForm(const RecordedEvent& event) {
   const Value* payload = event.entries.find(kRecordedPayloadKey);
-  return (!payload || payload->asBytes()) && !checkMetric(event) &&
-         isWithinLineLimits(event.entries);
+  return event.timeMs <= kLastRecordedMs && (!payload || payload->asBytes()) &&
+         !checkMetric(event) && isWithinLineLimits(event.entries);
 }
 
 std::string eventLine(const RecordedEvent& event) {

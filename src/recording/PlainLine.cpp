@@ -115,7 +115,7 @@ class PlainLine {
  private:
   bool readTime(Scanner& scanner) {
     const auto time = scanner.number();
-    if (!time || std::exchange(_hasTime, true)) return false;
+    if (!time || *time > kLastRecordedMs || std::exchange(_hasTime, true)) return false;
     event.timeMs = *time;
     return true;
   }

@@ -13,6 +13,9 @@ namespace qel {
 
 enum class RecordedKind : std::uint8_t { metric, trigger };
 
+// Later ones have no date: a line with one is a bad line.
+inline constexpr std::uint64_t kLastRecordedMs = 253402300799999;  // of the year 9999
+
 struct RecordedEvent {
   std::uint64_t timeMs = 0;  // when the event was received, since 1970-01-01 00:00 UTC
   RecordedKind kind = RecordedKind::metric;

@@ -26,7 +26,9 @@ std::vector<TimeLabel> timeLabels(std::uint64_t fromMs, std::uint64_t toMs, cons
       kTimeSteps, [&](std::uint64_t step) { return (toMs - fromMs) / step < kMostTimeLabels; });
   const std::uint64_t step = found == kTimeSteps.end() ? kTimeSteps.back() : *found;
   std::vector<TimeLabel> labels;
-  for (std::uint64_t time = (fromMs + step - 1) / step * step; time <= toMs; time += step) {
+  const std::uint64_t first = fromMs % step == 0 ? 0 : step - fromMs % step;
+  for (std::uint64_t after = first; after <= toMs - fromMs; after += step) {
+    const std::uint64_t time = fromMs + after;
     labels.push_back({time, step < 60'000 ? secondText(time, zone) : minuteText(time, zone)});
   }
   return labels;
