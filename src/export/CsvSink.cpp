@@ -4,15 +4,16 @@
 #include <unistd.h>
 
 #include <algorithm>
-#include <array>
 #include <cerrno>
 #include <cstring>
 #include <filesystem>
-#include <fstream>
+#include <set>
 #include <string_view>
 #include <system_error>
 
 #include "base/Rendering.h"
+#include "export/HappeningTable.h"
+#include "messages/catalogue/MetricMessages.h"
 
 namespace qel {
 namespace {
@@ -44,12 +45,23 @@ std::string headOf(const Table& table) {
   return line + "\r\n";
 }
 
-// Whether the file is a table of an export: others begin otherwise.
-bool isTable(const std::string& path) {
-  constexpr std::string_view kBegin = "time_utc";
-  std::array<char, kBegin.size()> begin{};
-  std::ifstream(path, std::ios::binary).read(begin.data(), begin.size());
-  return std::string_view(begin.data(), begin.size()) == kBegin;
+// Whether an export may have made a file of this name.
+bool isTableName(std::string_view name) {
+  return name == happeningTable().name ||
+         std::ranges::any_of(metricMessages(), [name](const MetricMessage& message) {
+           return message.className == name;
+         });
+}
+
+// A spreadsheet takes such a text for a formula.
+bool looksLikeFormula(std::string_view text) {
+  return !text.empty() && std::string_view("=+-@\t\r").find(text.front()) != std::string_view::npos;
+}
+
+std::string textIn(const Column& column, const Value& value) {
+  std::string text = cellText(value);
+  if (column.type == ColumnType::text && looksLikeFormula(text)) text.insert(0, 1, '\'');
+  return text;
 }
 
 }  // namespace
@@ -109,7 +121,8 @@ bool CsvSink::put(const Table& table, const TableRow& row) {
   for (const Value& value : row) {
     if (!isFirst) file->waiting += ',';
     isFirst = false;
-    if (!value.isNull()) appendCell(file->waiting, cellText(value));
+    const Column& column = table.columns[static_cast<std::size_t>(&value - row.data())];
+    if (!value.isNull()) appendCell(file->waiting, textIn(column, value));
   }
   file->waiting += "\r\n";
   return file->waiting.size() < kMostWaiting || flush(*file);
@@ -117,13 +130,16 @@ bool CsvSink::put(const Table& table, const TableRow& row) {
 
 // What is left in the folder of an export before.
 bool CsvSink::dropOthers() {
+  std::set<std::string> others;
   std::error_code code;
-  for (const fs::directory_entry& entry : fs::directory_iterator(_folder, code)) {
-    const std::string path = _folder + "/" + entry.path().filename().string();
-    const bool isOurs = std::ranges::any_of(
-        _files, [&path](const auto& file) { return file.second->part.path() == path; });
-    if (isOurs || entry.path().extension() != kEnding || !entry.is_regular_file(code)) continue;
-    if (!isTable(path)) continue;
+  for (fs::directory_iterator entry(_folder, code), end; !code && entry != end;
+       entry.increment(code)) {
+    const fs::path name = entry->path().filename();
+    if (name.extension() == kEnding && isTableName(name.stem().string())) others.insert(name);
+  }
+  for (const auto& [table, file] : _files) others.erase(table->name + std::string(kEnding));
+  for (const std::string& name : others) {
+    const std::string path = _folder + "/" + name;
     if (::unlink(path.c_str()) == 0) continue;
     _error = path + ": " + std::strerror(errno);
     return false;
@@ -137,12 +153,11 @@ bool CsvSink::finish() {
     if (!flush(*file)) return false;
     if (!file->part.complete()) return fail(*file);
   }
-  if (!dropOthers()) return false;
   _isOwn = false;
   for (const auto& [table, file] : _files) {
     if (!file->part.takePlace()) return fail(*file);
   }
-  return true;
+  return dropOthers();
 }
 
 }  // namespace qel

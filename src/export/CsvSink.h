@@ -13,10 +13,12 @@ namespace qel {
 
 // TABLE.csv in a folder, for each table that has a row or was made (RFC 4180: lines end with CR LF;
 // UTF-8). The first line names the columns, "rsrp [dBm]" where there is a unit. Nothing reported is
-// an empty cell, bytes are "<0a1b2c>".
+// an empty cell, bytes are "<0a1b2c>". A text that a spreadsheet would take for a formula begins
+// with a "'".
 class CsvSink final : public TableSink {
  public:
-  // The folder is made if need be. Without `replaces` it must be empty. Nothing when it cannot be
+  // The folder is made if need be. Without `replaces` it must be empty; with it, files named as a
+  // table of an export are replaced or go, and others stay. Nothing when it cannot be
   // used; `error` is then one line.
   static std::unique_ptr<CsvSink> create(const std::string& folder, bool replaces,
                                          std::string& error);

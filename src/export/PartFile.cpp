@@ -5,17 +5,11 @@
 
 #include <cerrno>
 #include <cstdio>
+#include <cstdlib>
 #include <cstring>
 #include <utility>
 
 namespace qel {
-namespace {
-
-// It tells where a phone has been.
-constexpr mode_t kFileMode = 0600;
-
-}  // namespace
-
 PartFile::~PartFile() {
   if (_descriptor >= 0) ::close(_descriptor);
   if (_isThere) ::unlink(partPath().c_str());
@@ -27,9 +21,10 @@ bool PartFile::fail(int code) {
 }
 
 bool PartFile::create() {
-  const std::string part = partPath();
-  ::unlink(part.c_str());
-  _descriptor = ::open(part.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, kFileMode);
+  constexpr std::string_view kEnding = ".part";
+  _part = _path + ".XXXXXX" + std::string(kEnding);
+  // It tells where a phone has been: the file is for its owner's eyes alone.
+  _descriptor = ::mkostemps(_part.data(), static_cast<int>(kEnding.size()), O_CLOEXEC);
   if (_descriptor < 0) return fail(errno);
   _isThere = true;
   return true;

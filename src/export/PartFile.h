@@ -6,8 +6,8 @@
 
 namespace qel {
 
-// Written as PATH.part, for its owner's eyes alone, and gone with this unless it took its place.
-// Closed by the destructor. One thread.
+// Written beside PATH under a name that no file has, PATH.XXXXXX.part, for its owner's eyes alone,
+// and gone with this unless it took its place. Closed by the destructor. One thread.
 class PartFile {
  public:
   explicit PartFile(std::string path) : _path(std::move(path)) {}
@@ -16,9 +16,9 @@ class PartFile {
   PartFile& operator=(const PartFile&) = delete;
 
   const std::string& path() const { return _path; }
-  std::string partPath() const { return _path + ".part"; }
+  const std::string& partPath() const { return _part; }  // once it is created
 
-  // Each is false when it failed: see error(). What an ended program left is replaced.
+  // Each is false when it failed: see error().
   bool create();
   bool write(std::string_view text);
   // Brings it to the disk and closes it.
@@ -33,6 +33,7 @@ class PartFile {
   bool fail(int code);
 
   const std::string _path;
+  std::string _part;
   int _descriptor = -1;
   bool _isThere = false;  // under its other name
   std::string _error;

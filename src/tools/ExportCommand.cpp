@@ -74,10 +74,10 @@ class Run {
   const Options& _options;
   RecordProgress _progress;
   const std::unique_ptr<RecordingReader> _reader = open();
+  const StopSignals _signals{StopSignals::Waiting::fails};  // before anything is made
   const std::unique_ptr<TableSink> _sink = begin(_options);
   std::optional<IdentityHider> _hider;
   std::optional<Exporter> _exporter;
-  const StopSignals _signals{StopSignals::Waiting::fails};
   steady_clock::time_point _shownAt = steady_clock::now();
   std::uint64_t _undecodable = 0;
 };
@@ -123,7 +123,9 @@ void Run::summarize(const Exporter::Counts& counts) {
   if (counts.without > 0) {
     text += ", " + counted(counts.without, "event") + " without a message class left out";
   }
-  if (_undecodable > 0) text += ", " + counted(_undecodable, "undecodable event") + " left out";
+  // The one that hides knows more of them: of classes that the screens do not show.
+  const std::uint64_t undecodable = _undecodable + (_hider ? _hider->undecodable() : 0);
+  if (undecodable > 0) text += ", " + counted(undecodable, "undecodable event") + " left out";
   if (_reader->cutOff()) _progress.say(*_reader->cutOff());
   if (_reader->skippedLines() > 0) {
     _progress.say(_options.recording.file +

@@ -8,6 +8,7 @@
 #include <fstream>
 #include <iterator>
 #include <memory>
+#include <string_view>
 #include <utility>
 
 #include "base/Rendering.h"
@@ -120,7 +121,12 @@ ExportedTable tableOf(sqlite3* database, const std::string& name) {
   ExportedTable table;
   const Statement rows = ask(database, "SELECT * FROM \"" + name + "\" ORDER BY rowid");
   const int columns = sqlite3_column_count(rows.get());
-  for (int i = 0; i < columns; ++i) table.header.emplace_back(sqlite3_column_name(rows.get(), i));
+  for (int i = 0; i < columns; ++i) {
+    table.header.emplace_back(sqlite3_column_name(rows.get(), i));
+    if (std::string_view(sqlite3_column_decltype(rows.get(), i)) == "TEXT") {
+      table.texts.insert(table.header.back());
+    }
+  }
   while (sqlite3_step(rows.get()) == SQLITE_ROW) {
     ExportedRow row;
     for (int i = 0; i < columns; ++i) {

@@ -38,6 +38,7 @@ using ExportedRow = std::map<std::string, std::string>;
 struct ExportedTable {
   std::vector<std::string> header;
   std::map<std::string, std::string> units;  // of columns that have one
+  std::set<std::string> texts;  // columns of texts, where types are known: in a database
   std::vector<ExportedRow> rows;
 };
 

@@ -143,6 +143,19 @@ void expectSame(const ExportedRow& exported, const ExportedRow& expected, const 
                             << ", of which the dispatcher says nothing";
 }
 
+// As CSV has it, where a text that looks like a formula begins with a "'".
+std::vector<ExportedRow> withoutFormulas(const std::vector<ExportedRow>& rows,
+                                         const std::set<std::string>& texts) {
+  std::vector<ExportedRow> result = rows;
+  for (ExportedRow& row : result) {
+    for (auto& [column, text] : row) {
+      if (!texts.contains(column) || text.empty()) continue;
+      if (std::string_view("=+-@\t\r").find(text[0]) != std::string_view::npos) text.insert(0, "'");
+    }
+  }
+  return result;
+}
+
 // Every record that `qelctl replay` prints, in its order.
 std::vector<std::pair<std::string, Json>> replayed(const std::string& recording) {
   std::vector<std::pair<std::string, Json>> records;
@@ -174,7 +187,7 @@ std::size_t expectAgreement(const std::string& recording, const Folder& folder) 
   for (const auto& [name, table] : tables) {
     EXPECT_EQ(files.at(name).header, table.header) << name;
     EXPECT_EQ(files.at(name).units, table.units) << name;
-    EXPECT_EQ(files.at(name).rows, table.rows) << name;
+    EXPECT_EQ(files.at(name).rows, withoutFormulas(table.rows, table.texts)) << name;
   }
   std::map<std::string, std::size_t> positions;
   std::size_t values = 0;

@@ -137,14 +137,57 @@ TEST(QelctlExport, replacesNothingUnlessItIsForced) {
   }
   // What an export before left is no part of this one.
   std::ofstream(folder / "out/KCellularMmContext.csv") << "time_utc,timestamp\r\n";
-  std::ofstream(folder / "out/expenses.csv") << "date,amount\r\n";
+  for (const char* name : {"expenses.csv", "picked.csv", "KCellularMmContext.txt"}) {
+    std::ofstream(folder / ("out/" + std::string(name))) << "time_utc,timestamp\r\n";
+  }
   ASSERT_EQ(
       qelctl({"export", recording.path(), "--format", "csv", "--out", folder / "out", "--force"})
           .exitCode,
       0);
-  EXPECT_TRUE(fs::exists(folder / "out/expenses.csv")) << "of somebody else";
-  fs::remove(folder / "out/expenses.csv");
+  for (const char* name : {"expenses.csv", "picked.csv", "KCellularMmContext.txt"}) {
+    EXPECT_TRUE(fs::remove(folder / ("out/" + std::string(name)))) << "of somebody else";
+  }
   EXPECT_EQ(readCsv(folder / "out").size(), 2U);
+}
+
+TEST(QelctlExport, touchesNoFileBesideTheOneItMakes) {
+  const TemporaryRecording recording(neighbours());
+  const Folder folder;
+  std::ofstream(folder / "out.db.part") << "of somebody else";
+  ASSERT_EQ(qelctl({"export", recording.path(), "--format", "sqlite", "--out", folder / "out.db"})
+                .exitCode,
+            0);
+  EXPECT_EQ(contentOf(folder / "out.db.part"), "of somebody else");
+  EXPECT_EQ(folder.names(), (std::set<std::string>{"out.db", "out.db.part"}));
+}
+
+TEST(QelctlExport, hasNoFormulasForASpreadsheet) {
+  std::string lines;
+  const std::vector<std::string> names = {"=1+cmd|x!A1", "+1", "-1", "@a", "\ta", "\ra", "a=1", ""};
+  for (const std::string& name : names) {
+    auto bearer = std::make_shared<BearerContext>();
+    bearer->setCid(5);
+    bearer->setApn(name);
+    KCellularActivatedBearerContexts message;
+    message.addBearerContexts(bearer);
+    lines += metricLine(MetricValidator::K_CELLULAR_ACTIVE_BEARER, message);
+  }
+  const TemporaryRecording recording(lines);
+  const Folder folder;
+  for (const auto& [format, name] : {std::pair("csv", "out"), std::pair("sqlite", "out.db")}) {
+    ASSERT_EQ(qelctl({"export", recording.path(), "--format", format, "--out", folder / name,
+                      "--keep-identities"})
+                  .exitCode,
+              0);
+  }
+  const auto files = readCsv(folder / "out");
+  const auto tables = readSqlite(folder / "out.db");
+  const auto& rows = files.at("KCellularActivatedBearerContexts").rows;
+  ASSERT_EQ(rows.size(), names.size());
+  for (std::size_t i = 0; i < names.size(); ++i) {
+    EXPECT_EQ(rows[i].at("apn"), (i < 6 ? "'" : "") + names[i]);
+    EXPECT_EQ(tables.at("KCellularActivatedBearerContexts").rows[i].at("apn"), names[i]);
+  }
 }
 
 TEST(QelctlExport, leavesNothingBehindWhenALineIsBad) {
