@@ -13,8 +13,10 @@
 namespace qel {
 namespace {
 
-constexpr std::uint64_t kEndOfTime = 253402300799999;  // of the year 9999
 constexpr std::size_t kAll = std::numeric_limits<std::size_t>::max();
+
+// A clock that moves by more than this was set, or was wrong.
+constexpr std::uint64_t kFarMs = 60'000;
 
 // Everything stays: it is bounded by what is read at all.
 History::Limits limitsOfHistory() {
@@ -44,7 +46,10 @@ struct RecordedHistory::State {
       : reader(std::move(opened)), limits(given), history(limitsOfHistory()), writer(&history) {}
 
   bool readOne();
-  void take(RecordedEvent event);
+  void arrive(RecordedEvent event);
+  void takeHeld(const RecordedEvent* next);
+  std::uint64_t placeOf(std::uint64_t timeMs);
+  void take(const RecordedEvent& event, std::uint64_t timeMs);
   void keepCheckpoint();
 
   const std::unique_ptr<RecordingReader> reader;
@@ -59,7 +64,11 @@ struct RecordedHistory::State {
   std::uint64_t endMs = 0;
   std::uint64_t events = 0;
   std::uint64_t undecodable = 0;
+  std::optional<RecordedEvent> held;  // far ahead of those before: what is the next one's time?
+  std::uint64_t shiftMs = 0;          // since the clock was set back
   std::uint64_t timesBack = 0;
+  std::uint64_t timesSetBack = 0;
+  std::uint64_t timesAhead = 0;
   bool isTooLarge = false;
   bool hasEnded = false;
 };
@@ -101,9 +110,39 @@ void RecordedHistory::State::keepCheckpoint() {
   limits.eventsBetween *= 2;
 }
 
-void RecordedHistory::State::take(RecordedEvent event) {
-  if (event.timeMs < endMs) ++timesBack;
-  const std::uint64_t timeMs = std::clamp(event.timeMs, endMs, kEndOfTime);
+// Where the clock went back a little, time stands; where it was set back, what comes then follows
+// what came before, until the clock is as far again.
+std::uint64_t RecordedHistory::State::placeOf(std::uint64_t timeMs) {
+  if (timeMs >= endMs) shiftMs = 0;
+  if (timeMs + shiftMs + kFarMs < endMs) {
+    shiftMs = endMs - timeMs;
+    ++timesSetBack;
+  } else if (timeMs + shiftMs < endMs) {
+    ++timesBack;
+  }
+  return std::clamp(timeMs + shiftMs, endMs, kLastRecordedMs);
+}
+
+// An event that was far ahead, and after which time goes on as before it, stands among the others.
+void RecordedHistory::State::takeHeld(const RecordedEvent* next) {
+  if (!held) return;
+  const RecordedEvent event = std::move(*held);
+  held.reset();
+  const bool isAlone = next && next->timeMs + kFarMs < event.timeMs;
+  if (isAlone) ++timesAhead;
+  take(event, isAlone ? endMs : placeOf(event.timeMs));
+}
+
+void RecordedHistory::State::arrive(RecordedEvent event) {
+  takeHeld(&event);
+  if (events > 0 && event.timeMs > endMs + kFarMs) {
+    held = std::move(event);
+  } else {
+    take(event, placeOf(event.timeMs));
+  }
+}
+
+void RecordedHistory::State::take(const RecordedEvent& event, std::uint64_t timeMs) {
   if (events == 0) beginMs = timeMs;
   // Between two milliseconds, so that a moment has all its events or none.
   if (eventsSince >= limits.eventsBetween && timeMs > endMs) keepCheckpoint();
@@ -120,16 +159,21 @@ void RecordedHistory::State::take(RecordedEvent event) {
 
 bool RecordedHistory::State::readOne() {
   auto event = reader->next();
-  if (!event) return false;
+  if (!event) {
+    takeHeld(nullptr);
+    return false;
+  }
   if (event->kind == RecordedKind::metric && !QuietDispatcher::isReadable(event->entries)) {
     ++undecodable;
     return true;
   }
-  if (history.journal().bytes() >= limits.bytes) {
+  // Marks and link failures are no reports that the journal holds.
+  if (history.journal().bytes() >= limits.bytes ||
+      history.happenings().size() >= limits.happenings) {
     isTooLarge = true;
     return false;
   }
-  take(std::move(*event));
+  arrive(std::move(*event));
   return true;
 }
 
@@ -169,6 +213,14 @@ std::vector<std::string> RecordedHistory::notes() const {
     notes.push_back("Its clock went back " + counted(state.timesBack, "time", "times") +
                     ": what came then stands at the time before");
   }
+  if (state.timesSetBack > 0) {
+    notes.push_back("Its clock was set back " + counted(state.timesSetBack, "time", "times") +
+                    ": what came then is shown as if it had gone on");
+  }
+  if (state.timesAhead > 0) {
+    notes.push_back("Its clock was ahead at " + counted(state.timesAhead, "event", "events") +
+                    ", shown at the time before");
+  }
   return notes;
 }
 
@@ -176,7 +228,7 @@ const History& RecordedHistory::history() const { return _state->history; }
 
 const MetricStore& RecordedHistory::storeAt(std::uint64_t timeMs) {
   State& state = *_state;
-  timeMs = std::min(timeMs, kEndOfTime);
+  timeMs = std::min(timeMs, kLastRecordedMs);
   const auto after = std::ranges::upper_bound(state.checkpoints, timeMs, {}, &Checkpoint::fromMs);
   const Checkpoint& before = *(after == state.checkpoints.begin() ? after : after - 1);
   if (timeMs + 1 < state.playedToMs || before.fromMs > state.playedToMs) {

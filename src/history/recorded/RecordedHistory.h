@@ -20,6 +20,7 @@ class RecordedHistory {
  public:
   struct Limits {
     std::size_t bytes = 128 * 1024 * 1024;  // of events in memory; what follows is not opened
+    std::size_t happenings = 200'000;       // the same
     std::size_t checkpoints = 512;          // copies of the store; beyond them every second goes
     std::size_t eventsBetween = 1024;       // two checkpoints, at first
   };
@@ -35,8 +36,9 @@ class RecordedHistory {
   // How much of the file has been read, from 0 to 1.
   float progress() const;
 
-  // Once all is read. Times are of reception; one that goes back counts as the one before it, one
-  // beyond the year 9999 as its end.
+  // Once all is read. Times are of reception; one that goes back counts as the one before it. After
+  // a clock that was set back by more than a minute they go on from there; an event alone that was
+  // a minute ahead counts as the one before it.
   std::uint64_t beginMs() const;  // of the first event; 0 for an empty recording
   std::uint64_t endMs() const;
   std::uint64_t events() const;

@@ -3,7 +3,6 @@
 #include <gtest/gtest.h>
 #include <sys/stat.h>
 
-#include <limits>
 #include <map>
 #include <random>
 #include <set>
@@ -185,7 +184,7 @@ TEST(RecordedHistory, leavesBadLinesAndReportsOutAndSaysSo) {
 
 TEST(RecordedHistory, holdsTheStoreWhateverTheClockSaid) {
   const TemporaryFolder folder;
-  constexpr auto kLast = std::numeric_limits<std::uint64_t>::max();
+  constexpr std::uint64_t kLast = kLastRecordedMs;
   std::string lines;
   for (const std::uint64_t time :
        {std::uint64_t{0}, std::uint64_t{5}, kLast - 1, std::uint64_t{7}, kLast}) {
@@ -198,9 +197,51 @@ TEST(RecordedHistory, holdsTheStoreWhateverTheClockSaid) {
     return *history->storeAt(timeMs).myLTESCellInfoDict->find("phy_cell_id")->asUInt64();
   };
   EXPECT_EQ(cellAt(kLast), kLast % 400);
-  EXPECT_EQ(cellAt(6), 5U);
+  EXPECT_EQ(cellAt(4), 0U);
+  EXPECT_EQ(cellAt(6), (kLast - 1) % 400) << "far ahead, alone";
+  EXPECT_EQ(cellAt(7), 7U);
   EXPECT_EQ(cellAt(history->endMs()), kLast % 400);
   EXPECT_EQ(cellAt(0), 0U);
+}
+
+std::string cellsAt(const std::vector<std::uint64_t>& times) {
+  std::string lines;
+  std::uint32_t code = 0;
+  for (const std::uint64_t time : times) lines += lineOf(lteCell(time, ++code));
+  return lines;
+}
+
+std::uint64_t codeAt(RecordedHistory& history, std::uint64_t timeMs) {
+  return *history.storeAt(timeMs).myLTESCellInfoDict->find("phy_cell_id")->asUInt64();
+}
+
+TEST(RecordedHistory, bearsAnEventFarAhead) {
+  const TemporaryFolder folder;
+  constexpr std::uint64_t kYears = 300'000'000'000;
+  const auto history =
+      opened(folder.file("a.jsonl", cellsAt({1000, 2000, kYears, 3000, 4000, 90'000, 91'000})));
+  EXPECT_EQ(history->endMs(), 91'000U);
+  EXPECT_EQ(codeAt(*history, 2500), 3U);
+  EXPECT_EQ(codeAt(*history, 3500), 4U);
+  EXPECT_EQ(codeAt(*history, 89'000), 5U) << "a pause is none";
+  EXPECT_EQ(codeAt(*history, 90'000), 6U);
+  EXPECT_EQ(history->notes(),
+            std::vector<std::string>{"Its clock was ahead at 1 event, shown at the time before"});
+}
+
+TEST(RecordedHistory, goesOnWhereItsClockWasSetBack) {
+  const TemporaryFolder folder;
+  const auto history = opened(folder.file(
+      "a.jsonl", cellsAt({10'000'000, 10'001'000, 5000, 6000, 7000, 10'009'000, 10'010'000})));
+  EXPECT_EQ(history->beginMs(), 10'000'000U);
+  EXPECT_EQ(codeAt(*history, 10'001'000), 3U);
+  EXPECT_EQ(codeAt(*history, 10'002'500), 4U);
+  EXPECT_EQ(codeAt(*history, 10'003'000), 5U);
+  EXPECT_EQ(codeAt(*history, 10'009'000), 6U) << "set right again";
+  EXPECT_EQ(history->endMs(), 10'010'000U);
+  EXPECT_EQ(history->notes(),
+            std::vector<std::string>{
+                "Its clock was set back 1 time: what came then is shown as if it had gone on"});
 }
 
 TEST(RecordedHistory, opensOfATooLargeRecordingWhatItCanHold) {
@@ -216,6 +257,20 @@ TEST(RecordedHistory, opensOfATooLargeRecordingWhatItCanHold) {
   EXPECT_TRUE(history->notes()[0].starts_with("Too large to be opened whole"))
       << history->notes()[0];
   EXPECT_EQ(history->progress(), 1);
+}
+
+TEST(RecordedHistory, holdsNoMoreHappeningsThanItMay) {
+  const TemporaryFolder folder;
+  std::string lines;
+  for (unsigned i = 0; i < 50; ++i) lines += lineOf(markEvent(1000 + i, i + 1));
+  RecordedHistory::Limits limits;
+  limits.happenings = 20;
+  const auto history = opened(folder.file("a.jsonl", lines), limits);
+  EXPECT_EQ(history->history().happenings().size(), 20U);
+  EXPECT_EQ(history->endMs(), 1019U);
+  ASSERT_EQ(history->notes().size(), 1U);
+  EXPECT_TRUE(history->notes()[0].starts_with("Too large to be opened whole"))
+      << history->notes()[0];
 }
 
 TEST(RecordedHistory, opensFilesOnly) {
