@@ -135,13 +135,21 @@ void RecordingsFolder::drop(const std::string& name) const {
   if (isRecording(name)) ::unlink(pathOf(name).c_str());
 }
 
-void RecordingsFolder::dropHidden() const {
+void RecordingsFolder::dropHidden(const std::string& name) const {
+  if (isRecording(name)) ::unlink(pathOf(hiddenName(name)).c_str());
+}
+
+void RecordingsFolder::dropHiddenBefore(std::uint64_t timeMs) const {
   std::vector<std::string> hidden;
   std::error_code code;
   for (fs::directory_iterator entry(_path, code), end; !code && entry != end;
        entry.increment(code)) {
     const std::string name = entry->path().filename().string();
-    if (isHidden(name)) hidden.push_back(name);
+    struct stat status {};
+    if (!isHidden(name) || ::lstat(entry->path().c_str(), &status) != 0) continue;
+    // Renaming changes no content, but the file's state.
+    const std::int64_t hiddenMs = std::int64_t{status.st_ctim.tv_sec} * 1000;
+    if (hiddenMs < static_cast<std::int64_t>(timeMs)) hidden.push_back(name);
   }
   for (const std::string& name : hidden) ::unlink(pathOf(name).c_str());
 }

@@ -48,8 +48,9 @@ class RecordingsFolder {
   std::string restore(const std::string& name) const;
   // It is gone after this.
   void drop(const std::string& name) const;
-  // And so are those that are hidden.
-  void dropHidden() const;
+  // And so are hidden ones: this one, or those that were hidden before this time.
+  void dropHidden(const std::string& name) const;
+  void dropHiddenBefore(std::uint64_t timeMs) const;
 
  private:
   std::string _path;

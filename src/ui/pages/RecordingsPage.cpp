@@ -28,11 +28,16 @@ struct RecordingsPage::Known {
   std::string fault;
 };
 
-RecordingsPage::RecordingsPage(RecordingsFolder folder) : _folder(std::move(folder)) {
-  _folder.dropHidden();  // of a viewer that was ended before it could
+// Some may be of a viewer that was ended before it could; those of a day may be of one that runs.
+RecordingsPage::RecordingsPage(RecordingsFolder folder, const Clock& clock)
+    : _folder(std::move(folder)) {
+  constexpr std::uint64_t kDayMs = 24ULL * 60 * 60 * 1000;
+  _folder.dropHiddenBefore(clock.nowMs() - std::min(clock.nowMs(), kDayMs));
 }
 
-RecordingsPage::~RecordingsPage() { _folder.dropHidden(); }
+RecordingsPage::~RecordingsPage() {
+  if (_removed) _folder.dropHidden(*_removed);
+}
 
 void RecordingsPage::changed() {
   describe();
@@ -48,6 +53,7 @@ void RecordingsPage::refresh(const std::string& growing) {
                         before->second.file.changedMs == file.changedMs;
     Known& now = known[file.name];
     if (isSame) now = std::move(before->second);
+    if (!isSame && file.name == _digested) _digest.reset();  // begun with what was there before
     now.file = std::move(file);
   }
   _known = std::move(known);
@@ -102,8 +108,8 @@ void RecordingsPage::undo() {
 }
 
 void RecordingsPage::forget() {
-  _folder.dropHidden();
   if (!_removed) return;
+  _folder.dropHidden(*_removed);
   _removed.reset();
   changed();
 }

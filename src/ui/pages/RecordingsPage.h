@@ -9,6 +9,7 @@
 #include <string>
 #include <vector>
 
+#include "base/Clock.h"
 #include "recording/RecordingsFolder.h"
 
 namespace qel {
@@ -38,7 +39,7 @@ struct RecordingsView {
 // not know in pieces, so that a window stays alive.
 class RecordingsPage {
  public:
-  explicit RecordingsPage(RecordingsFolder folder);
+  explicit RecordingsPage(RecordingsFolder folder, const Clock& clock = systemClock());
   ~RecordingsPage();
 
   // Called after every change of the view.
@@ -52,7 +53,7 @@ class RecordingsPage {
   // Out of the list at once; the file goes for good with the next one, or with forget().
   void remove(const std::string& name);
   void undo();
-  // The page is left: what was deleted is gone now.
+  // The page is left: what was deleted here is gone now.
   void forget();
 
   const RecordingsView& view() const { return _view; }

@@ -76,10 +76,46 @@ TEST_F(RecordingsPageTest, deletesForGoodOnlyWithTheNextOne) {
   EXPECT_TRUE(folder.has("notes.txt"));
 }
 
-TEST_F(RecordingsPageTest, finishesWhatAnEndedViewerDeleted) {
+TEST_F(RecordingsPageTest, finishesAfterADayWhatAnEndedViewerDeleted) {
+  struct LaterClock final : Clock {
+    std::uint64_t nowMs() const override { return systemClock().nowMs() + 25ULL * 60 * 60 * 1000; }
+  };
   folder.file("." + older + ".deleted", "");
-  const RecordingsPage page{RecordingsFolder(folder.path())};
+  { const RecordingsPage page{RecordingsFolder(folder.path())}; }
+  EXPECT_TRUE(folder.has("." + older + ".deleted"));
+  const RecordingsPage page{RecordingsFolder(folder.path()), LaterClock()};
   EXPECT_FALSE(folder.has("." + older + ".deleted"));
+}
+
+TEST_F(RecordingsPageTest, leavesWhatAnotherViewerCanUndo) {
+  RecordingsPage page{RecordingsFolder(folder.path())};
+  page.refresh();
+  page.remove(newer);
+  {
+    RecordingsPage other{RecordingsFolder(folder.path())};
+    other.refresh();
+    other.remove(older);
+    other.forget();
+  }
+  page.undo();
+  EXPECT_EQ(page.view().error, "");
+  EXPECT_EQ(names(page), Names{newer});
+}
+
+TEST_F(RecordingsPageTest, readsAFileAnewThatChangesMeanwhile) {
+  RecordingsPage page{RecordingsFolder(folder.path())};
+  const std::string lines = lineOf(lteCell(1'500'000'000'000, 1));
+  std::string many;
+  for (int i = 0; i < 3000; ++i) many += lines;
+  folder.file(newer, many);
+  page.refresh();
+  EXPECT_TRUE(page.work()) << "not yet all of it";
+  folder.file(newer, lines + lineOf(lteCell(1'500'000'060'000, 2)));
+  page.refresh();
+  while (page.work()) {
+  }
+  EXPECT_EQ(page.view().rows[0].length, "0:01:00");
+  EXPECT_EQ(page.view().rows[0].cells, "2 cells");
 }
 
 TEST_F(RecordingsPageTest, leavesTheOneBeingRecordedAlone) {
