@@ -131,11 +131,17 @@ void RecordingControl::finish(const std::string& why) {
 void RecordingControl::serviceCameBack() {
   if (!_connection || _isTalking) return;
   _isToStop = false;
+  tesk::CommandResult begun;
   {
     const Talk talk(*this);
-    _connection->begin();
+    begun = _connection->begin();
   }
-  if (_isToStop) stop();
+  if (begun.code != 0) {
+    finish("Nothing more can be recorded: " + begun.message);
+    changed();
+  } else if (_isToStop) {
+    stop();
+  }
 }
 
 std::optional<std::chrono::milliseconds> RecordingControl::untilNextTick() const {

@@ -50,7 +50,7 @@ class RecordingControl {
   void start();
   void mark();
   void stop();
-  // The service came back: what was asked of it is asked anew.
+  // The service came back: what was asked of it is asked anew. Where it refuses, this ends.
   void serviceCameBack();
 
   // When tick() is to be called next; nothing: not at all.

@@ -121,6 +121,19 @@ TEST_F(RecordingControlTest, asksAgainWhenTheServiceIsBack) {
   EXPECT_EQ(service->calls[0], tesk::kCommandAddConfiguration);
 }
 
+TEST_F(RecordingControlTest, endsWhenTheServiceThatIsBackRefuses) {
+  control.start();
+  send(lteCell(0, 7));
+  service->answer = [](std::string_view) {
+    return tesk::CommandResult{tesk::kServiceUnreachable, "too many clients"};
+  };
+  control.serviceCameBack();
+  EXPECT_FALSE(control.view().isRecording);
+  EXPECT_EQ(control.view().outcome,
+            "Nothing more can be recorded: too many clients. Kept as " + kName + ": 1 event");
+  EXPECT_EQ(recorded().size(), 1U);
+}
+
 // While the service is waited for, the window handles taps.
 TEST_F(RecordingControlTest, stopsOnceTheServiceHasAnswered) {
   service->answer = [this](std::string_view) {
