@@ -50,6 +50,20 @@ void RecordingDigest::take(const RecordedEvent& event) {
   _cells.emplace(cell->technology, orNone(cell->channel), orNone(cell->code), orNone(cell->cellId));
 }
 
+// In order, a cell without identity comes right behind those of its channel and code.
+std::size_t RecordingDigest::cells() const {
+  std::size_t count = 0;
+  const auto* before = static_cast<const Key*>(nullptr);
+  for (const Key& key : _cells) {
+    const auto& [technology, channel, code, identity] = key;
+    const bool isKnown =
+        identity == orNone(std::nullopt) && before && *before >= Key{technology, channel, code, 0};
+    if (!isKnown) ++count;
+    before = &key;
+  }
+  return count;
+}
+
 bool RecordingDigest::readOn(std::size_t events) {
   for (; events > 0; --events) {
     const auto event = _reader->next();

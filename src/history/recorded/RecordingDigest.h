@@ -26,7 +26,8 @@ class RecordingDigest {
   std::uint64_t lengthMs() const { return _endMs - _beginMs; }
   std::uint64_t beginMs() const { return _beginMs; }
   // Different serving cells; of more than 65,536 no more are counted.
-  std::size_t cells() const { return _cells.size(); }
+  // One whose identity was not told is the one of the same channel and code that has one.
+  std::size_t cells() const;
   // Why reading ended early, or empty.
   std::string fault() const { return _reader->fault() ? _reader->fault()->message : ""; }
 
@@ -38,7 +39,8 @@ class RecordingDigest {
   History _history;
   QuietDispatcher _dispatcher;
   // Technology, channel, code and identity.
-  std::set<std::tuple<Technology, std::uint64_t, std::uint64_t, std::uint64_t>> _cells;
+  using Key = std::tuple<Technology, std::uint64_t, std::uint64_t, std::uint64_t>;
+  std::set<Key> _cells;
   std::uint64_t _events = 0;
   std::uint64_t _beginMs = 0;
   std::uint64_t _endMs = 0;

@@ -24,6 +24,23 @@ TEST(RecordingDigest, countsCellsAndTime) {
   EXPECT_EQ(digest->fault(), "");
 }
 
+TEST(RecordingDigest, countsACellOnceWhoseIdentityIsToldLater) {
+  const TemporaryFolder folder;
+  KCellularLteScellInfo bare;
+  bare.setPhyCellId(1);
+  bare.setDlFreq(1300);
+  const auto withoutIdentity = metricEvent(5000, MetricValidator::K_LTE_SCELL_INFO, bare.data());
+  bare.setPhyCellId(3);
+  const auto never = metricEvent(8000, MetricValidator::K_LTE_SCELL_INFO, bare.data());
+  const std::string path =
+      folder.file("a.jsonl", lineOf(withoutIdentity) + lineOf(lteCell(6000, 1)) +
+                                 lineOf(lteCell(7000, 2)) + lineOf(never));
+  RecordingFault fault;
+  const auto digest = RecordingDigest::open(path, fault);
+  EXPECT_FALSE(digest->readOn(100));
+  EXPECT_EQ(digest->cells(), 3U);
+}
+
 TEST(RecordingDigest, tellsWhyAFileIsNoRecording) {
   const TemporaryFolder folder;
   RecordingFault fault;
