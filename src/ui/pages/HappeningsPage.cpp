@@ -89,12 +89,11 @@ std::string recordName(std::int64_t metric) {
   return metric == 0 || found == catalogue.end() ? std::string() : std::string(found->name);
 }
 
-HappeningRow rowOf(const Happening& happening, std::size_t number, DayHeader& days,
+HappeningRow rowOf(const Happening& happening, std::uint64_t number, DayHeader& days,
                    const TimeZone& zone) {
   HappeningRow row;
   row.timeMs = happening.timeMs;
-  row.id = std::to_string(happening.timeMs) + " " + std::string(nameOf(happening.kind)) + " " +
-           std::to_string(number);
+  row.id = std::to_string(happening.timeMs) + " " + std::to_string(number);
   row.day = days.of(happening.timeMs);
   row.time = secondText(happening.timeMs, zone);
   row.text = happening.text;
@@ -141,7 +140,7 @@ HappeningsPage happeningsPage(const Viewpoint& viewpoint, const HappeningsFilter
   const auto& all = viewpoint.history->happenings();
   std::map<HappeningKind, std::size_t> counts;
   std::size_t older = 0;
-  std::size_t atSameTime = 0;  // happenings before this one, of its time
+  const std::uint64_t gone = viewpoint.history->happeningsGone();
   DayHeader days(viewpoint, zone);
   for (std::size_t i = viewpoint.history->happeningsUntil(viewpoint.nowMs); i > 0; --i) {
     const Happening& happening = all[i - 1];
@@ -151,9 +150,7 @@ HappeningsPage happeningsPage(const Viewpoint& viewpoint, const HappeningsFilter
       ++older;
       continue;
     }
-    atSameTime = 0;
-    while (atSameTime + 1 < i && all[i - 2 - atSameTime].timeMs == happening.timeMs) ++atSameTime;
-    page.rows.push_back(rowOf(happening, atSameTime, days, zone));
+    page.rows.push_back(rowOf(happening, gone + i - 1, days, zone));
   }
   page.kinds = choices(counts, filter);
   page.notice = noticeFor(page);

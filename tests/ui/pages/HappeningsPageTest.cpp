@@ -2,6 +2,8 @@
 
 #include <gtest/gtest.h>
 
+#include <set>
+
 #include "support/FixedTimeZone.h"
 #include "ui/pages/Scene.h"
 
@@ -91,6 +93,19 @@ TEST(HappeningsPage, KeepsTheIdentityOfARow) {
   EXPECT_EQ(after[3].id, before[1].id);
   EXPECT_EQ(after[2].id, before[0].id);
   EXPECT_NE(after[1].id, after[2].id);
+}
+
+TEST(HappeningsPage, GivesEveryRowAnIdentityOfItsOwnWhenTheClockGoesBack) {
+  Scene scene;
+  happen(scene, 5, HappeningKind::mark, "one");
+  happen(scene, 3, HappeningKind::mark, "two");
+  happen(scene, 5, HappeningKind::mark, "three");
+  scene.at(10);
+  std::set<std::string> ids;
+  for (const HappeningRow& row : happeningsPage(scene.viewpoint(), {}, kUtc).rows) {
+    ids.insert(row.id);
+  }
+  EXPECT_EQ(ids.size(), 3U);
 }
 
 TEST(HappeningsPage, CountsTheOlderOnesThatItLeavesOut) {
