@@ -26,8 +26,9 @@ struct UmtsChannels {
   }
 };
 
-// 25.101, clauses 5.3.1 and 5.4: of each band the run of channels, then those between the steps of
-// the raster.
+// 25.101, clauses 5.3.1 and 5.4: of each band the run of channels; then, of bands II, IV to VII and
+// XIX, those between the steps of the raster. Those of X, XII, XIII, XIV, XXV and XXVI are in no
+// band here.
 constexpr std::array kChannels = {
     UmtsChannels{1, 10562, 10838, 0, 1900},    UmtsChannels{2, 9662, 9938, 0, 800},
     UmtsChannels{2, 412, 687, 18501, 800, 25}, UmtsChannels{3, 1162, 1513, 15750, 950},
