@@ -88,10 +88,16 @@ NowLine line(const char* id, std::string text, const char* unknown) {
   return {id, std::move(shown), std::move(spoken), isKnown};
 }
 
+// A band of GSM may name the technology itself: "GSM 900".
+std::string withBand(Technology technology, const std::string& band, std::string_view between) {
+  std::string name(nameOf(technology));
+  if (band.empty()) return name;
+  return band.starts_with(name) ? band : (name += between) += band;
+}
+
 NowLine radioLine(const NowPage& page) {
-  std::string text(nameOf(*page.technology));
   const bool isNumber = *page.technology != Technology::gsm;
-  if (!page.band.empty()) text += (isNumber ? " band " : ", ") + page.band;
+  std::string text = withBand(*page.technology, page.band, isNumber ? " band " : ", ");
   const auto& channel = page.cell ? page.cell->channel : std::nullopt;
   if (channel) {
     const auto down = frequenciesOf(*page.technology, *channel, countryOf(*page.cell)).down;
@@ -199,8 +205,7 @@ NowPage nowPage(const Viewpoint& viewpoint, const Feed& feed) {
   }
   if (page.cell && page.cell->technology != *page.technology) page.cell.reset();
   if (page.cell) page.band = bandOf(*viewpoint.store, *page.cell);
-  page.badge = nameOf(*page.technology);
-  if (!page.band.empty()) page.badge += " " + page.band;
+  page.badge = withBand(*page.technology, page.band, " ");
   page.rrc = connectionWord(*viewpoint.store, *page.technology);
   page.carriers = carrierCount(*viewpoint.store, *page.technology);
   page.lines = {radioLine(page), operatorLine(page.cell), codeLine(*page.technology, page.cell),

@@ -2,6 +2,7 @@
 
 #include <gtest/gtest.h>
 
+#include "messages/gsm.h"
 #include "messages/lte_neighbours.h"
 #include "ui/pages/Scene.h"
 
@@ -38,6 +39,21 @@ TEST(NowPage, SaysWhichCellInFiveLines) {
   EXPECT_EQ(page.rrc, "connected");
   EXPECT_EQ(page.carriers, 2U);
   EXPECT_EQ(page.lines[3].spoken, "TAC 4711, eNodeB 4660, sector 1");
+}
+
+TEST(NowPage, NamesGsmOnceWhereItsBandDoes) {
+  for (const auto& [arfcn, text, badge] :
+       {std::tuple{77U, "GSM 900, 950.4 MHz", "GSM 900"},
+        std::tuple{600U, "GSM, DCS 1800, 1822.8 MHz", "GSM DCS 1800"}}) {
+    Scene scene;
+    KCellularGsmScellInfo cell;
+    cell.setArfcn(arfcn);
+    cell.setMcc(262);
+    scene.validator.feed(MetricValidator::K_GSM_SCELL_INFO, cell);
+    const NowPage page = nowPage(scene.viewpoint(), {});
+    EXPECT_EQ(page.lines[0].text, text);
+    EXPECT_EQ(page.badge, badge);
+  }
 }
 
 TEST(NowPage, KeepsEveryLineInItsPlaceWhenLittleIsKnown) {
