@@ -27,6 +27,15 @@ const Chart& chartOf(const SignalsPage& page, const std::string& id) {
 
 using Texts = std::vector<std::string>;
 
+TEST(SignalsPage, HasAFewTimesAtTheEndOfAllTimes) {
+  Scene scene;
+  Viewpoint viewpoint = scene.viewpoint();
+  viewpoint.nowMs = History::kLatest;
+  const SignalsPage page = signalsPage(viewpoint, {}, kUtc);
+  EXPECT_GT(page.times.size(), 1U);
+  EXPECT_LE(page.times.size(), 7U);
+}
+
 TEST(SignalsPage, SaysWhatWillAppearWhileNothingDoes) {
   const Scene scene;
   const SignalsPage page = signalsPage(scene.viewpoint(), {}, kUtc);
