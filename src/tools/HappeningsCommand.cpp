@@ -100,7 +100,7 @@ void followLive(const Options& options, Output& output) {
   findResources();
   configurationFile();
   output.goOnWithoutReader();
-  auto& history = *new History(kHappeningsAlone);  // the connection outlives this function
+  static auto& history = *new History(kHappeningsAlone);  // the connection outlives this function
   const auto book = std::make_shared<FeedBook>("", options.bus);
   book->setHistory(&history);
   connectToService({.bus = options.bus,

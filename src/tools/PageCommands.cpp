@@ -108,7 +108,7 @@ void followLive(const Options& options, const Describe& describe, Output& output
   findResources();
   configurationFile();
   output.goOnWithoutReader();
-  auto& history = *new History;  // the connection outlives this function
+  static auto& history = *new History;  // the connection outlives this function
   const auto book = std::make_shared<FeedBook>("", options.bus);
   book->setHistory(&history);
   connectToService({.bus = options.bus,

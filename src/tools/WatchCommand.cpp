@@ -73,7 +73,7 @@ void run(const Options& options, Output& /*output*/) {
   watch::TerminalSignals signals;
   findResources();
   configurationFile();
-  auto& watched = *new Watched(options);
+  static auto& watched = *new Watched(options);  // the connection outlives this function
   connect(options, watched, loop);
   const auto& validator = MetricValidator::shared();
   validator->setObserver(&watched.history);  // no event has been taken yet
@@ -88,8 +88,7 @@ void run(const Options& options, Output& /*output*/) {
     watch::Watch watch(*terminal, signals, loop, desk, watched.history);
     watched.book->setObserver([&watch] { watch.feedChanged(); });
     if (const auto& wrapper = validator->mySharedTeskInstance) {
-      wrapper->setLossObserver(
-          [&watched](std::uint64_t dropped) { watched.book->noteDropped(dropped); });
+      wrapper->setLossObserver([](std::uint64_t dropped) { watched.book->noteDropped(dropped); });
     }
     watch.run();
     watched.book->setObserver({});
