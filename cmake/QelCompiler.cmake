@@ -71,6 +71,8 @@ set(QEL_STANDARD_HEADERS
   <algorithm> <array> <chrono> <cstdint> <deque> <functional> <map> <memory> <mutex> <optional>
   <string> <string_view> <thread> <unordered_map> <variant> <vector>)
 
+include(QelBatches)
+
 # qel_add_library(NAME SOURCES … DEPENDS …): a static library of the viewer, included from src/.
 function(qel_add_library name)
   cmake_parse_arguments(ARG "" "" "SOURCES;DEPENDS" ${ARGN})
@@ -78,6 +80,7 @@ function(qel_add_library name)
   target_include_directories(${name} PUBLIC ${CMAKE_SOURCE_DIR}/src)
   target_link_libraries(${name} PUBLIC ${ARG_DEPENDS} PRIVATE qel_warnings)
   qel_count_branches(${name})
+  qel_compile_in_batches(${name})
   if(QEL_SANITIZE AND TARGET qel_base AND NOT name STREQUAL qel_base)
     target_precompile_headers(${name} REUSE_FROM qel_base)
   elseif(QEL_SANITIZE)

@@ -6,13 +6,13 @@
 namespace qel {
 namespace {
 
-struct Sequence {
+struct CodeLength {
   std::size_t length;  // bytes taken, at least 1
   bool valid;
 };
 
 // The sequence that starts at the front of `text` (Unicode 15, table 3-7). `text` is not empty.
-Sequence firstSequence(std::string_view text) {
+CodeLength firstSequence(std::string_view text) {
   const auto byteAt = [text](std::size_t i) { return static_cast<std::uint8_t>(text[i]); };
   const std::uint8_t lead = byteAt(0);
   if (lead < 0x80) return {1, true};
@@ -44,7 +44,7 @@ Sequence firstSequence(std::string_view text) {
 
 bool isValidUtf8(std::string_view text) {
   while (!text.empty()) {
-    const Sequence sequence = firstSequence(text);
+    const CodeLength sequence = firstSequence(text);
     if (!sequence.valid) return false;
     text.remove_prefix(sequence.length);
   }
@@ -55,7 +55,7 @@ std::string withReplacements(std::string_view text) {
   std::string out;
   out.reserve(text.size());
   while (!text.empty()) {
-    const Sequence sequence = firstSequence(text);
+    const CodeLength sequence = firstSequence(text);
     out += sequence.valid ? text.substr(0, sequence.length) : "\xEF\xBF\xBD";
     text.remove_prefix(sequence.length);
   }

@@ -18,7 +18,7 @@
 namespace qel::tools {
 namespace {
 
-struct Options {
+struct DecodeOptions {
   std::string metric;
   std::optional<std::string> hex;
   bool batch = false;
@@ -27,7 +27,7 @@ struct Options {
 
 // The message as the command prints it, or nothing when the bytes are damaged.
 std::optional<std::string> rendered(const MetricMessage& row, ByteView payload,
-                                    const Options& options, const char* quote) {
+                                    const DecodeOptions& options, const char* quote) {
   if (options.reencode) {
     const auto message = row.decode(payload);
     return message ? std::optional(quote + hexText(message->data()) + quote) : std::nullopt;
@@ -61,7 +61,7 @@ Bytes standardInput() {
   return bytes;
 }
 
-void decodeOne(const Options& options, Output& output) {
+void decodeOne(const DecodeOptions& options, Output& output) {
   const std::uint32_t metric = parseMetric(options.metric);
   const MetricMessage* row = findMetricMessage(metric);
   if (!row) throw ToolError(EX_USAGE, options.metric, "no message class decodes this metric");
@@ -105,14 +105,14 @@ Request parseRequest(const std::string& line) {
   return {metricOf(*metric), std::move(*bytes)};
 }
 
-std::string answer(const Request& request, const Options& options) {
+std::string answer(const Request& request, const DecodeOptions& options) {
   const auto identifier = catalogueIdentifier(request.metric);
   const MetricMessage* row = identifier ? findMetricMessage(*identifier) : nullptr;
   const auto text = row ? rendered(*row, request.payload, options, "\"") : std::nullopt;
   return text.value_or("null");
 }
 
-void decodeBatch(const Options& options, Output& output) {
+void decodeBatch(const DecodeOptions& options, Output& output) {
   std::ios::sync_with_stdio(false);
   std::string line;
   for (std::size_t number = 1; std::cin.peek() != EOF; ++number) {
@@ -133,7 +133,7 @@ void decodeBatch(const Options& options, Output& output) {
 
 void addDecodeCommand(CLI::App& app, Action& chosen) {
   auto* command = app.add_subcommand("decode", "Decode payloads into JSON, one line each");
-  const auto options = std::make_shared<Options>();
+  const auto options = std::make_shared<DecodeOptions>();
   auto* metric = command->add_option("METRIC", options->metric,
                                      "Number (decimal, 0x-hex) or name of the metric");
   command->add_option("HEX", options->hex,

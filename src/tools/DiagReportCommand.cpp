@@ -30,7 +30,7 @@ using namespace std::chrono_literals;
 
 constexpr auto kFarewell = 2s;
 
-struct Options {
+struct ReportOptions {
   std::string place;
   double durationS = 60;
 };
@@ -73,7 +73,7 @@ void live(DiagnosticsSession& session, const diagnostics::DiagPort& port,
   }
 }
 
-diagnostics::FrameReader::Counts listen(const Options& options, PacketReport& report) {
+diagnostics::FrameReader::Counts listen(const ReportOptions& options, PacketReport& report) {
   const StopSignals signals(StopSignals::Waiting::fails);
   const auto port = openPort(options.place);
   complain("qelctl", "listening for " + std::to_string(static_cast<int>(options.durationS)) +
@@ -105,7 +105,7 @@ void addDiagReportCommand(CLI::App& app, Action& chosen) {
   command->footer(
       "The report has codes, versions and lengths of packets, and the names of the chip's\n"
       "software. It has nothing of what is in the packets: no identity, no place, no time.");
-  const auto options = std::make_shared<Options>();
+  const auto options = std::make_shared<ReportOptions>();
   command->add_option("PORT", options->place,
                       "A port, found when not given, or a raw log; - is standard input");
   command->add_option("--duration", options->durationS, "Listen to a port for so many seconds")

@@ -28,7 +28,7 @@ using std::chrono::steady_clock;
 constexpr const char* kCsv = "csv";
 constexpr const char* kSqlite = "sqlite";
 
-struct Options {
+struct ExportOptions {
   RecordingOptions recording;
   std::string format;
   std::string out;
@@ -36,7 +36,7 @@ struct Options {
   bool force = false;
 };
 
-std::unique_ptr<TableSink> begin(const Options& options) {
+std::unique_ptr<TableSink> begin(const ExportOptions& options) {
   if (isSameFile(options.recording.file, options.out)) {
     throw ToolError(EX_USAGE, options.out, "is the recording itself");
   }
@@ -60,7 +60,7 @@ std::string counted(std::uint64_t count, const std::string& what) {
 // One export, from the file to what is in its place.
 class Run {
  public:
-  explicit Run(const Options& options) : _options(options) {}
+  explicit Run(const ExportOptions& options) : _options(options) {}
 
   // 0, or the signal that ended it.
   int all();
@@ -71,7 +71,7 @@ class Run {
   void look();
   void summarize(const Exporter::Counts& counts);
 
-  const Options& _options;
+  const ExportOptions& _options;
   RecordProgress _progress;
   const std::unique_ptr<RecordingReader> _reader = open();
   const StopSignals _signals{StopSignals::Waiting::fails};  // before anything is made
@@ -151,7 +151,7 @@ int Run::all() {
 }
 
 // A signal ends the program as it would have, but with nothing left behind.
-void run(const Options& options) {
+void run(const ExportOptions& options) {
   const int signal = Run(options).all();
   if (signal != 0) std::raise(signal);
 }
@@ -167,7 +167,7 @@ void addExportCommand(CLI::App& app, Action& chosen) {
       "of a list is a row. Beside them \"happenings\". Subscriber and temporary identities, SIM "
       "file\n"
       "contents and addresses are replaced by pseudonyms; cells and areas stay.");
-  const auto options = std::make_shared<Options>();
+  const auto options = std::make_shared<ExportOptions>();
   addRecordingOptions(*command, options->recording);
   command->add_option("--format", options->format, "csv or sqlite")
       ->required()

@@ -25,7 +25,7 @@
 namespace qel::tools {
 namespace {
 
-struct Options {
+struct HappeningsOptions {
   RecordingOptions recording;
   std::string bus = "system";
   std::string kind;  // empty: all
@@ -62,7 +62,7 @@ std::string line(const Happening& happening) {
 // Prints what became known since it was last asked to.
 class Printer {
  public:
-  Printer(const Options& options, Output& output)
+  Printer(const HappeningsOptions& options, Output& output)
       : _kind(happeningKindNamed(options.kind)), _json(options.json), _output(output) {}
 
   void printNew(const History& history) {
@@ -85,7 +85,7 @@ class Printer {
   std::uint64_t _next = 0;  // number of the first one that is not printed
 };
 
-void readRecording(const Options& options, Output& output) {
+void readRecording(const HappeningsOptions& options, Output& output) {
   History history(kHappeningsAlone);
   Printer printer(options, output);
   feedRecording(options.recording, history, [&] {
@@ -94,7 +94,7 @@ void readRecording(const Options& options, Output& output) {
   });
 }
 
-void followLive(const Options& options, Output& output) {
+void followLive(const HappeningsOptions& options, Output& output) {
   MainLoop loop;
   loop.watchStandardOutput();
   findResources();
@@ -116,7 +116,7 @@ void followLive(const Options& options, Output& output) {
   std::_Exit(EX_OK);
 }
 
-void run(const Options& options, Output& output) {
+void run(const HappeningsOptions& options, Output& output) {
   setStandardOutput(nullptr);
   if (options.recording.file.empty()) {
     followLive(options, output);
@@ -131,7 +131,7 @@ void addHappeningsCommand(CLI::App& app, Action& chosen) {
   auto* command =
       app.add_subcommand("happenings", "Print what happened in a recording, or what happens");
   command->footer("Without FILE it follows the service until SIGINT or SIGTERM.");
-  const auto options = std::make_shared<Options>();
+  const auto options = std::make_shared<HappeningsOptions>();
   addRecordingOptions(*command, options->recording);
   auto* file = command->get_option("FILE")->required(false);
   addBusOption(*command, options->bus);

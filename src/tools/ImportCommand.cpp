@@ -26,7 +26,7 @@ namespace {
 using diagnostics::RawLog;
 using diagnostics::RawLogEvents;
 
-struct Options {
+struct ImportOptions {
   std::string file;
   std::string out;
   std::optional<double> everyS;
@@ -37,7 +37,7 @@ struct Options {
   bool force = false;
 };
 
-std::unique_ptr<RawLogEvents> open(const Options& options) {
+std::unique_ptr<RawLogEvents> open(const ImportOptions& options) {
   sources::SourceError error;
   auto log = RawLog::open(options.file, error);
   if (!log) throw ToolError(error.exitCode, error.message);
@@ -52,7 +52,7 @@ void check(const RawLog& log) {
   throw ToolError(EX_DATAERR, log.name(), "no frame of a diagnostics port in it");
 }
 
-std::unique_ptr<RecordingWriter> begin(const Options& options) {
+std::unique_ptr<RecordingWriter> begin(const ImportOptions& options) {
   if (options.out == "-") return RecordingWriter::onDescriptor(STDOUT_FILENO, "standard output");
   if (isSameFile(options.file, options.out)) {
     throw ToolError(EX_USAGE, options.out, "is the raw log itself");
@@ -67,7 +67,7 @@ std::unique_ptr<RecordingWriter> begin(const Options& options) {
 }
 
 // False when the recording cannot be written on.
-bool write(RawLogEvents& events, const Options& options, IdentityHider* hider,
+bool write(RawLogEvents& events, const ImportOptions& options, IdentityHider* hider,
            RecordingWriter& writer) {
   MetricThinning thinning(options.everyS);
   while (auto event = events.next()) {
@@ -79,14 +79,15 @@ bool write(RawLogEvents& events, const Options& options, IdentityHider* hider,
   return true;
 }
 
-void summarize(const RawLogEvents& events, const Options& options, const RecordingWriter& writer) {
+void summarize(const RawLogEvents& events, const ImportOptions& options,
+               const RecordingWriter& writer) {
   for (const std::string& line : summaryOf(events)) complain("qelctl", line);
   complain("qelctl", (options.out == "-" ? "standard output" : options.out) + ": " +
                          std::to_string(writer.eventsWritten()) + " events, " +
                          (options.keepIdentities ? "identities kept" : "identities hidden"));
 }
 
-void import(const Options& options) {
+void import(const ImportOptions& options) {
   const auto events = open(options);
   const auto writer = begin(options);
   std::optional<IdentityHider> hider;
@@ -99,7 +100,7 @@ void import(const Options& options) {
   check(events->log());
 }
 
-void inspect(const Options& options, Output& output) {
+void inspect(const ImportOptions& options, Output& output) {
   const auto events = open(options);
   while (events->next()) {
   }
@@ -120,7 +121,7 @@ void addImportCommand(CLI::App& app, Action& chosen) {
       "Events bear the modem's time. Subscriber and temporary identities, SIM file contents and\n"
       "addresses are replaced by pseudonyms. Cells and areas stay: a recording tells where the\n"
       "phone was.");
-  const auto options = std::make_shared<Options>();
+  const auto options = std::make_shared<ImportOptions>();
   command->add_option("FILE", options->file, "Raw log, plain or gzip; - is standard input")
       ->required();
   command->add_option("OUT", options->out,

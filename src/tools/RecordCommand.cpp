@@ -32,7 +32,7 @@ using namespace std::chrono_literals;
 
 constexpr std::size_t kLargestConfiguration = 1024 * 1024;  // bytes
 
-struct Options {
+struct RecordOptions {
   std::string file;
   std::string bus = "system";
   std::optional<double> durationS;
@@ -43,13 +43,13 @@ struct Options {
   bool force = false;
 };
 
-bool goesToStandardOutput(const Options& options) { return options.file == "-"; }
+bool goesToStandardOutput(const RecordOptions& options) { return options.file == "-"; }
 
-std::string nameOf(const Options& options) {
+std::string nameOf(const RecordOptions& options) {
   return goesToStandardOutput(options) ? "standard output" : options.file;
 }
 
-RecordingLimits limitsOf(const Options& options) {
+RecordingLimits limitsOf(const RecordOptions& options) {
   RecordingLimits limits = options.limits;
   limits.fileBytes = options.maxBytes;
   if (options.maxAgeS) {
@@ -59,7 +59,7 @@ RecordingLimits limitsOf(const Options& options) {
   return limits;
 }
 
-std::unique_ptr<RotatingRecording> begin(const Options& options) {
+std::unique_ptr<RotatingRecording> begin(const RecordOptions& options) {
   if (goesToStandardOutput(options)) {
     return RotatingRecording::onDescriptor(STDOUT_FILENO, nameOf(options));
   }
@@ -73,13 +73,13 @@ std::unique_ptr<RotatingRecording> begin(const Options& options) {
   throw ToolError(EX_IOERR, error + (isThere ? " (--force replaces it)" : ""));
 }
 
-std::unique_ptr<IdentityHider> hiderOf(const Options& options) {
+std::unique_ptr<IdentityHider> hiderOf(const RecordOptions& options) {
   if (options.keepIdentities) return nullptr;
   return std::make_unique<IdentityHider>(Pseudonyms::random());
 }
 
-std::string summary(const Options& options, const Recorder& recorder, Clock::duration duration,
-                    std::uint64_t lost) {
+std::string summary(const RecordOptions& options, const Recorder& recorder,
+                    Clock::duration duration, std::uint64_t lost) {
   const Recorder::Progress progress = recorder.progress();
   std::string text = nameOf(options) + ": " +
                      progressText(progress, std::chrono::floor<std::chrono::seconds>(duration));
@@ -99,8 +99,8 @@ std::string summary(const Options& options, const Recorder& recorder, Clock::dur
 }
 
 // Until the end that was asked for, or of what can be recorded.
-void recordOn(const Options& options, MainLoop& loop, Recorder& recorder, RecordProgress& progress,
-              Clock::time_point start) {
+void recordOn(const RecordOptions& options, MainLoop& loop, Recorder& recorder,
+              RecordProgress& progress, Clock::time_point start) {
   std::optional<Clock::time_point> end;
   if (options.durationS) {
     end = start + std::chrono::duration_cast<Clock::duration>(Seconds(*options.durationS));
@@ -117,7 +117,7 @@ void recordOn(const Options& options, MainLoop& loop, Recorder& recorder, Record
   }
 }
 
-void run(const Options& options) {
+void run(const RecordOptions& options) {
   MainLoop loop;
   if (goesToStandardOutput(options)) loop.watchStandardOutput();
   findResources();
@@ -154,7 +154,7 @@ CLI::Validator silent(Checked validator) {
   return validator.description("");
 }
 
-void addLimitOptions(CLI::App& command, Options& options) {
+void addLimitOptions(CLI::App& command, RecordOptions& options) {
   // Beyond any recording, and still a number of milliseconds.
   const auto seconds = silent(CLI::Range(0.001, 1e9));
   const auto bytes = silent(CLI::AsSizeValue(false));
@@ -189,7 +189,7 @@ void addRecordCommand(CLI::App& app, Action& chosen) {
       "Subscriber and temporary identities, SIM file contents and addresses are replaced by\n"
       "pseudonyms. Cells and areas stay: a recording tells where the phone was.\n"
       "It runs until SIGINT or SIGTERM, and goes on when the service comes back.");
-  const auto options = std::make_shared<Options>();
+  const auto options = std::make_shared<RecordOptions>();
   command
       ->add_option("FILE", options->file,
                    "Recording to write, compressed when it ends in .gz; - is standard output")

@@ -19,7 +19,7 @@
 namespace qel::tools {
 namespace {
 
-struct Options {
+struct ScreenOptions {
   RecordingOptions recording;
   std::string technology;
   std::string category;
@@ -45,7 +45,7 @@ std::string asJson(const std::string& technology, const std::string& category) {
       Dictionary{{"key", technology + " " + category}, {"sections", std::move(sections)}});
 }
 
-bool isTable(const Options& options) {
+bool isTable(const ScreenOptions& options) {
   const auto& menu = QelViewItems::shared().firstLevelViewItems;
   const auto names = menu.find(options.technology);
   if (names != menu.end() && std::ranges::count(names->second, options.category) > 0) return true;
@@ -55,13 +55,13 @@ bool isTable(const Options& options) {
 }
 
 // It is drawn all the same: "Come back later" stands for every name.
-void tellOfUnknownTable(const Options& options) {
+void tellOfUnknownTable(const ScreenOptions& options) {
   if (isTable(options)) return;
   complain("qelctl", "no table is named \"" + options.technology + " " + options.category +
                          "\"; qelctl screens FILE draws all there are");
 }
 
-void printTable(const Options& options, Output& output) {
+void printTable(const ScreenOptions& options, Output& output) {
   const TableSnapshot table = draw(options.technology, options.category);
   for (const std::string& line : tableLines(options.technology + " " + options.category, table)) {
     output.line(line);
@@ -70,7 +70,7 @@ void printTable(const Options& options, Output& output) {
 
 void addScreenCommand(CLI::App& app, Action& chosen) {
   auto* command = app.add_subcommand("screen", "Draw one category after a recording");
-  const auto options = std::make_shared<Options>();
+  const auto options = std::make_shared<ScreenOptions>();
   addRecordingOptions(*command, options->recording);
   command->add_option("TECHNOLOGY", options->technology, "Such as LTE")->required();
   command->add_option("CATEGORY", options->category, "Such as \"Tx Power\"")->required();

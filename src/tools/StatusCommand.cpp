@@ -15,7 +15,7 @@ namespace {
 
 using tesk::bus::ServiceStatus;
 
-struct Options {
+struct StatusOptions {
   std::string bus = "system";
   bool json = false;
 };
@@ -105,7 +105,7 @@ void printText(const ServiceStatus& status, Output& output) {
 void addStatusCommand(CLI::App& app, Action& chosen) {
   auto* command =
       app.add_subcommand("status", "Tell what the service does: its source, clients and events");
-  const auto options = std::make_shared<Options>();
+  const auto options = std::make_shared<StatusOptions>();
   addBusOption(*command, options->bus);
   command->add_flag("--json", options->json, "As one JSON object");
   command->callback([options, &chosen] {

@@ -14,11 +14,11 @@ constexpr std::uint8_t kMobilityManagement = 7;  // protocol discriminator
 constexpr std::uint8_t kPlain = 0;
 constexpr std::uint8_t kIntegrityProtected = 1;
 constexpr std::uint8_t kNewIntegrityProtected = 3;
-constexpr std::uint8_t kServiceRequest = 12;
+constexpr std::uint8_t kServiceRequestHeader = 12;
 constexpr std::size_t kSecurityOctets = 6;
 
 // Values of EmmProcedure.
-constexpr std::int32_t kAttach = 1;
+constexpr std::int32_t kAttachAlone = 1;
 constexpr std::int32_t kAttachCombined = 2;
 constexpr std::int32_t kAttachEmergency = 3;
 constexpr std::int32_t kUpdate = 4;
@@ -39,7 +39,7 @@ std::int32_t attachProcedure(std::uint8_t octet) {
     case 6:
       return kAttachEmergency;
     default:
-      return kAttach;
+      return kAttachAlone;
   }
 }
 
@@ -175,7 +175,7 @@ std::optional<EmmMessage> readEmmMessage(ByteView bytes) {
   if (bytes.empty() || (bytes[0] & 0xF) != kMobilityManagement) return std::nullopt;
   EmmMessage message;
   std::uint8_t security = bytes[0] >> 4;
-  if (security >= kServiceRequest) {
+  if (security >= kServiceRequestHeader) {
     message.type = EmmType::serviceRequest;
     message.procedure = kService;
     return message;
