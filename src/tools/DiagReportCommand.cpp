@@ -25,7 +25,7 @@ namespace qel::tools {
 namespace {
 
 using diagnostics::DiagnosticsSession;
-using Clock = DiagnosticsSession::Clock;
+using SteadyClock = DiagnosticsSession::Clock;
 using namespace std::chrono_literals;
 
 constexpr auto kFarewell = 2s;
@@ -60,14 +60,15 @@ std::unique_ptr<diagnostics::DiagPort> openPort(const std::string& wished) {
 
 // Until then, a signal or the end of the session.
 void live(DiagnosticsSession& session, const diagnostics::DiagPort& port,
-          const StopSignals* signals, Clock::time_point end) {
-  while (!session.isOver() && !(signals && signals->arrived()) && Clock::now() < end) {
-    const auto left = std::chrono::ceil<std::chrono::milliseconds>(std::clamp(
-        std::min(end, session.due()) - Clock::now(), Clock::duration::zero(), Clock::duration(1h)));
+          const StopSignals* signals, SteadyClock::time_point end) {
+  while (!session.isOver() && !(signals && signals->arrived()) && SteadyClock::now() < end) {
+    const auto left = std::chrono::ceil<std::chrono::milliseconds>(
+        std::clamp(std::min(end, session.due()) - SteadyClock::now(), SteadyClock::duration::zero(),
+                   SteadyClock::duration(1h)));
     pollfd waited[] = {{port.descriptor(), POLLIN, 0},
                        {signals ? signals->wakeUp().descriptor() : -1, POLLIN, 0}};
     ::poll(waited, 2, static_cast<int>(left.count()));
-    const auto now = Clock::now();
+    const auto now = SteadyClock::now();
     if (waited[0].revents != 0) session.receive(now);
     if (session.due() <= now) session.step(now);
   }
@@ -82,18 +83,18 @@ diagnostics::FrameReader::Counts listen(const ReportOptions& options, PacketRepo
       *port, report,
       {[](std::uint16_t code) { return diagnostics::findLog(code) != nullptr; },
        [](std::uint16_t id) { return diagnostics::findEvent(id) != nullptr; }},
-      {}, Clock::now());
+      {}, SteadyClock::now());
   live(session, *port, &signals,
-       Clock::now() + std::chrono::duration_cast<Clock::duration>(
-                          std::chrono::duration<double>(options.durationS)));
+       SteadyClock::now() + std::chrono::duration_cast<SteadyClock::duration>(
+                                std::chrono::duration<double>(options.durationS)));
   report.note(session.version(), session.build());
   using State = DiagnosticsSession::State;
   if (session.state() == State::silent || session.state() == State::lost) {
     throw ToolError(EX_IOERR, session.state() == State::silent ? "the modem does not answer"
                                                                : "the port has gone");
   }
-  session.end(Clock::now());
-  live(session, *port, nullptr, Clock::now() + kFarewell);
+  session.end(SteadyClock::now());
+  live(session, *port, nullptr, SteadyClock::now() + kFarewell);
   return port->counts();
 }
 

@@ -26,7 +26,7 @@ namespace {
 
 using capture::RecordConnection;
 using capture::Recorder;
-using Clock = MainLoop::Clock;
+using SteadyClock = MainLoop::Clock;
 using Seconds = std::chrono::duration<double>;
 using namespace std::chrono_literals;
 
@@ -67,7 +67,7 @@ std::unique_ptr<RotatingRecording> begin(const RecordOptions& options) {
   std::string error;
   auto recording = RotatingRecording::create(options.file, limitsOf(options),
                                              options.force ? Existing::replaced : Existing::refused,
-                                             Clock::now(), error);
+                                             SteadyClock::now(), error);
   if (recording) return recording;
   const bool isThere = error.ends_with(std::strerror(EEXIST));
   throw ToolError(EX_IOERR, error + (isThere ? " (--force replaces it)" : ""));
@@ -79,7 +79,7 @@ std::unique_ptr<IdentityHider> hiderOf(const RecordOptions& options) {
 }
 
 std::string summary(const RecordOptions& options, const Recorder& recorder,
-                    Clock::duration duration, std::uint64_t lost) {
+                    SteadyClock::duration duration, std::uint64_t lost) {
   const Recorder::Progress progress = recorder.progress();
   std::string text = nameOf(options) + ": " +
                      progressText(progress, std::chrono::floor<std::chrono::seconds>(duration));
@@ -100,14 +100,14 @@ std::string summary(const RecordOptions& options, const Recorder& recorder,
 
 // Until the end that was asked for, or of what can be recorded.
 void recordOn(const RecordOptions& options, MainLoop& loop, Recorder& recorder,
-              RecordProgress& progress, Clock::time_point start) {
-  std::optional<Clock::time_point> end;
+              RecordProgress& progress, SteadyClock::time_point start) {
+  std::optional<SteadyClock::time_point> end;
   if (options.durationS) {
-    end = start + std::chrono::duration_cast<Clock::duration>(Seconds(*options.durationS));
+    end = start + std::chrono::duration_cast<SteadyClock::duration>(Seconds(*options.durationS));
   }
-  Clock::time_point nextLook = start;
+  SteadyClock::time_point nextLook = start;
   while (loop.runOnce(end ? std::min(*end, nextLook) : nextLook)) {
-    const auto now = Clock::now();
+    const auto now = SteadyClock::now();
     if (end && now >= *end) return;
     if (now < nextLook) continue;
     nextLook = now + 1s;
@@ -125,7 +125,7 @@ void run(const RecordOptions& options) {
   requireService(options.bus);
   Recorder recorder(begin(options), hiderOf(options));
   RecordProgress progress;
-  const auto start = Clock::now();
+  const auto start = SteadyClock::now();
   std::unique_ptr<RecordConnection> connection;
   const auto connector = tesk::bus::makeBusConnector(
       {options.bus},
@@ -144,7 +144,7 @@ void run(const RecordOptions& options) {
   connection.reset();
   const bool isWhole = recorder.close() && recorder.error().empty();
   if (recorder.errorNumber() == EPIPE) return;
-  progress.say(summary(options, recorder, Clock::now() - start, lost));
+  progress.say(summary(options, recorder, SteadyClock::now() - start, lost));
   if (!isWhole) throw ToolError(EX_IOERR, recorder.error());
 }
 
