@@ -6,10 +6,9 @@
 
 #include "rrc/BitWriter.h"
 
-namespace qel::rrc {
+namespace qel::rrc::lte {
 namespace {
 
-using namespace lte;
 using testing::BitWriter;
 
 TEST(LteConnectionMessages, tellWhyAConnectionIsAskedFor) {
@@ -270,4 +269,4 @@ TEST(LteConnectionMessages, areNothingWhenThereAreNoBits) {
 }
 
 }  // namespace
-}  // namespace qel::rrc
+}  // namespace qel::rrc::lte

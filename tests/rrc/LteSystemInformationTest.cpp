@@ -6,10 +6,9 @@
 
 #include "rrc/BitWriter.h"
 
-namespace qel::rrc {
+namespace qel::rrc::lte {
 namespace {
 
-using namespace lte;
 using testing::BitWriter;
 
 BitWriter plmn(std::initializer_list<unsigned> mcc, std::initializer_list<unsigned> mnc,
@@ -233,4 +232,4 @@ TEST(LteSystemInformation, tellSeveralBlocksUpToTheFirstThatIsNotRead) {
 }
 
 }  // namespace
-}  // namespace qel::rrc
+}  // namespace qel::rrc::lte
