@@ -21,7 +21,7 @@
 namespace qel::tools {
 namespace {
 
-struct Options {
+struct FieldOptions {
   RecordingOptions recording;
   std::string technology;
   std::string category;
@@ -30,9 +30,11 @@ struct Options {
   bool json = false;
 };
 
-std::string keyOf(const Options& options) { return options.technology + ' ' + options.category; }
+std::string keyOf(const FieldOptions& options) {
+  return options.technology + ' ' + options.category;
+}
 
-FieldSheet sheetOf(const Options& options, const Viewpoint& viewpoint) {
+FieldSheet sheetOf(const FieldOptions& options, const Viewpoint& viewpoint) {
   const auto row =
       rowOfField(viewpoint, options.technology, options.category, options.section, options.field);
   auto sheet =
@@ -103,7 +105,7 @@ void print(const FieldSheet& sheet, Output& output) {
   }
 }
 
-void run(const Options& options, Output& output) {
+void run(const FieldOptions& options, Output& output) {
   if (!findCategory(keyOf(options), Routine::cells)) {
     throw ToolError(EX_USAGE, "no table is named \"" + keyOf(options) + '"');
   }
@@ -124,7 +126,7 @@ void run(const Options& options, Output& output) {
 
 void addFieldCommand(CLI::App& app, Action& chosen) {
   auto* command = app.add_subcommand("field", "Tell all of one field after a recording");
-  const auto options = std::make_shared<Options>();
+  const auto options = std::make_shared<FieldOptions>();
   addRecordingOptions(*command, options->recording);
   command->add_option("TECHNOLOGY", options->technology, "Such as LTE")->required();
   command->add_option("CATEGORY", options->category, "Such as \"Tx Power\"")->required();

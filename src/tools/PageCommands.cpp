@@ -27,7 +27,7 @@ namespace {
 
 using namespace std::chrono_literals;
 
-struct Options {
+struct PageOptions {
   RecordingOptions recording;
   std::string bus = "system";
   bool json = false;
@@ -36,14 +36,15 @@ struct Options {
 
 // What one page has to say at a moment.
 using Lines = std::vector<std::string>;
-using Describe = std::function<Lines(const Options&, const Viewpoint&, const Feed&)>;
+using Describe = std::function<Lines(const PageOptions&, const Viewpoint&, const Feed&)>;
 
-Lines describeNow(const Options& options, const Viewpoint& viewpoint, const Feed& feed) {
+Lines describeNow(const PageOptions& options, const Viewpoint& viewpoint, const Feed& feed) {
   const NowPage page = nowPage(viewpoint, feed);
   return options.json ? Lines{jsonText(asJson(page))} : linesOf(page);
 }
 
-Lines describeSignals(const Options& options, const Viewpoint& viewpoint, const Feed& /*feed*/) {
+Lines describeSignals(const PageOptions& options, const Viewpoint& viewpoint,
+                      const Feed& /*feed*/) {
   SignalsRange range;
   range.spanMs = options.spanSeconds * 1000;
   const SignalsPage page = signalsPage(viewpoint, range);
@@ -55,7 +56,7 @@ void print(const Lines& lines, Output& output) {
 }
 
 // The page after a recording.
-void describeRecording(const Options& options, const Describe& describe, Output& output) {
+void describeRecording(const PageOptions& options, const Describe& describe, Output& output) {
   History history;
   feedRecording(options.recording, history);
   const Viewpoint viewpoint{&history, MetricValidator::shared().get(),
@@ -66,7 +67,7 @@ void describeRecording(const Options& options, const Describe& describe, Output&
 // Prints the page whenever it has changed, at most once a second.
 class LivePage {
  public:
-  LivePage(const Options& options, const Describe& describe, Output& output)
+  LivePage(const PageOptions& options, const Describe& describe, Output& output)
       : _options(options), _describe(describe), _output(output) {}
 
   void print(const History& history, const Feed& feed) {
@@ -95,14 +96,14 @@ class LivePage {
     _output.draw(text);
   }
 
-  const Options& _options;
+  const PageOptions& _options;
   const Describe& _describe;
   Output& _output;
   Lines _printed;
   MainLoop::Clock::time_point _next;
 };
 
-void followLive(const Options& options, const Describe& describe, Output& output) {
+void followLive(const PageOptions& options, const Describe& describe, Output& output) {
   MainLoop loop;
   loop.watchStandardOutput();
   findResources();
@@ -126,7 +127,7 @@ void followLive(const Options& options, const Describe& describe, Output& output
   std::_Exit(EX_OK);
 }
 
-void run(const Options& options, const Describe& describe, Output& output) {
+void run(const PageOptions& options, const Describe& describe, Output& output) {
   setStandardOutput(nullptr);
   if (options.recording.file.empty()) {
     followLive(options, describe, output);
@@ -136,7 +137,7 @@ void run(const Options& options, const Describe& describe, Output& output) {
 }
 
 CLI::App* addPage(CLI::App& app, Action& chosen, const char* name, const char* what,
-                  const std::shared_ptr<Options>& options, Describe describe) {
+                  const std::shared_ptr<PageOptions>& options, Describe describe) {
   auto* command = app.add_subcommand(name, what);
   command->footer("Without FILE it follows the service until SIGINT or SIGTERM.");
   addRecordingOptions(*command, options->recording);
@@ -154,8 +155,8 @@ CLI::App* addPage(CLI::App& app, Action& chosen, const char* name, const char* w
 
 void addPageCommands(CLI::App& app, Action& chosen) {
   addPage(app, chosen, "now", "Tell which cell the phone is on, and how good it is",
-          std::make_shared<Options>(), describeNow);
-  const auto options = std::make_shared<Options>();
+          std::make_shared<PageOptions>(), describeNow);
+  const auto options = std::make_shared<PageOptions>();
   addPage(app, chosen, "signals", "Show curves of the serving cell and its neighbours", options,
           describeSignals)
       ->add_option("--span", options->spanSeconds, "How far back to look, in seconds")

@@ -21,7 +21,7 @@
 namespace qel::tools {
 namespace {
 
-struct Options {
+struct WatchOptions {
   std::string source;
   std::string bus = "system";
   std::string file;
@@ -29,7 +29,7 @@ struct Options {
 
 // What is watched. Held until the process ends: threads of the connection reach it.
 struct Watched {
-  explicit Watched(const Options& options)
+  explicit Watched(const WatchOptions& options)
       : book(std::make_shared<FeedBook>(
             options.file.empty() ? options.source : "recording:" + options.file, options.bus)) {}
 
@@ -43,7 +43,7 @@ void requireTerminal() {
 }
 
 // Connects as the options say; with a recording alone there is nothing to connect to.
-void connect(const Options& options, Watched& watched, MainLoop& loop) {
+void connect(const WatchOptions& options, Watched& watched, MainLoop& loop) {
   if (!options.file.empty()) {
     MetricValidator::shared();
     return;
@@ -64,7 +64,7 @@ void connect(const Options& options, Watched& watched, MainLoop& loop) {
   }
 }
 
-void run(const Options& options, Output& /*output*/) {
+void run(const WatchOptions& options, Output& /*output*/) {
   requireTerminal();
   // Nothing but the pages may come to the screen.
   setStandardOutput(nullptr);
@@ -102,7 +102,7 @@ void run(const Options& options, Output& /*output*/) {
 void addWatchCommand(CLI::App& app, Action& chosen) {
   auto* command = app.add_subcommand("watch", "The viewer in a terminal: pages, tables and keys");
   command->footer("It needs 80x24 characters. Without FILE and --source it follows the service.");
-  const auto options = std::make_shared<Options>();
+  const auto options = std::make_shared<WatchOptions>();
   auto* file =
       command->add_option("FILE", options->file, "Recording (.jsonl or .jsonl.gz) to open");
   auto* source = command

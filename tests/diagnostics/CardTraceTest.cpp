@@ -17,12 +17,12 @@ namespace {
 using test::cardLog;
 using test::CardTrace;
 using test::Heart;
-using testing::Contains;
-using testing::ElementsAre;
-using testing::IsEmpty;
-using testing::Not;
-using testing::Pair;
-using testing::UnorderedElementsAre;
+using ::testing::Contains;
+using ::testing::ElementsAre;
+using ::testing::IsEmpty;
+using ::testing::Not;
+using ::testing::Pair;
+using ::testing::UnorderedElementsAre;
 
 constexpr std::uint16_t kLog = 0x1098;
 

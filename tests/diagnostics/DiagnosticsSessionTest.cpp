@@ -16,8 +16,8 @@ using namespace std::chrono_literals;
 using State = DiagnosticsSession::State;
 using test::ModemBrain;
 using test::PacketLog;
-using testing::IsEmpty;
-using testing::SizeIs;
+using ::testing::IsEmpty;
+using ::testing::SizeIs;
 
 // The modem's answers are there as soon as the request is said.
 class PlayedPort final : public DiagPort {
@@ -91,9 +91,9 @@ TEST_F(DiagnosticsSessionTest, SwitchesAllOffThenAsksThenSwitchesOnWhatIsWanted)
   begin();
   passTime(500ms);
   EXPECT_EQ(session->state(), State::listening);
-  EXPECT_THAT(port.said, testing::ElementsAre("events off", "messages off", "logs off", "build",
-                                              "version", "log ranges", "log mask", "log mask",
-                                              "event mask", "events on"));
+  EXPECT_THAT(port.said, ::testing::ElementsAre("events off", "messages off", "logs off", "build",
+                                                "version", "log ranges", "log mask", "log mask",
+                                                "event mask", "events on"));
   EXPECT_TRUE(port.brain.sends(0xB0C0));
   EXPECT_TRUE(port.brain.sends(0x1098));
   EXPECT_FALSE(port.brain.sends(0xB0C1));
@@ -212,7 +212,7 @@ TEST_F(DiagnosticsSessionTest, ReadsTheMasksBackOnASharedPort) {
   EXPECT_EQ(session->state(), State::listening);
   port.said.clear();
   passTime(30s);
-  EXPECT_THAT(port.said, testing::Not(IsEmpty()));
+  EXPECT_THAT(port.said, ::testing::Not(IsEmpty()));
   EXPECT_EQ(session->replacedMasks(), 1U);
 }
 

@@ -13,8 +13,8 @@ namespace {
 using test::framed;
 using test::joined;
 using test::logPacket;
-using testing::ElementsAre;
-using testing::IsEmpty;
+using ::testing::ElementsAre;
+using ::testing::IsEmpty;
 
 const Bytes kPacket = logPacket(0xB193, Bytes{0x7E, 1, 0x7D, 2, 0x5E, 0x5D, 0});
 const Bytes kOther = logPacket(0xB0C2, Bytes{3});

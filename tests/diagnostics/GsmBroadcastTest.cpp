@@ -15,8 +15,8 @@ using test::Broadcast;
 using test::Heart;
 using test::PacketService;
 using test::RadioChannel;
-using testing::ElementsAre;
-using testing::IsEmpty;
+using ::testing::ElementsAre;
+using ::testing::IsEmpty;
 
 constexpr std::uint16_t kLog = 0x512F;
 

@@ -15,8 +15,8 @@ using test::BodyWriter;
 using test::Broadcast;
 using test::Heart;
 using test::RadioChannel;
-using testing::ElementsAre;
-using testing::IsEmpty;
+using ::testing::ElementsAre;
+using ::testing::IsEmpty;
 
 constexpr std::uint32_t kBand900 = 8U << 12;
 constexpr std::uint32_t kBand1900 = 10U << 12;

@@ -17,10 +17,10 @@ using test::BodyWriter;
 using test::fromPhone;
 using test::Heart;
 using test::toPhone;
-using testing::Contains;
-using testing::ElementsAre;
-using testing::IsEmpty;
-using testing::SizeIs;
+using ::testing::Contains;
+using ::testing::ElementsAre;
+using ::testing::IsEmpty;
+using ::testing::SizeIs;
 
 constexpr std::uint16_t kLog = 0x713A;
 

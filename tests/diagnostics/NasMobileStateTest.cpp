@@ -12,9 +12,9 @@ namespace {
 
 using test::BodyWriter;
 using test::Heart;
-using testing::ElementsAre;
-using testing::IsEmpty;
-using testing::SizeIs;
+using ::testing::ElementsAre;
+using ::testing::IsEmpty;
+using ::testing::SizeIs;
 
 KCellularMmContext mmOf(const Heart& heart) {
   return heart.report<KCellularMmContext>(metric::kMmContext);

@@ -17,9 +17,9 @@ using test::kSomeTimeMs;
 using test::logPacket;
 using test::PacketLog;
 using test::wrapped;
-using testing::ElementsAre;
-using testing::IsEmpty;
-using testing::SizeIs;
+using ::testing::ElementsAre;
+using ::testing::IsEmpty;
+using ::testing::SizeIs;
 
 struct Reading {
   PacketLog log;

@@ -17,8 +17,8 @@ namespace {
 
 using test::BodyWriter;
 using test::ModemBrain;
-using testing::IsEmpty;
-using testing::SizeIs;
+using ::testing::IsEmpty;
+using ::testing::SizeIs;
 using Answer = Request::Answer;
 
 LogRanges someRanges() {
@@ -204,8 +204,8 @@ TEST(LogMask, NeverEnablesKeysAndIdentities) {
       if ((mask.bits()[item / 8] >> item % 8 & 1) == 0) off.insert(mask.equipment() << 12 | item);
     }
   }
-  EXPECT_THAT(off, testing::ElementsAre(0x7139, 0xB0A3, 0xB0A5, 0xB0B3, 0xB0B5, 0xB0EF, 0xB0F2,
-                                        0xB0F3, 0xB0F4));
+  EXPECT_THAT(off, ::testing::ElementsAre(0x7139, 0xB0A3, 0xB0A5, 0xB0B3, 0xB0B5, 0xB0EF, 0xB0F2,
+                                          0xB0F3, 0xB0F4));
 }
 
 }  // namespace

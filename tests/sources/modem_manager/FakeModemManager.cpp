@@ -11,9 +11,9 @@ namespace {
 
 const std::string kService = "org.freedesktop.ModemManager1";
 const std::string kRoot = "/org/freedesktop/ModemManager1";
-const std::string kModem = "org.freedesktop.ModemManager1.Modem";
-const std::string kSignal = kModem + ".Signal";
-const std::string kLocation = kModem + ".Location";
+const std::string kModemInterface = "org.freedesktop.ModemManager1.Modem";
+const std::string kSignal = kModemInterface + ".Signal";
+const std::string kLocation = kModemInterface + ".Location";
 
 }  // namespace
 
@@ -92,7 +92,7 @@ FakeModemManager::Object& FakeModemManager::make(const std::string& path,
           [held = &property](sdbus::PropertyGetReply& reply) { held->write(reply); });
     }
   }
-  if (made->interfaces.contains(kModem)) addMethods(*made->object, path);
+  if (made->interfaces.contains(kModemInterface)) addMethods(*made->object, path);
   made->object->finishRegistration();
   return *(_objects[path] = std::move(made));
 }
@@ -209,7 +209,7 @@ void FakeModemManager::method(sdbus::IObject& object, const std::string& interfa
 }
 
 void FakeModemManager::addMethods(sdbus::IObject& object, const std::string& path) {
-  method(object, kModem, "GetCellInfo", "", "aa{sv}",
+  method(object, kModemInterface, "GetCellInfo", "", "aa{sv}",
          [this](sdbus::MethodCall&, sdbus::MethodReply& reply) { reply << _cells; });
   method(object, kLocation, "GetLocation", "", "a{uv}",
          [this](sdbus::MethodCall&, sdbus::MethodReply& reply) {
