@@ -29,7 +29,7 @@ namespace {
 
 using namespace std::chrono_literals;
 
-struct LiveOptions {
+struct FollowOptions {
   std::string bus = "system";
   std::string loggedEvents = "none";
   std::vector<std::string> screen;  // technology and category, or empty
@@ -97,7 +97,7 @@ void showTable(MainLoop& loop, Output& output, const std::vector<std::string>& s
   }
 }
 
-void chooseLog(const LiveOptions& options, bool verbose) {
+void chooseLog(const FollowOptions& options, bool verbose) {
   const LoggedEvents events = *loggedEventsNamed(options.loggedEvents);
   std::shared_ptr<LogSink> log = std::make_shared<NullSink>();
   using Sink = SystemLogSink;
@@ -109,7 +109,7 @@ void chooseLog(const LiveOptions& options, bool verbose) {
   setSystemLog(std::make_shared<EventLog>(std::move(log), events));
 }
 
-void run(const LiveOptions& options, bool verbose, Output& output) {
+void run(const FollowOptions& options, bool verbose, Output& output) {
   chooseLog(options, verbose);
   MainLoop loop;
   loop.watchStandardOutput();
@@ -140,7 +140,7 @@ void addLiveCommand(CLI::App& app, Action& chosen, const bool& verbose) {
   auto* command = app.add_subcommand(
       "live", "Connect as the viewer does; print the lines, or draw one category");
   command->footer("It runs until SIGINT or SIGTERM, and goes on when the service comes back.");
-  const auto options = std::make_shared<LiveOptions>();
+  const auto options = std::make_shared<FollowOptions>();
   addBusOption(*command, options->bus);
   command
       ->add_option("--screen", options->screen,
