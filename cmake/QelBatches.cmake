@@ -4,7 +4,9 @@
 # are by themselves, are for work on a few files, and find a forgotten #include.
 option(QEL_BATCHES "Compile the sources of a target in batches, which takes half the time" OFF)
 set(QEL_BATCH_SIZE 16)
+set(QEL_NAME_WARNINGS -Wshadow)
 if(QEL_BATCHES AND CMAKE_CXX_COMPILER_ID STREQUAL "GNU")
+  set(QEL_NAME_WARNINGS -Wshadow=local -Wno-subobject-linkage)  # neighbours' names do not count
   add_compile_options(--param=ggc-min-heapsize=400000)  # kB; a batch fills the usual ones often
 endif()
 

@@ -58,10 +58,12 @@ function(qel_count_branches name)
   endif()
 endfunction()
 
+include(QelBatches)
+
 # Our own code only; generated foreign code links without it.
 add_library(qel_warnings INTERFACE)
 target_compile_options(qel_warnings INTERFACE
-  -Wall -Wextra -Wpedantic -Wshadow -Wconversion -Wsign-conversion -Wold-style-cast
+  -Wall -Wextra -Wpedantic ${QEL_NAME_WARNINGS} -Wconversion -Wsign-conversion -Wold-style-cast
   -Wnon-virtual-dtor -Woverloaded-virtual -Wformat=2 -Werror
   $<$<CXX_COMPILER_ID:GNU>:-Wno-restrict>)  # GCC 12 sees overlaps in std::string that are not there
 
@@ -70,8 +72,6 @@ target_compile_options(qel_warnings INTERFACE
 set(QEL_STANDARD_HEADERS
   <algorithm> <array> <chrono> <cstdint> <deque> <functional> <map> <memory> <mutex> <optional>
   <string> <string_view> <thread> <unordered_map> <variant> <vector>)
-
-include(QelBatches)
 
 # qel_add_library(NAME SOURCES … DEPENDS …): a static library of the viewer, included from src/.
 function(qel_add_library name)
