@@ -96,7 +96,8 @@ void printMessage(Printer& printer, const Descriptor& message) {
   for (const FieldCode& field : fields) printLines(printer, field.member);
   if (!bits.empty()) printer.Print(variables, "PresenceWord<$scalars$> _has = 0;\n");
   printer.Outdent();
-  printer.Print("\n public:\n  static constexpr auto kFields = std::tuple{\n");
+  printer.Print(
+      "\n public:\n  template <class Self>\n  static constexpr auto kFields = std::tuple{\n");
   printer.Indent();
   printer.Indent();
   printer.Indent();

@@ -88,14 +88,14 @@ const Template kScalar = {
     {{"$type$ $name$() const", "return _$name$;"},
      {"void set$Name$($type$ value)", "_$name$ = value;\n  setHas$Name$(true);"}},
     "$type$ _$name$ = {};\n",
-    "ScalarField<$Message$, $type$, Encoding::$encoding$>",
+    "ScalarField<Self, $type$, Encoding::$encoding$>",
     {"$bit$"}};
 
 const Template kEnum = {
     {{"std::int32_t $name$() const", "return has$Name$() ? _$name$ : 0;"},
      {"void set$Name$(std::int32_t value)", "_$name$ = value;\n  setHas$Name$(true);"}},
     "std::int32_t _$name$ = {};\n",
-    "EnumField<$Message$>",
+    "EnumField<Self>",
     {"$bit$", "$names$"}};
 
 const Template kObject = {{{"const $held$& $name$() const", "return _$name$;"},
@@ -113,7 +113,7 @@ const Template kRepeatedMessage = {
      {"const std::shared_ptr<$Nested$>& $one$AtIndex(std::size_t index) const",
       "return _$name$.at(index);"}},
     "MessageList<$Nested$> _$name$;\n",
-    "RepeatedMessageField<$Message$, $Nested$>"};
+    "RepeatedMessageField<Self, $Nested$>"};
 
 const Template kPacked = {
     {{"const $type$* $name$() const", "return _$name$.list();"},
@@ -124,7 +124,7 @@ const Template kPacked = {
      {"void set$Name$(const $type$* list, std::size_t count)",
       "$Family$Set(_$name$, list, count);"}},
     "$Family$ _$name$;\n",
-    "PackedField<$Message$, $type$, Encoding::$encoding$>"};
+    "PackedField<Self, $type$, Encoding::$encoding$>"};
 
 std::string renderAccessors(const Variables& variables, const std::vector<Accessor>& accessors) {
   std::string code;
@@ -137,21 +137,20 @@ std::string renderAccessors(const Variables& variables, const std::vector<Access
 
 std::string renderRow(const Variables& variables, const Template& chosen) {
   std::vector<std::string> values = {render(variables, "$number$"), render(variables, "\"$key$\""),
-                                     render(variables, "&$Message$::_$name$")};
+                                     render(variables, "&Self::_$name$")};
   for (const char* value : chosen.rowEnd) values.push_back(render(variables, value));
   return rowLines(render(variables, chosen.row), values, kRowIndent);
 }
 
 // The template for the field, with the variables that only this kind has.
 const Template& chooseTemplate(const FieldDescriptor& field, Variables& variables) {
-  const std::string& message = variables["Message"];
   if (field.type() == FieldDescriptor::TYPE_MESSAGE) {
     const std::string& nested = field.message_type()->name();
     variables["Nested"] = nested;
     if (field.is_repeated()) return kRepeatedMessage;
     variables["held"] = "std::shared_ptr<" + nested + ">";
     variables["Kind"] = "Message";
-    variables["arguments"] = message + ", " + nested;
+    variables["arguments"] = "Self, " + nested;
     return kObject;
   }
   if (field.is_repeated()) {
@@ -174,7 +173,7 @@ const Template& chooseTemplate(const FieldDescriptor& field, Variables& variable
   const bool text = field.type() == FieldDescriptor::TYPE_STRING;
   variables["held"] = text ? "std::optional<std::string>" : "std::optional<Bytes>";
   variables["Kind"] = text ? "String" : "Data";
-  variables["arguments"] = message;
+  variables["arguments"] = "Self";
   return kObject;
 }
 

@@ -58,7 +58,7 @@ class AnyOrderTarget {
   }
 
  private:
-  static constexpr std::size_t kFieldCount = std::tuple_size_v<decltype(Message::kFields)>;
+  static constexpr std::size_t kFieldCount = std::tuple_size_v<FieldsOf<Message>>;
 
   template <class Nested>
   static Cursor readNested(Dictionary& nested, Cursor cursor) {
@@ -76,14 +76,14 @@ class AnyOrderTarget {
   }
   template <std::size_t index>
   static constexpr bool kIsPackedField =
-      kIsPacked<std::remove_cvref_t<decltype(std::get<index>(Message::kFields))>>;
+      kIsPacked<std::remove_cvref_t<decltype(std::get<index>(kFieldsOf<Message>))>>;
   template <std::size_t index>
   bool isThere() const {
     return kIsPackedField<index> || !_values[index].isNull() || !_lists[index].empty();
   }
   template <std::size_t index>
   void give(Entries& entries) {
-    constexpr auto& field = std::get<index>(Message::kFields);
+    constexpr auto& field = std::get<index>(kFieldsOf<Message>);
     if (!_values[index].isNull()) {
       entries.append(field.key, std::move(_values[index]));
     } else if (isThere<index>()) {

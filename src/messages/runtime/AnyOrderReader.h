@@ -23,8 +23,8 @@ Cursor readNumbered(Target& target, Cursor cursor, std::uint32_t number, std::ui
                     std::index_sequence<index...>) {
   Cursor next = cursor;
   const bool known =
-      ((number == std::get<index>(Message::kFields).number &&
-        (next = target.template take<index>(cursor, std::get<index>(Message::kFields)), true)) ||
+      ((number == std::get<index>(kFieldsOf<Message>).number &&
+        (next = target.template take<index>(cursor, std::get<index>(kFieldsOf<Message>)), true)) ||
        ...);
   return known ? next : skipUnknown(cursor, number, wireType);
 }
@@ -35,7 +35,7 @@ Cursor readNumbered(Target& target, Cursor cursor, std::uint32_t number, std::ui
 template <class Message, class Target>
 Cursor readInAnyOrder(Target& target, Cursor cursor) {
   constexpr std::uint8_t kEndOfGroup = 4;
-  using Fields = std::make_index_sequence<std::tuple_size_v<decltype(Message::kFields)>>;
+  using Fields = std::make_index_sequence<std::tuple_size_v<FieldsOf<Message>>>;
   while (!cursor.isAtEnd()) {
     const auto [tag, next] = readVarint(cursor);
     cursor.at = next;

@@ -20,15 +20,14 @@ template <class... Field>
 inline constexpr std::size_t kPackedFields<std::tuple<Field...>> = (std::size_t{kIsPacked<Field>} +
                                                                     ... + 0);
 template <class Message>
-inline constexpr std::size_t kPackedFieldsOf =
-    kPackedFields<std::remove_cv_t<decltype(Message::kFields)>>;
+inline constexpr std::size_t kPackedFieldsOf = kPackedFields<FieldsOf<Message>>;
 
 // Makes room for the entries of a part. Each takes a tag and a value, but for a last one whose
 // value is not there, and for packed fields: where the part is short there is room for no more than
 // that, which keeps memory in proportion to the input.
 template <class Message>
 [[gnu::always_inline]] inline void reserveEntries(Dictionary::Entries& entries, Cursor part) {
-  constexpr std::size_t kFieldCount = std::tuple_size_v<decltype(Message::kFields)>;
+  constexpr std::size_t kFieldCount = std::tuple_size_v<FieldsOf<Message>>;
   if (part.left() >= kFieldCount) [[likely]] {
     entries.reserve(kFieldCount);
   } else {

@@ -73,7 +73,7 @@ struct Tag {
 // Gives the field with this index to the target if it comes next. Whether reading is over.
 template <class Message, std::size_t index, class Target>
 [[gnu::always_inline]] inline bool readExpected(Target& target, Cursor& cursor) {
-  constexpr auto& field = std::get<index>(Message::kFields);
+  constexpr auto& field = std::get<index>(kFieldsOf<Message>);
   using Field = std::remove_cvref_t<decltype(field)>;
   using FieldTag = Tag<field.number << 3 | kWireType<Field>>;
   // A number that may be a metric's is left to the rules for any order.
@@ -102,7 +102,7 @@ template <class Message, class Target, std::size_t... index>
 // Stops in front of what is not in order.
 template <class Message, class Target>
 [[gnu::always_inline]] inline Cursor readInOrder(Target& target, Cursor cursor) {
-  constexpr std::size_t kFieldCount = std::tuple_size_v<decltype(Message::kFields)>;
+  constexpr std::size_t kFieldCount = std::tuple_size_v<FieldsOf<Message>>;
   return readInOrder<Message>(target, cursor, std::make_index_sequence<kFieldCount>());
 }
 

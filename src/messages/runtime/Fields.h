@@ -1,5 +1,6 @@
 // The rows of a message's field table. Every message class has a constant tuple of them, kFields,
-// in ascending field number; the codec rules are written once over these tables.
+// in ascending field number; the codec rules are written once over these tables. The compiler makes
+// a table where it is used: what only handles messages is spared the time.
 #pragma once
 
 #include <algorithm>
@@ -102,10 +103,15 @@ constexpr Name nameOf(std::span<const EnumName> names, std::int32_t value) {
   return found != names.end() && found->value == value ? found->name : Name();
 }
 
+template <class Message>
+inline constexpr const auto& kFieldsOf = Message::template kFields<Message>;
+template <class Message>
+using FieldsOf = std::remove_cvref_t<decltype(kFieldsOf<Message>)>;
+
 // Calls visit(field) for every row of the message's table, in field order.
 template <class Message, class Visitor>
 constexpr void forEachField(Visitor&& visit) {
-  std::apply([&visit](const auto&... field) { (visit(field), ...); }, Message::kFields);
+  std::apply([&visit](const auto&... field) { (visit(field), ...); }, kFieldsOf<Message>);
 }
 
 }  // namespace qel

@@ -71,7 +71,7 @@ constexpr FieldShape shapeOfField(const PackedField<Message, T, encoding>& field
 template <class Message>
 struct ShapeOf {
   static constexpr auto kFields = std::apply(
-      [](const auto&... field) { return std::array{shapeOfField(field)...}; }, Message::kFields);
+      [](const auto&... field) { return std::array{shapeOfField(field)...}; }, kFieldsOf<Message>);
   static constexpr MessageShape kShape = {Message::kClassName, kFields};
 };
 

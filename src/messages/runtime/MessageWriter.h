@@ -55,8 +55,6 @@ template <class... Field>
 inline constexpr bool kOnlyScalars<std::tuple<Field...>> = ((kFieldRoom<Field> > 0) && ...);
 
 template <class Message>
-using FieldsOf = std::remove_cv_t<decltype(Message::kFields)>;
-template <class Message>
 inline constexpr std::size_t kRoom = kRoomOf<FieldsOf<Message>>;
 
 // A nested message of scalars whose length always is one byte.
