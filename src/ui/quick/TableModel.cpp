@@ -12,7 +12,7 @@ namespace {
 
 constexpr int kNoRow = -1;  // of the cell of an empty section
 
-QString shown(const std::optional<std::string>& text) {
+QString textOrNone(const std::optional<std::string>& text) {
   return text ? QString::fromStdString(*text) : QString();
 }
 
@@ -41,13 +41,13 @@ QVariant TableModel::data(const QModelIndex& index, int role) const {
   const Row& row = _rows[static_cast<std::size_t>(index.row())];
   switch (role) {
     case sectionTitleRole:
-      return shown(row.sectionTitle);
+      return textOrNone(row.sectionTitle);
     case cellRole:
       return QString::fromStdString(row.cell.cellIdentifier);
     case textRole:
-      return shown(row.cell.text);
+      return textOrNone(row.cell.text);
     case detailRole:
-      return shown(row.cell.detail);
+      return textOrNone(row.cell.detail);
     case noticeRole:
       return isNotice(row.cell);
     case changesRole:

@@ -12,8 +12,8 @@ namespace {
 const std::string kService = "org.freedesktop.ModemManager1";
 const std::string kRoot = "/org/freedesktop/ModemManager1";
 const std::string kModemInterface = "org.freedesktop.ModemManager1.Modem";
-const std::string kSignal = kModemInterface + ".Signal";
-const std::string kLocation = kModemInterface + ".Location";
+const std::string kSignalInterface = kModemInterface + ".Signal";
+const std::string kLocationInterface = kModemInterface + ".Location";
 
 }  // namespace
 
@@ -211,40 +211,42 @@ void FakeModemManager::method(sdbus::IObject& object, const std::string& interfa
 void FakeModemManager::addMethods(sdbus::IObject& object, const std::string& path) {
   method(object, kModemInterface, "GetCellInfo", "", "aa{sv}",
          [this](sdbus::MethodCall&, sdbus::MethodReply& reply) { reply << _cells; });
-  method(object, kLocation, "GetLocation", "", "a{uv}",
+  method(object, kLocationInterface, "GetLocation", "", "a{uv}",
          [this](sdbus::MethodCall&, sdbus::MethodReply& reply) {
            reply << std::map<std::uint32_t, sdbus::Variant>{{1U, sdbus::Variant(_place)}};
          });
-  method(object, kLocation, "Location.Setup", "ub", "",
+  method(object, kLocationInterface, "Location.Setup", "ub", "",
          [this, path](sdbus::MethodCall& call, sdbus::MethodReply&) {
            std::uint32_t sources = 0;
            bool signals = false;
            call >> sources >> signals;
            _places.emplace_back(sources, signals);
            Object& modem = *_objects.at(path);
-           auto& location = modem.interfaces.at(kLocation);
+           auto& location = modem.interfaces.at(kLocationInterface);
            location.at("Enabled").write = FakeProperty(sources).write;
            location.at("SignalsLocation").write = FakeProperty(signals).write;
-           modem.object->emitPropertiesChangedSignal(kLocation, {"Enabled", "SignalsLocation"});
+           modem.object->emitPropertiesChangedSignal(kLocationInterface,
+                                                     {"Enabled", "SignalsLocation"});
          });
-  method(object, kSignal, "SetupThresholds", "a{sv}", "",
+  method(object, kSignalInterface, "SetupThresholds", "a{sv}", "",
          [this, path](sdbus::MethodCall& call, sdbus::MethodReply&) {
            FakeDictionary thresholds;
            call >> thresholds;
            const auto rssi = thresholds.at("rssi-threshold").get<std::uint32_t>();
            _thresholds.push_back(rssi);
            Object& modem = *_objects.at(path);
-           modem.interfaces.at(kSignal).at("RssiThreshold").write = FakeProperty(rssi).write;
-           modem.object->emitPropertiesChangedSignal(kSignal, {"RssiThreshold"});
+           modem.interfaces.at(kSignalInterface).at("RssiThreshold").write =
+               FakeProperty(rssi).write;
+           modem.object->emitPropertiesChangedSignal(kSignalInterface, {"RssiThreshold"});
          });
-  method(object, kSignal, "Setup", "u", "",
+  method(object, kSignalInterface, "Setup", "u", "",
          [this, path](sdbus::MethodCall& call, sdbus::MethodReply&) {
            std::uint32_t rate = 0;
            call >> rate;
            _rates.push_back(rate);
            Object& modem = *_objects.at(path);
-           modem.interfaces.at(kSignal).at("Rate").write = FakeProperty(rate).write;
-           modem.object->emitPropertiesChangedSignal(kSignal, {"Rate"});
+           modem.interfaces.at(kSignalInterface).at("Rate").write = FakeProperty(rate).write;
+           modem.object->emitPropertiesChangedSignal(kSignalInterface, {"Rate"});
          });
 }
 
