@@ -5,6 +5,10 @@
 
 namespace qel {
 
+std::string counted(std::uint64_t count, std::string_view what) {
+  return std::to_string(count) + " " + std::string(what) + (count == 1 ? "" : "s");
+}
+
 std::string sizeText(std::uint64_t bytes) {
   constexpr std::array kUnits = {"kB", "MB", "GB", "TB"};
   if (bytes < 1000) return std::to_string(bytes) + " bytes";

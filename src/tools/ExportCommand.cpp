@@ -9,6 +9,7 @@
 #include <optional>
 #include <string>
 
+#include "base/Amounts.h"
 #include "export/CsvSink.h"
 #include "export/Exporter.h"
 #include "export/SqliteSink.h"
@@ -51,10 +52,6 @@ std::unique_ptr<TableSink> begin(const ExportOptions& options) {
   const bool isThere =
       error.ends_with(std::strerror(EEXIST)) || error.ends_with(std::strerror(ENOTEMPTY));
   throw ToolError(EX_IOERR, error + (isThere ? " (--force replaces what is there)" : ""));
-}
-
-std::string counted(std::uint64_t count, const std::string& what) {
-  return std::to_string(count) + " " + what + (count == 1 ? "" : "s");
 }
 
 // One export, from the file to what is in its place.

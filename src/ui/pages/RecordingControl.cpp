@@ -18,10 +18,6 @@ constexpr const char* kHidden =
     "Hidden: subscriber and temporary identities, SIM files and addresses. Cells, areas, networks "
     "and times stay: a recording tells where the phone was, and when.";
 
-std::string counted(std::uint64_t count, const std::string& what) {
-  return std::to_string(count) + " " + what + (count == 1 ? "" : "s");
-}
-
 }  // namespace
 
 // The service is waited for as long as this lives.

@@ -12,10 +12,6 @@ namespace {
 
 constexpr std::size_t kEventsAtOnce = 2048;
 
-std::string counted(std::size_t count, const std::string& what) {
-  return std::to_string(count) + " " + what + (count == 1 ? "" : "s");
-}
-
 }  // namespace
 
 // A file as it was when it was looked at last.
