@@ -4,22 +4,10 @@
 
 #include "export/HappeningTable.h"
 #include "history/MarkHappening.h"
-#include "messages/catalogue/KBBMetricUtility.h"
 #include "messages/catalogue/TagLog.h"
+#include "recording/RecordedMetric.h"
 
 namespace qel {
-namespace {
-
-const MetricMessage* messageOf(const Dictionary& event) {
-  const Value* metric = event.find(kRecordedMetricKey);
-  const auto identifier = metric ? metric->asInt64() : std::nullopt;
-  if (!identifier || *identifier < kMetricEventBase || *identifier > kMetricEventBase + 0xFFFF) {
-    return nullptr;
-  }
-  return findMetricMessage(static_cast<std::uint32_t>(*identifier - kMetricEventBase));
-}
-
-}  // namespace
 
 Exporter::Exporter(TableSink& sink, IdentityHider* hider)
     : _sink(sink), _hider(hider), _dispatcher(&_history) {}
@@ -30,10 +18,8 @@ bool Exporter::report(const RecordedEvent& event) {
     ++_counts.without;
     return true;
   }
-  const Value* payload = event.entries.find(kRecordedPayloadKey);
-  const Bytes* bytes = payload ? payload->asBytes() : nullptr;
   const CountedTagLines tagLines;
-  auto record = message->describe(bytes ? ByteView(*bytes) : ByteView());
+  auto record = message->describe(payloadOf(event.entries));
   if (!record) return true;
   const MetricTable& table = _tables.try_emplace(message->identifier, *message).first->second;
   ++_counts.events;

@@ -1,14 +1,12 @@
 #include "service/EventSubject.h"
 
-#include "messages/catalogue/KBBMetricUtility.h"
 #include "messages/catalogue/MetricMessages.h"
+#include "messages/catalogue/MetricNumber.h"
 #include "service/ReportContent.h"
 #include "tesk/Constants.h"
 
 namespace qel::service {
 namespace {
-
-constexpr std::int64_t kLargestMetric = 0xFFFF;
 
 std::optional<std::int64_t> integerUnder(std::string_view key, const Dictionary& entries,
                                          std::string& reason) {
@@ -45,14 +43,14 @@ bool examinePayload(const MetricMessage& message, const Dictionary& entries, Eve
 std::optional<EventSubject> examineMetric(const Dictionary& entries, EventFault& fault) {
   const auto identifier = integerUnder(tesk::kKeyMetricID, entries, fault.reason);
   if (!identifier) return std::nullopt;
-  const std::int64_t metric = *identifier - std::int64_t{kMetricEventBase};
-  if (metric < 0 || metric > kLargestMetric) {
+  const auto metric = metricOfNumber(*identifier);
+  if (!metric) {
     fault.reason = "kKeyMetricID " + std::to_string(*identifier) + " is no metric's";
     return std::nullopt;
   }
-  const MetricMessage* message = findMetricMessage(static_cast<std::uint32_t>(metric));
+  const MetricMessage* message = findMetricMessage(*metric);
   if (message && !examinePayload(*message, entries, fault)) return std::nullopt;
-  return EventSubject{true, metric};
+  return EventSubject{true, *metric};
 }
 
 }  // namespace

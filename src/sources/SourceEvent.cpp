@@ -2,7 +2,7 @@
 
 #include <utility>
 
-#include "messages/catalogue/KBBMetricUtility.h"
+#include "messages/catalogue/MetricNumber.h"
 
 namespace qel::sources {
 
@@ -18,10 +18,7 @@ std::optional<std::uint32_t> metricOf(const SourceEvent& event) {
   if (event.stream != tesk::kEventMetric) return std::nullopt;
   const Value* value = event.entries.find(tesk::kKeyMetricID);
   const auto identifier = value ? value->asInt64() : std::nullopt;
-  if (!identifier || *identifier < kMetricEventBase || *identifier > kMetricEventBase + 0xFFFF) {
-    return std::nullopt;
-  }
-  return static_cast<std::uint32_t>(*identifier - kMetricEventBase);
+  return identifier ? metricOfNumber(*identifier) : std::nullopt;
 }
 
 }  // namespace qel::sources

@@ -1,10 +1,8 @@
 #include "history/recorded/QuietDispatcher.h"
 
 #include "base/DroppedOutput.h"
-#include "messages/catalogue/KBBMetricUtility.h"
-#include "messages/catalogue/MetricMessages.h"
 #include "messages/catalogue/TagLog.h"
-#include "recording/RecordedEvent.h"
+#include "recording/RecordedMetric.h"
 
 namespace qel {
 
@@ -14,17 +12,9 @@ QuietDispatcher::QuietDispatcher(MetricObserver* observer)
 }
 
 bool QuietDispatcher::isReadable(const Dictionary& event) {
-  const Value* metric = event.find(kRecordedMetricKey);
-  const auto identifier = metric ? metric->asInt64() : std::nullopt;
-  if (!identifier || *identifier < kMetricEventBase || *identifier > kMetricEventBase + 0xFFFF) {
-    return true;
-  }
-  const auto* message =
-      findMetricMessage(static_cast<std::uint32_t>(*identifier - kMetricEventBase));
-  const Value* payload = event.find(kRecordedPayloadKey);
-  const Bytes* bytes = payload ? payload->asBytes() : nullptr;
+  const MetricMessage* message = messageOf(event);
   const CountedTagLines tagLines;
-  return !message || message->isReadable(bytes ? ByteView(*bytes) : ByteView());
+  return !message || message->isReadable(payloadOf(event));
 }
 
 bool QuietDispatcher::take(const Dictionary& event, std::uint64_t receivedMs) {

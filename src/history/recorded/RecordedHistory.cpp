@@ -1,13 +1,12 @@
 #include "history/recorded/RecordedHistory.h"
 
-#include <sys/stat.h>
-
 #include <algorithm>
 #include <limits>
 #include <utility>
 
 #include "base/TimeZone.h"
 #include "history/MarkHappening.h"
+#include "history/recorded/OpenedRecording.h"
 #include "history/recorded/QuietDispatcher.h"
 
 namespace qel {
@@ -81,13 +80,7 @@ std::unique_ptr<RecordedHistory> RecordedHistory::open(const std::string& path,
 std::unique_ptr<RecordedHistory> RecordedHistory::open(const std::string& path,
                                                        RecordingFault& fault,
                                                        const Limits& limits) {
-  struct stat status {};
-  // A pipe would hold the window up.
-  if (::stat(path.c_str(), &status) == 0 && !S_ISREG(status.st_mode)) {
-    fault = {RecordingFault::Kind::notOpened, path + ": no regular file"};
-    return nullptr;
-  }
-  auto reader = RecordingReader::open(path, RecordingReader::BadLines::skip, fault);
+  auto reader = openedRecording(path, fault);
   if (!reader) return nullptr;
   return std::unique_ptr<RecordedHistory>(
       new RecordedHistory(std::make_unique<State>(std::move(reader), limits)));

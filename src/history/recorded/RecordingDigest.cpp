@@ -1,12 +1,11 @@
 #include "history/recorded/RecordingDigest.h"
 
-#include <sys/stat.h>
-
 #include <algorithm>
 #include <array>
 #include <limits>
 #include <utility>
 
+#include "history/recorded/OpenedRecording.h"
 #include "metrics/MetricValidator.h"
 
 namespace qel {
@@ -25,12 +24,7 @@ std::uint64_t orNone(const std::optional<std::uint32_t>& number) {
 
 std::unique_ptr<RecordingDigest> RecordingDigest::open(const std::string& path,
                                                        RecordingFault& fault) {
-  struct stat status {};
-  if (::stat(path.c_str(), &status) == 0 && !S_ISREG(status.st_mode)) {
-    fault = {RecordingFault::Kind::notOpened, path + ": no regular file"};
-    return nullptr;
-  }
-  auto reader = RecordingReader::open(path, RecordingReader::BadLines::skip, fault);
+  auto reader = openedRecording(path, fault);
   if (!reader) return nullptr;
   return std::unique_ptr<RecordingDigest>(new RecordingDigest(std::move(reader)));
 }

@@ -3,20 +3,14 @@
 #include <utility>
 #include <vector>
 
-#include "messages/catalogue/KBBMetricUtility.h"
+#include "recording/RecordedMetric.h"
 #include "recording/privacy/IdentityTable.h"
 
 namespace qel {
 namespace {
 
 const MetricMessage* messageOf(const RecordedEvent& event) {
-  if (event.kind != RecordedKind::metric) return nullptr;
-  const Value* value = event.entries.find(kRecordedMetricKey);
-  const auto identifier = value ? value->asInt64() : std::nullopt;
-  constexpr std::int64_t kBase{kMetricEventBase};
-  constexpr std::int64_t kWidest = 0xFFFF;
-  if (!identifier || *identifier < kBase || *identifier > kBase + kWidest) return nullptr;
-  return findMetricMessage(static_cast<std::uint32_t>(*identifier - kBase));
+  return event.kind == RecordedKind::metric ? qel::messageOf(event.entries) : nullptr;
 }
 
 bool isNumber(const Value& value) {
