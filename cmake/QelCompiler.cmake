@@ -10,6 +10,9 @@ if(QEL_CCACHE AND NOT CMAKE_CXX_COMPILER_LAUNCHER)
   set(CMAKE_CXX_COMPILER_LAUNCHER ${QEL_CCACHE})
 endif()
 
+# The same objects in whatever folder, for the compiler cache and for packages that can be compared.
+add_compile_options(-ffile-prefix-map=${CMAKE_SOURCE_DIR}/=)
+
 set(QEL_SANITIZE "" CACHE STRING "Sanitizers to build with, as for -fsanitize=")
 if(QEL_SANITIZE)
   add_compile_options(-fsanitize=${QEL_SANITIZE} -fno-sanitize-recover=all -fno-omit-frame-pointer -g1)
