@@ -1,4 +1,5 @@
-// Time and allocations of each work, for one payload. Takes the options of Google Benchmark.
+// Time and allocations of each work, for one payload. Takes --recording FILE and the options of
+// Google Benchmark.
 
 #include <benchmark/benchmark.h>
 
@@ -6,6 +7,7 @@
 #include <vector>
 
 #include "AllocationCounter.h"
+#include "Mixes.h"
 #include "Report.h"
 #include "Works.h"
 #include "base/LogSink.h"
@@ -24,10 +26,10 @@ void measure(benchmark::State& state, const Work& work) {
     for (std::size_t i = 0; i < count; ++i) step(i);
     allocated += allocations() - before;
   }
-  const auto payloads = static_cast<double>(count);
-  state.counters["payloads"] = payloads;
+  const auto pieces = static_cast<double>(work.pieces);
+  state.counters["payloads"] = pieces;
   state.counters["allocations"] =
-      static_cast<double>(allocated) / (static_cast<double>(state.iterations()) * payloads);
+      static_cast<double>(allocated) / (static_cast<double>(state.iterations()) * pieces);
 }
 
 }  // namespace
@@ -35,10 +37,12 @@ void measure(benchmark::State& state, const Work& work) {
 
 int main(int argc, char** argv) {
   qel::setSystemLog(nullptr);
-  qel::bench::checkPeers();
+  std::vector<char*> given(argv, argv + argc);
+  const auto mixes = qel::bench::takeMixes(given);
+  qel::bench::checkPeers(mixes);
   std::vector<std::string> names;
-  for (const auto& work : qel::bench::works()) {
-    names.push_back(work.group + '|' + std::string(work.who));
+  for (const auto& work : qel::bench::works(mixes)) {
+    names.push_back(work.group + '|' + std::string(work.who) + '|' + std::string(work.mix));
     benchmark::RegisterBenchmark(names.back().c_str(), qel::bench::measure, work);
   }
   // Short repetitions by turns, so that what else the machine does falls on all alike.
@@ -46,7 +50,7 @@ int main(int argc, char** argv) {
   std::string time = "--benchmark_min_time=0.05";
   std::string turns = "--benchmark_enable_random_interleaving=true";
   std::vector<char*> arguments{argv[0], repetitions.data(), time.data(), turns.data()};
-  arguments.insert(arguments.end(), argv + 1, argv + argc);
+  arguments.insert(arguments.end(), given.begin() + 1, given.end());
   auto count = static_cast<int>(arguments.size());
   benchmark::Initialize(&count, arguments.data());
   if (benchmark::ReportUnrecognizedArguments(count, arguments.data())) return 1;

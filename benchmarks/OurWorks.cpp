@@ -87,9 +87,17 @@ Step textOurs(const std::vector<Payload>& payloads) {
   };
 }
 
-Step timeOurs(const std::vector<Payload>&) {
-  return [dates = DateTexts(systemTimeZone())](std::size_t i) mutable {
-    benchmark::DoNotOptimize(dates.at(static_cast<double>(kMixStartMs + i * kMixStepMs)).data());
+std::vector<std::uint64_t> timesOf(const std::vector<Payload>& payloads) {
+  return forEach(payloads, [](const Payload& payload) {
+    const auto entries = findMetricMessage(payload.metric)->describe(payload.bytes);
+    const Value* time = entries ? entries->find("timestamp") : nullptr;
+    return time ? time->asUInt64().value_or(kMixStartMs) : kMixStartMs;
+  });
+}
+
+Step timeOurs(const std::vector<Payload>& payloads) {
+  return [times = timesOf(payloads), dates = DateTexts(systemTimeZone())](std::size_t i) mutable {
+    benchmark::DoNotOptimize(dates.at(static_cast<double>(times[i])).data());
   };
 }
 

@@ -15,6 +15,9 @@ Step eventOurs(const std::vector<Payload>& payloads);
 // The same with a history that listens, at 100 events a second.
 Step eventWithHistory(const std::vector<Payload>& payloads);
 
+// When each was reported, in milliseconds; those that do not say so, at the start of a drawn mix.
+std::vector<std::uint64_t> timesOf(const std::vector<Payload>& payloads);
+
 // A metric event as the service sends it.
 Dictionary eventOf(const Payload& payload);
 

@@ -2,7 +2,6 @@
 
 #include <array>
 #include <memory>
-#include <numeric>
 #include <random>
 
 #include "messages/gsm.h"
@@ -195,13 +194,6 @@ std::vector<Payload> phoneMix(std::size_t count) {
     time += kMixStepMs;
   }
   return payloads;
-}
-
-double meanSize(const std::vector<Payload>& payloads) {
-  const std::size_t total =
-      std::accumulate(payloads.begin(), payloads.end(), std::size_t{0},
-                      [](std::size_t sum, const Payload& one) { return sum + one.bytes.size(); });
-  return static_cast<double>(total) / static_cast<double>(payloads.size());
 }
 
 }  // namespace qel::bench

@@ -1,4 +1,4 @@
-// One table in Markdown of all works: time and allocations for one payload.
+// Tables in Markdown of all works: time and allocations for one payload, mix beside mix.
 #pragma once
 
 #include <benchmark/benchmark.h>
@@ -10,7 +10,7 @@
 namespace qel::bench {
 
 // Keeps the least time of each work's repetitions; the ratio is to the first of the same work.
-// Benchmarks are named "work|who" and count "payloads" (an iteration) and "allocations" (a
+// Benchmarks are named "work|who|mix" and count "payloads" (an iteration) and "allocations" (a
 // payload).
 class Report final : public benchmark::BenchmarkReporter {
  public:
@@ -22,13 +22,18 @@ class Report final : public benchmark::BenchmarkReporter {
   void Finalize() override;
 
  private:
-  struct Row {
+  struct Cell {
     std::string name;
+    std::string work, who, mix;
     double nanoseconds = std::numeric_limits<double>::infinity();
     double allocations = 0;
   };
+  using Cells = std::vector<const Cell*>;
 
-  std::vector<Row> _rows;
+  // The work's rows; before them the head of a table when its mixes are others than those above.
+  void printWork(const Cells& cells, std::vector<std::string>& columns);
+
+  std::vector<Cell> _cells;
 };
 
 }  // namespace qel::bench

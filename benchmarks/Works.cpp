@@ -1,7 +1,9 @@
 #include "Works.h"
 
 #include <algorithm>
+#include <deque>
 
+#include "ListMix.h"
 #include "OurWorks.h"
 #include "messages/catalogue/MetricMessages.h"
 #include "peers/PeerWorks.h"
@@ -9,62 +11,125 @@
 namespace qel::bench {
 namespace {
 
-const std::vector<Payload>& mix() {
-  static const std::vector<Payload> payloads = phoneMix(2000);
-  return payloads;
+struct Doer {
+  const char* who;
+  Step (*prepare)(const std::vector<Payload>& payloads);
+};
+
+using Doers = std::vector<Doer>;
+
+struct Group {
+  const char* name;
+  Doers doers;
+};
+
+const std::vector<Group>& groups() {
+  static const std::vector<Group> all = {
+      {"decode a fresh message",
+       {{"libprotobuf", decodeStock},
+        {"protozero, stack", decodeProtozero},
+        {"protozero, shared", keepProtozero},
+        {"nanopb", decodeNanopb},
+        {"ours", decodeOurs}}},
+      {"decode, dictionary, visit every entry",
+       {{"libprotobuf", entriesStock},
+        {"protozero", entriesProtozero},
+        {"protozero, a row of views", entriesFlat},
+        {"ours", dictionaryOurs}}},
+      {"encode a kept message",
+       {{"libprotobuf", encodeStock},
+        {"protozero", encodeProtozero},
+        {"nanopb", encodeNanopb},
+        {"ours", encodeOurs}}},
+      {"text of a dictionary",
+       {{"fmt", textFmt}, {"of a struct, generated", textPlain}, {"ours", textOurs}}},
+      {"time text, warm",
+       {{"strftime", timeStrftime}, {"strftime, kept for a minute", timeKept}, {"ours", timeOurs}}},
+      {"one metric event",
+       {{"libprotobuf, message and line kept", eventStock},
+        {"protozero, struct and line kept", eventProtozero},
+        {"libprotobuf, std::map, streams", eventNaive},
+        {"ours", eventOurs}}},
+      {"one metric event, and what is kept of it",
+       {{"ours without history", eventOurs}, {"ours with history", eventWithHistory}}},
+  };
+  return all;
 }
 
-// The mix by metric, in the order in which they first occur.
-const std::vector<std::vector<Payload>>& mixByMetric() {
-  static const auto byMetric = [] {
-    std::vector<std::vector<Payload>> metrics;
-    for (const Payload& payload : mix()) {
-      const auto found = std::ranges::find_if(
-          metrics, [&](const auto& payloads) { return payloads.front().metric == payload.metric; });
-      (found != metrics.end() ? *found : metrics.emplace_back()).push_back(payload);
+struct Class {
+  std::uint32_t metric;
+  std::deque<Mix> mixes;  // what there is of the class in each
+};
+
+// In the order in which they first occur.
+std::deque<Class> classesOf(const std::vector<Mix>& mixes) {
+  std::deque<Class> classes;
+  for (const Mix& mix : mixes) {
+    for (const Payload& payload : mix.payloads) {
+      auto found = std::ranges::find(classes, payload.metric, &Class::metric);
+      if (found == classes.end()) found = classes.insert(found, {payload.metric, {}});
+      auto& parts = found->mixes;
+      if (parts.empty() || parts.back().name != mix.name) parts.push_back({mix.name, {}});
+      parts.back().payloads.push_back(payload);
     }
-    return metrics;
-  }();
-  return byMetric;
+  }
+  return classes;
 }
 
-void addDecoding(std::vector<Work>& works, const std::string& group,
-                 const std::vector<Payload>& payloads) {
-  works.push_back({group, "libprotobuf", decodeStock, &payloads});
-  works.push_back({group, "protozero, stack", decodeProtozero, &payloads});
-  works.push_back({group, "protozero, shared", keepProtozero, &payloads});
-  works.push_back({group, "nanopb", decodeNanopb, &payloads});
-  works.push_back({group, "ours", decodeOurs, &payloads});
+struct List {
+  Mix mix;
+  std::size_t elements;
+};
+
+const std::vector<List>& lists() {
+  static const auto all = [] {
+    std::vector<List> lists;
+    for (const std::uint32_t length : {1U, 10U, 100U, 1000U, 10000U}) {
+      auto payloads = listPayloads(length);
+      const std::size_t elements = length * payloads.size();
+      lists.push_back({{std::to_string(length), std::move(payloads)}, elements});
+    }
+    return lists;
+  }();
+  return all;
 }
 
 }  // namespace
 
-std::vector<Work> works() {
+std::vector<Work> works(const std::vector<Mix>& mixes) {
   std::vector<Work> works;
-  addDecoding(works, "decode a fresh message", mix());
-
-  const auto add = [&](const char* group, const char* who, auto prepare) {
-    works.push_back({group, who, prepare, &mix()});
+  const auto add = [&works](const std::string& group, const Doers& doers, const auto& parts) {
+    for (const Doer& doer : doers) {
+      for (const Mix& mix : parts) {
+        works.push_back(
+            {group, doer.who, mix.name, doer.prepare, &mix.payloads, mix.payloads.size()});
+      }
+    }
   };
-  add("decode, dictionary, visit every entry", "libprotobuf", entriesStock);
-  add("decode, dictionary, visit every entry", "protozero", entriesProtozero);
-  add("decode, dictionary, visit every entry", "ours", dictionaryOurs);
-  add("encode a kept message", "libprotobuf", encodeStock);
-  add("encode a kept message", "protozero", encodeProtozero);
-  add("encode a kept message", "nanopb", encodeNanopb);
-  add("encode a kept message", "ours", encodeOurs);
-  add("text of a dictionary", "fmt", textFmt);
-  add("text of a dictionary", "ours", textOurs);
-  add("time text, warm", "strftime", timeStrftime);
-  add("time text, warm", "ours", timeOurs);
-  add("one metric event", "libprotobuf, std::map, streams", eventStock);
-  add("one metric event", "ours", eventOurs);
-  add("one metric event, and what is kept of it", "ours without history", eventOurs);
-  add("one metric event, and what is kept of it", "ours with history", eventWithHistory);
+  for (const Group& group : groups()) add(group.name, group.doers, mixes);
 
-  for (const auto& payloads : mixByMetric()) {
-    const auto name = findMetricMessage(payloads.front().metric)->className;
-    addDecoding(works, "decode " + std::string(name), payloads);
+  static std::deque<Class> classes;
+  classes = classesOf(mixes);
+  const Doers decoders = {{"libprotobuf", decodeStock},
+                          {"protozero, stack", decodeProtozero},
+                          {"protozero, shared", keepProtozero},
+                          {"ours", decodeOurs}};
+  for (const Class& one : classes) {
+    const auto name = findMetricMessage(one.metric)->className;
+    add("decode " + std::string(name), decoders, one.mixes);
+  }
+
+  const Group ofLists = {"an element of a list",
+                         {{"ours, decoded", decodeOurs},
+                          {"ours, as dictionary", dictionaryOurs},
+                          {"ours, encoded", encodeOurs},
+                          {"ours, as text", textOurs},
+                          {"ours, as event", eventOurs}}};
+  for (const Doer& doer : ofLists.doers) {
+    for (const List& list : lists()) {
+      works.push_back(
+          {ofLists.name, doer.who, list.mix.name, doer.prepare, &list.mix.payloads, list.elements});
+    }
   }
   return works;
 }

@@ -5,11 +5,14 @@
 #include <array>
 #include <cstdlib>
 
+#include "gsm.nano.h"
 #include "lte_neighbours.nano.h"
 #include "lte_rrc.nano.h"
 #include "lte_serving.nano.h"
 #include "nas.nano.h"
 #include "peers/PeerMessages.h"
+#include "sim.nano.h"
+#include "wcdma.nano.h"
 
 namespace qel::bench {
 namespace {
@@ -38,7 +41,7 @@ std::shared_ptr<const void> keep(ByteView payload) {
 
 template <class Message>
 std::string_view encode(const void* kept, std::string& memory) {
-  constexpr std::size_t kLongest = 4096;
+  constexpr std::size_t kLongest = 65536;
   if (memory.empty()) memory.resize(kLongest);
   pb_ostream_t stream =
       pb_ostream_from_buffer(reinterpret_cast<pb_byte_t*>(memory.data()), memory.size());
@@ -46,21 +49,15 @@ std::string_view encode(const void* kept, std::string& memory) {
   return std::string_view(memory).substr(0, stream.bytes_written);
 }
 
-template <class Message>
-constexpr PeerMessage peer(std::uint32_t metric) {
-  return {metric, decode<Message>, keep<Message>, encode<Message>};
-}
-
+#define PEER(metric, Message)                                                   \
+  PeerMessage {                                                                 \
+    metric, decode<qelwatch_schema_##Message>, keep<qelwatch_schema_##Message>, \
+        encode<qelwatch_schema_##Message>                                       \
+  }
 constexpr std::array kMessages = {
-    peer<qelwatch_schema_KCellularLteRsrpRsrqSinr>(20330),
-    peer<qelwatch_schema_KCellularLteTxPower>(54018),
-    peer<qelwatch_schema_KCellularLteNbrEutraCellMeas>(54031),
-    peer<qelwatch_schema_KCellularLteRrcState>(19972),
-    peer<qelwatch_schema_KCellularLteScellInfo>(16578),
-    peer<qelwatch_schema_KCellularLteSelReselCellInfo>(54030),
-    peer<qelwatch_schema_KCellularEmmContext>(54540),
-    peer<qelwatch_schema_KCellularActivatedBearerContexts>(54541),
+#include <metrics.inc>
 };
+#undef PEER
 
 }  // namespace
 

@@ -12,6 +12,7 @@
 #include "OurWorks.h"
 #include "base/Rendering.h"
 #include "messages/catalogue/MetricMessages.h"
+#include "peers/FlatEntries.h"
 #include "peers/PeerMessages.h"
 #include "peers/PeerWorks.h"
 #include "peers/PlainEntries.h"
@@ -67,7 +68,11 @@ void fill(Message& message) {
     } else if (field.cpp_type() == FieldDescriptor::CPPTYPE_MESSAGE) {
       for (int k = 0; k < 2; ++k) fill(*reflection.AddMessage(&message, &field));
     } else {
-      for (const std::uint32_t number : {1U, 300U}) reflection.AddUInt32(&message, &field, number);
+      const bool isSigned = field.cpp_type() == FieldDescriptor::CPPTYPE_INT32;
+      for (const int number : {1, 300}) {
+        isSigned ? reflection.AddInt32(&message, &field, -number)
+                 : reflection.AddUInt32(&message, &field, static_cast<std::uint32_t>(number));
+      }
     }
   }
 }
@@ -83,6 +88,15 @@ Payload fullPayload(std::uint32_t metric) {
 std::string fmtText(EntriesReader (*readerOf)(std::uint32_t), const Payload& payload) {
   std::string text;
   appendFmt(text, readerOf(payload.metric)(payload.bytes));
+  return text;
+}
+
+std::string plainText(const Payload& payload) {
+  const PlainRecord& record = findPlainRecord(payload.metric);
+  const auto message = record.make();
+  record.read(message.get(), payload.bytes);
+  std::string text;
+  record.appendText(message.get(), {}, text);
   return text;
 }
 
@@ -110,6 +124,10 @@ void checkEntries(const Payload& payload) {
   const std::string text = jsonText(ours.value());
   require(fmtText(stockEntries, payload) == text, "libprotobuf", payload.metric);
   require(fmtText(protozeroEntries, payload) == text, "protozero", payload.metric);
+  require(plainText(payload) == text, "generated text", payload.metric);
+  FlatEntries row;
+  readFlat(fieldsOf(payload.metric), payload.bytes, row);
+  require(flatText(row) == text, "protozero's row", payload.metric);
 }
 
 // The lines that an event gives, their characters sorted: the entries of a std::map are in another
@@ -127,18 +145,22 @@ std::string charactersOf(Step (*prepare)(const std::vector<Payload>&), const Pay
 }
 
 void checkEvent(const Payload& payload) {
-  require(charactersOf(eventStock, payload) == charactersOf(eventOurs, payload), "plain event",
-          payload.metric);
+  const std::string ours = charactersOf(eventOurs, payload);
+  require(charactersOf(eventStock, payload) == ours, "event by libprotobuf", payload.metric);
+  require(charactersOf(eventProtozero, payload) == ours, "event by protozero", payload.metric);
+  require(charactersOf(eventNaive, payload) == ours, "plain event", payload.metric);
 }
 
 }  // namespace
 
-void checkPeers() {
-  for (const Payload& payload : phoneMix(500)) {
-    checkOurs(payload);
-    checkCodec(payload);
-    checkEntries(payload);
-    checkEvent(payload);
+void checkPeers(const std::vector<Mix>& mixes) {
+  for (const Mix& mix : mixes) {
+    for (const Payload& payload : mix.payloads) {
+      checkOurs(payload);
+      checkCodec(payload);
+      checkEntries(payload);
+      checkEvent(payload);
+    }
   }
   for (const PeerMessage& message : protozeroMessages()) {
     const Payload full = fullPayload(message.metric);

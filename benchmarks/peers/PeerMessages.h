@@ -1,8 +1,9 @@
-// The message classes of the mix, by peers that know nothing like a common base class.
+// The message classes of all metrics, by peers that know nothing like a common base class.
 #pragma once
 
 #include <cstdint>
 #include <memory>
+#include <optional>
 #include <span>
 #include <string>
 #include <string_view>
@@ -24,5 +25,16 @@ std::span<const PeerMessage> nanopbMessages();
 
 // Ends the program when there is none of the metric.
 const PeerMessage& findPeerMessage(std::span<const PeerMessage> messages, std::uint32_t metric);
+
+// A message that is read into again and again, and its text.
+struct PlainRecord {
+  std::uint32_t metric;
+  std::shared_ptr<void> (*make)();
+  // What was there goes. The time of the report, or nothing.
+  std::optional<std::uint64_t> (*read)(void* message, ByteView payload);
+  void (*appendText)(const void* message, std::string_view time, std::string& out);
+};
+
+const PlainRecord& findPlainRecord(std::uint32_t metric);
 
 }  // namespace qel::bench

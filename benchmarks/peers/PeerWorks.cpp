@@ -8,6 +8,9 @@
 #include <ctime>
 #include <memory>
 
+#include "OurWorks.h"
+#include "peers/FlatEntries.h"
+#include "peers/KeptTime.h"
 #include "peers/PeerMessages.h"
 #include "peers/PlainEntries.h"
 #include "peers/StockMessages.h"
@@ -114,6 +117,15 @@ Step entriesProtozero(const std::vector<Payload>& payloads) {
   return visitBy(protozeroEntries, payloads);
 }
 
+Step entriesFlat(const std::vector<Payload>& payloads) {
+  const auto fields = [](const Payload& payload) { return &fieldsOf(payload.metric); };
+  return
+      [&payloads, tables = forEach(payloads, fields), row = FlatEntries()](std::size_t i) mutable {
+        readFlat(*tables[i], payloads[i].bytes, row);
+        benchmark::DoNotOptimize(visit(row));
+      };
+}
+
 Step decodeNanopb(const std::vector<Payload>& payloads) {
   return decodeBy(nanopbMessages(), payloads);
 }
@@ -133,14 +145,38 @@ Step textFmt(const std::vector<Payload>& payloads) {
   };
 }
 
-Step timeStrftime(const std::vector<Payload>&) {
-  return [](std::size_t i) {
-    const auto seconds = static_cast<std::time_t>((kMixStartMs + i * kMixStepMs) / 1000);
+Step textPlain(const std::vector<Payload>& payloads) {
+  struct Kept {
+    std::shared_ptr<void> message;
+    decltype(PlainRecord::appendText) append;
+  };
+  const auto keep = [](const Payload& payload) {
+    const PlainRecord& record = findPlainRecord(payload.metric);
+    Kept kept{record.make(), record.appendText};
+    record.read(kept.message.get(), payload.bytes);
+    return kept;
+  };
+  return [all = forEach(payloads, keep), line = std::string()](std::size_t i) mutable {
+    line.clear();
+    all[i].append(all[i].message.get(), {}, line);
+    benchmark::DoNotOptimize(line.data());
+  };
+}
+
+Step timeStrftime(const std::vector<Payload>& payloads) {
+  return [times = timesOf(payloads)](std::size_t i) {
+    const auto seconds = static_cast<std::time_t>(times[i] / 1000);
     std::tm local{};
     ::localtime_r(&seconds, &local);
     std::array<char, 64> text;
     benchmark::DoNotOptimize(
         std::strftime(text.data(), text.size(), "%Y-%m-%d %H:%M:%S %Z", &local));
+  };
+}
+
+Step timeKept(const std::vector<Payload>& payloads) {
+  return [times = timesOf(payloads), kept = KeptTime()](std::size_t i) mutable {
+    benchmark::DoNotOptimize(kept.at(times[i]).data());
   };
 }
 

@@ -1,53 +1,13 @@
-// Payloads as entries, read by tables of the fields. The tables are made of libprotobuf's
-// descriptors once, before anything is measured.
-
-#include <google/protobuf/descriptor.h>
-#include <google/protobuf/message.h>
+// Payloads as entries, read by tables of the fields.
 
 #include <cstdlib>
-#include <map>
-#include <memory>
 #include <protozero/pbf_reader.hpp>
 
+#include "peers/FieldTables.h"
 #include "peers/PlainEntries.h"
-#include "peers/StockMessages.h"
 
 namespace qel::bench {
 namespace {
-
-struct Field;
-using Fields = std::vector<Field>;  // by tag; those without a key do not exist
-
-struct Field {
-  std::string_view key;
-  google::protobuf::FieldDescriptor::Type type{};
-  bool repeated = false;
-  std::vector<std::string_view> names;  // of an enum, by value
-  const Fields* nested = nullptr;       // of a message
-};
-
-const Fields& fieldsOf(const google::protobuf::Descriptor& message) {
-  static std::map<const google::protobuf::Descriptor*, Fields> known;
-  const auto [entry, isNew] = known.try_emplace(&message);
-  Fields& fields = entry->second;
-  if (!isNew) return fields;
-  for (int i = 0; i < message.field_count(); ++i) {
-    const auto& descriptor = *message.field(i);
-    const auto tag = static_cast<std::size_t>(descriptor.number());
-    if (fields.size() <= tag) fields.resize(tag + 1);
-    Field field{descriptor.name(), descriptor.type(), descriptor.is_repeated(), {}, nullptr};
-    if (const auto* values = descriptor.enum_type()) {
-      for (int k = 0; k < values->value_count(); ++k) {
-        const auto number = static_cast<std::size_t>(values->value(k)->number());
-        if (field.names.size() <= number) field.names.resize(number + 1);
-        if (field.names[number].empty()) field.names[number] = values->value(k)->name();
-      }
-    }
-    if (const auto* nested = descriptor.message_type()) field.nested = &fieldsOf(*nested);
-    fields[tag] = std::move(field);
-  }
-  return fields;
-}
 
 PlainEntries entriesOf(protozero::pbf_reader reader, const Fields& fields);
 
@@ -81,7 +41,19 @@ PlainValue valueOf(protozero::pbf_reader& reader, const Field& field) {
     case Descriptor::TYPE_MESSAGE:
       return {entriesOf(reader.get_message(), *field.nested)};
     default:
-      std::abort();  // no message of the mix has such a field
+      std::abort();  // no metric message has such a field
+  }
+}
+
+void addPacked(protozero::pbf_reader& reader, const Field& field, PlainList& list) {
+  if (field.type == google::protobuf::FieldDescriptor::TYPE_SINT32) {
+    for (const std::int32_t number : reader.get_packed_sint32()) {
+      list.push_back({std::int64_t{number}});
+    }
+  } else {
+    for (const std::uint32_t number : reader.get_packed_uint32()) {
+      list.push_back({std::uint64_t{number}});
+    }
   }
 }
 
@@ -98,10 +70,7 @@ PlainEntries entriesOf(protozero::pbf_reader reader, const Fields& fields) {
     if (!field.repeated) {
       entries.push_back({field.key, valueOf(reader, field)});
     } else if (!field.nested && reader.has_wire_type(protozero::pbf_wire_type::length_delimited)) {
-      PlainList& list = listOf(entries, field.key);  // packed numbers
-      for (const std::uint32_t number : reader.get_packed_uint32()) {
-        list.push_back({std::uint64_t{number}});
-      }
+      addPacked(reader, field, listOf(entries, field.key));
     } else {
       listOf(entries, field.key).push_back(valueOf(reader, field));
     }
@@ -112,7 +81,7 @@ PlainEntries entriesOf(protozero::pbf_reader reader, const Fields& fields) {
 }  // namespace
 
 EntriesReader protozeroEntries(std::uint32_t metric) {
-  const Fields& fields = fieldsOf(*stockPrototype(metric)->GetDescriptor());
+  const Fields& fields = fieldsOf(metric);
   return [&fields](const Bytes& bytes) {
     const auto* data = reinterpret_cast<const char*>(bytes.data());
     return entriesOf(protozero::pbf_reader(data, bytes.size()), fields);

@@ -1,10 +1,12 @@
 #include <benchmark/benchmark.h>
+#include <plain.h>
 
+#include <algorithm>
 #include <array>
+#include <cstdlib>
 #include <protozero/exception.hpp>
 
 #include "peers/PeerMessages.h"
-#include "peers/ProtozeroMessages.h"
 
 namespace qel::bench {
 namespace {
@@ -41,23 +43,47 @@ std::string_view encode(const void* kept, std::string& memory) {
 }
 
 template <class Message>
-constexpr PeerMessage peer(std::uint32_t metric) {
-  return {metric, decode<Message>, keep<Message>, encode<Message>};
+std::shared_ptr<void> make() {
+  return std::make_shared<Message>();
 }
 
+template <class Message>
+std::optional<std::uint64_t> readAgain(void* kept, ByteView payload) {
+  auto& message = *static_cast<Message*>(kept);
+  plain::clear(message);
+  plain::read(textOf(payload), message);
+  return message.timestamp;
+}
+
+template <class Message>
+void appendText(const void* kept, std::string_view time, std::string& out) {
+  plain::appendText(*static_cast<const Message*>(kept), time, out);
+}
+
+#define PEER(metric, Message) \
+  PeerMessage { metric, decode<plain::Message>, keep<plain::Message>, encode<plain::Message> }
 constexpr std::array kMessages = {
-    peer<plain::KCellularLteRsrpRsrqSinr>(20330),
-    peer<plain::KCellularLteTxPower>(54018),
-    peer<plain::KCellularLteNbrEutraCellMeas>(54031),
-    peer<plain::KCellularLteRrcState>(19972),
-    peer<plain::KCellularLteScellInfo>(16578),
-    peer<plain::KCellularLteSelReselCellInfo>(54030),
-    peer<plain::KCellularEmmContext>(54540),
-    peer<plain::KCellularActivatedBearerContexts>(54541),
+#include <metrics.inc>
 };
+#undef PEER
+
+#define PEER(metric, Message)                                                           \
+  PlainRecord {                                                                         \
+    metric, make<plain::Message>, readAgain<plain::Message>, appendText<plain::Message> \
+  }
+constexpr std::array kRecords = {
+#include <metrics.inc>
+};
+#undef PEER
 
 }  // namespace
 
 std::span<const PeerMessage> protozeroMessages() { return kMessages; }
+
+const PlainRecord& findPlainRecord(std::uint32_t metric) {
+  const auto found = std::ranges::find(kRecords, metric, &PlainRecord::metric);
+  if (found == kRecords.end()) std::abort();
+  return *found;
+}
 
 }  // namespace qel::bench

@@ -42,7 +42,7 @@ PlainValue valueOf(const Message& message, const Reflection& reflection,
     case FieldDescriptor::CPPTYPE_MESSAGE:
       return {entriesOf(reflection.GetMessage(message, &field))};
     default:
-      std::abort();  // no message of the mix has such a field
+      std::abort();  // no metric message has such a field
   }
 }
 
@@ -56,6 +56,8 @@ PlainList listOf(const Message& message, const Reflection& reflection,
       list.push_back({entriesOf(reflection.GetRepeatedMessage(message, &field, i))});
     } else if (field.cpp_type() == FieldDescriptor::CPPTYPE_UINT32) {
       list.push_back({std::uint64_t{reflection.GetRepeatedUInt32(message, &field, i)}});
+    } else if (field.cpp_type() == FieldDescriptor::CPPTYPE_INT32) {
+      list.push_back({std::int64_t{reflection.GetRepeatedInt32(message, &field, i)}});
     } else {
       std::abort();
     }

@@ -12,6 +12,10 @@
 
 namespace qel::benchmarks {
 
+std::chrono::microseconds timeOf(const timeval& time) {
+  return std::chrono::seconds(time.tv_sec) + std::chrono::microseconds(time.tv_usec);
+}
+
 std::chrono::nanoseconds processorTime() {
   timespec time{};
   ::clock_gettime(CLOCK_PROCESS_CPUTIME_ID, &time);

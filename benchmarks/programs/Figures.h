@@ -1,6 +1,8 @@
 // What the measuring programs share: clocks, counters and the middle of several runs.
 #pragma once
 
+#include <sys/time.h>
+
 #include <chrono>
 #include <cstdint>
 #include <string>
@@ -11,6 +13,8 @@ namespace qel::benchmarks {
 using Clock = std::chrono::steady_clock;
 using Microseconds = std::chrono::duration<double, std::micro>;
 using Milliseconds = std::chrono::duration<double, std::milli>;
+
+std::chrono::microseconds timeOf(const timeval& time);
 
 // Processor time of this process so far, all threads.
 std::chrono::nanoseconds processorTime();

@@ -39,10 +39,6 @@ std::vector<char**> programsOf(char** words) {
   return programs;
 }
 
-double milliseconds(const timeval& time) {
-  return static_cast<double>(time.tv_sec) * 1e3 + static_cast<double>(time.tv_usec) / 1e3;
-}
-
 // Reads the program's standard error until it tells of a frame. False when it ends without.
 bool waitForFrame(int descriptor) {
   std::string heard;
@@ -74,7 +70,7 @@ bool run(char** words, Starts& starts) {
   ::kill(process, SIGKILL);
   rusage used{};
   ::wait4(process, nullptr, 0, &used);
-  starts.processorMs.push_back(milliseconds(used.ru_utime) + milliseconds(used.ru_stime));
+  starts.processorMs.push_back(Milliseconds(timeOf(used.ru_utime) + timeOf(used.ru_stime)).count());
   return drawn;
 }
 

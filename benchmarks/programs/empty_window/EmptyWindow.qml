@@ -1,8 +1,12 @@
 import QtQuick
-import QtQuick.Controls
 
-ApplicationWindow {
+Window {
     width: 360
     height: 720
     visible: true
+
+    Text {
+        anchors.centerIn: parent
+        text: "qelwatch"
+    }
 }

@@ -1,4 +1,5 @@
-// The least that a Qt Quick program can be: what the viewer's start and memory are held against.
+// The least that a Qt Quick program with something to read can be: what the viewer's start and
+// memory are held against.
 #include <QtGui/QGuiApplication>
 #include <QtQml/QQmlApplicationEngine>
 
