@@ -39,6 +39,7 @@ const std::vector<Group>& groups() {
       {"encode a kept message",
        {{"libprotobuf", encodeStock},
         {"protozero", encodeProtozero},
+        {"its structs, generated", encodeSized},
         {"nanopb", encodeNanopb},
         {"ours", encodeOurs}}},
       {"text of a dictionary",

@@ -21,6 +21,7 @@ struct PeerMessage {
 };
 
 std::span<const PeerMessage> protozeroMessages();
+std::span<const PeerMessage> sizedMessages();  // protozero's structs, written without it
 std::span<const PeerMessage> nanopbMessages();
 
 // Ends the program when there is none of the metric.

@@ -113,6 +113,10 @@ Step encodeProtozero(const std::vector<Payload>& payloads) {
   return encodeBy(protozeroMessages(), payloads);
 }
 
+Step encodeSized(const std::vector<Payload>& payloads) {
+  return encodeBy(sizedMessages(), payloads);
+}
+
 Step entriesProtozero(const std::vector<Payload>& payloads) {
   return visitBy(protozeroEntries, payloads);
 }

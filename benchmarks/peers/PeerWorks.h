@@ -15,6 +15,7 @@ Step entriesStock(const std::vector<Payload>& payloads);  // by reflection
 Step decodeProtozero(const std::vector<Payload>& payloads);
 Step keepProtozero(const std::vector<Payload>& payloads);
 Step encodeProtozero(const std::vector<Payload>& payloads);
+Step encodeSized(const std::vector<Payload>& payloads);       // by generated code, lengths first
 Step entriesProtozero(const std::vector<Payload>& payloads);  // without structs between
 Step entriesFlat(const std::vector<Payload>& payloads);  // as views, in a row that is used again
 

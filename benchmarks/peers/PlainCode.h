@@ -3,6 +3,8 @@
 
 #include <fmt/format.h>
 
+#include <algorithm>
+#include <bit>
 #include <cstdint>
 #include <optional>
 #include <protozero/pbf_reader.hpp>
@@ -35,6 +37,27 @@ Message& made(std::optional<Message>& message) {
 template <class Range, class Number>
 void addAll(const Range& range, std::vector<Number>& list) {
   list.insert(list.end(), range.begin(), range.end());
+}
+
+// Numbers as they are written, and how long they then are.
+inline std::uint64_t plainly(std::uint64_t value) { return value; }
+inline std::uint64_t zigzag(std::int32_t value) {
+  return (static_cast<std::uint32_t>(value) << 1) ^ static_cast<std::uint32_t>(value >> 31);
+}
+inline std::uint64_t extended(std::int64_t value) { return static_cast<std::uint64_t>(value); }
+
+inline std::size_t sizeOf(std::uint64_t value) {
+  return (static_cast<std::size_t>(std::bit_width(value | 1)) * 9 + 64) / 64;
+}
+inline std::size_t lengthOf(const std::string& text) { return text.size(); }
+
+inline char* put(char* at, std::uint64_t value) {
+  for (; value >= 128; value >>= 7) *at++ = static_cast<char>(value | 128);
+  *at++ = static_cast<char>(value);
+  return at;
+}
+inline char* put(char* at, const std::string& text) {
+  return std::copy(text.begin(), text.end(), at);
 }
 
 template <class Number>

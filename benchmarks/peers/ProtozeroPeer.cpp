@@ -43,6 +43,12 @@ std::string_view encode(const void* kept, std::string& memory) {
 }
 
 template <class Message>
+std::string_view encodeSized(const void* kept, std::string& memory) {
+  plain::writeSized(*static_cast<const Message*>(kept), memory);
+  return memory;
+}
+
+template <class Message>
 std::shared_ptr<void> make() {
   return std::make_shared<Message>();
 }
@@ -67,6 +73,13 @@ constexpr std::array kMessages = {
 };
 #undef PEER
 
+#define PEER(metric, Message) \
+  PeerMessage { metric, decode<plain::Message>, keep<plain::Message>, encodeSized<plain::Message> }
+constexpr std::array kSizedMessages = {
+#include <metrics.inc>
+};
+#undef PEER
+
 #define PEER(metric, Message)                                                           \
   PlainRecord {                                                                         \
     metric, make<plain::Message>, readAgain<plain::Message>, appendText<plain::Message> \
@@ -79,6 +92,7 @@ constexpr std::array kRecords = {
 }  // namespace
 
 std::span<const PeerMessage> protozeroMessages() { return kMessages; }
+std::span<const PeerMessage> sizedMessages() { return kSizedMessages; }
 
 const PlainRecord& findPlainRecord(std::uint32_t metric) {
   const auto found = std::ranges::find(kRecords, metric, &PlainRecord::metric);

@@ -154,6 +154,76 @@ void printTexts(Printer& printer, const Descriptor& message, const FieldDescript
   printer.Print("close(out, '}');\n");
 }
 
+// How a value is turned into the number that is written.
+const char* numberOf(const FieldDescriptor& field) {
+  switch (field.type()) {
+    case FieldDescriptor::TYPE_SINT32:
+      return "zigzag";
+    case FieldDescriptor::TYPE_ENUM:
+      return "extended";
+    default:
+      return "plainly";
+  }
+}
+
+Variables sizedVariablesOf(const FieldDescriptor& field) {
+  Variables variables = variablesOf(field);
+  const bool isNumber =
+      !field.message_type() && field.cpp_type() != FieldDescriptor::CPPTYPE_STRING;
+  const int wire = isNumber && !field.is_packed() ? 0 : 2;
+  const int key = field.number() << 3 | wire;
+  variables["key"] = std::to_string(key);
+  variables["keySize"] = std::to_string(key < 128 ? 1 : 2);
+  variables["of"] = field.is_repeated() ? "each" : "*message." + field.name();
+  variables["number"] = numberOf(field);
+  return variables;
+}
+
+// `number` is for what stands there as a number, `held` for what has a length in front.
+void printSized(Printer& printer, const FieldDescriptor& field, const char* number,
+                const char* held) {
+  const Variables variables = sizedVariablesOf(field);
+  if (field.is_packed()) {
+    printer.Print(variables,
+                  "if (!message.$field$.empty()) {\n"
+                  "  std::size_t length = 0;\n"
+                  "  for (const auto each : message.$field$) "
+                  "length += sizeOf($number$(each));\n");
+    printer.Print(variables, held);
+    printer.Print("}\n");
+    return;
+  }
+  printer.Print(variables, field.is_repeated() ? "for (const auto& each : message.$field$) {\n"
+                                               : "if (message.$field$) {\n");
+  if (field.message_type() || field.cpp_type() == FieldDescriptor::CPPTYPE_STRING) {
+    printer.Print(variables, "  const std::size_t length = lengthOf($of$);\n");
+    printer.Print(variables, held);
+  } else {
+    printer.Print(variables, number);
+  }
+  printer.Print("}\n");
+}
+
+void printLengthOf(Printer& printer, const Descriptor& message) {
+  printer.Print("std::size_t size = 0;\n");
+  forEachField(message, [&](const FieldDescriptor& field) {
+    printSized(printer, field, "  size += $keySize$ + sizeOf($number$($of$));\n",
+               "  size += $keySize$ + sizeOf(length) + length;\n");
+  });
+  printer.Print("return size;\n");
+}
+
+void printPut(Printer& printer, const Descriptor& message) {
+  forEachField(message, [&](const FieldDescriptor& field) {
+    printSized(printer, field, "  at = put(put(at, $key$), $number$($of$));\n",
+               field.is_packed()
+                   ? "  at = put(put(at, $key$), length);\n"
+                     "  for (const auto each : message.$field$) at = put(at, $number$(each));\n"
+                   : "  at = put(put(put(at, $key$), length), $of$);\n");
+  });
+  printer.Print("return at;\n");
+}
+
 template <class Print>
 void printFunction(Printer& printer, const std::string& head, const Print& print) {
   printer.Print("$head$ {\n", "head", head);
@@ -161,6 +231,14 @@ void printFunction(Printer& printer, const std::string& head, const Print& print
   print();
   printer.Outdent();
   printer.Print("}\n\n");
+}
+
+void printSizedOperations(Printer& printer, const Descriptor& message) {
+  const std::string& name = message.name();
+  printFunction(printer, "std::size_t lengthOf(const " + name + "& message)",
+                [&] { printLengthOf(printer, message); });
+  printFunction(printer, "char* put(char* at, const " + name + "& message)",
+                [&] { printPut(printer, message); });
 }
 
 }  // namespace
@@ -176,6 +254,7 @@ void printStruct(Printer& printer, const Descriptor& message) {
 
 void printHeldOperations(Printer& printer, const Descriptor& message) {
   const std::string& name = message.name();
+  printSizedOperations(printer, message);
   printFunction(printer, "void read(pbf_reader reader, " + name + "& message)",
                 [&] { printReads(printer, message); });
   printFunction(printer, "void write(const " + name + "& message, pbf_writer writer)", [&] {
@@ -191,6 +270,12 @@ void printMetricOperations(Printer& printer, const Descriptor& message) {
   const std::string& name = message.name();
   const FieldDescriptor& first = *message.field(0);
   if (first.name() != "timestamp") refuse(first);
+  printer.Print("namespace {\n\n");
+  printSizedOperations(printer, message);
+  printer.Print("}  // namespace\n\n");
+  printFunction(printer, "void writeSized(const " + name + "& message, std::string& out)", [&] {
+    printer.Print("out.resize(lengthOf(message));\nput(out.data(), message);\n");
+  });
   printFunction(printer, "void read(std::string_view data, " + name + "& message)", [&] {
     printer.Print("pbf_reader reader(data.data(), data.size());\n");
     printReads(printer, message);

@@ -31,13 +31,15 @@ constexpr const char* kHeaderHead =
     "#include <string_view>\n#include <vector>\n\nnamespace qel::bench::plain {\n\n";
 constexpr const char* kSourceHead =
     "#include \"plain.h\"\n\n#include \"peers/PlainCode.h\"\n\nnamespace qel::bench::plain {\n"
-    "namespace {\n\n";
+    "namespace {\n\nusing plain::lengthOf;\nusing plain::put;\n\n";
 constexpr const char* kOperations =
     "// What is there lands on top of the message. Throws protozero::exception on damaged bytes.\n"
     "void read(std::string_view data, $Message$& message);\n"
     "void clear($Message$& message);\n"
     "// Appended to `out`.\n"
     "void write(const $Message$& message, std::string& out);\n"
+    "// In place of `out`, without protozero: the lengths are counted first.\n"
+    "void writeSized(const $Message$& message, std::string& out);\n"
     "// As JSON on one line, with `time` in place of the timestamp unless empty.\n"
     "void appendText(const $Message$& message, std::string_view time, std::string& out);\n\n";
 
