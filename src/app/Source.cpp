@@ -102,7 +102,7 @@ int Source::openWithin(const std::string& source) {
   service::ConditionBook& book = core->condition();
   book.observe([&book, first = _book->condition(), then = _condition->observer()] {
     const sources::SourceCondition current = book.current();
-    first({inWords(current), std::string(current.state), current.model});
+    first({inWords(current), std::string(current.state), current.model, current.reason});
     then(inWords(current));
   });
   _connector = std::make_shared<ClosingConnector>(service::makeInProcessConnector(std::move(core)));

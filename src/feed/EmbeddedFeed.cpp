@@ -13,7 +13,7 @@ std::shared_ptr<tesk::Connector> connectWithin(const std::string& source, FeedBo
   service::ConditionBook& condition = core->condition();
   condition.observe([&condition, tell = book.condition()] {
     const sources::SourceCondition current = condition.current();
-    tell({inWords(current), std::string(current.state), current.model});
+    tell({inWords(current), std::string(current.state), current.model, current.reason});
   });
   return service::makeInProcessConnector(std::move(core));
 }

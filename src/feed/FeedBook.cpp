@@ -117,6 +117,7 @@ void FeedBook::changeReach(bool isReachable, const std::string& why) {
 void FeedBook::changeCondition(const Condition& condition) {
   _feed.condition = condition.line;
   _feed.state = condition.state;
+  _feed.reason = condition.reason;
   _feed.hasEnded = condition.state == "ended";
   const bool hasNameOfItsOwn =
       _feed.kind == Feed::Kind::recording || _feed.kind == Feed::Kind::rawLog;

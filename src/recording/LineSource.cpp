@@ -16,6 +16,7 @@ std::unique_ptr<LineSource> LineSource::open(const std::string& path, std::strin
 bool LineSource::fill() {
   if (!_ended) _chunk = _bytes->next();
   _ended = _chunk.empty();
+  _bytesRead += _chunk.size();
   return !_ended;
 }
 
@@ -23,17 +24,28 @@ std::string LineSource::error() const {
   return errorIsDamage() ? "damaged gzip data" : _bytes->error();
 }
 
-LineSource::Outcome LineSource::next(std::string& line) {
-  line.clear();
+LineSource::Outcome LineSource::next(std::string_view& line) {
+  const std::size_t size = _chunk.find('\n');
+  if (size > kLongestLineBytes) return nextOfSeveralChunks(line);
+  line = _chunk.substr(0, size);
+  _chunk.remove_prefix(size + 1);
+  return Outcome::line;
+}
+
+LineSource::Outcome LineSource::nextOfSeveralChunks(std::string_view& line) {
+  _parts.clear();
   bool tooLong = false;
   while (!_chunk.empty() || fill()) {
     const std::size_t size = std::min(_chunk.find('\n'), _chunk.size());
-    tooLong = tooLong || line.size() + size > kLongestLineBytes;
-    if (!tooLong) line.append(_chunk, 0, size);
+    tooLong = tooLong || _parts.size() + size > kLongestLineBytes;
+    if (!tooLong) _parts.append(_chunk, 0, size);
     const bool isWhole = size < _chunk.size();
     _chunk.remove_prefix(size + (isWhole ? 1 : 0));
-    if (isWhole) return tooLong ? Outcome::tooLong : Outcome::line;
+    if (!isWhole) continue;
+    line = _parts;
+    return tooLong ? Outcome::tooLong : Outcome::line;
   }
+  line = _parts;
   const FileBytes::End why = _bytes->end();
   if (why == FileBytes::End::damaged || why == FileBytes::End::failed) return Outcome::failed;
   if (tooLong) return Outcome::tooLong;

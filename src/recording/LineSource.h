@@ -25,7 +25,8 @@ class LineSource {
   // Nothing when the file cannot be opened; `error` then says why.
   static std::unique_ptr<LineSource> open(const std::string& path, std::string& error);
 
-  Outcome next(std::string& line);
+  // The line is valid until the next call.
+  Outcome next(std::string_view& line);
 
   // At the end: the gzip stream stopped in the middle.
   bool streamCutOff() const { return _bytes->end() == FileBytes::End::cutOff; }
@@ -35,14 +36,19 @@ class LineSource {
 
   // How much of the file was read, from 0 to 1.
   float share() const { return _bytes->share(); }
+  // How much text that was, decompressed.
+  std::uint64_t bytes() const { return _bytesRead; }
 
  private:
   explicit LineSource(std::unique_ptr<FileBytes> bytes) : _bytes(std::move(bytes)) {}
   // False at the end of the file, or on failure.
   bool fill();
+  Outcome nextOfSeveralChunks(std::string_view& line);
 
   const std::unique_ptr<FileBytes> _bytes;
   std::string_view _chunk;
+  std::string _parts;  // of a line that begins in one chunk and ends in another
+  std::uint64_t _bytesRead = 0;
   bool _ended = false;
   bool _restTold = false;  // that there is something else behind the stream
 };

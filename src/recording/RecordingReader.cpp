@@ -44,7 +44,11 @@ void RecordingReader::reject(const std::string& reason) {
     ++_skippedLines;
     return;
   }
-  _fault = RecordingFault{RecordingFault::Kind::badData, at(reason)};
+  fail(RecordingFault::Kind::badData, reason);
+}
+
+void RecordingReader::fail(RecordingFault::Kind kind, const std::string& reason) {
+  _fault = RecordingFault{kind, at(reason), "line " + std::to_string(_lineNumber) + ": " + reason};
   _ended = true;
 }
 
@@ -72,12 +76,9 @@ std::optional<RecordedEvent> RecordingReader::next() {
   while (!_ended) {
     const LineSource::Outcome outcome = _lines->next(_line);
     if (outcome == LineSource::Outcome::failed) {
-      const bool damage = _lines->errorIsDamage();
+      using Kind = RecordingFault::Kind;
       ++_lineNumber;
-      _fault =
-          RecordingFault{damage ? RecordingFault::Kind::badData : RecordingFault::Kind::notRead,
-                         at(_lines->error())};
-      _ended = true;
+      fail(_lines->errorIsDamage() ? Kind::badData : Kind::notRead, _lines->error());
       break;
     }
     if (outcome == LineSource::Outcome::end) {

@@ -5,6 +5,7 @@
 #include <memory>
 #include <optional>
 #include <string>
+#include <string_view>
 
 #include "recording/LineSource.h"
 #include "recording/RecordedEvent.h"
@@ -16,6 +17,7 @@ struct RecordingFault {
   enum class Kind { notOpened, badData, notRead };
   Kind kind = Kind::notOpened;
   std::string message;
+  std::string inFile = {};  // the same without the file, "line 3: WHY"; empty: it was not opened
 
   // What a program should end with, of sysexits(3).
   int exitCode() const;
@@ -42,6 +44,8 @@ class RecordingReader {
   std::uint64_t skippedLines() const { return _skippedLines; }
   // How much of the file was read, from 0 to 1; 0 where that cannot be told.
   float share() const { return _lines->share(); }
+  // How much text that was, decompressed.
+  std::uint64_t bytes() const { return _lines->bytes(); }
   // Number of the line read last, from 1.
   std::uint64_t lineNumber() const { return _lineNumber; }
 
@@ -51,11 +55,12 @@ class RecordingReader {
   // An event of the line; else the line is counted, or ends the reading.
   std::optional<RecordedEvent> take(LineSource::Outcome outcome);
   void reject(const std::string& reason);
+  void fail(RecordingFault::Kind kind, const std::string& reason);
 
   std::string _path;
   BadLines _badLines;
   std::unique_ptr<LineSource> _lines;
-  std::string _line;
+  std::string_view _line;
   std::optional<RecordingFault> _fault;
   std::optional<std::string> _cutOff;
   std::uint64_t _skippedLines = 0;

@@ -58,7 +58,7 @@ using SourceChoice = std::variant<SimulatedChoice, RecordingChoice, ModemManager
 // wrong.
 std::optional<SourceChoice> parseSourceChoice(std::string_view text, SourceError& error);
 
-// Nothing when there is no such source; a recording is read once to see that it is sound.
+// Nothing when there is no such source; of a file the beginning is looked at.
 std::unique_ptr<EventSource> makeSource(const SourceChoice& choice, SourceError& error,
                                         WaitClock& clock = steadyWaitClock());
 

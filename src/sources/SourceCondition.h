@@ -7,7 +7,8 @@
 namespace qel::sources {
 
 // Words of the program's own, but for the names, which the modem gives and which are short
-// printable ASCII. Nothing in it tells one modem from another of its kind.
+// printable ASCII, and what a reason quotes of a file, short and printable. Nothing in it tells one
+// modem from another of its kind.
 struct SourceCondition {
   std::string_view state;     // one word for programs; empty: there is nothing to say
   std::string_view headline;  // for people

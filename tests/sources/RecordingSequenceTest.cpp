@@ -144,5 +144,53 @@ TEST_F(RecordingSequenceTest, TellsThatItHasEnded) {
   EXPECT_EQ(endless.condition().state, "playing");
 }
 
+// Seven lines of a million characters, and what comes after them.
+std::string large(const std::string& rest) {
+  std::string lines;
+  for (int i = 0; i < 7; ++i) {
+    lines += R"({"time_ms": 1, "event": "trigger", "x": ")" + std::string(1'000'000, 'x') + "\"}\n";
+  }
+  return lines + rest;
+}
+
+// Once the whole file was read before its first event.
+TEST_F(RecordingSequenceTest, WhatIsWrongFarIntoAFileIsToldWhenItIsReached) {
+  const std::string content = large(metricLine(5, 4) + "no event\n" + metricLine(6, 4));
+  for (const bool compressed : {false, true}) {
+    const testing::CapturedSystemLog systemLog;
+    file.write(compressed ? testing::gzipped(content) : content);
+    auto events = sequence(true);
+    for (int i = 0; i < 8; ++i) ASSERT_TRUE(events.next()) << i;
+    EXPECT_EQ(events.condition().state, "playing");
+    EXPECT_TRUE(systemLog.lines().empty());
+    EXPECT_FALSE(events.next());
+    EXPECT_FALSE(events.next());
+    EXPECT_EQ(events.condition().state, "ended");
+    EXPECT_THAT(events.condition().reason, ::testing::StartsWith("line 9: not JSON"));
+    ASSERT_EQ(systemLog.lines().size(), 1U);
+    EXPECT_THAT(systemLog.lines()[0], ::testing::StartsWith(file.path() + ":9: not JSON"));
+  }
+}
+
+TEST_F(RecordingSequenceTest, WhatComesFarIntoAFileIsKnownOnceItHasPassed) {
+  file.write(metricLine(5, 4) + large(metricLine(6, 4)));
+  auto events = sequence(false);
+  EXPECT_TRUE(events.query(5).known);
+  EXPECT_EQ(events.query(6).message, "metric 6 is not in the recording so far");
+  while (const auto event = events.next()) events.passed(*event);
+  EXPECT_TRUE(events.query(6).known);
+  EXPECT_EQ(events.query(7).message, "metric 7 is not in the recording");
+}
+
+TEST_F(RecordingSequenceTest, ThatItsLastLineWasCutOffIsToldOnceAndThere) {
+  file.write(metricLine(5, 4) + R"({"time)");
+  const testing::CapturedSystemLog systemLog;
+  auto events = sequence(true);
+  EXPECT_TRUE(events.next());
+  EXPECT_TRUE(systemLog.lines().empty());
+  for (int round = 0; round < 3; ++round) EXPECT_TRUE(events.next());
+  EXPECT_EQ(systemLog.lines(), std::vector<std::string>{file.path() + ":2: last line cut off"});
+}
+
 }  // namespace
 }  // namespace qel

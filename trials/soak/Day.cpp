@@ -26,7 +26,8 @@ std::vector<Line> sampleLines() {
   if (!source) throw std::runtime_error(error);
   std::vector<Line> lines;
   const std::string key = kTimeKey;
-  for (std::string line; source->next(line) == LineSource::Outcome::line;) {
+  for (std::string_view text; source->next(text) == LineSource::Outcome::line;) {
+    const std::string line(text);
     std::size_t digits = 0;
     const auto time = std::stoull(line.substr(key.size()), &digits);
     lines.push_back({time, line.substr(key.size() + digits) + "\n"});

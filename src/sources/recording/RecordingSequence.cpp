@@ -13,23 +13,40 @@
 namespace qel::sources {
 namespace {
 
+// However large a file is, its first event does not wait for the rest of it.
+constexpr std::uint64_t kLookedAt = std::uint64_t{4} * 1024 * 1024;
+
 SourceEvent serviceEvent(RecordedEvent event) {
   const auto stream = event.kind == RecordedKind::metric ? tesk::kEventMetric : tesk::kEventTrigger;
   return {event.timeMs, stream, std::move(event.entries)};
 }
 
-// Of what answers queries, in bytes, roughly; a file may hold as much as it likes.
-constexpr std::size_t kMostMetricsKept = 256;
-constexpr std::size_t kLargestEventKept = 64 * 1024;
-
-bool mayKeep(const EventOfMetric& kept, std::uint32_t metric, const SourceEvent& event) {
-  return (kept.size() < kMostMetricsKept || kept.contains(metric)) &&
-         weightOf(event.entries) <= kLargestEventKept;
-}
-
 SourceError errorOf(const RecordingFault& fault) { return {fault.exitCode(), fault.message}; }
 
 }  // namespace
+
+bool EventOfMetric::mayKeep(std::uint32_t metric, const SourceEvent& event) const {
+  constexpr std::size_t kMostMetrics = 256;
+  constexpr std::size_t kLargestEvent = 64 * 1024;  // bytes, roughly
+  return (_events.size() < kMostMetrics || _events.contains(metric)) &&
+         weightOf(event.entries) <= kLargestEvent;
+}
+
+void EventOfMetric::keepFirst(SourceEvent event) {
+  const auto metric = metricOf(event);
+  if (!metric || _events.contains(*metric) || !mayKeep(*metric, event)) return;
+  _events.emplace(*metric, std::move(event));
+}
+
+void EventOfMetric::keepNewest(const SourceEvent& event) {
+  const auto metric = metricOf(event);
+  if (metric && mayKeep(*metric, event)) _events.insert_or_assign(*metric, event);
+}
+
+const SourceEvent* EventOfMetric::find(std::uint32_t metric) const {
+  const auto found = _events.find(metric);
+  return found == _events.end() ? nullptr : &found->second;
+}
 
 bool checkRecording(const std::string& path, EventOfMetric& firsts, SourceError& error) {
   struct stat status {};
@@ -44,18 +61,17 @@ bool checkRecording(const std::string& path, EventOfMetric& firsts, SourceError&
     error = errorOf(fault);
     return false;
   }
-  bool any = false;
-  while (auto recorded = reader->next()) {
-    any = true;
-    SourceEvent event = serviceEvent(std::move(*recorded));
-    const auto metric = metricOf(event);
-    if (metric && mayKeep(firsts, *metric, event)) firsts.try_emplace(*metric, std::move(event));
+  auto recorded = reader->next();
+  const bool any = recorded.has_value();
+  while (recorded && reader->bytes() <= kLookedAt) {
+    firsts.keepFirst(serviceEvent(std::move(*recorded)));
+    recorded = reader->next();
   }
   if (reader->fault()) {
     error = errorOf(*reader->fault());
     return false;
   }
-  if (reader->cutOff()) systemLog().write(*reader->cutOff());
+  firsts.isOfWholeFile = !recorded;
   if (!any) error = {EX_DATAERR, path + ": no event in it"};
   return any;
 }
@@ -66,11 +82,16 @@ RecordingSequence::RecordingSequence(std::string path, bool loops,
   reopen();
 }
 
+void RecordingSequence::endEarly(const RecordingFault& fault) {
+  systemLog().write(fault.message);
+  _whyEarly = fault.inFile.empty() ? "it cannot be read any more" : fault.inFile;
+  _reader.reset();
+}
+
 bool RecordingSequence::reopen() {
   RecordingFault fault;
   _reader = RecordingReader::open(_path, RecordingReader::BadLines::fail, fault);
-  // It was sound when the source was made; that it no longer is ends the events.
-  if (!_reader) systemLog().write(fault.message);
+  if (!_reader) endEarly(fault);
   return _reader != nullptr;
 }
 
@@ -78,10 +99,10 @@ std::optional<SourceEvent> RecordingSequence::read() {
   if (!_reader) return std::nullopt;
   auto event = _reader->next();
   if (event) return serviceEvent(std::move(*event));
-  if (_reader->fault()) {
-    systemLog().write(_reader->fault()->message);
-    _reader.reset();
+  if (_reader->cutOff() && !std::exchange(_cutOffTold, true)) {
+    systemLog().write(*_reader->cutOff());
   }
+  if (_reader->fault()) endEarly(RecordingFault(*_reader->fault()));
   return std::nullopt;
 }
 
@@ -97,22 +118,18 @@ std::optional<SourceEvent> RecordingSequence::next() {
 
 SourceCondition RecordingSequence::condition() const {
   if (!_ended) return {"playing", "Recording is playing", ""};
-  return {"ended", "Recording has ended", _reader ? "" : "it cannot be read any more"};
-}
-
-void RecordingSequence::passed(const SourceEvent& event) {
-  const auto metric = metricOf(event);
-  if (metric && mayKeep(_newest, *metric, event)) _newest.insert_or_assign(*metric, event);
+  return {"ended", "Recording has ended", _whyEarly};
 }
 
 SourceAnswer RecordingSequence::query(std::uint32_t metric) {
   for (const EventOfMetric* events : {&std::as_const(_newest), _firsts.get()}) {
-    const auto found = events->find(metric);
-    if (found != events->end()) {
-      return {true, "", found->second.timeMs, found->second.entries};
+    if (const SourceEvent* found = events->find(metric)) {
+      return {true, "", found->timeMs, found->entries};
     }
   }
-  return {false, "metric " + std::to_string(metric) + " is not in the recording", 0, {}};
+  const bool isAllKnown = _firsts->isOfWholeFile || (_ended && _whyEarly.empty());
+  const std::string none = "metric " + std::to_string(metric) + " is not in the recording";
+  return {false, none + (isAllKnown ? "" : " so far"), 0, {}};
 }
 
 }  // namespace qel::sources

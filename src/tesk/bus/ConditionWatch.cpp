@@ -81,7 +81,8 @@ void ConditionWatch::take(const sdbus::Variant& condition) {
   Condition told;
   if (condition.containsValueOfType<Entries>()) {
     const auto entries = condition.get<Entries>();
-    told = {textAt(entries, "text"), textAt(entries, "state"), textAt(entries, "model")};
+    told = {textAt(entries, "text"), textAt(entries, "state"), textAt(entries, "model"),
+            textAt(entries, "reason")};
   }
   tell(std::move(told));
 }

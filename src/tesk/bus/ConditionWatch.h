@@ -12,9 +12,10 @@ namespace tesk::bus {
 
 // Each text of 256 bytes at most.
 struct Condition {
-  std::string line;   // for people; empty: there is nothing to say
-  std::string state;  // one word for programs
-  std::string model;  // of the modem; empty: not known
+  std::string line;         // for people; empty: there is nothing to say
+  std::string state;        // one word for programs
+  std::string model;        // of the modem; empty: not known
+  std::string reason = {};  // where there is more to say; it is in the line too
 
   // For observers that only show the line.
   operator const std::string&() const { return line; }

@@ -35,6 +35,7 @@ struct Feed {
   std::string name;       // file without folder, or the modem's model; empty: there is none
   std::string state;      // one word about what stands behind it, such as "running" or "no-modem"
   std::string condition;  // the same in a line for people; empty: there is nothing to say
+  std::string reason;     // the part of it that says why; empty: there is no more to say
   bool isWithoutModem = false;  // so it says
   Reach reach = Reach::there;
   std::optional<std::uint64_t> lostSinceMs;  // the service was there until then

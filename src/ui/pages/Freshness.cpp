@@ -131,7 +131,7 @@ Freshness freshness(const Feed& feed, const Viewpoint& viewpoint, const TimeZone
   }
   if (!told.isFlowing) told.bar = capitalized(told.state);
   addLine(told.footer, told.source);
-  if (!isFile(feed)) addLine(told.footer, feed.condition);
+  addLine(told.footer, isFile(feed) ? capitalized(feed.reason) : feed.condition);
   addLine(told.footer, capitalized(told.state));
   addLine(told.footer, told.advice);
   addLine(told.footer, told.loss);

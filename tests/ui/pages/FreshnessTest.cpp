@@ -74,6 +74,20 @@ TEST(Freshness, ExpectsNothingOfWhatHasEnded) {
   EXPECT_TRUE(freshness({}, scene.viewpoint(false), kUtc).isFlowing);
 }
 
+// Once only the log knew.
+TEST(Freshness, SaysWhyAFileHasEndedBeforeItsEnd) {
+  const Scene scene;
+  Feed feed;
+  feed.kind = Feed::Kind::recording;
+  feed.name = "drive.jsonl";
+  feed.hasEnded = true;
+  feed.condition = "Recording has ended";
+  EXPECT_EQ(freshness(feed, scene.viewpoint(), kUtc).footer, "Recording drive.jsonl, ended");
+  feed.reason = "line 9: not JSON, column 1";
+  EXPECT_EQ(freshness(feed, scene.viewpoint(), kUtc).footer,
+            "Recording drive.jsonl, ended\nLine 9: not JSON, column 1");
+}
+
 TEST(Freshness, HasWordsOfItsOwnForEachReasonWhyThereIsNoService) {
   const Scene scene;
   std::set<std::string> states;
