@@ -10,23 +10,46 @@ constexpr std::string_view kHexDigits = "0123456789abcdef";
 constexpr std::string_view kBase64Digits =
     "ABCDEFGHIJKLMNOPQRSTUVWXYZabcdefghijklmnopqrstuvwxyz0123456789+/";
 
-int hexDigit(char c) {
-  if (c >= '0' && c <= '9') return c - '0';
-  if (c >= 'a' && c <= 'f') return c - 'a' + 10;
-  if (c >= 'A' && c <= 'F') return c - 'A' + 10;
-  return -1;
-}
+constexpr std::uint8_t kNoHexDigit = 0xF0;
 
-constexpr std::array<int, 256> makeBase64Values() {
-  std::array<int, 256> values{};
-  values.fill(-1);
-  for (std::size_t i = 0; i < kBase64Digits.size(); ++i) {
-    values[static_cast<unsigned char>(kBase64Digits[i])] = static_cast<int>(i);
+// The value of each character as a digit.
+constexpr std::array<std::uint8_t, 256> makeHexValues() {
+  std::array<std::uint8_t, 256> values{};
+  values.fill(kNoHexDigit);
+  for (std::size_t i = 0; i < 10; ++i) values['0' + i] = static_cast<std::uint8_t>(i);
+  for (std::size_t i = 0; i < 6; ++i) {
+    values['a' + i] = values['A' + i] = static_cast<std::uint8_t>(10 + i);
   }
   return values;
 }
 
-constexpr auto kBase64Values = makeBase64Values();
+constexpr auto kHexValues = makeHexValues();
+
+// Beyond the 24 bits that four digits make.
+constexpr std::uint32_t kNoBase64Digit = 1U << 31;
+
+// For each of the four places in a group of digits, what each character stands for there.
+using Base64Places = std::array<std::array<std::uint32_t, 256>, 4>;
+constexpr Base64Places makeBase64Places() {
+  Base64Places places{};
+  for (std::size_t place = 0; place < places.size(); ++place) {
+    places[place].fill(kNoBase64Digit);
+    for (std::uint32_t i = 0; i < kBase64Digits.size(); ++i) {
+      places[place][static_cast<unsigned char>(kBase64Digits[i])] = i << (18 - 6 * place);
+    }
+  }
+  return places;
+}
+
+constexpr Base64Places kBase64Places = makeBase64Places();
+
+std::uint32_t base64Group(const char* digits, std::size_t count) {
+  std::uint32_t group = 0;
+  for (std::size_t place = 0; place < count; ++place) {
+    group |= kBase64Places[place][static_cast<unsigned char>(digits[place])];
+  }
+  return group;
+}
 
 }  // namespace
 
@@ -46,14 +69,16 @@ std::string hexText(ByteView bytes) {
 
 std::optional<Bytes> bytesFromHex(std::string_view text) {
   if (text.size() % 2 != 0) return std::nullopt;
-  Bytes bytes;
-  bytes.reserve(text.size() / 2);
-  for (std::size_t i = 0; i < text.size(); i += 2) {
-    const int high = hexDigit(text[i]);
-    const int low = hexDigit(text[i + 1]);
-    if (high < 0 || low < 0) return std::nullopt;
-    bytes.push_back(static_cast<std::uint8_t>(high * 16 + low));
+  Bytes bytes(text.size() / 2);
+  const char* digits = text.data();
+  unsigned seen = 0;
+  for (std::uint8_t& byte : bytes) {
+    const unsigned high = kHexValues[static_cast<unsigned char>(*digits++)];
+    const unsigned low = kHexValues[static_cast<unsigned char>(*digits++)];
+    byte = static_cast<std::uint8_t>(high << 4 | low);
+    seen |= high | low;
   }
+  if ((seen & kNoHexDigit) != 0) return std::nullopt;
   return bytes;
 }
 
@@ -73,24 +98,29 @@ std::string base64Text(ByteView bytes) {
 
 std::optional<Bytes> bytesFromBase64(std::string_view text) {
   if (text.size() % 4 != 0) return std::nullopt;
+  if (text.empty()) return Bytes();
   std::size_t padding = 0;
-  while (padding < 2 && padding < text.size() && text[text.size() - 1 - padding] == '=') ++padding;
-  const std::size_t digits = text.size() - padding;
-  const std::size_t size = text.size() / 4 * 3 - padding;
-  Bytes bytes(size);
-  for (std::size_t group = 0; group * 4 < digits; ++group) {
-    int value = 0;  // of four digits; negative once one of them is none
-    for (std::size_t i = group * 4; i < group * 4 + 4; ++i) {
-      value = value << 6 | (i < digits ? kBase64Values[static_cast<unsigned char>(text[i])] : 0);
-    }
-    const auto bits = static_cast<std::uint32_t>(value);
-    const std::size_t end = std::min(group * 3 + 3, size);
-    std::uint32_t left = bits << 8;
-    for (std::size_t i = group * 3; i < end; ++i, left <<= 8) {
-      bytes[i] = static_cast<std::uint8_t>(left >> 24);
-    }
-    if (value < 0 || left != 0) return std::nullopt;
+  while (padding < 2 && text[text.size() - 1 - padding] == '=') ++padding;
+  Bytes bytes(text.size() / 4 * 3 - padding);
+  const char* digits = text.data();
+  const char* const last = digits + text.size() - 4;
+  std::uint8_t* next = bytes.data();
+  std::uint32_t seen = 0;
+  for (; digits != last; digits += 4, next += 3) {
+    const std::uint32_t group = base64Group(digits, 4);
+    seen |= group;
+    next[0] = static_cast<std::uint8_t>(group >> 16);
+    next[1] = static_cast<std::uint8_t>(group >> 8);
+    next[2] = static_cast<std::uint8_t>(group);
   }
+  std::uint32_t group = base64Group(last, 4 - padding);
+  seen |= group;
+  for (std::uint8_t* const end = bytes.data() + bytes.size(); next != end; ++next) {
+    *next = static_cast<std::uint8_t>(group >> 16);
+    group <<= 8;
+  }
+  const bool isRestZero = (group & 0xFFFFFF) == 0;
+  if ((seen & kNoBase64Digit) != 0 || !isRestZero) return std::nullopt;
   return bytes;
 }
 

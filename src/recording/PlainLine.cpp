@@ -1,142 +1,130 @@
 #include "recording/PlainLine.h"
 
-#include <algorithm>
 #include <array>
 #include <utility>
 
 #include "base/Bytes.h"
 #include "recording/LineLimits.h"
+#include "recording/PlainScanner.h"
 
 namespace qel {
 namespace {
 
-// Keys that a dictionary need not copy.
-constexpr std::array<Name, 4> kUsualKeys = {"kKeyMetricID", "kKeyPayload", "kKeyProfileID",
-                                            "kKeyTriggerID"};
+// The keys of nearly every line, in the order in which they come there. A dictionary need not copy
+// their names.
+struct UsualKey {
+  Name name;
+  KnownText text;  // as a line has it
+};
+#define QEL_USUAL_KEY(name) \
+  UsualKey { name, KnownText("\"" name "\":") }
+constexpr std::array kUsualKeys = {
+    QEL_USUAL_KEY("time_ms"),       QEL_USUAL_KEY("event"),       QEL_USUAL_KEY("kKeyMetricID"),
+    QEL_USUAL_KEY("kKeyProfileID"), QEL_USUAL_KEY("kKeyPayload"), QEL_USUAL_KEY("kKeyTriggerID"),
+};
+#undef QEL_USUAL_KEY
+constexpr std::size_t kTime = 0;
+constexpr std::size_t kKind = 1;
+constexpr std::size_t kPayload = 4;
+constexpr std::size_t kOther = kUsualKeys.size();
+static_assert(kUsualKeys[kTime].name == kRecordedTimeKey &&
+              kUsualKeys[kKind].name == kRecordedEventKey &&
+              kUsualKeys[kPayload].name == kRecordedPayloadKey);
 
-Text keyText(std::string_view key) {
-  const auto* const usual = std::ranges::find(kUsualKeys, key, &Name::view);
-  return usual == kUsualKeys.end() ? Text(key) : Text(*usual);
+struct UsualKind {
+  RecordedKind kind;
+  KnownText text;
+};
+constexpr std::array kUsualKinds = {UsualKind{RecordedKind::metric, KnownText("\"metric\"")},
+                                    UsualKind{RecordedKind::trigger, KnownText("\"trigger\"")}};
+static_assert(kUsualKinds.size() == kRecordedKindNames.size());
+
+std::optional<Value> readValue(PlainScanner& scanner) {
+  if (scanner.startsWith('"')) {
+    const auto text = scanner.text();
+    return text ? std::optional(Value(*text)) : std::nullopt;
+  }
+  const auto number = scanner.number();
+  return number ? std::optional(Value(*number)) : std::nullopt;
 }
 
-// Takes the parts of a plain line off its front.
-class Scanner {
- public:
-  explicit Scanner(std::string_view line) : _left(line) {}
-
-  bool take(char wanted) {
-    skipBlanks();
-    if (_left.empty() || _left.front() != wanted) return false;
-    _left.remove_prefix(1);
-    return true;
-  }
-
-  std::optional<std::string_view> text() {
-    if (!take('"')) return std::nullopt;
-    const std::size_t size = _left.find('"');
-    if (size == std::string_view::npos) return std::nullopt;
-    const std::string_view text = _left.substr(0, size);
-    bool isPlain = true;
-    for (const char c : text) isPlain &= c >= ' ' && c <= '~' && c != '\\';
-    if (!isPlain) return std::nullopt;
-    _left.remove_prefix(size + 1);
-    return text;
-  }
-
-  std::optional<std::uint64_t> number() {
-    constexpr std::size_t kMostDigits = 18;
-    skipBlanks();
-    const auto size = lengthWhile([](char c) { return c >= '0' && c <= '9'; });
-    if (size == 0 || size > kMostDigits || (size > 1 && _left.front() == '0')) return std::nullopt;
-    std::uint64_t number = 0;
-    for (const char digit : _left.substr(0, size)) {
-      number = number * 10 + static_cast<std::uint64_t>(digit - '0');
-    }
-    _left.remove_prefix(size);
-    return number;
-  }
-
-  bool startsText() {
-    skipBlanks();
-    return _left.starts_with('"');
-  }
-
-  bool atEnd() {
-    skipBlanks();
-    return _left.empty();
-  }
-
- private:
-  template <class Condition>
-  std::size_t lengthWhile(const Condition& condition) const {
-    const auto* const end = std::ranges::find_if_not(_left, condition);
-    return static_cast<std::size_t>(end - _left.begin());
-  }
-
-  void skipBlanks() {
-    _left.remove_prefix(lengthWhile([](char c) { return c == ' ' || c == '\t' || c == '\r'; }));
-  }
-
-  std::string_view _left;
-};
-
-std::optional<Value> readValue(std::string_view key, Scanner& scanner) {
-  const bool isPayload = key == kRecordedPayloadKey;
-  if (!isPayload && !scanner.startsText()) {
-    const auto number = scanner.number();
-    return number ? std::optional(Value(*number)) : std::nullopt;
-  }
-  const auto text = scanner.text();
-  if (!text) return std::nullopt;
-  if (!isPayload) return Value(*text);
-  auto bytes = bytesFromBase64(*text);
+// A text that is base64 is plain.
+std::optional<Value> readPayload(PlainScanner& scanner) {
+  const auto text = scanner.quoted();
+  auto bytes = text ? bytesFromBase64(*text) : std::nullopt;
   return bytes ? std::optional(Value(std::move(*bytes))) : std::nullopt;
 }
 
 // One line while it is read. Each of these is false when the line is not plain.
 class PlainLine {
  public:
-  bool readEntry(Scanner& scanner) {
-    const auto key = scanner.text();
-    if (!key || !scanner.take(':')) return false;
-    if (*key == kRecordedTimeKey) return readTime(scanner);
-    if (*key == kRecordedEventKey) return readKind(scanner);
-    auto value = readValue(*key, scanner);
-    if (!value || event.entries.size() + kKeysOfTheLine == kMostKeysOfAnObject) return false;
-    if (event.entries.contains(*key)) return false;
-    event.entries.append(keyText(*key), std::move(*value));
-    return true;
+  bool readEntry(PlainScanner& scanner) {
+    std::size_t key = takeUsualKey(scanner);
+    std::optional<std::string_view> text;
+    if (key == kOther) {
+      text = scanner.text();
+      if (!text || !scanner.take(':')) return false;
+      key = placeOf(*text);
+    }
+    if (key == kOther) return !event.entries.contains(*text) && append(*text, readValue(scanner));
+    if (std::exchange(_has[key], true)) return false;
+    if (key == kTime) return readTime(scanner);
+    if (key == kKind) return readKind(scanner);
+    return append(kUsualKeys[key].name,
+                  key == kPayload ? readPayload(scanner) : readValue(scanner));
   }
 
-  bool isWhole() const { return _hasTime && _hasKind; }
+  bool isWhole() const { return _has[kTime] && _has[kKind]; }
 
   RecordedEvent event;
 
  private:
-  bool readTime(Scanner& scanner) {
+  // Looks first for the one that usually comes next.
+  std::size_t takeUsualKey(PlainScanner& scanner) {
+    for (std::size_t tried = 0; tried < kUsualKeys.size(); ++tried) {
+      const std::size_t key = _next;
+      _next = key + 1 == kUsualKeys.size() ? 0 : key + 1;
+      if (scanner.take(kUsualKeys[key].text)) return key;
+    }
+    return kOther;
+  }
+
+  static std::size_t placeOf(std::string_view key) {
+    std::size_t place = 0;
+    while (place < kUsualKeys.size() && kUsualKeys[place].name.view() != key) ++place;
+    return place;
+  }
+
+  bool append(Text key, std::optional<Value> value) {
+    if (!value || event.entries.size() + kKeysOfTheLine == kMostKeysOfAnObject) return false;
+    event.entries.append(std::move(key), std::move(*value));
+    return true;
+  }
+
+  bool readTime(PlainScanner& scanner) {
     const auto time = scanner.number();
-    if (!time || *time > kLastRecordedMs || std::exchange(_hasTime, true)) return false;
+    if (!time || *time > kLastRecordedMs) return false;
     event.timeMs = *time;
     return true;
   }
 
-  bool readKind(Scanner& scanner) {
-    const auto name = scanner.text();
-    const auto kind = name ? recordedKind(*name) : std::nullopt;
-    if (!kind || std::exchange(_hasKind, true)) return false;
-    event.kind = *kind;
-    return true;
+  bool readKind(PlainScanner& scanner) {
+    for (const UsualKind& usual : kUsualKinds) {
+      event.kind = usual.kind;
+      if (scanner.take(usual.text)) return true;
+    }
+    return false;
   }
 
-  bool _hasTime = false;
-  bool _hasKind = false;
+  std::array<bool, kUsualKeys.size()> _has{};
+  std::size_t _next = 0;
 };
 
 }  // namespace
 
 std::optional<RecordedEvent> readPlainLine(std::string_view line) {
   constexpr std::size_t kUsualEntries = 4;
-  Scanner scanner(line);
+  PlainScanner scanner(line);
   PlainLine plain;
   plain.event.entries.reserve(kUsualEntries);
   if (!scanner.take('{')) return std::nullopt;

@@ -2,6 +2,9 @@
 
 #include <gtest/gtest.h>
 
+#include <cctype>
+#include <string>
+
 namespace qel {
 namespace {
 
@@ -12,6 +15,15 @@ ByteView viewOf(std::string_view text) {
 TEST(HexText, isLowerCaseWithTwoDigitsAByte) {
   EXPECT_EQ(hexText(Bytes{0x00, 0x0A, 0xFF}), "000aff");
   EXPECT_EQ(hexText({}), "");
+}
+
+TEST(BytesFromHex, refusesEveryOtherCharacter) {
+  for (int character = 0; character < 256; ++character) {
+    if (std::isxdigit(character) != 0) continue;
+    const char c = static_cast<char>(character);
+    EXPECT_EQ(bytesFromHex(std::string{'1', '2', c, '3'}), std::nullopt) << character;
+    EXPECT_EQ(bytesFromHex(std::string{'1', '2', '3', c}), std::nullopt) << character;
+  }
 }
 
 TEST(BytesFromHex, readsBothCasesAndNothingElse) {
@@ -37,6 +49,32 @@ TEST(Base64, agreesWithTheVectorsOfItsDefinition) {
     const ByteView bytes = viewOf(plain);
     EXPECT_EQ(base64Text(bytes), encoded);
     EXPECT_EQ(bytesFromBase64(encoded), Bytes(bytes.begin(), bytes.end()));
+  }
+}
+
+TEST(Base64, readsWhatItWritesWhateverTheBytes) {
+  for (std::size_t size = 0; size < 20; ++size) {
+    for (unsigned first = 0; first < 256; first += 5) {
+      Bytes bytes;
+      for (std::size_t i = 0; i < size; ++i) {
+        bytes.push_back(static_cast<std::uint8_t>(first + 83 * i));
+      }
+      EXPECT_EQ(bytesFromBase64(base64Text(bytes)), bytes);
+    }
+  }
+}
+
+TEST(Base64, refusesEveryOtherCharacterAtEveryPlace) {
+  const std::string good = "Zm9vYmFyZg==";
+  for (std::size_t place = 0; place < good.size(); ++place) {
+    for (int character = 0; character < 256; ++character) {
+      const auto c = static_cast<unsigned char>(character);
+      if (std::isalnum(c) != 0 || c == '+' || c == '/') continue;
+      std::string text = good;
+      text[place] = static_cast<char>(c);
+      if (text == good) continue;
+      EXPECT_EQ(bytesFromBase64(text), std::nullopt) << place << " " << character;
+    }
   }
 }
 

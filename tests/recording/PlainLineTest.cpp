@@ -2,6 +2,10 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
+#include <string>
+#include <vector>
+
 namespace qel {
 namespace {
 
@@ -28,6 +32,63 @@ TEST(PlainLine, mayHaveBlanksAnywhereBetweenItsParts) {
   EXPECT_EQ(event->kind, RecordedKind::trigger);
   EXPECT_EQ(event->timeMs, 0U);
   EXPECT_EQ(event->entries, (Dictionary{{"x", std::uint64_t{999999999999999999}}}));
+}
+
+TEST(PlainLine, hasNumbersOfEveryLengthAtAnyDistanceFromItsEnd) {
+  const std::string digits = "987654321012345678";
+  for (std::size_t length = 1; length <= digits.size(); ++length) {
+    const std::string number = digits.substr(0, length);
+    for (const char* rest :
+         {"}", " }", "  }", "     }", "      }", "       }", ",\"y\":\"zzzzz\"}"}) {
+      const auto event = readPlainLine(R"({"time_ms":1,"event":"trigger","x":)" + number + rest);
+      ASSERT_TRUE(event) << number << rest;
+      EXPECT_EQ(*event->entries.find("x"), Value(std::uint64_t{std::stoull(number)}));
+    }
+  }
+}
+
+TEST(PlainLine, hasNothingBesideADigitForADigit) {
+  const std::string good = "1234567890123";
+  for (std::size_t place = 0; place < good.size(); ++place) {
+    for (int character = 0; character < 256; ++character) {
+      std::string number = good;
+      number[place] = static_cast<char>(character);
+      const std::string line = R"({"event":"trigger","x":)" + number + R"(,"time_ms":1})";
+      const bool isAtAnEnd = place == 0 || place + 1 == good.size();
+      const bool isBlank = character == ' ' || character == '\t' || character == '\r';
+      const bool isDigit = character >= (place == 0 ? '1' : '0') && character <= '9';
+      EXPECT_EQ(readPlainLine(line).has_value(), isDigit || (isBlank && isAtAnEnd)) << line;
+    }
+  }
+}
+
+TEST(PlainLine, hasItsKeysInAnyOrder) {
+  std::vector<std::string> parts = {R"("time_ms":5)", R"("event":"metric")", R"("kKeyMetricID":7)",
+                                    R"( "kKeyPayload" :"AA==")", R"("x":"y")"};
+  std::sort(parts.begin(), parts.end());
+  do {
+    std::string line;
+    for (const std::string& part : parts) line += (line.empty() ? "{" : ",") + part;
+    const auto event = readPlainLine(line + "}");
+    ASSERT_TRUE(event) << line;
+    EXPECT_EQ(event->timeMs, 5U);
+    EXPECT_EQ(event->entries,
+              (Dictionary{{"kKeyMetricID", 7U}, {"kKeyPayload", Bytes{0}}, {"x", "y"}}));
+  } while (std::next_permutation(parts.begin(), parts.end()));
+}
+
+TEST(PlainLine, hasEachKeyOnceHoweverItIsWritten) {
+  for (const char* key : {"time_ms", "event", "kKeyMetricID", "kKeyPayload", "x"}) {
+    const std::string value = key == std::string_view("event")         ? "\"metric\""
+                              : key == std::string_view("kKeyPayload") ? "\"\""
+                                                                       : "1";
+    for (const char* colon : {":", " :"}) {
+      const std::string again = "\"" + std::string(key) + "\"" + colon + value;
+      const std::string line = "{\"" + std::string(key) + "\":" + value + "," + again;
+      EXPECT_FALSE(readPlainLine(line + R"(,"time_ms":1,"event":"metric"})")) << line;
+      EXPECT_FALSE(readPlainLine(line + "}")) << line;
+    }
+  }
 }
 
 // Whether such lines are good is not for the short way to say.
