@@ -95,7 +95,8 @@ std::vector<Bytes> lineSeeds(const std::vector<RecordedEvent>& events) {
       const std::string_view line :
       {R"({"time_ms": 1, "event": "trigger", "kKeyTriggerID": 7, "x": [1, -2.5, null, {"y": true}]})",
        R"({"time_ms": 1e3, "event": "metric"})",
-       R"({"event": "trigger", "time_ms": 2, "a": "\u00e4"})"}) {
+       R"({"event": "trigger", "time_ms": 2, "a": "\u00e4"})",
+       R"({"metric": 19972, "payload": "08e807"})", R"({"payload": "", "metric": -1, "a": 1})"}) {
     seeds.push_back(Seed().rest(viewOf(line)).bytes);
   }
   return seeds;

@@ -1,10 +1,10 @@
-// One line of a recording: the short way to read it against the general one.
+// One line of a recording, or of payloads: the short way to read it against the general one.
 
 #include "base/Rendering.h"
 #include "fuzz/support/Law.h"
 #include "fuzz/support/Target.h"
 #include "recording/EventLine.h"
-#include "recording/PlainLine.h"
+#include "recording/PayloadLine.h"
 
 namespace qel::fuzz {
 namespace {
@@ -20,6 +20,19 @@ void expectOneLine(const std::string& text) {
   }
 }
 
+void tryPayloads(std::string_view line) {
+  const auto read = parsePayloadLine(line);
+  const auto generally = parsePayloadLine("\n" + std::string(line));
+  law(read.index() == generally.index(), "both ways take the same lines of payloads");
+  if (const auto* payload = std::get_if<PayloadLine>(&read)) {
+    const auto& same = std::get<PayloadLine>(generally);
+    law(payload->metric == same.metric && payload->payload == same.payload,
+        "both ways read the same payload");
+  } else {
+    expectOneLine(std::get<std::string>(read));
+  }
+}
+
 }  // namespace
 
 void tryInput(Input input) {
@@ -27,6 +40,7 @@ void tryInput(Input input) {
   const std::string_view line = textOf(bytes);
   if (line.find('\n') != std::string_view::npos) return;
   if (line.find_first_not_of(" \t\r") == std::string_view::npos) return;  // has a fault of its own
+  tryPayloads(line);
   const auto read = parseEventLine(line);
   // A newline is a blank to the general parser, and to the short way the end of its patience.
   const auto generally = parseEventLine("\n" + std::string(line));
