@@ -81,7 +81,7 @@ void refill(Dictionary& entry, const Dictionary& reported, const ListCopy& copy)
 }
 
 // Makes the list that of the reported dictionaries. What there is is used again.
-void refill(EntryList& target, const List& reported, const ListCopy& copy) {
+void refill(EntryList::Entries& target, const List& reported, const ListCopy& copy) {
   target.reserve(reported.size());
   while (target.size() < reported.size()) target.emplace_back();
   while (target.size() > reported.size()) target.erase(target.end() - 1);
@@ -90,9 +90,10 @@ void refill(EntryList& target, const List& reported, const ListCopy& copy) {
   }
 }
 
-void copyList(const ListCopy& copy, const Dictionary& record, MetricStore& store,
-              const BandwidthTable& bandwidths) {
-  EntryList& target = copy.target(store);
+}  // namespace
+
+void copyEntries(const ListCopy& copy, const Dictionary& record, EntryList::Entries& target,
+                 const BandwidthTable& bandwidths) {
   const Value* source = record.find(copy.key);
   const List* list = source ? source->asList() : nullptr;
   if (!list || !allDictionaries(*list)) return target.clear();
@@ -109,8 +110,6 @@ void copyList(const ListCopy& copy, const Dictionary& record, MetricStore& store
     for (Dictionary& entry : target) entry.assign(key, carried);
   }
 }
-
-}  // namespace
 
 void applyRewrite(const Rewrite& rewrite, Dictionary& record, const BandwidthTable& bandwidths) {
   Value* value = record.find(rewrite.key);
@@ -130,7 +129,9 @@ void applyDerivation(const Derivation& derivation, Dictionary& record, MetricSto
                      const BandwidthTable& bandwidths) {
   for (const Rewrite& rewrite : derivation.inPlace) applyRewrite(rewrite, record, bandwidths);
   if (derivation.projection) project(record, derivation.projection(store));
-  for (const ListCopy& copy : derivation.copies) copyList(copy, record, store, bandwidths);
+  for (const ListCopy& copy : derivation.copies) {
+    copy.target(store).copyLater(copy, record, bandwidths);
+  }
 }
 
 }  // namespace qel

@@ -31,6 +31,7 @@ struct Rewrite {
 
 // Copies the dictionaries of a list of the record into a list of the store: emptied, then one entry
 // each, rewritten, with the record's values under `carried` (absent there: removed from the entry).
+// Without such a list, or with anything else in it, the list of the store is empty.
 struct ListCopy {
   Name key;
   EntryList& (*target)(MetricStore&);
@@ -51,7 +52,10 @@ void applyRewrite(const Rewrite& rewrite, Dictionary& record, const BandwidthTab
 // never comes back.
 void project(const Dictionary& record, Dictionary& projection);
 
-// `record` is the stored one; `store` holds the lists.
+void copyEntries(const ListCopy& copy, const Dictionary& record, EntryList::Entries& target,
+                 const BandwidthTable& bandwidths);
+
+// `record` is the stored one; `store` holds the lists, which copy from it when somebody looks.
 void applyDerivation(const Derivation& derivation, Dictionary& record, MetricStore& store,
                      const BandwidthTable& bandwidths);
 

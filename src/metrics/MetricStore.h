@@ -4,13 +4,12 @@
 #include <optional>
 
 #include "base/Value.h"
+#include "metrics/EntryList.h"
 
 namespace qel {
 
 // Main thread only, no lock. Nothing is ever cleared or aged. A reader that keeps a record copies
 // it; changing a copy changes nothing here.
-
-using EntryList = Sequence<Dictionary>;
 
 // The one entry of a list that no report has filled yet: "Waiting for Update" both ways.
 EntryList placeholderList();
