@@ -13,6 +13,8 @@ class LogSink {
  public:
   virtual ~LogSink() = default;
   virtual void write(std::string_view line) = 0;
+  // Whether lines go anywhere: one that is dear to make need not be made for nobody.
+  virtual bool wantsLines() const { return true; }
   // A line about an event: `text` and the event as JSON. A sink may want to know that it is one.
   virtual void writeEvent(std::string_view text, const Dictionary& event);
   // Hands on what the sink still holds.
@@ -23,6 +25,7 @@ class LogSink {
 class NullSink final : public LogSink {
  public:
   void write(std::string_view) override {}
+  bool wantsLines() const override { return false; }
   void writeEvent(std::string_view, const Dictionary&) override {}
 };
 

@@ -1,6 +1,7 @@
 #include "metrics/MetricValidator.h"
 
-#include <array>
+#include <algorithm>
+#include <bit>
 #include <string>
 
 #include "base/FatalError.h"
@@ -12,16 +13,10 @@ namespace {
 
 // "%2X" of a 64-bit integer.
 void appendHexadecimal(std::string& out, std::int64_t number) {
-  std::array<char, 16> digits;
-  auto first = digits.end();
-  auto left = static_cast<std::uint64_t>(number);
-  do {
-    *--first = "0123456789ABCDEF"[left % 16];
-    left /= 16;
-  } while (left != 0);
-  const auto count = static_cast<std::size_t>(digits.end() - first);
-  if (count < 2) out += ' ';
-  out.append(first, count);
+  const auto left = static_cast<std::uint64_t>(number);
+  if (left < 16) out += ' ';
+  const int digits = std::max(1, (static_cast<int>(std::bit_width(left)) + 3) / 4);
+  for (int i = digits - 1; i >= 0; --i) out += "0123456789ABCDEF"[left >> 4 * i & 0xF];
 }
 
 [[noreturn]] void refusePayload(std::int64_t identifier) {
@@ -69,14 +64,15 @@ bool MetricValidator::processMetric(const Dictionary& event) {
   const Value* identifier = event.find(metricIDKey);
   metricID = identifier ? identifier->asInt64() : std::nullopt;
   if (!metricID) fatalError("a metric event without an integer under \"" + metricIDKey + "\"");
-  logHexadecimal(*metricID);
+  LogSink& output = standardOutput();
+  logHexadecimal(*metricID, output);
 
   const Value* payload = event.find(payloadKey);
   const Bytes* bytes = payload ? payload->asBytes() : nullptr;
   const ByteView view = bytes ? ByteView(*bytes) : ByteView();
   const DispatchRow* row = findDispatchRow(*metricID);
   if (!row) {
-    standardOutput().write("I dont care for this Metric");
+    output.write("I dont care for this Metric");
     if (_observer) _observer->metricWasPassedOver({*metricID, view, _clock->nowMs()});
     return false;
   }
@@ -86,7 +82,7 @@ bool MetricValidator::processMetric(const Dictionary& event) {
   Slot& slot = this->*row->slot;
   slot = std::move(record);
   rewriteTimestamp(*slot);
-  logRecord(row->logText, *slot);
+  logRecord(row->logText, *slot, output);
   applyDerivation(row->derivation, *slot, *this, dlbwlookup);
   if (_observer) _observer->metricWasStored({*row, *slot, view, _clock->nowMs()});
   return true;
@@ -100,16 +96,18 @@ void MetricValidator::rewriteTimestamp(Dictionary& record) {
   *value = _dates.at(*milliseconds);
 }
 
-void MetricValidator::logHexadecimal(std::int64_t identifier) {
+void MetricValidator::logHexadecimal(std::int64_t identifier, LogSink& output) {
+  if (!output.wantsLines()) return;
   _line = "Metric ID in Hex = ";
   appendHexadecimal(_line, identifier);
-  standardOutput().write(_line);
+  output.write(_line);
 }
 
-void MetricValidator::logRecord(std::string_view text, const Dictionary& record) {
+void MetricValidator::logRecord(std::string_view text, const Dictionary& record, LogSink& output) {
+  if (!output.wantsLines()) return;
   _line = text;
   appendJson(_line, record);
-  standardOutput().write(_line);
+  output.write(_line);
 }
 
 }  // namespace qel

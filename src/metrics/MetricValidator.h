@@ -84,8 +84,8 @@ class MetricValidator final : public MetricStore,
  private:
   MetricValidator(std::shared_ptr<TeskWrapper> wrapper, const TimeZone& zone);
   void rewriteTimestamp(Dictionary& record);
-  void logHexadecimal(std::int64_t identifier);
-  void logRecord(std::string_view text, const Dictionary& record);
+  void logHexadecimal(std::int64_t identifier, LogSink& output);
+  void logRecord(std::string_view text, const Dictionary& record, LogSink& output);
 
   DateTexts _dates;
   MetricObserver* _observer = nullptr;

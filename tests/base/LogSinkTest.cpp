@@ -8,6 +8,7 @@
 #include <cerrno>
 
 #include "base/DescriptorSink.h"
+#include "base/DroppedOutput.h"
 #include "support/RecordingSink.h"
 
 namespace qel {
@@ -83,6 +84,17 @@ TEST(StandardOutputAndSystemLog, goWhereTheyAreSet) {
 TEST(StandardOutput, dropsLinesWhenThereIsNoSink) {
   setStandardOutput(nullptr);
   EXPECT_NO_FATAL_FAILURE(standardOutput().write("dropped"));
+}
+
+TEST(StandardOutput, wantsLinesUnlessTheyAreDropped) {
+  {
+    const testing::CapturedStandardOutput out;
+    EXPECT_TRUE(standardOutput().wantsLines());
+    const DroppedOutput dropped;
+    EXPECT_FALSE(standardOutput().wantsLines());
+  }
+  setStandardOutput(nullptr);
+  EXPECT_FALSE(standardOutput().wantsLines());
 }
 
 }  // namespace

@@ -129,6 +129,28 @@ TEST(MetricValidator, listensBeforeItIsTheDelegateAndThereIsOne) {
   EXPECT_EQ(shared->mySharedTeskInstance, TeskWrapper::sharedInstance());
 }
 
+// Lines were written out and thrown away where only the store was asked for.
+TEST(MetricValidator, writesOutNoRecordForASinkThatWantsNoLines) {
+  class Unwanting final : public LogSink {
+   public:
+    explicit Unwanting(Lines& lines) : _lines(lines) {}
+    void write(std::string_view line) override { _lines.emplace_back(line); }
+    bool wantsLines() const override { return false; }
+
+   private:
+    Lines& _lines;
+  };
+  const FedValidator validator;
+  Lines lines;
+  setStandardOutput(std::make_shared<Unwanting>(lines));
+  KCellularLteRrcState report;
+  report.setTimestamp(1500000000000);
+  validator->metricsDidUpdate(metricEvent(MetricValidator::K_LTE_RRC_STATE, report));
+  setStandardOutput(nullptr);
+  EXPECT_EQ(lines, (Lines{"Received Valid Metric"}));
+  EXPECT_EQ(*validator->myLTERRCStateDict, (Dictionary{{"timestamp", "2017-07-14 02:40:00 UTC"}}));
+}
+
 TEST(MetricValidator, knowsItsKeysAndTheBandwidths) {
   const FedValidator validator;
   EXPECT_EQ(validator->metricIDKey, "kKeyMetricID");

@@ -39,7 +39,7 @@ EventLog::EventLog(std::shared_ptr<LogSink> log, LoggedEvents events)
 void EventLog::write(std::string_view line) { _log->write(line); }
 
 void EventLog::writeEvent(std::string_view text, const Dictionary& event) {
-  if (_events == LoggedEvents::none) return;
+  if (_events == LoggedEvents::none || !_log->wantsLines()) return;
   if (_events == LoggedEvents::full) return _log->writeEvent(text, event);
   _log->writeEvent(text, withoutIdentities(event));
 }

@@ -30,6 +30,7 @@ class EventLog final : public LogSink {
  public:
   EventLog(std::shared_ptr<LogSink> log, LoggedEvents events);
   void write(std::string_view line) override;
+  bool wantsLines() const override { return _log->wantsLines(); }
   void writeEvent(std::string_view text, const Dictionary& event) override;
   void flush() override;
 
