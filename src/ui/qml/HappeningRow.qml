@@ -30,7 +30,7 @@ Rectangle {
         id: time
         anchors {
             left: sign.right
-            leftMargin: 6
+            leftMargin: 8
         }
         y: texts.y
         text: line.row.time

@@ -1,31 +1,18 @@
 import QtQuick
 import Qelwatch.Ui
 
-// A small drawn sign for the kind of a happening: filled where something was lost or refused.
-Item {
+// The drawn sign for the kind of a happening, in the colour of its weight: lost or refused, another
+// place, the rest. The shape alone tells the kind.
+Sign {
     id: sign
 
     required property string kind
 
-    readonly property real side: Math.round(10 * Appearance.textScale)
     readonly property bool isBad: kind === "radio-link-failure" || kind === "reject" || kind === "gap"
-    readonly property bool isPlace: kind === "cell" || kind === "technology"
-    readonly property bool isMark: kind === "mark"
+    readonly property bool isPlace: kind === "cell" || kind === "technology" || kind === "mark"
 
-    implicitWidth: side + 4
-    implicitHeight: side + 4
-
-    Rectangle {
-        anchors.centerIn: parent
-        width: sign.side
-        height: sign.side
-        radius: sign.isPlace ? sign.side / 2 : sign.isMark ? 0 : 2
-        rotation: sign.isBad ? 45 : 0
-        antialiasing: true
-        color: sign.isBad ? Theme.error : sign.isMark ? Theme.accent : "transparent"
-        border {
-            width: 2
-            color: sign.isBad ? Theme.error : sign.isPlace || sign.isMark ? Theme.accent : Theme.secondary
-        }
-    }
+    implicitWidth: Math.round(16 * Appearance.textScale)
+    implicitHeight: implicitWidth
+    name: kind
+    color: isBad ? Theme.error : isPlace ? Theme.accent : Theme.secondary
 }

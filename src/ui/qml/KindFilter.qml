@@ -12,6 +12,7 @@ ListView {
     boundsBehavior: Flickable.StopAtBounds
     leftMargin: Theme.inset(width) - 8
     rightMargin: leftMargin
+    onLeftMarginChanged: positionViewAtBeginning()  // the screen was turned
     spacing: 4
     clip: true
     model: happenings.kinds
@@ -31,7 +32,7 @@ ListView {
         required property var row
         readonly property bool chosen: filter.happenings.filtered && row.shown
 
-        width: Math.ceil(label.implicitWidth) + 24
+        width: Math.ceil(label.x + label.implicitWidth) + 14
         height: filter.implicitHeight
         text: row.name
         activeFocusOnTab: true
@@ -55,9 +56,20 @@ ListView {
                 color: choice.chosen ? Theme.accent : Theme.separator
             }
         }
+        HappeningSign {
+            id: sign
+            x: 12
+            y: Math.round((choice.height - height) / 2)
+            kind: choice.row.kind
+            color: choice.chosen ? Theme.page : Theme.value
+        }
         Text {
             id: label
-            anchors.centerIn: parent
+            anchors {
+                left: sign.right
+                leftMargin: 6
+                verticalCenter: parent.verticalCenter
+            }
             text: choice.row.name + " " + choice.row.count
             textFormat: Text.PlainText
             color: choice.chosen ? Theme.page : Theme.value
