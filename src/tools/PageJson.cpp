@@ -42,7 +42,7 @@ Dictionary chartValue(const Chart& chart) {
   }
   List labels;
   for (const AxisLabel& label : chart.labels) {
-    labels.emplace_back(Dictionary{{"value", label.value}, {"grade", label.word}});
+    labels.emplace_back(Dictionary{{"value", label.value}, {"grade", nameOf(label.grade)}});
   }
   const QuantityFacts& facts = factsOf(chart.quantity);
   return {{"technology", nameOf(facts.technology)},

@@ -15,15 +15,17 @@ std::vector<Run> thinnedAll(std::vector<Run> runs, const ChartFrame& frame) {
   return runs;
 }
 
-// Good and fair, and as far again beyond either where such values are.
+// Good and fair, and as far again beyond either where such values are. A grade is named once, where
+// it begins; the lowest label is always one of poor.
 std::vector<AxisLabel> axisLabels(const Chart& chart) {
   const QuantityFacts& facts = factsOf(chart.quantity);
   const float width = facts.good - facts.fair;
   std::vector<AxisLabel> labels;
   for (const float value : {facts.fair - width, facts.fair, facts.good, facts.good + width}) {
-    if (value <= facts.lowest || value >= facts.highest) continue;
+    if (value < facts.lowest || value >= facts.highest) continue;
     const Grade grade = gradeOf(chart.quantity, value);
-    labels.push_back({value, figureText(value), grade, std::string(nameOf(grade))});
+    const bool begins = labels.empty() || labels.back().grade != grade;
+    labels.push_back({value, figureText(value), grade, std::string(begins ? nameOf(grade) : "")});
   }
   return labels;
 }

@@ -70,7 +70,20 @@ TEST(SignalsPage, LabelsTheAxisAtTheThresholdsOfQuality) {
   for (const AxisLabel& label : chartOf(page, "LTE RSRP").labels) {
     labels.push_back(label.text + " " + label.word);
   }
-  EXPECT_EQ(labels, (Texts{"-115 poor", "-105 fair", "-95 good", "-85 good"}));
+  EXPECT_EQ(labels, (Texts{"-115 poor", "-105 fair", "-95 good", "-85 "}));
+}
+
+TEST(SignalsPage, NamesEachGradeOnceBesideTheAxis) {
+  Scene scene;
+  scene.cell({});
+  scene.signals(0, 5'000, -90);
+  for (const Chart& chart : signalsPage(scene.viewpoint(), {}, kUtc).charts) {
+    Texts words;
+    for (const AxisLabel& label : chart.labels) {
+      if (!label.word.empty()) words.push_back(label.word);
+    }
+    EXPECT_EQ(words, (Texts{"poor", "fair", "good"})) << chart.id;
+  }
 }
 
 TEST(SignalsPage, NeverDrawsAcrossASilence) {

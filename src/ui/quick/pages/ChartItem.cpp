@@ -21,6 +21,11 @@ const Point* lastOf(const Curve& curve) {
   return nullptr;
 }
 
+// The value at which the band above a label ends.
+float endOfBand(const Chart& chart, std::size_t label) {
+  return label + 1 < chart.labels.size() ? chart.labels[label + 1].value : chart.highest;
+}
+
 }  // namespace
 
 ChartItem::ChartItem(QQuickItem* parent) : QQuickPaintedItem(parent) {
@@ -54,22 +59,44 @@ const Chart* ChartItem::chart() const {
   return &_page->page().charts[static_cast<std::size_t>(_chart)];
 }
 
-// Left of the curves stand the thresholds, right of them the neighbours' codes, above them the
-// marks' letters and below them the times.
+qreal ChartItem::AxisRoom::width() const {
+  return isOneColumn ? std::max(numbers, words) : words + kGap + numbers;
+}
+
+// A word stands between the numbers of its band where the band is high enough for both.
+ChartItem::AxisRoom ChartItem::axisRoom(const Chart& chart) const {
+  const QFontMetricsF metrics(_font);
+  const qreal needed = metrics.capHeight() + metrics.height();
+  const qreal height = boundingRect().height() - 2 * metrics.height();
+  AxisRoom room;
+  for (std::size_t i = 0; i < chart.labels.size(); ++i) {
+    const AxisLabel& label = chart.labels[i];
+    room.numbers = std::max(room.numbers, metrics.horizontalAdvance(shown(label.text)));
+    if (label.word.empty()) continue;
+    room.words = std::max(room.words, metrics.horizontalAdvance(shown(label.word)));
+    const float share = (endOfBand(chart, i) - label.value) / (chart.highest - chart.lowest);
+    room.isOneColumn = room.isOneColumn && static_cast<qreal>(share) * height >= needed;
+  }
+  return room;
+}
+
+// Left of the curves stand the thresholds and what they mean, right of them the neighbours' codes,
+// above them the marks' letters and below them the times: nothing is written across a curve. Each
+// moment stands at the same place in all charts of the page.
 QRectF ChartItem::plotRect() const {
   const QFontMetricsF metrics(_font);
   qreal left = 0;
   qreal right = kGap;
-  if (const Chart* shownChart = chart()) {
-    for (const AxisLabel& label : shownChart->labels) {
-      left = std::max(left, metrics.horizontalAdvance(shown(label.text)));
-    }
-    for (const Curve& curve : shownChart->curves) {
+  const qreal line = metrics.height();
+  const QRectF area = boundingRect().adjusted(0, line, 0, -line);
+  if (!_page) return area;
+  for (const Chart& each : _page->page().charts) {
+    left = std::max(left, axisRoom(each).width());
+    for (const Curve& curve : each.curves) {
       right = std::max(right, metrics.horizontalAdvance(shown(curve.label)) + 2 * kGap);
     }
   }
-  const qreal line = metrics.height();
-  return boundingRect().adjusted(left + kBandWidth + 2 * kGap, line, -right, -line);
+  return area.adjusted(left + kBandWidth + 2 * kGap, 0, -right, 0);
 }
 
 QColor ChartItem::colorOf(Grade grade) const {
@@ -88,24 +115,34 @@ QColor ChartItem::colorOf(Grade grade) const {
 
 void ChartItem::drawBands(QPainter& painter, const PlotArea& plot, const Chart& chart) const {
   const QRectF& area = plot.area();
-  const QFontMetricsF metrics(_font);
   for (std::size_t i = 0; i < chart.labels.size(); ++i) {
     const AxisLabel& label = chart.labels[i];
-    const qreal bottom = plot.y(label.value);
-    const qreal top = i + 1 < chart.labels.size() ? plot.y(chart.labels[i + 1].value) : area.top();
-    const QColor color = colorOf(label.grade);
-    const qreal end = i == 0 ? area.bottom() : bottom;  // below the lowest it is no better
-    painter.fillRect(QRectF(area.left() - kBandWidth, top, kBandWidth, end - top), color);
+    const qreal top = plot.y(endOfBand(chart, i));
+    const qreal line = plot.y(label.value);
+    const qreal bottom = i == 0 ? area.bottom() : line;  // below the lowest it is no better
+    painter.fillRect(QRectF(area.left() - kBandWidth, top, kBandWidth, bottom - top),
+                     colorOf(label.grade));
     painter.setPen(QPen(_lines, 1));
-    painter.drawLine(QPointF(area.left(), bottom), QPointF(area.right(), bottom));
-    painter.setPen(_words);
-    const QString text = shown(label.text);
-    painter.drawText(QPointF(area.left() - kBandWidth - kGap - metrics.horizontalAdvance(text),
-                             bottom + metrics.ascent() / 2 - 1),
-                     text);
-    if (label.word.empty() || bottom - top < metrics.height()) continue;
+    painter.drawLine(QPointF(area.left(), line), QPointF(area.right(), line));
+  }
+}
+
+// Each number at its line, and each word in the middle of its band.
+void ChartItem::drawAxis(QPainter& painter, const PlotArea& plot, const Chart& chart) const {
+  const QFontMetricsF metrics(_font);
+  const AxisRoom room = axisRoom(chart);
+  const qreal numbers = plot.area().left() - kBandWidth - kGap;
+  const qreal words = room.isOneColumn ? numbers : numbers - room.numbers - kGap;
+  const auto write = [&](const std::string& text, const QColor& color, qreal right, qreal middle) {
     painter.setPen(color);
-    painter.drawText(QPointF(area.left() + kGap, bottom - metrics.descent()), shown(label.word));
+    const qreal left = right - metrics.horizontalAdvance(shown(text));
+    painter.drawText(QPointF(left, middle + metrics.capHeight() / 2), shown(text));
+  };
+  for (std::size_t i = 0; i < chart.labels.size(); ++i) {
+    const AxisLabel& label = chart.labels[i];
+    write(label.text, _words, numbers, plot.y(label.value));
+    if (label.word.empty()) continue;
+    write(label.word, colorOf(label.grade), words, plot.y((label.value + endOfBand(chart, i)) / 2));
   }
 }
 
@@ -167,6 +204,7 @@ void ChartItem::paint(QPainter* painter) {
   const PlotArea plot(plotRect(), page.fromMs, page.toMs, shownChart->lowest, shownChart->highest);
   painter->setFont(_font);
   drawBands(*painter, plot, *shownChart);
+  drawAxis(*painter, plot, *shownChart);
   drawTimes(*painter, plot);
   painter->setRenderHint(QPainter::Antialiasing);
   drawMarks(*painter, plot);

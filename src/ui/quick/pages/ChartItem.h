@@ -55,10 +55,20 @@ class ChartItem : public QQuickPaintedItem {
   void geometryChange(const QRectF& now, const QRectF& before) override;
 
  private:
+  // How much room the numbers and the words at the left of the curves take.
+  struct AxisRoom {
+    qreal numbers = 0;
+    qreal words = 0;
+    bool isOneColumn = true;  // words stand between numbers; else left of them
+    qreal width() const;
+  };
+
   const Chart* chart() const;
+  AxisRoom axisRoom(const Chart& chart) const;
   QRectF plotRect() const;
   QColor colorOf(Grade grade) const;
   void drawBands(QPainter& painter, const PlotArea& plot, const Chart& chart) const;
+  void drawAxis(QPainter& painter, const PlotArea& plot, const Chart& chart) const;
   void drawMarks(QPainter& painter, const PlotArea& plot) const;
   void drawTimes(QPainter& painter, const PlotArea& plot) const;
   void drawCurves(QPainter& painter, const PlotArea& plot, const Chart& chart) const;
