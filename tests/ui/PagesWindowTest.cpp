@@ -177,6 +177,29 @@ TEST(PagesInTheWindow, aTapOnAFieldOpensItsSheetAndEscapeClosesIt) {
   EXPECT_EQ(window.warnings(), 0);
 }
 
+TEST(PagesInTheWindow, aSheetAndItsRowShowTheSameValue) {
+  const Window window;
+  reportCell(123);
+  ASSERT_TRUE(window.open("LTE", "Serving Cell Info"));
+  const TableModel& table = window.top();
+  const auto rows = table.match(table.index(0), TableModel::textRole, "phy_cell_id");
+  ASSERT_EQ(rows.size(), 1);
+  const QModelIndex row = rows.first();
+  reportCell(124);
+  window.tap(*window.row(row.row()));
+  const SheetModel* sheet = window.navigation().pages()->sheet();
+  EXPECT_EQ(sheet->value(), "124");
+  EXPECT_EQ(row.data(TableModel::detailRole), "124");
+  reportCell(125);
+  window.navigation().pages()->look();
+  QTest::qWait(700);  // in which a page would have followed
+  EXPECT_EQ(sheet->value(), "124");
+  EXPECT_EQ(row.data(TableModel::detailRole), "124");
+  window.refresh();
+  EXPECT_EQ(sheet->value(), "125");
+  EXPECT_EQ(row.data(TableModel::detailRole), "125");
+}
+
 TEST(PagesInTheWindow, aRowThatIsNoFieldOpensNoSheet) {
   const Window window;
   ASSERT_TRUE(window.open("LTE", "EUTRA Neighbor Info"));

@@ -129,13 +129,9 @@ void addMeaning(FieldSheet& sheet, const FieldFacts& facts) {
   add(sheet, "clause", "Defined in", clauseText(facts.clause));
 }
 
-void addAge(FieldSheet& sheet, const Viewpoint& viewpoint, const Report& report,
-            const TimeZone& zone) {
-  const std::uint64_t received = report.entry.receivedMs;
-  const std::uint64_t age = viewpoint.nowMs - std::min(viewpoint.nowMs, received);
-  const std::string text = age < kShortestAgeMs ? "just now" : durationText(age);
-  add(sheet, "age", "Age", text + ", since " + secondText(received, zone));
-  if (viewpoint.isLive) sheet.changesAtMs = received + nextDurationMs(age);
+std::string ageText(std::uint64_t age, std::uint64_t receivedMs, const TimeZone& zone) {
+  const std::string time = secondText(receivedMs, zone);
+  return age < kShortestAgeMs ? "just now, at " + time : durationText(age) + ", since " + time;
 }
 
 void addSource(FieldSheet& sheet, const Row& row) {
@@ -225,12 +221,27 @@ std::optional<FieldSheet> fieldSheet(const Viewpoint& viewpoint, std::string_vie
     const MessageFacts& around =
         at->origin.isCarried(sheet.key) ? *at->origin.payload : *at->origin.entry;
     if (raw) addRaw(sheet, {*at->facts, *raw, around, *report.around});
-    addAge(sheet, viewpoint, report, zone);
+    sheet.receivedMs = report.entry.receivedMs;
+    sheet.lines.push_back({"age", "Age", ""});
     setCurve(sheet, viewpoint, *at, report, section);
   }
   addSource(sheet, *at);
-  sheet.clipboard = clipboardOf(sheet);
+  if (!tellAge(sheet, viewpoint, zone)) sheet.clipboard = clipboardOf(sheet);
   return sheet;
+}
+
+bool tellAge(FieldSheet& sheet, const Viewpoint& viewpoint, const TimeZone& zone) {
+  const auto line = std::ranges::find(sheet.lines, "age", &SheetLine::id);
+  if (!sheet.receivedMs || line == sheet.lines.end()) return false;
+  const std::uint64_t received = *sheet.receivedMs;
+  const std::uint64_t age = viewpoint.nowMs - std::min(viewpoint.nowMs, received);
+  sheet.changesAtMs.reset();
+  if (viewpoint.isLive) sheet.changesAtMs = received + nextDurationMs(age);
+  std::string text = ageText(age, received, zone);
+  if (line->value == text) return false;
+  line->value = std::move(text);
+  sheet.clipboard = clipboardOf(sheet);
+  return true;
 }
 
 std::optional<int> rowOfField(const Viewpoint& viewpoint, std::string_view technology,

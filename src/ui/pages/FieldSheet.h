@@ -42,6 +42,7 @@ struct FieldSheet {
   float highest = 0;
 
   std::string clipboard;                     // all of it, a line each
+  std::optional<std::uint64_t> receivedMs;   // when its report came; none: nothing was kept of it
   std::optional<std::uint64_t> changesAtMs;  // when its age reads differently without a report
 };
 
@@ -50,6 +51,11 @@ struct FieldSheet {
 std::optional<FieldSheet> fieldSheet(const Viewpoint& viewpoint, std::string_view technology,
                                      std::string_view category, int section, int row,
                                      const TimeZone& zone = systemTimeZone());
+
+// Tells how old its report is at the viewpoint's moment, and leaves all else as it was. True when
+// the age reads differently now.
+bool tellAge(FieldSheet& sheet, const Viewpoint& viewpoint,
+             const TimeZone& zone = systemTimeZone());
 
 // Where the field with this name stands in a section; nothing: it has none.
 std::optional<int> rowOfField(const Viewpoint& viewpoint, std::string_view technology,

@@ -61,6 +61,7 @@ void Navigation::componentComplete() {
   emit pagesChanged();
   connect(this, &Navigation::depthChanged, _pages,
           [this] { _pages->setInSight(_depth == 1 ? QStringLiteral("first") : topKind()); });
+  // At another moment of a recording the store holds other values.
   connect(_pages, &Pages::momentChanged, this, &Navigation::drawAnew);
   _controller->setObserver([this] { stackChanged(); });
   stackChanged();
@@ -152,12 +153,13 @@ void Navigation::follow(const TableModel* table, IndexPath indexPath) {
   if (!category || !category->tableView()) return;
   const TableViewCell* cell = category->tableView()->cellForRowAtIndexPath(indexPath);
   if (!cell || !cell->textLabel) return;
+  const std::string field = cell->textLabel->text.value_or("");
+  drawAnew();  // the row and its sheet tell the same
   _pages->sheet()->open({category->firstSelection.value_or(""),
                          category->seguedThroughRow.value_or(""), indexPath.section, indexPath.row,
-                         cell->textLabel->text.value_or("")});
+                         field});
 }
 
-// At another moment of a recording the store holds other values.
 void Navigation::drawAnew() {
   const auto table =
       std::dynamic_pointer_cast<TableViewController>(_controller->topViewController());
@@ -191,6 +193,7 @@ void Navigation::show(const std::shared_ptr<ViewController>& controller) {
     screen.table = new TableModel(tableController, screen.previousTitle, this);
     connect(screen.table, &TableModel::chosen, this,
             [this, table = screen.table](IndexPath indexPath) { follow(table, indexPath); });
+    connect(screen.table, &TableModel::drawn, _pages, &Pages::tableDrawn);
   }
   beginInsertRows({}, rowCount(), rowCount());
   _screens.push_back(screen);

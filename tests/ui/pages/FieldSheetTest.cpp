@@ -163,7 +163,7 @@ TEST_F(FieldSheetTest, endsItsCurveAtTheMoment) {
   ASSERT_TRUE(told);
   ASSERT_EQ(told->curve.size(), 1U);
   EXPECT_EQ(told->curve[0].size(), 5U);
-  EXPECT_EQ(line(*told, "age"), "just now, since 08:00:04");
+  EXPECT_EQ(line(*told, "age"), "just now, at 08:00:04");
   EXPECT_FALSE(told->changesAtMs);
 }
 

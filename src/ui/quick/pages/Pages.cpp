@@ -66,6 +66,12 @@ void Pages::look() {
   if (_seen != _playback.playback().viewpoint().history->version()) refreshSoon(kShortestInterval);
 }
 
+void Pages::tableDrawn() {
+  if (!_sheet.isOpen()) return;
+  _sheet.tableDrawn();
+  refresh();
+}
+
 void Pages::refreshSoon(std::chrono::milliseconds interval) {
   if (_soon.isActive()) return;
   const auto since = _sinceRefresh.isValid() ? std::chrono::milliseconds(_sinceRefresh.elapsed())

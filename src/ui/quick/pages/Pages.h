@@ -62,6 +62,8 @@ class Pages : public QObject {
   void setInSight(const QString& screen);
   // Something may have been told: if so, the page in sight follows.
   void look();
+  // The table in sight was drawn: what lies over it follows.
+  void tableDrawn();
   // Opens a recording of the list.
   Q_INVOKABLE void openRecording(const QString& name);
 

@@ -10,6 +10,7 @@ namespace qel {
 
 void SheetModel::open(Place place) {
   _place = std::move(place);
+  _isToRead = true;
   if (_ask) _ask();
 }
 
@@ -26,18 +27,24 @@ void SheetModel::copy() const {
 
 std::optional<std::uint64_t> SheetModel::refresh(const Viewpoint& viewpoint) {
   if (!_place) return {};
+  if (std::exchange(_isToRead, false)) {
+    read(viewpoint);
+  } else if (_sheet && tellAge(*_sheet, viewpoint)) {
+    takeLines();
+    emit changed();
+  }
+  return _sheet ? _sheet->changesAtMs : std::nullopt;
+}
+
+void SheetModel::read(const Viewpoint& viewpoint) {
   const auto row =
       rowOfField(viewpoint, _place->technology, _place->category, _place->section, _place->field);
   auto sheet = fieldSheet(viewpoint, _place->technology, _place->category, _place->section,
                           row.value_or(_place->row));
-  if (!sheet) {
-    close();
-    return {};
-  }
+  if (!sheet) return close();
   _sheet = std::move(sheet);
   takeLines();
   emit changed();
-  return _sheet->changesAtMs;
 }
 
 void SheetModel::takeLines() {

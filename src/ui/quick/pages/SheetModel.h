@@ -12,7 +12,9 @@
 
 namespace qel {
 
-// GUI thread only. Open from a tap on a row until it is closed or the field is there no more.
+// GUI thread only. Open from a tap on a row until it is closed or the field is there no more. It
+// shows what the row shows: it is read when it is opened and when its table was drawn anew; between
+// that only its age goes on.
 class SheetModel : public QObject {
   Q_OBJECT
   QML_ELEMENT
@@ -45,6 +47,8 @@ class SheetModel : public QObject {
   Q_INVOKABLE void close();
   Q_INVOKABLE void copy() const;
 
+  // The rows below were drawn: the next refresh reads the field again.
+  void tableDrawn() { _isToRead = true; }
   // The sheet as of the viewpoint; when it will read differently by itself.
   std::optional<std::uint64_t> refresh(const Viewpoint& viewpoint);
 
@@ -65,10 +69,12 @@ class SheetModel : public QObject {
 
  private:
   QString text(std::string FieldSheet::*member) const;
+  void read(const Viewpoint& viewpoint);
   void takeLines();
 
   std::function<void()> _ask;
   std::optional<Place> _place;
+  bool _isToRead = false;
   std::optional<FieldSheet> _sheet;
   RowsModel _lines;
 };
