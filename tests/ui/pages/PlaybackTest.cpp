@@ -18,14 +18,27 @@ struct FixedClock final : Clock {
   std::uint64_t nowMs() const override { return 777; }
 };
 
+// The process has one dispatcher, which stays with the service that it found first.
+const std::shared_ptr<FakeService>& theService() {
+  static const auto service = installFakeService();
+  return service;
+}
+
 // A viewer's dispatcher and history, and a recording of ten seconds with three cells and a mark.
 class PlaybackTest : public ::testing::Test {
  protected:
   PlaybackTest() {
+    static_cast<MetricStore&>(*shown) = MetricStore();
     shown->setObserver(&live, clock);
     recording =
         folder.file("drive.jsonl", lineOf(lteCell(100'000, 1)) + lineOf(lteCell(104'000, 2)) +
                                        lineOf(markEvent(106'000, 1)) + lineOf(lteCell(110'000, 3)));
+  }
+
+  ~PlaybackTest() override {
+    playback.setOnChanged({});
+    playback.close();
+    shown->setObserver(nullptr);
   }
 
   // As the service would send it.
@@ -48,7 +61,7 @@ class PlaybackTest : public ::testing::Test {
 
   CapturedSystemLog log;
   CapturedStandardOutput output;
-  std::shared_ptr<FakeService> service = installFakeService();
+  const std::shared_ptr<FakeService> service = theService();
   std::shared_ptr<MetricValidator> shown = MetricValidator::shared();
   FixedClock clock;
   History live;
