@@ -3,7 +3,6 @@
 #include <CLI/CLI.hpp>
 #include <algorithm>
 #include <cstdint>
-#include <cstdlib>
 #include <memory>
 #include <optional>
 #include <string>
@@ -12,15 +11,12 @@
 #include "base/Rendering.h"
 #include "base/TerminalText.h"
 #include "base/TimeZone.h"
-#include "feed/FeedBook.h"
 #include "history/History.h"
-#include "metrics/MetricValidator.h"
 #include "tools/Commands.h"
 #include "tools/HappeningJson.h"
 #include "tools/LiveConnection.h"
 #include "tools/RecordingFeed.h"
 #include "tools/Service.h"
-#include "tools/ToolError.h"
 
 namespace qel::tools {
 namespace {
@@ -95,25 +91,11 @@ void readRecording(const HappeningsOptions& options, Output& output) {
 }
 
 void followLive(const HappeningsOptions& options, Output& output) {
-  MainLoop loop;
-  loop.watchStandardOutput();
-  findResources();
-  configurationFile();
-  output.goOnWithoutReader();
-  static auto& history = *new History(kHappeningsAlone);  // the connection outlives this function
-  const auto book = std::make_shared<FeedBook>("", options.bus);
-  book->setHistory(&history);
-  connectToService({.bus = options.bus,
-                    .say = [](const std::string& text) { complain("qelctl", text); },
-                    .reachability = book->reachability(),
-                    .condition = book->condition()},
-                   loop);
-  MetricValidator::shared()->setObserver(&history);  // no event has been taken yet
   Printer printer(options, output);
-  while (loop.runOnce(output.flushWhenDue())) printer.printNew(history);
-  output.flush();
-  // The viewer's connection is never released; its threads must not see the process taken apart.
-  std::_Exit(EX_OK);
+  followService(options.bus, kHappeningsAlone, output, [&](const History& history, const Feed&) {
+    printer.printNew(history);
+    return output.flushWhenDue();
+  });
 }
 
 void run(const HappeningsOptions& options, Output& output) {

@@ -4,7 +4,6 @@
 
 #include <CLI/CLI.hpp>
 #include <chrono>
-#include <cstdlib>
 #include <memory>
 #include <optional>
 #include <string>
@@ -20,7 +19,6 @@
 #include "tools/PageText.h"
 #include "tools/RecordingFeed.h"
 #include "tools/Service.h"
-#include "tools/ToolError.h"
 
 namespace qel::tools {
 namespace {
@@ -104,27 +102,11 @@ class LivePage {
 };
 
 void followLive(const PageOptions& options, const Describe& describe, Output& output) {
-  MainLoop loop;
-  loop.watchStandardOutput();
-  findResources();
-  configurationFile();
-  output.goOnWithoutReader();
-  static auto& history = *new History;  // the connection outlives this function
-  const auto book = std::make_shared<FeedBook>("", options.bus);
-  book->setHistory(&history);
-  connectToService({.bus = options.bus,
-                    .say = [](const std::string& text) { complain("qelctl", text); },
-                    .reachability = book->reachability(),
-                    .condition = book->condition()},
-                   loop);
-  MetricValidator::shared()->setObserver(&history);  // no event has been taken yet
   LivePage page(options, describe, output);
-  do {
-    page.print(history, book->feed());
-  } while (loop.runOnce(page.next()));
-  output.flush();
-  // The viewer's connection is never released; its threads must not see the process taken apart.
-  std::_Exit(EX_OK);
+  followService(options.bus, {}, output, [&page](const History& history, const Feed& feed) {
+    page.print(history, feed);
+    return page.next();
+  });
 }
 
 void run(const PageOptions& options, const Describe& describe, Output& output) {

@@ -191,6 +191,40 @@ TEST_F(QelctlLivePages, followTheService) {
   EXPECT_EQ(now.err(), "");
 }
 
+TEST_F(QelctlLivePages, drawCurvesOfWhatComes) {
+  RunningQelctl signals(words({"signals", "--json"}));
+  const auto newest = [&] {
+    const auto lines = linesOf(signals.out());
+    return lines.empty() ? Json::object() : Json::parse(lines.back());
+  };
+  ASSERT_TRUE(eventually([&] {
+    return newest().contains("charts") && !newest()["charts"].empty();
+  })) << signals.err();
+  const Json page = newest();
+  const Json curve = page["charts"][0]["curves"].back();
+  EXPECT_EQ(curve["serving"], true);
+  ASSERT_FALSE(curve["runs"].empty());
+  EXPECT_LE(curve["runs"].back().back()[0], page["to_ms"]);
+  signals.signal(SIGTERM);
+  EXPECT_EQ(signals.waitForEnd(), 0);
+}
+
+TEST_F(QelctlLivePages, tellWhatHappensWhenItHappens) {
+  RunningQelctl happenings(words({"happenings"}));
+  const auto tells = [&](const char* text) {
+    return eventually([&] { return happenings.out().find(text) != std::string::npos; });
+  };
+  EXPECT_TRUE(tells("Service found"));
+  EXPECT_TRUE(tells("LTE RRC: connected")) << happenings.out();
+  service.signal(SIGTERM);
+  ASSERT_EQ(service.waitForEnd(), 0);
+  EXPECT_TRUE(tells("Service lost")) << happenings.out();
+  service.start();
+  EXPECT_TRUE(tells("Service found again")) << happenings.out();
+  happenings.signal(SIGINT);
+  EXPECT_EQ(happenings.waitForEnd(), 0);
+}
+
 TEST_F(QelctlLivePages, sayThatTheServiceIsNotThere) {
   service.signal(SIGTERM);
   ASSERT_EQ(service.waitForEnd(), 0);
