@@ -8,7 +8,8 @@
 namespace qel::tools {
 
 // One, on the main thread, made before other threads. While it lives the first SIGINT or SIGTERM is
-// only noted; a second one of the same kind ends the program, should a write hold it up.
+// only noted; a second one of the same kind does what it did before, which ends the program, should
+// a write hold it up.
 class StopSignals {
  public:
   // What becomes of a system call that the signal finds waiting: it goes on, or fails with EINTR.

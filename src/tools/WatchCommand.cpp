@@ -16,6 +16,7 @@
 #include "tools/MainLoop.h"
 #include "tools/Service.h"
 #include "tools/ToolError.h"
+#include "tools/watch/TerminalRescue.h"
 #include "tools/watch/Watch.h"
 
 namespace qel::tools {
@@ -66,6 +67,7 @@ void connect(const WatchOptions& options, Watched& watched, MainLoop& loop) {
 
 void run(const WatchOptions& options, Output& /*output*/) {
   requireTerminal();
+  const watch::TerminalRescue rescue;  // before whoever else handles signals
   // Nothing but the pages may come to the screen.
   setStandardOutput(nullptr);
   setSystemLog(nullptr);

@@ -124,6 +124,13 @@ void MoodyService::setCondition(std::string text) {
   _condition = std::move(text);
 }
 
+void MoodyService::send(const qel::Bytes& packet) const {
+  const std::lock_guard lock(_mutex);
+  for (const sdbus::UnixFd& stream : _streams) {
+    (void)!::send(stream.get(), packet.data(), packet.size(), MSG_NOSIGNAL);
+  }
+}
+
 std::vector<std::string> MoodyService::commands() const {
   const std::lock_guard lock(_mutex);
   return _commands;

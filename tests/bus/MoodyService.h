@@ -8,11 +8,12 @@
 #include <string>
 #include <vector>
 
+#include "base/Bytes.h"
 #include "support/PrivateBus.h"
 
 namespace qel::testing {
 
-// Has the service's name while it lives, and a thread of its own. Sends no events.
+// Has the service's name while it lives, and a thread of its own. Sends no events by itself.
 class MoodyService {
  public:
   enum class Mood { answers, refuses, saysNothing, isBusy };
@@ -27,6 +28,9 @@ class MoodyService {
 
   // What it says of its modem from now on, to whoever asks.
   void setCondition(std::string text);
+
+  // To everybody who registered, whatever they asked for.
+  void send(const qel::Bytes& packet) const;
 
   // Of the commands that it took, in their order.
   std::vector<std::string> commands() const;

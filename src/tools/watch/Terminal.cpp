@@ -17,6 +17,7 @@
 #include "base/NonBlockingWriter.h"
 #include "base/TerminalText.h"
 #include "tools/watch/Palette.h"
+#include "tools/watch/TerminalRescue.h"
 
 namespace qel::watch {
 namespace {
@@ -32,6 +33,20 @@ constexpr int kEscape = 27;
 void chooseCharacters() {
   std::setlocale(LC_CTYPE, "");
   if (std::string_view(::nl_langinfo(CODESET)) != "UTF-8") std::setlocale(LC_CTYPE, "C.UTF-8");
+}
+
+// What ends the look of a viewer: the terminal's own words, without the pauses of old ones.
+std::string leaveSequence() {
+  std::string text;
+  for (const char* name : {"sgr0", "op", "rmkx", "cnorm", "rmcup"}) {
+    const char* own = ::tigetstr(name);
+    if (!own || own == reinterpret_cast<const char*>(-1)) continue;
+    text += own;
+    for (auto pause = text.find("$<"); pause != std::string::npos; pause = text.find("$<")) {
+      text.erase(pause, text.find('>', pause) - pause + 1);
+    }
+  }
+  return text;
 }
 
 struct CodeOfKey {
@@ -120,10 +135,12 @@ Terminal::~Terminal() {
     _curses->writer.wait(50ms);
   }
   ::tcsetattr(STDIN_FILENO, TCSANOW, &_before);
+  releaseTerminal();
 }
 
 // Key by key, without an echo; signals are made of keys as before.
 void Terminal::takeSettings() {
+  holdTerminal(_before, leaveSequence());
   termios settings = _before;
   settings.c_lflag &= ~static_cast<tcflag_t>(ICANON | ECHO);
   settings.c_iflag &= ~static_cast<tcflag_t>(ICRNL | IXON);
@@ -152,6 +169,7 @@ void Terminal::measure() {
 void Terminal::stopAndGoOn() {
   giveBack();
   ::tcsetattr(STDIN_FILENO, TCSANOW, &_before);
+  releaseTerminal();
   std::signal(SIGTSTP, SIG_DFL);
   std::raise(SIGTSTP);
   ::tcgetattr(STDIN_FILENO, &_before);
@@ -159,7 +177,9 @@ void Terminal::stopAndGoOn() {
   measure();
 }
 
+// Nothing more once another thread has given the terminal back.
 void Terminal::send() {
+  if (!isTerminalHeld()) return;
   _curses->collect();
   std::string& waiting = _curses->waiting;
   waiting.erase(0, _curses->writer.write(waiting));

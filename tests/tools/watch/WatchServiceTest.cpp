@@ -2,7 +2,11 @@
 
 #include <csignal>
 
+#include "bus/MoodyService.h"
+#include "tesk/Constants.h"
+#include "tesk/bus/EventPacket.h"
 #include "tools/WithService.h"
+#include "tools/watch/Pty.h"
 #include "tools/watch/Tmux.h"
 
 namespace qel::testing {
@@ -27,6 +31,24 @@ TEST_F(WatchAtService, tellsThatItIsLostAndGoesOnWhenItIsBack) {
   EXPECT_TRUE(becomes("Service lost")) << terminal.screen();
   service.start();
   EXPECT_TRUE(becomes("Service found again")) << terminal.screen();
+}
+
+// What no service sends that keeps to the rules ends the viewer; its reader is left with a terminal
+// that can be used, and with the reason.
+TEST(WatchAtABrokenService, givesTheTerminalBackBeforeItEndsFatally) {
+  using Mood = MoodyService::Mood;
+  const PrivateBus bus;
+  MoodyService service(bus, Mood::answers, Mood::answers);
+  WatchAtPty watch({"--bus", bus.address()});
+  const termios before = watch.settings();
+  ASSERT_TRUE(watch.writes("Connected, no reports yet"));
+  const auto packet = tesk::bus::encodeEvent(tesk::kEventMetric, tesk::Message());
+  ASSERT_TRUE(packet);
+  service.send(*packet);
+  EXPECT_EQ(watch.waitForEnd(), -SIGABRT);
+  EXPECT_TRUE(WatchAtPty::areSame(watch.settings(), before));
+  ASSERT_TRUE(watch.writes("fatal error: "));
+  EXPECT_LT(watch.written().find("\x1B[?1049l"), watch.written().find("fatal error: "));
 }
 
 }  // namespace

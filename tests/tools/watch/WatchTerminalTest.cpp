@@ -5,6 +5,7 @@
 #include <csignal>
 #include <thread>
 
+#include "support/Sanitized.h"
 #include "tools/Qelctl.h"
 #include "tools/RunningQelctl.h"
 #include "tools/watch/Pty.h"
@@ -56,6 +57,33 @@ TEST(WatchTerminal, holdsNothingUpWhenItDoesNotRead) {
   std::this_thread::sleep_for(2s);  // frames that nobody reads
   watch.signal(SIGTERM);
   EXPECT_EQ(watch.waitForEnd(), 0);
+  EXPECT_TRUE(WatchAtPty::areSame(watch.settings(), before));
+}
+
+TEST(WatchTerminal, isAsBeforeWhateverSignalEndsTheProgram) {
+  for (const int signal : {SIGQUIT, SIGABRT, SIGUSR1, SIGALRM, SIGSEGV}) {
+    WatchAtPty watch(kSimulated);
+    const termios before = watch.settings();
+    ASSERT_TRUE(watch.writes("Operator"));
+    watch.signal(signal);
+    const int end = watch.waitForEnd();
+    const bool isReported = kIsSanitized && signal == SIGSEGV;
+    EXPECT_EQ(end, isReported ? end : -signal);
+    EXPECT_TRUE(watch.writes("\x1B[?1049l")) << "signal " << signal;
+    EXPECT_TRUE(WatchAtPty::areSame(watch.settings(), before)) << "signal " << signal;
+  }
+}
+
+// While it still waits for a terminal that does not read.
+TEST(WatchTerminal, isAsBeforeWhenItIsInterruptedTwice) {
+  WatchAtPty watch(kSimulated);
+  const termios before = watch.settings();
+  ASSERT_TRUE(eventually([&] { return !WatchAtPty::areSame(watch.settings(), before); }));
+  std::this_thread::sleep_for(2s);  // frames that nobody reads
+  watch.signal(SIGINT);
+  std::this_thread::sleep_for(100ms);
+  watch.signal(SIGINT);
+  watch.waitForEnd();
   EXPECT_TRUE(WatchAtPty::areSame(watch.settings(), before));
 }
 
