@@ -11,7 +11,6 @@
 #include <optional>
 #include <string>
 
-#include "base/FileContent.h"
 #include "capture/RecordConnection.h"
 #include "capture/Recorder.h"
 #include "tesk/bus/BusConnector.h"
@@ -29,8 +28,6 @@ using capture::Recorder;
 using SteadyClock = MainLoop::Clock;
 using Seconds = std::chrono::duration<double>;
 using namespace std::chrono_literals;
-
-constexpr std::size_t kLargestConfiguration = 1024 * 1024;  // bytes
 
 struct RecordOptions {
   std::string file;
@@ -121,7 +118,6 @@ void run(const RecordOptions& options) {
   MainLoop loop;
   if (goesToStandardOutput(options)) loop.watchStandardOutput();
   findResources();
-  Bytes configuration = contentOfFile(configurationFile(), kLargestConfiguration);
   requireService(options.bus);
   Recorder recorder(begin(options), hiderOf(options));
   RecordProgress progress;
@@ -133,7 +129,7 @@ void run(const RecordOptions& options) {
                       [&connection] { connection->begin(); }),
       loop.answerWaits());
   connection = std::make_unique<RecordConnection>(
-      *connector, capture::kConsoleRecorder, options.bus, std::move(configuration),
+      *connector, capture::kConsoleRecorder, options.bus, configuration(),
       [&recorder](std::string_view eventName, const tesk::Message& event) {
         recorder.take(eventName, event);
       });

@@ -9,6 +9,7 @@
 #include <utility>
 
 #include "base/DispatchQueue.h"
+#include "base/FileContent.h"
 #include "tesk/bus/Reasons.h"
 #include "tesk/bus/ServiceStatus.h"
 #include "tools/ToolError.h"
@@ -22,6 +23,7 @@ using namespace std::chrono_literals;
 constexpr const char* kService = "baseband manager service";
 constexpr const char* kConfigurationName = "orb_test_lte";
 constexpr const char* kConfigurationType = "deviceconfig";
+constexpr std::size_t kLargestConfiguration = 1024 * 1024;  // bytes
 
 // "baseband manager service does not answer" after "baseband manager service: ".
 std::string withoutItsName(const std::string& why) {
@@ -92,5 +94,7 @@ std::string configurationFile() {
   }
   return *path;
 }
+
+Bytes configuration() { return contentOfFile(configurationFile(), kLargestConfiguration); }
 
 }  // namespace qel::tools

@@ -4,6 +4,7 @@
 #include <functional>
 #include <string>
 
+#include "base/Bytes.h"
 #include "tesk/bus/BusConnector.h"
 
 namespace CLI {
@@ -30,5 +31,7 @@ void findResources();
 // The configuration that asks for every metric: the name of its file. A ToolError when it is not
 // there.
 std::string configurationFile();
+// And what stands in it; empty when that is more than a configuration can be.
+Bytes configuration();
 
 }  // namespace qel::tools

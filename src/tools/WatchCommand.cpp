@@ -3,11 +3,16 @@
 #include <unistd.h>
 
 #include <CLI/CLI.hpp>
+#include <chrono>
 #include <cstdlib>
 #include <memory>
+#include <optional>
 #include <string>
+#include <utility>
 
 #include "base/LogSink.h"
+#include "base/NonBlockingWriter.h"
+#include "base/TerminalText.h"
 #include "feed/EmbeddedFeed.h"
 #include "feed/FeedBook.h"
 #include "metrics/MetricValidator.h"
@@ -18,6 +23,7 @@
 #include "tools/ToolError.h"
 #include "tools/watch/TerminalRescue.h"
 #include "tools/watch/Watch.h"
+#include "ui/pages/RecordingControl.h"
 
 namespace qel::tools {
 namespace {
@@ -43,26 +49,47 @@ void requireTerminal() {
   throw ToolError(EX_USAGE, "watch", "standard input and output must be a terminal");
 }
 
-// Connects as the options say; with a recording alone there is nothing to connect to.
-void connect(const WatchOptions& options, Watched& watched, MainLoop& loop) {
+// Connects as the options say; nothing with a recording alone, where there is nothing to connect
+// to.
+std::shared_ptr<tesk::Connector> connect(const WatchOptions& options, Watched& watched,
+                                         MainLoop& loop) {
   if (!options.file.empty()) {
     MetricValidator::shared();
-    return;
+    return nullptr;
   }
   FeedBook& book = *watched.book;
   if (options.source.empty()) {
-    connectWithoutWaiting({.bus = options.bus,
-                           .say = [](const std::string&) {},
-                           .reachability = book.reachability(),
-                           .condition = book.condition()},
-                          loop);
-  } else {
-    sources::SourceError error;
-    auto connector = connectWithin(options.source, book, error);
-    if (!connector) throw ToolError(error.exitCode, error.message);
-    tesk::setConnector(std::move(connector));
-    startAsTheViewerDoes();
+    return connectWithoutWaiting({.bus = options.bus,
+                                  .say = [](const std::string&) {},
+                                  .reachability = book.reachability(),
+                                  .condition = book.condition()},
+                                 loop);
   }
+  sources::SourceError error;
+  auto connector = connectWithin(options.source, book, error);
+  if (!connector) throw ToolError(error.exitCode, error.message);
+  tesk::setConnector(connector);
+  startAsTheViewerDoes();
+  return connector;
+}
+
+// Nothing where there is nothing to record, or nowhere to keep it.
+std::unique_ptr<RecordingControl> makeRecorder(const WatchOptions& options,
+                                               std::shared_ptr<tesk::Connector> connector) {
+  const std::string folder = RecordingsFolder::usualPath();
+  if (!connector || folder.empty()) return nullptr;
+  const auto bus = options.source.empty() ? std::optional(options.bus) : std::nullopt;
+  return std::make_unique<RecordingControl>(
+      RecordingsFolder(folder), RecordingControl::Way{std::move(connector), bus, configuration()});
+}
+
+// What became of a recording that was still made is said on the terminal that is given back, if
+// that is still there.
+void finish(RecordingControl& recorder) {
+  constexpr std::chrono::milliseconds kPatience{500};
+  if (!recorder.view().isRecording) return;
+  recorder.stop();
+  writeBriefly(STDOUT_FILENO, forTerminal(recorder.view().outcome) + "\n", kPatience);
 }
 
 void run(const WatchOptions& options, Output& /*output*/) {
@@ -76,13 +103,13 @@ void run(const WatchOptions& options, Output& /*output*/) {
   findResources();
   configurationFile();
   static auto& watched = *new Watched(options);  // the connection outlives this function
-  connect(options, watched, loop);
+  const auto recorder = makeRecorder(options, connect(options, watched, loop));
   const auto& validator = MetricValidator::shared();
   validator->setObserver(&watched.history);  // no event has been taken yet
   watched.book->setHistory(&watched.history);
   Playback playback(validator, watched.history);
   if (!options.file.empty()) playback.open(options.file);
-  watch::Desk desk{playback, watched.book->feed()};
+  watch::Desk desk{playback, watched.book->feed(), recorder.get()};
   std::string why;
   {
     const auto terminal = watch::Terminal::open(why);
@@ -95,6 +122,7 @@ void run(const WatchOptions& options, Output& /*output*/) {
     watch.run();
     watched.book->setObserver({});
   }
+  if (recorder) finish(*recorder);
   // The viewer's connection is never released; its threads must not see the process taken apart.
   std::_Exit(EX_OK);
 }

@@ -43,7 +43,8 @@ std::unique_ptr<View> viewOfLetter(char letter, Desk& desk) {
 Sheet HomeView::sheet(Size size) {
   Sheet sheet;
   sheet.title = "qelwatch";
-  sheet.keys = "up/down choose  Enter open  s signals  h happenings  r recordings  q quit";
+  sheet.keys = "up/down choose  Enter open  s/h/r pages";
+  sheet.keys += _desk.recorder ? "  R record  q quit" : "  q quit";
   _changesAtMs.reset();
   addNow(size, sheet);
   addMenu(sheet);

@@ -2,14 +2,20 @@
 
 #include <algorithm>
 #include <chrono>
+#include <utility>
 
 #include "tools/watch/Rows.h"
 
 namespace qel::watch {
 
 RecordingsView::RecordingsView(Desk& desk)
-    : _desk(desk), _page(RecordingsFolder(RecordingsFolder::usualPath())) {
-  _page.refresh();
+    : _desk(desk), _page(RecordingsFolder(RecordingsFolder::usualPath())), _growing(recorded()) {
+  _page.refresh(_growing);
+}
+
+// The file being recorded; empty: none.
+std::string RecordingsView::recorded() const {
+  return _desk.recorder ? _desk.recorder->fileName() : std::string();
 }
 
 // A little between two frames, so that keys are heard.
@@ -20,21 +26,33 @@ void RecordingsView::readOn() {
 }
 
 Sheet RecordingsView::sheet(Size size) {
+  if (std::exchange(_growing, recorded()) != recorded()) {
+    _page.refresh(_growing);
+    _hasMoreToRead = true;
+  }
   readOn();
   Sheet sheet;
   sheet.title = "Recordings";
-  sheet.keys = "up/down choose  Enter open  d delete  u undo  Escape back  q quit";
+  sheet.keys = "up/down choose  Enter open  d delete  u undo";
+  sheet.keys += _desk.recorder ? "  R record  Escape back  q quit" : "  Escape back  q quit";
   const auto& view = _page.view();
   sheet.side = view.totalText;
-  for (std::string& line : wrapped(view.emptyText, static_cast<std::size_t>(size.columns))) {
-    sheet.rows.push_back(plainRow(std::move(line)));
-  }
+  const auto say = [&](const std::string& text, Style style) {
+    for (std::string& line : wrapped(text, static_cast<std::size_t>(size.columns))) {
+      sheet.rows.push_back(plainRow(std::move(line), style));
+    }
+  };
+  say(view.emptyText, Style::plain);
   for (const RecordingRow& row : view.rows) {
     sheet.rows.push_back(
         {{{"  " + padded(row.title, 34), Style::plain},
           {padded(row.length, 10) + padded(row.size, 10) + row.cells, Style::muted},
           {row.fault.empty() ? "" : "  " + row.fault, Style::notice}},
          row.name});
+  }
+  if (_desk.recorder && _growing.empty()) {
+    sheet.rows.emplace_back();
+    say(_desk.recorder->view().hiddenText, Style::muted);
   }
   for (const std::string& text : {view.undoText, view.error, _desk.playback.view().error}) {
     if (!text.empty()) sheet.foot.push_back(plainRow(text, Style::notice));

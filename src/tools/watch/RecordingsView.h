@@ -17,10 +17,12 @@ class RecordingsView final : public View {
 
  private:
   void readOn();
+  std::string recorded() const;
 
   Desk& _desk;
   RecordingsPage _page;
   bool _hasMoreToRead = true;
+  std::string _growing;  // the file being recorded, as the page knows it
 };
 
 // What can be done with an open recording, wherever one is: true when the key meant that.

@@ -11,6 +11,7 @@
 #include "tools/watch/Terminal.h"
 #include "ui/pages/Feed.h"
 #include "ui/pages/Playback.h"
+#include "ui/pages/RecordingControl.h"
 
 namespace qel::watch {
 
@@ -18,6 +19,7 @@ namespace qel::watch {
 struct Desk {
   Playback& playback;
   const Feed& feed;
+  RecordingControl* recorder;  // none: nothing can be recorded
 
   Viewpoint viewpoint() const { return playback.viewpoint(); }
 };

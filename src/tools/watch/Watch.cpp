@@ -3,6 +3,7 @@
 #include <unistd.h>
 
 #include <algorithm>
+#include <utility>
 
 #include "base/Clock.h"
 #include "tools/watch/HomeView.h"
@@ -29,9 +30,16 @@ std::vector<std::size_t> choosable(const Sheet& sheet) {
 
 Watch::Watch(Terminal& terminal, TerminalSignals& signals, tools::MainLoop& loop, Desk& desk,
              History& history)
-    : _terminal(terminal), _signals(signals), _loop(loop), _desk(desk), _history(history) {
+    : _terminal(terminal),
+      _signals(signals),
+      _loop(loop),
+      _desk(desk),
+      _history(history),
+      _recorderKeys(desk.recorder),
+      _wasThere(desk.feed.reach == Feed::Reach::there) {
   _views.push_back(std::make_unique<HomeView>(_desk, _screens));
   _desk.playback.setOnChanged([this] { _isTouched = true; });
+  if (_desk.recorder) _desk.recorder->setOnChanged([this] { _isTouched = true; });
   _loop.watchInput(STDIN_FILENO);
   _loop.watchInput(_signals.descriptor());
 }
@@ -44,7 +52,16 @@ void Watch::run() {
     drawWhenDue();
   } while (!_isLeft && !_terminal.isClosed() && !_signals.isHungUp() && _loop.runOnce(nextTurn()));
   _desk.playback.setOnChanged({});
+  if (_desk.recorder) _desk.recorder->setOnChanged({});
   while (_views.size() > 1) _views.pop_back();  // the stack of screens is taken down from its top
+}
+
+// A recording goes on at a service that came back.
+void Watch::feedChanged() {
+  _isTouched = true;
+  const bool isThere = _desk.feed.reach == Feed::Reach::there;
+  const bool wasThere = std::exchange(_wasThere, isThere);
+  if (isThere && !wasThere && _desk.recorder) _desk.recorder->serviceCameBack();
 }
 
 void Watch::takeSignals() {
@@ -70,7 +87,8 @@ void Watch::takeKeys() {
 }
 
 void Watch::take(const KeyPress& press) {
-  if (_views.back()->take(press) || takeForPlayback(press, _desk.playback)) return;
+  if (_recorderKeys.take(press) || _views.back()->take(press)) return;
+  if (takeForPlayback(press, _desk.playback)) return;
   if (!takeEverywhere(press)) moveTo(press);
 }
 
@@ -150,6 +168,7 @@ void Watch::back() {
 
 void Watch::runTimers() {
   RunLoop::main().fireDue(Clock::now());
+  _recorderKeys.runTimer(Clock::now());
   const auto tick = _desk.playback.untilNextTick();
   if (tick && *tick <= 0ms) _desk.playback.tick();
 }
@@ -168,6 +187,7 @@ void Watch::drawWhenDue() {
   _drawnVersion = _history.version();
   Sheet sheet = _views.back()->sheet(_terminal.size());
   for (Row& row : playbackFoot(_desk.playback)) sheet.foot.push_back(std::move(row));
+  for (Row& row : _recorderKeys.foot(_terminal.size())) sheet.foot.push_back(std::move(row));
   _changesAtMs = _views.back()->changesAtMs();
   _sheet = std::move(sheet);
   _terminal.draw(_sheet, lookAt(_sheet));
@@ -200,6 +220,7 @@ std::optional<Watch::Clock::time_point> Watch::nextTurn() {
   if (isChanged()) sooner(std::max(_drawnAt + kBetweenFrames, now));
   if (_terminal.isBehind()) sooner(now + kWhileBehind);
   if (const auto tick = _desk.playback.untilNextTick()) sooner(now + *tick);
+  if (const auto turn = _recorderKeys.nextTurn()) sooner(*turn);
   if (_changesAtMs) {
     const std::uint64_t nowMs = systemClock().nowMs();
     sooner(now + std::chrono::milliseconds(*_changesAtMs - std::min(*_changesAtMs, nowMs)));

@@ -8,6 +8,7 @@
 #include <vector>
 
 #include "tools/MainLoop.h"
+#include "tools/watch/RecorderKeys.h"
 #include "tools/watch/Screens.h"
 #include "tools/watch/Terminal.h"
 #include "tools/watch/TerminalSignals.h"
@@ -26,7 +27,7 @@ class Watch {
   // Until it is left, interrupted, or the terminal is gone.
   void run();
   // What feeds it has changed.
-  void feedChanged() { _isTouched = true; }
+  void feedChanged();
 
  private:
   using Clock = std::chrono::steady_clock;
@@ -50,12 +51,14 @@ class Watch {
   Desk& _desk;
   History& _history;
   Screens _screens;
+  RecorderKeys _recorderKeys;
   std::vector<std::unique_ptr<View>> _views;
   Sheet _sheet;  // as last drawn
   std::uint64_t _drawnVersion = 0;
   Clock::time_point _drawnAt;
   std::optional<std::uint64_t> _changesAtMs;
   bool _isTouched = true;
+  bool _wasThere = false;  // the service, when it changed last
   bool _isLeft = false;
 };
 

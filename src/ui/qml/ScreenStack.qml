@@ -63,6 +63,18 @@ FocusScope {
             event.accepted = true;
             navigation.open(page);
         }
+        const recorder = navigation.pages.recorder;
+        if (event.key === Qt.Key_R && event.modifiers === Qt.ShiftModifier) {
+            event.accepted = true;
+            if (recorder.recording)
+                recorder.stop();
+            else
+                recorder.start();
+        }
+        if (event.key === Qt.Key_M && event.modifiers === Qt.NoModifier) {
+            event.accepted = true;
+            recorder.mark();
+        }
     }
 
     NumberAnimation {

@@ -4,10 +4,13 @@
 
 #include <filesystem>
 #include <fstream>
+#include <regex>
 
 #include "messages/lte_rrc.h"
 #include "messages/lte_serving.h"
+#include "messages/nas.h"
 #include "metrics/MetricValidator.h"
+#include "support/RecordedLines.h"
 #include "tools/Qelctl.h"
 #include "tools/RunningQelctl.h"
 #include "tools/watch/Tmux.h"
@@ -233,6 +236,59 @@ TEST_F(WatchScreens, listRecordingsThatCanBeDeletedAndOpened) {
     EXPECT_TRUE(eventually([&] { return !terminal.shows("of 0:01:00"); }));
   }
   std::filesystem::remove_all(data);
+}
+
+TEST_F(WatchScreens, recordMarkAndKeepWithAKeyEach) {
+  const TemporaryFolder data;
+  const std::string watch = "env XDG_DATA_HOME=" + data.path() + " " + program;
+  const Tmux terminal(80, 24, watch + "--source simulated,speed=20; cat");
+  ASSERT_TRUE(becomes(terminal, "R record"));
+  terminal.press("R");
+  ASSERT_TRUE(becomes(terminal, "Recording 0:00:"));
+  EXPECT_TRUE(terminal.shows("Hidden: subscriber and temporary identities"));
+  terminal.press("m");
+  EXPECT_TRUE(becomes(terminal, "Mark 1"));
+  EXPECT_FALSE(terminal.shows("Hidden:")) << "what was said stays";
+  terminal.press("r");
+  ASSERT_TRUE(becomes(terminal, "being recorded"));
+  terminal.press("R");
+  ASSERT_TRUE(becomes(terminal, "Kept as "));
+  EXPECT_TRUE(becomes(terminal, "1 recording,"));
+  EXPECT_TRUE(becomes(terminal, " cell")) << "what is in it is read";
+  terminal.press("Escape");
+  terminal.press("R");
+  ASSERT_TRUE(becomes(terminal, "Recording 0:00:0"));
+  ASSERT_TRUE(becomes(terminal, " events, "));
+  terminal.press("q");
+  EXPECT_TRUE(becomes(terminal, "Kept as ")) << "said on the screen that is given back";
+  EXPECT_FALSE(terminal.shows("Simulated modem"));
+}
+
+TEST_F(WatchScreens, recordNothingWhereNothingIsLive) {
+  const Tmux terminal(80, 24, program + recording.path());
+  ASSERT_TRUE(becomes(terminal, "PCI 1,"));
+  EXPECT_FALSE(terminal.shows("R record"));
+  terminal.press("R");
+  terminal.press("n");
+  ASSERT_TRUE(becomes(terminal, "PCI 2,"));
+  EXPECT_FALSE(terminal.shows("Recording 0:"));
+}
+
+TEST_F(WatchScreens, showAValueThatIsCalledLikeItsField) {
+  KCellularActivatedBearerContexts report;
+  auto bearer = std::make_shared<BearerContext>();
+  bearer->setApn("apn");
+  report.addBearerContexts(bearer);
+  const TemporaryRecording bearers(metricLine(V::K_CELLULAR_ACTIVE_BEARER, report));
+  const Tmux terminal(100, 30, program + bearers.path());
+  ASSERT_TRUE(becomes(terminal, "0:00:00 of 0:00:00"));
+  terminal.press("Down");
+  terminal.press("Enter");
+  ASSERT_TRUE(becomes(terminal, "Active Bearers"));
+  terminal.press("End");
+  terminal.press("Enter");
+  ASSERT_TRUE(becomes(terminal, "PDP 0"));
+  EXPECT_TRUE(std::regex_search(terminal.screen(), std::regex("apn +apn"))) << terminal.screen();
 }
 
 TEST_F(WatchScreens, sayWhatIsMissingWhenThereIsNoService) {
