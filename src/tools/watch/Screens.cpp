@@ -6,6 +6,7 @@
 #include "tools/watch/FieldView.h"
 #include "tools/watch/Rows.h"
 #include "ui/kit/Storyboard.h"
+#include "ui/screens/Placeholders.h"
 #include "ui/screens/QelViewItems.h"
 #include "ui/screens/SecondLevelViewController.h"
 #include "ui/screens/StandardScreens.h"
@@ -107,10 +108,10 @@ Sheet ScreenView::sheet(Size /*size*/) {
     }
     for (int row = 0; const RowSnapshot& shown : each.rows) {
       const std::string name = shown.text.value_or("");
-      const bool isPlaceholder = shown.detail && name == *shown.detail;
+      const bool isNotice = shown.detail && isPlaceholder(name, *shown.detail);
       Row made{{{"  " + padded(name, columns), shown.detail ? Style::muted : Style::plain}},
                idOf({section, row++})};
-      if (isPlaceholder) {
+      if (isNotice) {
         made.spans = {{"  " + name, Style::muted}};
       } else if (shown.detail) {
         made.spans.push_back({"  " + *shown.detail, Style::plain});
