@@ -8,6 +8,8 @@ Item {
 
     required property string name
     required property string value
+    // Words rather than a value.
+    property bool prose: false
 
     readonly property bool blank: value === ""
     readonly property bool sideBySide:
@@ -36,7 +38,7 @@ Item {
         text: texts.blank ? "\u2013" : Theme.breakable(texts.value)
         textFormat: Text.PlainText
         color: texts.blank ? Theme.secondary : Theme.value
-        font.family: Theme.fixedFamily
+        font.family: texts.prose ? nameLabel.font.family : Theme.fixedFamily
         font.pointSize: Theme.valueSize
         wrapMode: Text.Wrap
         Accessible.ignored: true

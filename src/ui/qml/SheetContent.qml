@@ -74,6 +74,7 @@ Column {
             width: content.width
             name: row.label
             value: row.value
+            prose: row.prose
             Accessible.role: Accessible.ListItem
             Accessible.name: row.label + ": " + row.value
         }

@@ -50,8 +50,11 @@ void SheetModel::read(const Viewpoint& viewpoint) {
 void SheetModel::takeLines() {
   std::vector<RowsModel::Row> rows;
   for (const SheetLine& line : _sheet->lines) {
-    rows.push_back(
-        {shown(line.id), {}, {{"label", shown(line.label)}, {"value", shown(line.value)}}});
+    rows.push_back({shown(line.id),
+                    {},
+                    {{"label", shown(line.label)},
+                     {"value", shown(line.value)},
+                     {"prose", line.id == "meaning"}}});
   }
   _lines.take(std::move(rows));
 }

@@ -62,7 +62,7 @@ class SheetModel : public QObject {
   QString unit() const { return text(&FieldSheet::unit); }
   QString word() const { return text(&FieldSheet::word); }
   bool hasCurve() const { return _sheet && !_sheet->curve.empty(); }
-  RowsModel* lines() { return &_lines; }  // label, value
+  RowsModel* lines() { return &_lines; }  // label, value, prose
 
  signals:
   void changed();
