@@ -27,22 +27,27 @@ Rectangle {
         Text {
             id: name
             y: line.fits ? values.baselineOffset - baselineOffset : 0
+            width: line.fits ? implicitWidth : parent.width
             text: line.row.name + "  " + line.row.channel + (line.row.age ? "  " + line.row.age : "")
             textFormat: Text.PlainText
             color: Theme.secondary
             font.pointSize: Theme.nameSize
             font.weight: line.row.hasCurve ? Font.DemiBold : Font.Normal
+            wrapMode: Text.Wrap
             Accessible.ignored: true
         }
         Text {
             id: values
             y: line.fits ? 0 : name.height + 2
             anchors.right: parent.right
+            width: line.fits ? implicitWidth : parent.width
             text: [line.row.level, line.row.quality, line.row.difference].filter(part => part).join("  ")
             textFormat: Text.PlainText
             color: Theme.value
             font.family: Theme.fixedFamily
             font.pointSize: Theme.nameSize
+            horizontalAlignment: Text.AlignRight
+            wrapMode: Text.Wrap
             Accessible.ignored: true
         }
     }
