@@ -6,17 +6,23 @@
 #include "base/Amounts.h"
 #include "base/TimeZone.h"
 #include "history/recorded/RecordingDigest.h"
+#include "recording/RecordingReader.h"
 
 namespace qel {
 namespace {
 
 constexpr std::size_t kEventsAtOnce = 2048;
 
+std::string titleOf(std::uint64_t beginMs) {
+  return dateText(static_cast<double>(beginMs), systemTimeZone());
+}
+
 }  // namespace
 
 // A file as it was when it was looked at last.
 struct RecordingsPage::Known {
   RecordingFile file;
+  bool isTitled = false;
   bool isDigested = false;
   std::string title;
   std::string length;
@@ -57,6 +63,22 @@ void RecordingsPage::refresh(const std::string& growing) {
   changed();
 }
 
+// Of one of those that have none, so that no title waits for what is in a large file.
+void RecordingsPage::takeTitle() {
+  for (auto known = _known.rbegin(); known != _known.rend(); ++known) {
+    auto& [name, about] = *known;
+    if (about.isTitled || about.isDigested || name == _growing) continue;
+    about.isTitled = true;
+    RecordingFault fault;
+    const auto reader =
+        RecordingReader::open(_folder.pathOf(name), RecordingReader::BadLines::fail, fault);
+    const auto first = reader ? reader->next() : std::nullopt;
+    if (first) about.title = titleOf(first->timeMs);
+    changed();
+    return;
+  }
+}
+
 bool RecordingsPage::beginDigest() {
   for (auto known = _known.rbegin(); known != _known.rend(); ++known) {
     if (known->second.isDigested || known->first == _growing) continue;
@@ -72,6 +94,7 @@ bool RecordingsPage::beginDigest() {
 }
 
 bool RecordingsPage::work() {
+  takeTitle();
   if (!_digest && !beginDigest()) return false;
   if (_digest->readOn(kEventsAtOnce)) return true;
   Known& known = _known.at(_digested);
@@ -79,7 +102,7 @@ bool RecordingsPage::work() {
   known.fault = _digest->fault();
   if (_digest->events() == 0 && known.fault.empty()) known.fault = "No event in it";
   if (_digest->events() > 0) {
-    known.title = dateText(static_cast<double>(_digest->beginMs()), systemTimeZone());
+    known.title = titleOf(_digest->beginMs());
     known.length = durationText(std::chrono::seconds(_digest->lengthMs() / 1000));
     known.cells = counted(_digest->cells(), "cell");
   }

@@ -47,7 +47,8 @@ class RecordingsPage {
 
   // Looks into the folder again; `growing` is the recording being made, if any.
   void refresh(const std::string& growing = {});
-  // Reads on where a length is not known yet. False when there is nothing left to read.
+  // Reads on where a length is not known yet; when they were begun is known first of all files.
+  // False when there is nothing left to read.
   bool work();
 
   // Out of the list at once; the file goes for good with the next one, or with forget().
@@ -60,6 +61,7 @@ class RecordingsPage {
 
  private:
   struct Known;
+  void takeTitle();
   bool beginDigest();
   void describe();
   void changed();

@@ -46,6 +46,21 @@ TEST_F(RecordingsPageTest, listsRecordingsNewestFirstWithWhatIsInThem) {
   EXPECT_EQ(page.view().emptyText, "");
 }
 
+// Once the title of a small file waited until a large one was read.
+TEST_F(RecordingsPageTest, tellsWhenEachWasBegunBeforeOneIsRead) {
+  std::string many;
+  for (int i = 0; i < 10'000; ++i) many += lineOf(lteCell(1'500'000'000'000, 1));
+  folder.file(newer, many);
+  RecordingsPage page{RecordingsFolder(folder.path())};
+  page.refresh();
+  page.work();
+  page.work();
+  for (const RecordingRow& row : page.view().rows) {
+    EXPECT_EQ(row.title, "2017-07-14 02:40:00 UTC");
+    EXPECT_EQ(row.length, "");
+  }
+}
+
 TEST_F(RecordingsPageTest, saysThatThereIsNone) {
   const TemporaryFolder empty;
   RecordingsPage page{RecordingsFolder(empty.path() + "/not/there")};
