@@ -119,15 +119,18 @@ class FlatReader {
 
 class FlatWriter {
  public:
-  FlatWriter(const FlatEntries& entries, std::string& out) : _entries(entries), _out(out) {}
+  FlatWriter(const FlatEntries& entries, Line& out) : _entries(entries), _out(out) {}
 
-  void write(std::size_t from, std::size_t to, char open, char close) {
-    _out += open;
+  void write(std::size_t from, std::size_t to, std::string_view open, std::string_view close) {
+    _out.append(open);
     while (from < to) {
       const FlatEntry& entry = _entries[from];
-      if (!entry.key.empty()) _out.append("\"").append(entry.key).append("\": ");
+      if (!entry.key.empty()) {
+        plain::quoted(_out, entry.key);
+        _out.back(2);
+        _out.literal(": ");
+      }
       from = writeValue(entry, from + 1);
-      _out += ", ";
     }
     plain::close(_out, close);
   }
@@ -140,10 +143,10 @@ class FlatWriter {
         plain::truth(_out, entry.number != 0);
         break;
       case Kind::number:
-        plain::number(_out, entry.number);
+        _out.number(entry.number);
         break;
       case Kind::negative:
-        plain::number(_out, static_cast<std::int64_t>(entry.number));
+        _out.number(static_cast<std::int64_t>(entry.number));
         break;
       case Kind::name:
       case Kind::text:
@@ -153,17 +156,17 @@ class FlatWriter {
         plain::hexadecimal(_out, entry.text);
         break;
       case Kind::list:
-        write(next, entry.end, '[', ']');
+        write(next, entry.end, "[", "], ");
         return entry.end;
       case Kind::entries:
-        write(next, entry.end, '{', '}');
+        write(next, entry.end, "{", "}, ");
         return entry.end;
     }
     return next;
   }
 
   const FlatEntries& _entries;
-  std::string& _out;
+  Line& _out;
 };
 
 }  // namespace
@@ -183,9 +186,9 @@ std::size_t visit(const FlatEntries& entries) {
 }
 
 std::string flatText(const FlatEntries& entries) {
-  std::string text;
-  FlatWriter(entries, text).write(0, entries.size(), '{', '}');
-  return text;
+  Line text;
+  FlatWriter(entries, text).write(0, entries.size(), "{", "}");
+  return std::string(text.view());
 }
 
 }  // namespace qel::bench

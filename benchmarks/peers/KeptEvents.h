@@ -3,20 +3,16 @@
 // the screens.
 #pragma once
 
-#include <fmt/compile.h>
-#include <fmt/format.h>
-
 #include <array>
-#include <iterator>
 #include <memory>
 #include <optional>
-#include <string>
 
 #include "Payload.h"
 #include "base/LogSink.h"
 #include "messages/catalogue/KBBMetricUtility.h"
 #include "metrics/DispatchTable.h"
 #include "peers/KeptTime.h"
+#include "peers/Line.h"
 
 namespace qel::bench {
 
@@ -26,24 +22,27 @@ template <class Record>
 class KeptValidator {
  public:
   void take(std::int64_t metric, ByteView payload) {
-    _line = "Metric ID in Hex = ";
-    fmt::format_to(std::back_inserter(_line), FMT_COMPILE("{:2X}"), metric);
-    standardOutput().write(_line);
+    _line.clear();
+    _line.literal("Metric ID in Hex = ");
+    _line.upperHexadecimal(metric);
+    LogSink& out = standardOutput();
+    out.write(_line.view());
     const DispatchRow* row = findDispatchRow(metric);
-    if (!row) return standardOutput().write("I dont care for this Metric");
+    if (!row) return out.write("I dont care for this Metric");
 
     auto& record = _records[static_cast<std::size_t>(row - dispatchTable().data())];
     if (!record) record.emplace(static_cast<std::uint32_t>(metric - kMetricEventBase));
     const auto time = record->read(payload);
-    _line = row->logText;
+    _line.clear();
+    _line.append(row->logText);
     record->appendText(time ? _time.at(*time) : std::string_view(), _line);
-    standardOutput().write(_line);
-    standardOutput().write("Received Valid Metric");
+    out.write(_line.view());
+    out.write("Received Valid Metric");
   }
 
  private:
   std::array<std::optional<Record>, 29> _records;  // the newest of each metric
-  std::string _line;
+  Line _line;
   KeptTime _time;
 };
 

@@ -95,9 +95,9 @@ std::string plainText(const Payload& payload) {
   const PlainRecord& record = findPlainRecord(payload.metric);
   const auto message = record.make();
   record.read(message.get(), payload.bytes);
-  std::string text;
+  Line text;
   record.appendText(message.get(), {}, text);
-  return text;
+  return std::string(text.view());
 }
 
 // Ours shows packed lists even when they are empty; the rivals do not. The timestamp is before

@@ -9,6 +9,7 @@
 #include <string_view>
 
 #include "base/Bytes.h"
+#include "peers/Line.h"
 
 namespace qel::bench {
 
@@ -33,7 +34,7 @@ struct PlainRecord {
   std::shared_ptr<void> (*make)();
   // What was there goes. The time of the report, or nothing.
   std::optional<std::uint64_t> (*read)(void* message, ByteView payload);
-  void (*appendText)(const void* message, std::string_view time, std::string& out);
+  void (*appendText)(const void* message, std::string_view time, Line& out);
 };
 
 const PlainRecord& findPlainRecord(std::uint32_t metric);

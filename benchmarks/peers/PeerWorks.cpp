@@ -160,10 +160,10 @@ Step textPlain(const std::vector<Payload>& payloads) {
     record.read(kept.message.get(), payload.bytes);
     return kept;
   };
-  return [all = forEach(payloads, keep), line = std::string()](std::size_t i) mutable {
-    line.clear();
-    all[i].append(all[i].message.get(), {}, line);
-    benchmark::DoNotOptimize(line.data());
+  return [all = forEach(payloads, keep), line = std::make_shared<Line>()](std::size_t i) {
+    line->clear();
+    all[i].append(all[i].message.get(), {}, *line);
+    benchmark::DoNotOptimize(line->view().data());
   };
 }
 

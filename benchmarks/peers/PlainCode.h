@@ -1,8 +1,6 @@
 // What the generated code of the plain structs is made of.
 #pragma once
 
-#include <fmt/format.h>
-
 #include <algorithm>
 #include <bit>
 #include <cstdint>
@@ -12,6 +10,8 @@
 #include <string>
 #include <string_view>
 #include <vector>
+
+#include "peers/Line.h"
 
 namespace qel::bench::plain {
 
@@ -60,63 +60,44 @@ inline char* put(char* at, const std::string& text) {
   return std::copy(text.begin(), text.end(), at);
 }
 
-template <class Number>
-void number(std::string& out, Number value) {
-  const fmt::format_int digits(value);
-  out.append(digits.data(), digits.size());
+inline void truth(Line& out, bool value) { value ? out.literal("true, ") : out.literal("false, "); }
+
+inline void unknown(Line& out, std::int32_t value) {
+  out.literal("\"(unknown: ");
+  out.number(value);
+  out.back(2);
+  out.literal(")\", ");
 }
 
-inline void truth(std::string& out, bool value) { out += value ? "true" : "false"; }
-
-inline void unknown(std::string& out, std::int32_t value) {
-  out += "\"(unknown: ";
-  number(out, value);
-  out += ")\"";
+inline void quoted(Line& out, std::string_view text) {
+  out.literal("\"");
+  out.escaped(text);
+  out.literal("\", ");
 }
 
-inline void quoted(std::string& out, std::string_view text) {
-  out += '"';
-  for (const char c : text) {
-    if (c == '"' || c == '\\') {
-      out += '\\';
-      out += c;
-    } else if (static_cast<unsigned char>(c) < 0x20) {
-      fmt::format_to(std::back_inserter(out), "\\u{:04x}", static_cast<int>(c));
-    } else {
-      out += c;
-    }
-  }
-  out += '"';
+inline void hexadecimal(Line& out, std::string_view bytes) {
+  out.literal("\"<");
+  out.hexadecimal(bytes);
+  out.literal(">\", ");
 }
 
-inline void hexadecimal(std::string& out, std::string_view bytes) {
-  out += "\"<";
-  for (const char byte : bytes) {
-    const auto value = static_cast<unsigned char>(byte);
-    out += "0123456789abcdef"[value >> 4];
-    out += "0123456789abcdef"[value & 15];
-  }
-  out += ">\"";
+// After the last element, behind which ", " stands unless there is none.
+inline void close(Line& out, std::string_view end) {
+  if (out.last() == ' ') out.back(2);
+  out.append(end);
 }
 
-// After the last element, which ", " follows.
-inline void close(std::string& out, char end) {
-  if (out.back() == ' ') out.resize(out.size() - 2);
-  out += end;
-}
-
-inline void appendTime(std::string& out, const std::optional<std::uint64_t>& timestamp,
+inline void appendTime(Line& out, const std::optional<std::uint64_t>& timestamp,
                        std::string_view time) {
   if (!timestamp) return;
-  out += "\"timestamp\": ";
+  out.literal("\"timestamp\": ");
   if (time.empty()) {
-    number(out, *timestamp);
+    out.number(*timestamp);
   } else {
-    out += '"';
-    out += time;
-    out += '"';
+    out.literal("\"");
+    out.append(time);
+    out.literal("\", ");
   }
-  out += ", ";
 }
 
 }  // namespace qel::bench::plain

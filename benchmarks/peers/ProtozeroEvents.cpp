@@ -14,7 +14,7 @@ class StructRecord {
   std::optional<std::uint64_t> read(ByteView payload) {
     return _operations.read(_message.get(), payload);
   }
-  void appendText(std::string_view time, std::string& out) const {
+  void appendText(std::string_view time, Line& out) const {
     _operations.appendText(_message.get(), time, out);
   }
 

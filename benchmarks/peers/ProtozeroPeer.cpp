@@ -62,7 +62,7 @@ std::optional<std::uint64_t> readAgain(void* kept, ByteView payload) {
 }
 
 template <class Message>
-void appendText(const void* kept, std::string_view time, std::string& out) {
+void appendText(const void* kept, std::string_view time, Line& out) {
   plain::appendText(*static_cast<const Message*>(kept), time, out);
 }
 

@@ -21,7 +21,7 @@ using google::protobuf::Reflection;
 
 class TextWriter {
  public:
-  explicit TextWriter(std::string& out) : _out(out) {}
+  explicit TextWriter(Line& out) : _out(out) {}
 
   // `time` goes in place of the field `timed`.
   void append(const Message& message, const FieldDescriptor* timed, std::string_view time) {
@@ -29,11 +29,11 @@ class TextWriter {
     auto& fields = _fields.at(_depth++);
     fields.clear();
     reflection.ListFields(message, &fields);
-    _out += '{';
+    _out.literal("{");
     for (const FieldDescriptor* field : fields) {
-      _out += '"';
-      _out += field->name();
-      _out += "\": ";
+      _out.literal("\"");
+      _out.append(field->name());
+      _out.literal("\": ");
       if (field == timed && !time.empty()) {
         plain::quoted(_out, time);
       } else if (field->is_repeated()) {
@@ -41,10 +41,8 @@ class TextWriter {
       } else {
         appendValue(message, reflection, *field);
       }
-      _out += ", ";
     }
-    plain::close(_out, '}');
-    --_depth;
+    plain::close(_out, --_depth > 0 ? "}, " : "}");
   }
 
  private:
@@ -52,11 +50,11 @@ class TextWriter {
                    const FieldDescriptor& field) {
     switch (field.cpp_type()) {
       case FieldDescriptor::CPPTYPE_UINT32:
-        return plain::number(_out, reflection.GetUInt32(message, &field));
+        return _out.number(reflection.GetUInt32(message, &field));
       case FieldDescriptor::CPPTYPE_UINT64:
-        return plain::number(_out, reflection.GetUInt64(message, &field));
+        return _out.number(reflection.GetUInt64(message, &field));
       case FieldDescriptor::CPPTYPE_INT32:
-        return plain::number(_out, reflection.GetInt32(message, &field));
+        return _out.number(reflection.GetInt32(message, &field));
       case FieldDescriptor::CPPTYPE_BOOL:
         return plain::truth(_out, reflection.GetBool(message, &field));
       case FieldDescriptor::CPPTYPE_ENUM:
@@ -75,23 +73,22 @@ class TextWriter {
 
   void appendList(const Message& message, const Reflection& reflection,
                   const FieldDescriptor& field) {
-    _out += '[';
+    _out.literal("[");
     const int count = reflection.FieldSize(message, &field);
     for (int i = 0; i < count; ++i) {
       if (field.cpp_type() == FieldDescriptor::CPPTYPE_MESSAGE) {
         append(reflection.GetRepeatedMessage(message, &field, i), nullptr, {});
       } else if (field.cpp_type() == FieldDescriptor::CPPTYPE_INT32) {
-        plain::number(_out, reflection.GetRepeatedInt32(message, &field, i));
+        _out.number(reflection.GetRepeatedInt32(message, &field, i));
       } else {
-        plain::number(_out, reflection.GetRepeatedUInt32(message, &field, i));
+        _out.number(reflection.GetRepeatedUInt32(message, &field, i));
       }
-      _out += ", ";
     }
-    plain::close(_out, ']');
+    plain::close(_out, "], ");
   }
 
   static thread_local std::array<std::vector<const FieldDescriptor*>, 8> _fields;  // by depth
-  std::string& _out;
+  Line& _out;
   std::string _scratch;
   std::size_t _depth = 0;
 };
@@ -110,7 +107,7 @@ class MessageRecord {
     if (!reflection.HasField(*_message, _timestamp)) return std::nullopt;
     return reflection.GetUInt64(*_message, _timestamp);
   }
-  void appendText(std::string_view time, std::string& out) const {
+  void appendText(std::string_view time, Line& out) const {
     TextWriter(out).append(*_message, _timestamp, time);
   }
 

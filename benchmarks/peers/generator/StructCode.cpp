@@ -22,25 +22,25 @@ using google::protobuf::io::Printer;
 struct Kind {
   const char* cpp;
   const char* wire;
-  const char* text;  // the function of peers/PlainCode.h that appends it
+  const char* text;  // what appends it to the line, but for the value
 };
 
 Kind kindOf(const FieldDescriptor& field) {
   switch (field.type()) {
     case FieldDescriptor::TYPE_UINT32:
-      return {"std::uint32_t", "uint32", "number"};
+      return {"std::uint32_t", "uint32", "out.number("};
     case FieldDescriptor::TYPE_UINT64:
-      return {"std::uint64_t", "uint64", "number"};
+      return {"std::uint64_t", "uint64", "out.number("};
     case FieldDescriptor::TYPE_SINT32:
-      return {"std::int32_t", "sint32", "number"};
+      return {"std::int32_t", "sint32", "out.number("};
     case FieldDescriptor::TYPE_BOOL:
-      return {"bool", "bool", "truth"};
+      return {"bool", "bool", "truth(out, "};
     case FieldDescriptor::TYPE_ENUM:
-      return {"std::int32_t", "enum", "name"};
+      return {"std::int32_t", "enum", ""};
     case FieldDescriptor::TYPE_STRING:
-      return {"std::string", "string", "quoted"};
+      return {"std::string", "string", "quoted(out, "};
     case FieldDescriptor::TYPE_BYTES:
-      return {"std::string", "bytes", "hexadecimal"};
+      return {"std::string", "bytes", "hexadecimal(out, "};
     default:
       refuse(field);
   }
@@ -115,17 +115,18 @@ void printWrite(Printer& printer, const FieldDescriptor& field) {
 
 void printName(Printer& printer, const FieldDescriptor& field) {
   printer.Print(
-      "if (message.$field$) {\n  out += \"\\\"$field$\\\": \";\n"
+      "if (message.$field$) {\n  out.literal(\"\\\"$field$\\\": \");\n"
       "  switch (*message.$field$) {\n",
       "field", field.name());
   const EnumDescriptor& values = *field.enum_type();
   for (int i = 0; i < values.value_count(); ++i) {
     if (values.FindValueByNumber(values.value(i)->number()) != values.value(i)) continue;
-    printer.Print("    case $number$:\n      out += \"\\\"$name$\\\"\";\n      break;\n", "number",
-                  std::to_string(values.value(i)->number()), "name", values.value(i)->name());
+    printer.Print("    case $number$:\n      out.literal(\"\\\"$name$\\\", \");\n      break;\n",
+                  "number", std::to_string(values.value(i)->number()), "name",
+                  values.value(i)->name());
   }
-  printer.Print("    default:\n      unknown(out, *message.$field$);\n  }\n  out += \", \";\n}\n",
-                "field", field.name());
+  printer.Print("    default:\n      unknown(out, *message.$field$);\n  }\n}\n", "field",
+                field.name());
 }
 
 void printText(Printer& printer, const FieldDescriptor& field) {
@@ -133,25 +134,26 @@ void printText(Printer& printer, const FieldDescriptor& field) {
   if (field.type() == FieldDescriptor::TYPE_ENUM) return printName(printer, field);
   printer.Print(variables, field.is_repeated() ? "if (!message.$field$.empty()) {\n"
                                                : "if (message.$field$) {\n");
-  printer.Print(variables, "  out += \"\\\"$field$\\\": \";\n");
+  printer.Print(variables, "  out.literal(\"\\\"$field$\\\": \");\n");
   if (field.is_repeated()) {
-    printer.Print(variables, "  out += '[';\n  for (const auto& each : message.$field$) {\n");
-    printer.Print(variables, field.message_type() ? "    appendText(each, out);\n"
-                                                  : "    $text$(out, each);\n");
-    printer.Print("    out += \", \";\n  }\n  close(out, ']');\n");
+    printer.Print(variables,
+                  "  out.literal(\"[\");\n  for (const auto& each : message.$field$) {\n");
+    printer.Print(variables,
+                  field.message_type() ? "    appendText(each, out);\n" : "    $text$each);\n");
+    printer.Print("  }\n  close(out, \"], \");\n");
   } else if (field.message_type()) {
     printer.Print(variables, "  appendText(*message.$field$, out);\n");
   } else {
-    printer.Print(variables, "  $text$(out, *message.$field$);\n");
+    printer.Print(variables, "  $text$*message.$field$);\n");
   }
-  printer.Print("  out += \", \";\n}\n");
+  printer.Print("}\n");
 }
 
 void printTexts(Printer& printer, const Descriptor& message, const FieldDescriptor* leftOut) {
   forEachField(message, [&](const FieldDescriptor& field) {
     if (&field != leftOut) printText(printer, field);
   });
-  printer.Print("close(out, '}');\n");
+  printer.Print("close(out, \"$end$\");\n", "end", leftOut ? "}" : "}, ");
 }
 
 // How a value is turned into the number that is written.
@@ -260,8 +262,8 @@ void printHeldOperations(Printer& printer, const Descriptor& message) {
   printFunction(printer, "void write(const " + name + "& message, pbf_writer writer)", [&] {
     forEachField(message, [&](const FieldDescriptor& field) { printWrite(printer, field); });
   });
-  printFunction(printer, "void appendText(const " + name + "& message, std::string& out)", [&] {
-    printer.Print("out += '{';\n");
+  printFunction(printer, "void appendText(const " + name + "& message, Line& out)", [&] {
+    printer.Print("out.literal(\"{\");\n");
     printTexts(printer, message, nullptr);
   });
 }
@@ -291,12 +293,12 @@ void printMetricOperations(Printer& printer, const Descriptor& message) {
     printer.Print("pbf_writer writer(out);\n");
     forEachField(message, [&](const FieldDescriptor& field) { printWrite(printer, field); });
   });
-  printFunction(
-      printer,
-      "void appendText(const " + name + "& message, std::string_view time, std::string& out)", [&] {
-        printer.Print("out += '{';\nappendTime(out, message.timestamp, time);\n");
-        printTexts(printer, message, &first);
-      });
+  printFunction(printer,
+                "void appendText(const " + name + "& message, std::string_view time, Line& out)",
+                [&] {
+                  printer.Print("out.literal(\"{\");\nappendTime(out, message.timestamp, time);\n");
+                  printTexts(printer, message, &first);
+                });
 }
 
 }  // namespace qel::bench::generator

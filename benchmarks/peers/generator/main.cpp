@@ -28,7 +28,8 @@ using google::protobuf::io::Printer;
 constexpr const char* kHead = "// Made from the schemas; changes belong there.\n";
 constexpr const char* kHeaderHead =
     "#pragma once\n\n#include <cstdint>\n#include <optional>\n#include <string>\n"
-    "#include <string_view>\n#include <vector>\n\nnamespace qel::bench::plain {\n\n";
+    "#include <string_view>\n#include <vector>\n\n#include \"peers/Line.h\"\n\nnamespace "
+    "qel::bench::plain {\n\n";
 constexpr const char* kSourceHead =
     "#include \"plain.h\"\n\n#include \"peers/PlainCode.h\"\n\nnamespace qel::bench::plain {\n"
     "namespace {\n\nusing plain::lengthOf;\nusing plain::put;\n\n";
@@ -41,7 +42,7 @@ constexpr const char* kOperations =
     "// In place of `out`, without protozero: the lengths are counted first.\n"
     "void writeSized(const $Message$& message, std::string& out);\n"
     "// As JSON on one line, with `time` in place of the timestamp unless empty.\n"
-    "void appendText(const $Message$& message, std::string_view time, std::string& out);\n\n";
+    "void appendText(const $Message$& message, std::string_view time, Line& out);\n\n";
 
 // Those that others hold before those others.
 void addHoldersLast(const Descriptor& message, std::vector<const Descriptor*>& messages) {
