@@ -23,7 +23,7 @@ constexpr int kPatienceMs = 200;  // with a terminal that does not read
 
 std::array<struct sigaction, kDeadly.size()> actionsBefore;  // read by the handler
 termios settingsBefore;
-std::string leaveSequence;
+std::string howToLeave;
 std::atomic<bool> isHeld = false;
 static_assert(std::atomic<bool>::is_always_lock_free);
 
@@ -32,7 +32,7 @@ void giveBack() {
   if (!isHeld.exchange(false)) return;
   pollfd output{STDOUT_FILENO, POLLOUT, 0};
   if (::poll(&output, 1, kPatienceMs) == 1) {
-    (void)!::write(STDOUT_FILENO, leaveSequence.data(), leaveSequence.size());
+    (void)!::write(STDOUT_FILENO, howToLeave.data(), howToLeave.size());
   }
   ::tcsetattr(STDIN_FILENO, TCSANOW, &settingsBefore);
 }
@@ -73,7 +73,7 @@ TerminalRescue::~TerminalRescue() {
 void holdTerminal(const termios& before, std::string leave) {
   isHeld = false;
   settingsBefore = before;
-  leaveSequence = std::move(leave);
+  howToLeave = std::move(leave);
   isHeld = true;
 }
 
