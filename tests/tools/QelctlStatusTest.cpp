@@ -97,6 +97,28 @@ TEST(QelctlStatusOfARecording, countsReportsThatNoTableCouldDraw) {
   EXPECT_EQ(told["events"]["received"], 3);
 }
 
+// Once such a file was read whole, and refused, before its service was there.
+TEST(QelctlStatusOfARecording, tellsWhereAndWhyItEndedEarly) {
+  std::string lines;
+  std::size_t count = 0;
+  for (; lines.size() < 5'000'000; ++count) lines += kTriggerLine;
+  const TemporaryRecording recording(lines + "no event\n");
+  const PrivateBus bus;
+  const ServiceProcess service(bus, "recording:" + recording.path() + ",speed=1000000");
+  Client client(bus, "tester");
+  ASSERT_TRUE(client.waitForReachable(true));
+  ASSERT_EQ(client.install(7, {19992}).code, 0);
+  client.transport().eventsOn();
+  const auto told = [&bus] {
+    return nlohmann::json::parse(qelctl({"status", "--json", "--bus", bus.address()}).out);
+  };
+  ASSERT_TRUE(eventually([&] { return told()["condition"]["state"] == "ended"; }));
+  const auto status = told();
+  EXPECT_EQ(status["condition"]["reason"],
+            "line " + std::to_string(count + 1) + ": not JSON, column 2");
+  EXPECT_EQ(status["events"]["received"], count);
+}
+
 // A modem that cannot give values once looked like one with nothing to report.
 TEST(QelctlStatusOfAModem, tellsHowItIsWithIt) {
   const PrivateBus bus;
