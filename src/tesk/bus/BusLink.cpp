@@ -217,15 +217,16 @@ int BusLink::pollTimeout(const sdbus::IConnection::PollData& bus) const {
   return timeout < 0 ? wait : std::min(timeout, wait);
 }
 
-void BusLink::waitAndProcess(int wakeDescriptor) {
+bool BusLink::waitAndProcess(int wakeDescriptor) {
   const auto bus = _connection->getEventLoopPollData();
   std::array<pollfd, 3> waited = {{{bus.fd, bus.events, 0},
                                    {wakeDescriptor, POLLIN, 0},
                                    {isAttached() ? _stream.get() : -1, POLLIN, 0}}};
   ::poll(waited.data(), waited.size(), pollTimeout(bus));
   if (waited[2].revents != 0) processStream();
-  processBus();
+  if (waited[0].revents != 0 || bus.getPollTimeout() == 0) processBus();
   if (_tryAgainAt && Clock::now() >= *_tryAgainAt) tryAgain();
+  return waited[1].revents != 0;
 }
 
 void BusLink::processBus() {

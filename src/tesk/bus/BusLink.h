@@ -54,8 +54,9 @@ class BusLink {
   // it came to.
   void performCommand(Command command);
 
-  // Waits for the bus, the stream or `wakeDescriptor`, and takes what came.
-  void waitAndProcess(int wakeDescriptor);
+  // Waits for the bus, the stream or `wakeDescriptor`, and takes what came. Whether the descriptor
+  // has something to say.
+  bool waitAndProcess(int wakeDescriptor);
 
  private:
   struct Sent {

@@ -4,11 +4,11 @@
 
 #include <algorithm>
 #include <condition_variable>
-#include <deque>
 #include <future>
 #include <mutex>
 #include <optional>
 #include <utility>
+#include <vector>
 
 #include "base/WakeUp.h"
 #include "tesk/bus/BusLink.h"
@@ -157,8 +157,7 @@ class BusTransport::Worker {
     while (!isStopping()) {
       runTasks(&link);
       if (const auto now = link.reachability()) tell(now->reachable, now->why);
-      link.waitAndProcess(_wakeUp.descriptor());
-      _wakeUp.clear();
+      if (link.waitAndProcess(_wakeUp.descriptor())) _wakeUp.clear();
     }
   }
 
@@ -176,7 +175,7 @@ class BusTransport::Worker {
   }
 
   void runTasks(BusLink* link) {
-    std::deque<Task> tasks;
+    std::vector<Task> tasks;
     {
       const std::lock_guard lock(_mutex);
       tasks.swap(_tasks);
@@ -198,7 +197,7 @@ class BusTransport::Worker {
   const qel::WakeUp _wakeUp;
   std::mutex _mutex;
   std::condition_variable _changed;
-  std::deque<Task> _tasks;
+  std::vector<Task> _tasks;
   bool _stopping = false;
   bool _connecting = false;
   bool _ended = false;
