@@ -7,9 +7,9 @@
 
 namespace qel {
 
-// A thread keeps the blocks that are given back on it and hands them out again, so that work that
-// repeats itself asks the heap for nothing. Blocks may be given back on any thread; each keeps a
-// bounded number, and the rest, like everything larger than kLargest, is the heap's. Under
+// Blocks that are given back are kept and handed out again, so that work that goes on asks the heap
+// for nothing: by each thread, and from threads that only give for those that only take. A bounded
+// number is kept; the rest, like everything larger than kLargest, is the heap's. Under
 // AddressSanitizer every block is the heap's, so that none is used after its end unseen.
 class SmallBlocks {
  public:
