@@ -10,7 +10,7 @@ namespace qel {
 struct SerialQueue::State {
   std::mutex mutex;
   std::condition_variable changed;
-  std::deque<Work> waiting;
+  WorkList waiting;
   bool stopping = false;
 };
 
@@ -53,7 +53,7 @@ void SerialQueue::run(const std::shared_ptr<State>& state) {
     state->waiting.pop_front();
     lock.unlock();
     work();
-    work = nullptr;
+    work = {};
     lock.lock();
   }
 }
@@ -64,23 +64,23 @@ MainQueue& MainQueue::shared() {
 }
 
 void MainQueue::async(Work work) {
-  Work waker;
+  std::shared_ptr<const std::function<void()>> waker;
   {
     const std::lock_guard lock(_mutex);
     _waiting.push_back(std::move(work));
     if (_waiting.size() == 1) waker = _waker;
   }
   _changed.notify_one();
-  if (waker) waker();
+  if (waker) (*waker)();
 }
 
-void MainQueue::setWaker(Work waker) {
+void MainQueue::setWaker(std::function<void()> waker) {
   const std::lock_guard lock(_mutex);
-  _waker = std::move(waker);
+  _waker = waker ? std::make_shared<const std::function<void()>>(std::move(waker)) : nullptr;
 }
 
 bool MainQueue::drain(std::size_t most) {
-  std::deque<Work> ready;
+  WorkList ready;
   {
     const std::lock_guard lock(_mutex);
     most = std::min(most, _waiting.size());

@@ -11,9 +11,12 @@
 #include <string>
 #include <thread>
 
+#include "base/SmallBlocks.h"
+#include "base/Work.h"
+
 namespace qel {
 
-using Work = std::function<void()>;
+using WorkList = std::deque<Work, SmallBlockAllocator<Work>>;
 
 // Runs work items one at a time, in the order in which they came. async may be called from any
 // thread, also from a running item.
@@ -54,7 +57,7 @@ class MainQueue final : public DispatchQueue {
   void async(Work work) override;
 
   // Called from any thread when the queue stops being empty. Set before other threads use it.
-  void setWaker(Work waker);
+  void setWaker(std::function<void()> waker);
 
   // Runs the items that wait now, none that they add, `most` at most. True when items are left.
   bool drain(std::size_t most = std::numeric_limits<std::size_t>::max());
@@ -65,8 +68,8 @@ class MainQueue final : public DispatchQueue {
  private:
   std::mutex _mutex;
   std::condition_variable _changed;
-  std::deque<Work> _waiting;
-  Work _waker;
+  WorkList _waiting;
+  std::shared_ptr<const std::function<void()>> _waker;
 };
 
 }  // namespace qel

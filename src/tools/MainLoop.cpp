@@ -51,7 +51,7 @@ class MainLoop::AnswerWait final : public tesk::bus::AnswerWait {
   std::atomic<bool> _woken = false;
 };
 
-MainLoop::MainLoop() {
+MainLoop::MainLoop() : _waited{{_signals.wakeUp().descriptor(), POLLIN, 0}, {-1, 0, 0}} {
   MainQueue::shared().setWaker([this] { _signals.wakeUp().signal(); });
 }
 
@@ -61,17 +61,17 @@ tesk::bus::AnswerWaitMaker MainLoop::answerWaits() {
   return [this] { return std::make_shared<AnswerWait>(*this); };
 }
 
+// A pipe without a reader answers though nothing is asked of it.
+void MainLoop::watchStandardOutput() { _waited[1].fd = STDOUT_FILENO; }
+
 bool MainLoop::isStopping() const { return _signals.arrived() != 0 || _outputClosed; }
 
 bool MainLoop::runOnce(std::optional<Clock::time_point> until) {
   if (isStopping()) return false;
-  // A pipe without a reader answers though nothing is asked of it.
-  std::vector<pollfd> waited = {{_signals.wakeUp().descriptor(), POLLIN, 0},
-                                {_watchesOutput ? STDOUT_FILENO : -1, 0, 0}};
-  for (const int input : _inputs) waited.push_back({input, POLLIN, 0});
-  ::poll(waited.data(), waited.size(), _more ? 0 : waitUntil(until));
-  _outputClosed = (waited[1].revents & (POLLERR | POLLHUP)) != 0;
-  _signals.wakeUp().clear();
+  for (pollfd& each : _waited) each.revents = 0;
+  ::poll(_waited.data(), _waited.size(), _more ? 0 : waitUntil(until));
+  _outputClosed = (_waited[1].revents & (POLLERR | POLLHUP)) != 0;
+  if (_waited[0].revents != 0) _signals.wakeUp().clear();
   if (isStopping()) return false;
   _more = MainQueue::shared().drain(1);
   return true;

@@ -1,6 +1,8 @@
 // The main thread of a subcommand that runs until it is told to end.
 #pragma once
 
+#include <poll.h>
+
 #include <chrono>
 #include <optional>
 #include <vector>
@@ -21,10 +23,10 @@ class MainLoop {
   MainLoop& operator=(const MainLoop&) = delete;
 
   // Ends the loop, too, when nobody reads what goes to standard output any more.
-  void watchStandardOutput() { _watchesOutput = true; }
+  void watchStandardOutput();
 
   // Wakes up, too, when there is something to read.
-  void watchInput(int descriptor) { _inputs.push_back(descriptor); }
+  void watchInput(int descriptor) { _waited.push_back({descriptor, POLLIN, 0}); }
 
   // Waits for work of the main queue, at most until that time, and does one item of it. False when
   // the program is to end.
@@ -40,8 +42,7 @@ class MainLoop {
   bool isStopping() const;
 
   StopSignals _signals;
-  std::vector<int> _inputs;
-  bool _watchesOutput = false;
+  std::vector<pollfd> _waited;  // the bell, standard output, inputs
   bool _outputClosed = false;
   bool _more = true;  // work may have come before this loop
 };
