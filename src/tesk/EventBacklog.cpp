@@ -9,7 +9,8 @@
 namespace tesk {
 namespace {
 
-constexpr std::size_t kBytesOfAnEvent = 128;  // beside its entries
+constexpr std::size_t kBytesOfAnEvent = 128;    // beside its entries
+constexpr std::size_t kMetricsRemembered = 64;  // more than a phone reports
 
 std::optional<std::int64_t> metricOf(const EventBacklog::Event& event) {
   if (event.name != kEventMetric) return std::nullopt;
@@ -48,10 +49,11 @@ void EventBacklog::makeRoom(std::size_t bytes) {
   }
 }
 
-EventBacklog::Event EventBacklog::remove(std::deque<Waiting>::iterator waiting) {
+EventBacklog::Event EventBacklog::remove(WaitingEvents::iterator waiting) {
   Event event = std::move(waiting->event);
   _bytes -= waiting->bytes;
-  if (waiting->ofItsMetric && --*waiting->ofItsMetric == 0) _metrics.erase(*waiting->metric);
+  const bool isLast = waiting->ofItsMetric && --*waiting->ofItsMetric == 0;
+  if (isLast && _metrics.size() > kMetricsRemembered) _metrics.erase(*waiting->metric);
   _waiting.erase(waiting);
   return event;
 }

@@ -49,12 +49,13 @@ class EventBacklog {
   };
 
   void makeRoom(std::size_t bytes);
-  Event remove(std::deque<Waiting>::iterator waiting);
+  using WaitingEvents = std::deque<Waiting, qel::SmallBlockAllocator<Waiting>>;
+  Event remove(WaitingEvents::iterator waiting);
 
   const Limits _limits;
   mutable std::mutex _mutex;
-  std::deque<Waiting> _waiting;
-  std::unordered_map<std::int64_t, std::size_t> _metrics;
+  WaitingEvents _waiting;
+  std::unordered_map<std::int64_t, std::size_t> _metrics;  // those that wait, and some that did
   std::size_t _bytes = 0;
   std::size_t _asked = 0;
   std::uint64_t _dropped = 0;
