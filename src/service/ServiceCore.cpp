@@ -29,16 +29,20 @@ std::shared_ptr<Session> ServiceCore::open(std::string_view clientName, tesk::Ev
   auto session = std::make_shared<Session>(std::string(clientName), std::move(sink),
                                            _configurations, _book.opened(clientName));
   const std::lock_guard lock(_mutex);
-  _sessions.push_back(session);
+  auto sessions = std::make_shared<Sessions>(*_sessions);
+  sessions->push_back(session);
+  _sessions = std::move(sessions);
   return session;
 }
 
 void ServiceCore::close(const std::shared_ptr<Session>& session) {
   session->close();
   const std::lock_guard lock(_mutex);
-  if (std::erase(_sessions, session) == 0) return;
+  auto sessions = std::make_shared<Sessions>(*_sessions);
+  if (std::erase(*sessions, session) == 0) return;
+  _sessions = std::move(sessions);
   _book.closed(session->clientName());
-  if (_sessions.empty() && _sourceRunning) {
+  if (_sessions->empty() && _sourceRunning) {
     _source->stop();
     _sourceRunning = false;
     _condition.forget();
@@ -49,14 +53,14 @@ void ServiceCore::eventsOn(Session& session) {
   if (!session.eventsOn()) return;
   _listeners->changed();
   const std::lock_guard lock(_mutex);
-  if (_sourceRunning || _sessions.empty()) return;
+  if (_sourceRunning || _sessions->empty()) return;
   _source->start(weak_from_this(), _listeners);
   _sourceRunning = true;
 }
 
 void ServiceCore::eventsOff(Session& session) { session.eventsOff(); }
 
-std::vector<std::shared_ptr<Session>> ServiceCore::sessions() const {
+std::shared_ptr<const ServiceCore::Sessions> ServiceCore::sessions() const {
   const std::lock_guard lock(_mutex);
   return _sessions;
 }
@@ -88,15 +92,15 @@ sources::EventReceiver::Taken ServiceCore::take(const sources::SourceEvent& even
   // Whether anyone listens is known only from the offers themselves: a look beforehand could be
   // overtaken by a client that switches its events off and on again.
   const auto open = sessions();
-  std::vector<Session::Offer> offers;
-  for (const auto& session : open) offers.push_back(session->offer(event, *subject));
+  Sequence<Session::Offer> offers;
+  for (const auto& session : *open) offers.push_back(session->offer(event, *subject));
   const bool heard = std::ranges::any_of(offers, [](Session::Offer offer) {
     return offer == Session::Offer::delivered || offer == Session::Offer::notWanted;
   });
   if (!heard) return Taken::nobodyListens;
   ++_received;
   for (std::size_t i = 0; i < offers.size(); ++i) {
-    open[i]->pass(offers[i]);
+    (*open)[i]->pass(offers[i]);
     switch (offers[i]) {
       case Session::Offer::delivered:
         ++_delivered;
@@ -125,7 +129,7 @@ CoreStatus ServiceCore::status() const {
   {
     const std::lock_guard lock(_mutex);
     status.sourceRunning = _sourceRunning;
-    for (const auto& session : _sessions) status.sessions.push_back(session->status());
+    for (const auto& session : *_sessions) status.sessions.push_back(session->status());
   }
   status.received = _received;
   status.delivered = _delivered;

@@ -79,6 +79,9 @@ class ServiceCore final : public sources::EventReceiver,
   };
   static const std::array<Command, 3> kCommands;
 
+  // Never changed, only replaced: an event goes to those that it found.
+  using Sessions = std::vector<std::shared_ptr<Session>>;
+
   ServiceCore(std::unique_ptr<sources::EventSource> source, const Clock& clock,
               std::unique_ptr<StateKeeper> keeper, sources::WaitClock& waitClock);
 
@@ -89,7 +92,7 @@ class ServiceCore final : public sources::EventReceiver,
   void join(Session& session, std::int64_t application);
   std::optional<EventSubject> examine(const sources::SourceEvent& event, EventFault& fault);
   void noteTagLines(std::size_t lines);
-  std::vector<std::shared_ptr<Session>> sessions() const;
+  std::shared_ptr<const Sessions> sessions() const;
 
   ConfigurationStore _configurations;
   const std::shared_ptr<sources::ListenerSignal> _listeners =
@@ -100,7 +103,7 @@ class ServiceCore final : public sources::EventReceiver,
   KeptBook _book;
 
   mutable std::mutex _mutex;
-  std::vector<std::shared_ptr<Session>> _sessions;
+  std::shared_ptr<const Sessions> _sessions = std::make_shared<Sessions>();  // those open
   bool _sourceRunning = false;
 
   std::atomic<std::uint64_t> _received = 0;
