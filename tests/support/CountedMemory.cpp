@@ -11,10 +11,12 @@ namespace {
 
 std::atomic<std::size_t> held = 0;
 std::atomic<std::size_t> mostHeld = 0;
+std::atomic<std::size_t> timesTaken = 0;
 
 void* counted(std::size_t size) {
   void* memory = std::malloc(size);
   if (!memory) throw std::bad_alloc();
+  ++timesTaken;
   held += ::malloc_usable_size(memory);
   mostHeld = std::max(mostHeld.load(), held.load());
   return memory;
@@ -29,9 +31,11 @@ void givenBack(void* memory) {
 
 namespace qel::testing {
 
-CountedMemory::CountedMemory() : _before(held) { mostHeld = _before; }
+CountedMemory::CountedMemory() : _before(held), _timesBefore(timesTaken) { mostHeld = _before; }
 
 std::size_t CountedMemory::most() const { return mostHeld - _before; }
+
+std::size_t CountedMemory::times() const { return timesTaken - _timesBefore; }
 
 }  // namespace qel::testing
 
