@@ -1,5 +1,6 @@
 // The metrics of a modem on GSM.
 #include "messages/gsm.h"
+#include "messages/runtime/MessageReader.h"
 #include "radio/Bands.h"
 #include "radio/Levels.h"
 #include "sources/Filling.h"
@@ -10,7 +11,7 @@ namespace qel::sources {
 namespace {
 
 void addGsm(const CellReading& cell, KCellularGsmGrrEventMeasCr& message) {
-  auto entry = std::make_shared<GsmNcellMeas>();
+  auto entry = makeMessage<GsmNcellMeas>();
   if (cell.network) {
     entry->setMcc(cell.network->mcc);
     entry->setMnc(cell.network->mnc);
@@ -24,7 +25,7 @@ void addGsm(const CellReading& cell, KCellularGsmGrrEventMeasCr& message) {
 }
 
 void addUmts(const CellReading& cell, KCellularGsmGrrEventMeasCr& message) {
-  auto entry = std::make_shared<UmtsNcellMeas>();
+  auto entry = makeMessage<UmtsNcellMeas>();
   set(*entry, &UmtsNcellMeas::setCpichSc, cell.code);
   set(*entry, &UmtsNcellMeas::setDlUarfcn, cell.channel);
   set(*entry, &UmtsNcellMeas::setCpichRscp, cell.levelDbm, rscpIndex);
@@ -33,7 +34,7 @@ void addUmts(const CellReading& cell, KCellularGsmGrrEventMeasCr& message) {
 }
 
 void addLte(const CellReading& cell, KCellularGsmGrrEventMeasCr& message) {
-  auto entry = std::make_shared<LteNcellMeas>();
+  auto entry = makeMessage<LteNcellMeas>();
   set(*entry, &LteNcellMeas::setPhysicalCellId, cell.code);
   set(*entry, &LteNcellMeas::setRsrp, cell.levelDbm, rsrpIndex);
   set(*entry, &LteNcellMeas::setEarfcn, cell.channel);

@@ -1,6 +1,7 @@
 // The metrics of a modem on LTE.
 #include "messages/lte_neighbours.h"
 #include "messages/lte_serving.h"
+#include "messages/runtime/MessageReader.h"
 #include "radio/Bands.h"
 #include "radio/Levels.h"
 #include "sources/Filling.h"
@@ -12,7 +13,7 @@ namespace {
 
 std::shared_ptr<RsrpRsrqSinr> sampleOf(const ModemPicture& modem) {
   const LevelReading& levels = modem.levels;
-  auto sample = std::make_shared<RsrpRsrqSinr>();
+  auto sample = makeMessage<RsrpRsrqSinr>();
   if (modem.serving) set(*sample, &RsrpRsrqSinr::setPhyCellId, modem.serving->code);
   if (levels.levelDbm) sample->setRsrp0(rounded(*levels.levelDbm));
   if (levels.qualityDb) sample->setRsrq0(rounded(*levels.qualityDb));
@@ -21,7 +22,7 @@ std::shared_ptr<RsrpRsrqSinr> sampleOf(const ModemPicture& modem) {
 }
 
 void addLte(const CellReading& cell, KCellularLteNbrEutraCellMeas& message) {
-  auto entry = std::make_shared<EgwErrcNbrEutraMeas>();
+  auto entry = makeMessage<EgwErrcNbrEutraMeas>();
   set(*entry, &EgwErrcNbrEutraMeas::setNbrEarfcn, cell.channel);
   set(*entry, &EgwErrcNbrEutraMeas::setNbrPhysCellId, cell.code);
   if (cell.channel) set(*entry, &EgwErrcNbrEutraMeas::setFreqBandInd, lteBandOf(*cell.channel));
@@ -31,7 +32,7 @@ void addLte(const CellReading& cell, KCellularLteNbrEutraCellMeas& message) {
 }
 
 void addUmts(const CellReading& cell, KCellularLteNbrInterRatCellMeas& message) {
-  auto entry = std::make_shared<EgwErrcNbrUtraMeas>();
+  auto entry = makeMessage<EgwErrcNbrUtraMeas>();
   set(*entry, &EgwErrcNbrUtraMeas::setUarfcn, cell.channel);
   set(*entry, &EgwErrcNbrUtraMeas::setPsc, cell.code);
   set(*entry, &EgwErrcNbrUtraMeas::setRscp, cell.levelDbm, rscpIndex);
@@ -40,7 +41,7 @@ void addUmts(const CellReading& cell, KCellularLteNbrInterRatCellMeas& message) 
 }
 
 void addGsm(const CellReading& cell, KCellularLteNbrInterRatCellMeas& message) {
-  auto entry = std::make_shared<EgwErrcNbrGeranMeas>();
+  auto entry = makeMessage<EgwErrcNbrGeranMeas>();
   set(*entry, &EgwErrcNbrGeranMeas::setArfcn, cell.channel);
   set(*entry, &EgwErrcNbrGeranMeas::setBsic, cell.code);
   set(*entry, &EgwErrcNbrGeranMeas::setRxlev, cell.levelDbm, rxlevIndex);
@@ -75,7 +76,7 @@ std::optional<Bytes> modemLteMeasurement(const ModemPicture& modem, std::uint64_
   if (!levels.rssiDbm && !levels.levelDbm && !levels.qualityDb && !levels.snrDb) {
     return std::nullopt;
   }
-  auto receiver = std::make_shared<RxInfo>();
+  auto receiver = makeMessage<RxInfo>();
   if (levels.rssiDbm) receiver->setRssi(rounded(*levels.rssiDbm));
   set(*receiver, &RxInfo::setRsrpRange, levels.levelDbm, rsrpIndex);
   set(*receiver, &RxInfo::setRsrqRange, levels.qualityDb, rsrqIndex);
@@ -104,7 +105,7 @@ std::optional<Bytes> modemLteCarriers(const ModemPicture& modem, std::uint64_t t
   KCellularLteCarrierAggregationStatus message;
   message.setTimestamp(timeMs);
   for (const CellReading& cell : *modem.carriers) {
-    auto entry = std::make_shared<SecondaryComponentCarrier>();
+    auto entry = makeMessage<SecondaryComponentCarrier>();
     set(*entry, &SecondaryComponentCarrier::setPci, cell.code);
     set(*entry, &SecondaryComponentCarrier::setDlEarfcn, cell.channel);
     if (cell.channel) {

@@ -3,6 +3,7 @@
 #include <array>
 
 #include "messages/nas.h"
+#include "messages/runtime/MessageReader.h"
 #include "sources/Filling.h"
 #include "sources/modem_manager/CellFilling.h"
 #include "sources/modem_manager/ModemReports.h"
@@ -60,7 +61,7 @@ std::shared_ptr<Area> areaOf(const ModemPicture& modem, const RegistrationRow& r
   if (!row.registered || !modem.serving) return nullptr;
   const CellReading& cell = *modem.serving;
   if (!cell.area || !cell.network) return nullptr;
-  auto area = std::make_shared<Area>();
+  auto area = makeMessage<Area>();
   area->setEncodedPlmn(encoded(*cell.network));
   area->setLac(*cell.area);
   return area;
@@ -87,7 +88,7 @@ Bytes pdpAddressOf(const BearerReading& bearer) {
 std::int32_t addressType(const Bytes& address) { return address.size() == 4 ? kPdpIPv4 : kPdpIPv6; }
 
 std::shared_ptr<BearerContext> contextOf(const BearerReading& bearer, bool onLte) {
-  auto context = std::make_shared<BearerContext>();
+  auto context = makeMessage<BearerContext>();
   if (bearer.profile != 0) context->setCid(bearer.profile);
   if (!bearer.apn.empty()) context->setApn(bearer.apn);
   if (const auto type = pdpTypeOf(bearer, onLte)) context->setPdpType(*type);

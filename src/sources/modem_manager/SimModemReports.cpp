@@ -3,6 +3,7 @@
 #include <optional>
 #include <string_view>
 
+#include "messages/runtime/MessageReader.h"
 #include "messages/sim.h"
 #include "sources/modem_manager/ModemReports.h"
 #include "sources/simulated/Bcd.h"
@@ -91,7 +92,7 @@ std::optional<Bytes> modemSimFiles(const ModemPicture& modem, std::uint64_t time
   for (const FileRow& row : kFiles) {
     Bytes content = row.content(modem.sim);
     if (content.empty()) continue;
-    auto file = std::make_shared<ElementaryFile>();
+    auto file = makeMessage<ElementaryFile>();
     file->setEfId(row.identifier);
     file->setContent(std::move(content));
     message.addEfList(file);

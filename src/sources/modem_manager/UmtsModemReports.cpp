@@ -1,5 +1,6 @@
 // The metrics of a modem on UMTS.
 #include "messages/lte_serving.h"
+#include "messages/runtime/MessageReader.h"
 #include "messages/wcdma.h"
 #include "radio/Bands.h"
 #include "radio/Levels.h"
@@ -23,7 +24,7 @@ std::optional<std::int32_t> packetAccess(std::uint32_t technologies) {
 }
 
 void addUmts(const CellReading& cell, KCellularWcdmaNbrCellMeas& message) {
-  auto entry = std::make_shared<UtraCellMeasResult>();
+  auto entry = makeMessage<UtraCellMeasResult>();
   set(*entry, &UtraCellMeasResult::setUarfcn, cell.channel);
   set(*entry, &UtraCellMeasResult::setPsc, cell.code);
   set(*entry, &UtraCellMeasResult::setEcno, cell.qualityDb, ecnoIndex);
@@ -32,7 +33,7 @@ void addUmts(const CellReading& cell, KCellularWcdmaNbrCellMeas& message) {
 }
 
 void addGsm(const CellReading& cell, KCellularWcdmaNbrCellMeas& message) {
-  auto entry = std::make_shared<GsmCellMeasResult>();
+  auto entry = makeMessage<GsmCellMeasResult>();
   set(*entry, &GsmCellMeasResult::setArfcn, cell.channel);
   set(*entry, &GsmCellMeasResult::setBsic, cell.code);
   set(*entry, &GsmCellMeasResult::setRxlev, cell.levelDbm, rxlevIndex);
@@ -40,7 +41,7 @@ void addGsm(const CellReading& cell, KCellularWcdmaNbrCellMeas& message) {
 }
 
 void addLte(const CellReading& cell, KCellularWcdmaNbrCellMeas& message) {
-  auto entry = std::make_shared<LteCellMeasResult>();
+  auto entry = makeMessage<LteCellMeasResult>();
   set(*entry, &LteCellMeasResult::setEarfcn, cell.channel);
   set(*entry, &LteCellMeasResult::setPhyCellId, cell.code);
   if (cell.channel) set(*entry, &LteCellMeasResult::setEutraBand, lteBandOf(*cell.channel));
@@ -76,7 +77,7 @@ std::optional<Bytes> modemUmtsMeasurement(const ModemPicture& modem, std::uint64
   const LevelReading& levels = modem.levels;
   if (modem.technology != Technology::umts) return std::nullopt;
   if (!levels.rssiDbm && !levels.levelDbm && !levels.qualityDb) return std::nullopt;
-  auto receiver = std::make_shared<RxInfo>();
+  auto receiver = makeMessage<RxInfo>();
   if (levels.rssiDbm) receiver->setRssi(rounded(*levels.rssiDbm));
   set(*receiver, &RxInfo::setRsrpRange, levels.levelDbm, rscpIndex);
   set(*receiver, &RxInfo::setRsrqRange, levels.qualityDb, ecnoIndex);

@@ -1,5 +1,6 @@
 // What the phone reports on GSM.
 #include "messages/gsm.h"
+#include "messages/runtime/MessageReader.h"
 #include "radio/Bands.h"
 #include "sources/simulated/Random.h"
 #include "sources/simulated/Reports.h"
@@ -28,7 +29,7 @@ std::uint32_t qualityOf(double levelDbm) { return index((-95 - levelDbm) / 2, 7)
 
 void addGsm(const PhoneView& view, KCellularGsmGrrEventMeasCr& message) {
   for (const std::size_t cell : neighbours(view, Technology::gsm, kMostNeighbours)) {
-    auto entry = std::make_shared<GsmNcellMeas>();
+    auto entry = makeMessage<GsmNcellMeas>();
     entry->setMcc(kMcc);
     entry->setMnc(kMnc);
     entry->setLac(cells()[cell].area);
@@ -42,7 +43,7 @@ void addGsm(const PhoneView& view, KCellularGsmGrrEventMeasCr& message) {
 
 void addUmts(const PhoneView& view, KCellularGsmGrrEventMeasCr& message) {
   for (const std::size_t cell : neighbours(view, Technology::umts, kMostNeighbours)) {
-    auto entry = std::make_shared<UmtsNcellMeas>();
+    auto entry = makeMessage<UmtsNcellMeas>();
     entry->setCellType(0);
     entry->setCpichSc(cells()[cell].code);
     entry->setDlUarfcn(cells()[cell].channel);
@@ -54,7 +55,7 @@ void addUmts(const PhoneView& view, KCellularGsmGrrEventMeasCr& message) {
 
 void addLte(const PhoneView& view, KCellularGsmGrrEventMeasCr& message) {
   for (const std::size_t cell : neighbours(view, Technology::lte, kMostNeighbours)) {
-    auto entry = std::make_shared<LteNcellMeas>();
+    auto entry = makeMessage<LteNcellMeas>();
     entry->setPhysicalCellId(cells()[cell].code);
     entry->setBandwidth(layerOf(cells()[cell]).bandwidthCode);
     entry->setRsrp(rsrpIndex(view.scene.of(cell).levelDbm));

@@ -1,6 +1,7 @@
 // What the phone measures and sends on LTE.
 #include "messages/lte_neighbours.h"
 #include "messages/lte_serving.h"
+#include "messages/runtime/MessageReader.h"
 #include "sources/simulated/Random.h"
 #include "sources/simulated/Reports.h"
 
@@ -25,7 +26,7 @@ double clampedPower(double dbm) { return std::clamp(dbm, kLeastPowerDbm, kMostPo
 
 // SINR in half dB.
 std::shared_ptr<RsrpRsrqSinr> sampleOf(const QualitySample& sample) {
-  auto message = std::make_shared<RsrpRsrqSinr>();
+  auto message = makeMessage<RsrpRsrqSinr>();
   const CellSignal& signal = sample.signal;
   message->setPhyCellId(sample.code);
   message->setRsrp0(std::max(-140, rounded(signal.antennaDbm[0])));
@@ -56,7 +57,7 @@ std::shared_ptr<SecondaryComponentCarrier> carrierOf(const PhoneView& view, std:
   const CellSignal& signal = view.scene.of(secondary.cell);
   const Layer& layer = layerOf(cell);
   const auto hundredths = [](double value) { return rounded(value * 100); };
-  auto carrier = std::make_shared<SecondaryComponentCarrier>();
+  auto carrier = makeMessage<SecondaryComponentCarrier>();
   carrier->setIndex(static_cast<std::uint32_t>(number + 1));
   carrier->setState(secondary.activated ? kSccActivated : kSccDeactivated);
   carrier->setPci(cell.code);
@@ -79,7 +80,7 @@ std::optional<Bytes> lteServingMeasurement(const PhoneView& view, std::uint64_t 
   message.setTimestamp(timeMs);
   message.setIsConnectedMode(view.phone.connection().connected());
   for (std::size_t i = 0; i < kAntennas; ++i) {
-    auto receiver = std::make_shared<RxInfo>();
+    auto receiver = makeMessage<RxInfo>();
     receiver->setRssi(rounded(view.signal().antennaRssiDbm[i]));
     receiver->setRsrpRange(rsrpIndex(view.signal().antennaDbm[i]));
     receiver->setRsrqRange(rsrqIndex(view.signal().antennaQualityDb[i]));
@@ -97,7 +98,7 @@ std::optional<Bytes> lteTxPower(const PhoneView& view, std::uint64_t timeMs) {
   for (const std::uint32_t subframe : kSubframes) {
     // Each subframe has another share of the carrier.
     const auto blocks = static_cast<double>(1 + scramble(timeMs, subframe) % 24);
-    auto power = std::make_shared<TxPowerInfo>();
+    auto power = makeMessage<TxPowerInfo>();
     power->setPucchTxPower(rounded(clampedPower(kPucchTargetDbm + pathLossDb)));
     power->setPuschTxPower(
         rounded(clampedPower(kPuschTargetDbm + 10 * std::log10(blocks) + kPuschPart * pathLossDb)));
@@ -155,7 +156,7 @@ std::optional<Bytes> lteNeighbours(const PhoneView& view, std::uint64_t timeMs) 
   KCellularLteNbrEutraCellMeas message;
   message.setTimestamp(timeMs);
   for (const std::size_t cell : neighbours(view, Technology::lte, kMostNeighbours)) {
-    auto entry = std::make_shared<EgwErrcNbrEutraMeas>();
+    auto entry = makeMessage<EgwErrcNbrEutraMeas>();
     entry->setNbrEarfcn(cells()[cell].channel);
     entry->setNbrPhysCellId(cells()[cell].code);
     entry->setFreqBandInd(layerOf(cells()[cell]).band);
@@ -171,7 +172,7 @@ std::optional<Bytes> lteInterRat(const PhoneView& view, std::uint64_t timeMs) {
   KCellularLteNbrInterRatCellMeas message;
   message.setTimestamp(timeMs);
   for (const std::size_t cell : neighbours(view, Technology::umts, kMostOfOthers)) {
-    auto entry = std::make_shared<EgwErrcNbrUtraMeas>();
+    auto entry = makeMessage<EgwErrcNbrUtraMeas>();
     entry->setUarfcn(cells()[cell].channel);
     entry->setPsc(cells()[cell].code);
     entry->setRscp(static_cast<std::int32_t>(rscpIndex(view.scene.of(cell).levelDbm)));
@@ -179,7 +180,7 @@ std::optional<Bytes> lteInterRat(const PhoneView& view, std::uint64_t timeMs) {
     message.addMeasNbrUtra(entry);
   }
   for (const std::size_t cell : neighbours(view, Technology::gsm, kMostOfOthers)) {
-    auto entry = std::make_shared<EgwErrcNbrGeranMeas>();
+    auto entry = makeMessage<EgwErrcNbrGeranMeas>();
     entry->setArfcn(cells()[cell].channel);
     entry->setBsic(cells()[cell].code);
     entry->setRxlev(rxlevIndex(view.scene.of(cell).levelDbm));
@@ -188,15 +189,17 @@ std::optional<Bytes> lteInterRat(const PhoneView& view, std::uint64_t timeMs) {
   return message.data();
 }
 
-std::vector<std::size_t> neighbours(const PhoneView& view, Technology technology,
-                                    std::size_t most) {
-  std::vector<std::size_t> found;
+CellList neighbours(const PhoneView& view, Technology technology, std::size_t most) {
+  CellList found;
   for (std::size_t cell = 0; cell < view.scene.size(); ++cell) {
     if (cell == view.phone.servingIndex() || !view.scene.of(cell).detected) continue;
     if (layerOf(cells()[cell]).technology == technology) found.push_back(cell);
   }
-  std::ranges::stable_sort(found, std::ranges::greater(),
-                           [&](std::size_t cell) { return view.scene.of(cell).levelDbm; });
+  std::ranges::sort(found, [&](std::size_t a, std::size_t b) {
+    const double levelOfA = view.scene.of(a).levelDbm;
+    const double levelOfB = view.scene.of(b).levelDbm;
+    return levelOfA > levelOfB || (levelOfA == levelOfB && a < b);
+  });
   found.resize(std::min(found.size(), most));
   return found;
 }

@@ -1,6 +1,7 @@
 // What the LTE cell is and how it is configured.
 #include "messages/lte_rrc.h"
 #include "messages/lte_serving.h"
+#include "messages/runtime/MessageReader.h"
 #include "messages/runtime/PBDataWriter.h"
 #include "sources/simulated/Reports.h"
 
@@ -12,7 +13,7 @@ constexpr std::uint32_t kCdrxConfigured = 1;
 constexpr std::uint32_t kTransmissionMode = 4;  // closed-loop spatial multiplexing
 
 std::shared_ptr<NbrEutra> otherFrequency(const Layer& layer) {
-  auto other = std::make_shared<NbrEutra>();
+  auto other = makeMessage<NbrEutra>();
   other->setEarfcn(layer.channel);
   other->setQRxlevMin(layer.minLevelDbm);
   other->setQQualMin(kLeastQualityDb);

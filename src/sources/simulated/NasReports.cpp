@@ -1,5 +1,6 @@
 // Registration and packet connections.
 #include "messages/nas.h"
+#include "messages/runtime/MessageReader.h"
 #include "sources/simulated/Bcd.h"
 #include "sources/simulated/Identities.h"
 #include "sources/simulated/Reports.h"
@@ -30,7 +31,7 @@ std::int32_t statusOf(const PhoneView& view) {
 
 std::shared_ptr<BearerContext> internet(const PhoneView& view) {
   const bool onLte = view.on(Technology::lte);
-  auto bearer = std::make_shared<BearerContext>();
+  auto bearer = makeMessage<BearerContext>();
   bearer->setCid(1);
   bearer->setNsapi(5);
   bearer->setApn("internet");
@@ -50,7 +51,7 @@ std::shared_ptr<BearerContext> internet(const PhoneView& view) {
 }
 
 std::shared_ptr<BearerContext> voice() {
-  auto bearer = std::make_shared<BearerContext>();
+  auto bearer = makeMessage<BearerContext>();
   bearer->setCid(2);
   bearer->setNsapi(6);
   bearer->setApn("ims");
@@ -66,7 +67,7 @@ std::shared_ptr<BearerContext> voice() {
 
 // Pictures and the like, over a network of IPv4 alone.
 std::shared_ptr<BearerContext> messaging() {
-  auto bearer = std::make_shared<BearerContext>();
+  auto bearer = makeMessage<BearerContext>();
   bearer->setCid(3);
   bearer->setNsapi(7);
   bearer->setApn("mms");
@@ -86,14 +87,14 @@ std::optional<Bytes> mmCommonInfo(const PhoneView&, std::uint64_t timeMs) {
   KCellularMmCommonInfo message;
   message.setTimestamp(timeMs);
   message.setImsi(encodedImsi(kImsi));
-  auto own = std::make_shared<Plmn>();
+  auto own = makeMessage<Plmn>();
   own->setEncodedPlmn(plmn());
   message.addEplmnList(own);
-  auto locationArea = std::make_shared<KCellularLocationAreaId>();
+  auto locationArea = makeMessage<KCellularLocationAreaId>();
   locationArea->setEncodedPlmn(encodedPlmn(kMcc, kForbiddenMnc, kMncDigits));
   locationArea->setLac(kForbiddenArea);
   message.addRoamingFlaiList(locationArea);
-  auto trackingArea = std::make_shared<KCellularTrackingAreaId>();
+  auto trackingArea = makeMessage<KCellularTrackingAreaId>();
   trackingArea->setEncodedPlmn(encodedPlmn(kMcc, kForbiddenMnc, kMncDigits));
   trackingArea->setTac(kForbiddenArea);
   message.addRoamingFtaiList(trackingArea);
@@ -102,7 +103,7 @@ std::optional<Bytes> mmCommonInfo(const PhoneView&, std::uint64_t timeMs) {
 
 std::optional<Bytes> mmContext(const PhoneView& view, std::uint64_t timeMs) {
   const Registration& registration = view.phone.registration();
-  auto area = std::make_shared<KCellularLocationAreaId>();
+  auto area = makeMessage<KCellularLocationAreaId>();
   area->setEncodedPlmn(plmn());
   area->setLac(registration.locationArea());
   KCellularMmContext message;
@@ -122,7 +123,7 @@ std::optional<Bytes> gmmContext(const PhoneView& view, std::uint64_t timeMs) {
   const Registration& registration = view.phone.registration();
   // On LTE this domain rests with what it last knew.
   const bool resting = view.on(Technology::lte);
-  auto area = std::make_shared<RoutingAreaId>();
+  auto area = makeMessage<RoutingAreaId>();
   area->setEncodedPlmn(plmn());
   area->setLac(registration.locationArea());
   area->setRac(registration.routingArea());
@@ -149,12 +150,12 @@ std::optional<Bytes> emmContext(const PhoneView& view, std::uint64_t timeMs) {
   message.setUpdateStatus(registration.inProgress() ? kPacketNotUpdated : kPacketUpdated);
   message.setUeOpMode(kEmmCsPsMode1);
   for (const std::uint32_t area : registration.trackingAreas()) {
-    auto trackingArea = std::make_shared<KCellularTrackingAreaId>();
+    auto trackingArea = makeMessage<KCellularTrackingAreaId>();
     trackingArea->setEncodedPlmn(plmn());
     trackingArea->setTac(area);
     message.addTaiList(trackingArea);
   }
-  auto guti = std::make_shared<Guti>();
+  auto guti = makeMessage<Guti>();
   guti->setMmegi(kMmeGroup);
   guti->setMmec(kMmeCode);
   guti->setMTmsi(registration.mTmsi());

@@ -4,6 +4,7 @@
 #include <cmath>
 #include <numbers>
 
+#include "base/SmallBlocks.h"
 #include "sources/simulated/Journey.h"
 #include "sources/simulated/Random.h"
 
@@ -87,7 +88,7 @@ void RadioScene::receive(std::size_t index, std::uint64_t step) {
 
 // Quality of every cell at one antenna, from all that its carrier brings.
 void RadioScene::weigh(std::size_t antenna) {
-  std::vector<double> carrierMw(layers().size());
+  std::vector<double, SmallBlockAllocator<double>> carrierMw(layers().size());
   for (std::size_t i = 0; i < carrierMw.size(); ++i) {
     const bool umts = layers()[i].technology == Technology::umts;
     carrierMw[i] = milliwatts(umts ? kUmtsNoiseDbm : kLteNoiseDbm);

@@ -7,6 +7,7 @@
 #include <vector>
 
 #include "base/Bytes.h"
+#include "base/SmallBlocks.h"
 #include "radio/Levels.h"
 #include "sources/simulated/Phone.h"
 #include "sources/simulated/RadioScene.h"
@@ -72,6 +73,7 @@ inline constexpr double kMostPowerDbm = 23;
 inline constexpr double kLeastPowerDbm = -40;
 
 // The detected cells of the technology but the serving one, the strongest first, at most so many.
-std::vector<std::size_t> neighbours(const PhoneView& view, Technology technology, std::size_t most);
+using CellList = std::vector<std::size_t, SmallBlockAllocator<std::size_t>>;
+CellList neighbours(const PhoneView& view, Technology technology, std::size_t most);
 
 }  // namespace qel::sources

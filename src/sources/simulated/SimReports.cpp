@@ -1,6 +1,7 @@
 // The files of the simulated SIM card.
 #include <array>
 
+#include "messages/runtime/MessageReader.h"
 #include "messages/sim.h"
 #include "sources/simulated/Bcd.h"
 #include "sources/simulated/Identities.h"
@@ -110,7 +111,7 @@ std::optional<Bytes> simFiles(const PhoneView& view, std::uint64_t timeMs) {
   KCellularSimCardFiles message;
   message.setTimestamp(timeMs);
   for (const File& row : kFiles) {
-    auto file = std::make_shared<ElementaryFile>();
+    auto file = makeMessage<ElementaryFile>();
     file->setEfId(row.identifier);
     file->setContent(row.content(view));
     message.addEfList(file);

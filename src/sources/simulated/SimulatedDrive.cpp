@@ -55,7 +55,6 @@ void SimulatedDrive::advance() {
   }
   emitChanges(changes, stepMs);
   emitPeriodic(changes, stepMs);
-  std::ranges::stable_sort(_ready, {}, &SourceEvent::timeMs);
   ++_step;
 }
 
@@ -71,13 +70,19 @@ void SimulatedDrive::collectSample() {
 void SimulatedDrive::emit(std::uint32_t metric, std::uint64_t timeMs) {
   auto payload = findReport(metric)->build(view(), timeMs);
   if (!payload) return;
-  _ready.push_back(metricEvent(metric, std::move(*payload), timeMs));
+  add(metricEvent(metric, std::move(*payload), timeMs));
 }
 
 void SimulatedDrive::emit(Trigger trigger, std::uint64_t timeMs) {
-  _ready.push_back({timeMs,
-                    tesk::kEventTrigger,
-                    {{tesk::kKeyTriggerID, std::int64_t{static_cast<std::uint32_t>(trigger)}}}});
+  add({timeMs,
+       tesk::kEventTrigger,
+       {{tesk::kKeyTriggerID, std::int64_t{static_cast<std::uint32_t>(trigger)}}}});
+}
+
+// Behind those of the same time.
+void SimulatedDrive::add(SourceEvent event) {
+  const auto behind = std::ranges::upper_bound(_ready, event.timeMs, {}, &SourceEvent::timeMs);
+  _ready.insert(behind, std::move(event));
 }
 
 // A trigger comes before what it triggers; both come before the step's other reports.

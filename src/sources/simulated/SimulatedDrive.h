@@ -6,6 +6,7 @@
 #include <optional>
 #include <vector>
 
+#include "base/SmallBlocks.h"
 #include "sources/EventSequence.h"
 #include "sources/simulated/Phone.h"
 #include "sources/simulated/RadioScene.h"
@@ -31,6 +32,7 @@ class SimulatedDrive final : public EventSequence {
   void advance();
   void emit(std::uint32_t metric, std::uint64_t timeMs);
   void emit(Trigger trigger, std::uint64_t timeMs);
+  void add(SourceEvent event);
   void emitChanges(const Changes& changes, std::uint64_t stepMs);
   void emitPeriodic(const Changes& changes, std::uint64_t stepMs);
   void collectSample();
@@ -40,7 +42,8 @@ class SimulatedDrive final : public EventSequence {
   RadioScene _scene;
   Phone _phone;
   std::vector<QualitySample> _samples;  // since the last report of them
-  std::deque<SourceEvent> _ready;       // of the last step, in time order
+  // Of the last step, in time order.
+  std::deque<SourceEvent, SmallBlockAllocator<SourceEvent>> _ready;
 };
 
 }  // namespace qel::sources

@@ -1,6 +1,7 @@
 // What the phone reports on UMTS.
 #include "messages/lte_neighbours.h"
 #include "messages/lte_serving.h"
+#include "messages/runtime/MessageReader.h"
 #include "messages/wcdma.h"
 #include "sources/simulated/Reports.h"
 
@@ -64,7 +65,7 @@ std::optional<Bytes> umtsServingMeasurement(const PhoneView& view, std::uint64_t
   message.setTimestamp(timeMs);
   message.setConnectedMode(connected(view));
   for (std::size_t i = 0; i < kAntennas; ++i) {
-    auto receiver = std::make_shared<RxInfo>();
+    auto receiver = makeMessage<RxInfo>();
     receiver->setRssi(rounded(view.signal().antennaRssiDbm[i]));
     receiver->setRsrpRange(rscpIndex(view.signal().antennaDbm[i]));
     receiver->setRsrqRange(ecnoIndex(view.signal().antennaQualityDb[i]));
@@ -77,7 +78,7 @@ std::optional<Bytes> umtsServingMeasurement(const PhoneView& view, std::uint64_t
 std::optional<Bytes> umtsTxPower(const PhoneView& view, std::uint64_t timeMs) {
   if (!view.on(Technology::umts) || !connected(view)) return std::nullopt;
   const double powerDbm = kPowerOverRscpDbm - view.signal().levelDbm;
-  auto power = std::make_shared<TxPowerInfo>();
+  auto power = makeMessage<TxPowerInfo>();
   power->setPuschTxPower(rounded(std::clamp(powerDbm, kLeastPowerDbm, kMostPowerDbm)));
   KCellularWcdmaTxPower message;
   message.setTimestamp(timeMs);
@@ -105,12 +106,12 @@ std::optional<Bytes> umtsSelRes(const PhoneView& view, std::uint64_t timeMs) {
   message.setSCellPrio(own.priority);
   for (const Layer& layer : layers()) {
     if (layer.technology == Technology::lte) {
-      auto frequency = std::make_shared<EutraFreqInfo>();
+      auto frequency = makeMessage<EutraFreqInfo>();
       frequency->setEarfcn(layer.channel);
       frequency->setPrio(layer.priority);
       message.addEutraPrioInfo(frequency);
     } else if (layer.technology == Technology::umts && &layer != &own) {
-      auto frequency = std::make_shared<UtraFreqInfo>();
+      auto frequency = makeMessage<UtraFreqInfo>();
       frequency->setUarfcn(layer.channel);
       frequency->setPrio(layer.priority);
       message.addUtraPrioInfo(frequency);
@@ -118,7 +119,7 @@ std::optional<Bytes> umtsSelRes(const PhoneView& view, std::uint64_t timeMs) {
   }
   for (const Cell& cell : cells()) {
     if (layerOf(cell).technology != Technology::gsm || cell.area != view.cell().area) continue;
-    auto frequency = std::make_shared<GsmFreqInfo>();
+    auto frequency = makeMessage<GsmFreqInfo>();
     frequency->setArfcn(cell.channel);
     frequency->setPrio(layerOf(cell).priority);
     message.addGsmPrioInfo(frequency);
@@ -131,7 +132,7 @@ std::optional<Bytes> umtsNeighbours(const PhoneView& view, std::uint64_t timeMs)
   KCellularWcdmaNbrCellMeas message;
   message.setTimestamp(timeMs);
   for (const std::size_t cell : neighbours(view, Technology::umts, kMostNeighbours)) {
-    auto entry = std::make_shared<UtraCellMeasResult>();
+    auto entry = makeMessage<UtraCellMeasResult>();
     entry->setUarfcn(cells()[cell].channel);
     entry->setBand(layerOf(cells()[cell]).band);
     entry->setPsc(cells()[cell].code);
@@ -140,14 +141,14 @@ std::optional<Bytes> umtsNeighbours(const PhoneView& view, std::uint64_t timeMs)
     message.addMeasUtraResult(entry);
   }
   for (const std::size_t cell : neighbours(view, Technology::gsm, kMostNeighbours)) {
-    auto entry = std::make_shared<GsmCellMeasResult>();
+    auto entry = makeMessage<GsmCellMeasResult>();
     entry->setArfcn(cells()[cell].channel);
     entry->setBsic(cells()[cell].code);
     entry->setRxlev(rxlevIndex(view.scene.of(cell).levelDbm));
     message.addMeasGsmResult(entry);
   }
   for (const std::size_t cell : neighbours(view, Technology::lte, kMostNeighbours)) {
-    auto entry = std::make_shared<LteCellMeasResult>();
+    auto entry = makeMessage<LteCellMeasResult>();
     entry->setEarfcn(cells()[cell].channel);
     entry->setPhyCellId(cells()[cell].code);
     entry->setEutraBand(layerOf(cells()[cell]).band);

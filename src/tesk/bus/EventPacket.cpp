@@ -5,6 +5,7 @@
 #include <memory>
 
 #include "messages/event_packet.h"
+#include "messages/runtime/MessageReader.h"
 #include "tesk/Constants.h"
 
 namespace tesk::bus {
@@ -23,7 +24,7 @@ constexpr std::array kStreams = {Stream{1, kEventMetric}, Stream{2, kEventTrigge
 
 // Nothing for a value of a kind that does not travel.
 std::shared_ptr<EventEntry> entryOf(const Dictionary::Entry& from) {
-  auto entry = std::make_shared<EventEntry>();
+  auto entry = qel::makeMessage<EventEntry>();
   entry->setKey(std::string(from.key.view()));
   if (const auto boolean = from.value.asBoolean()) {
     entry->setBoolean(*boolean);

@@ -1,6 +1,7 @@
 #include "sources/diagnostics/gsm/GsmReports.h"
 
 #include "messages/gsm.h"
+#include "messages/runtime/MessageReader.h"
 #include "radio/Levels.h"
 #include "sources/Filling.h"
 
@@ -149,7 +150,7 @@ std::optional<Bytes> gsmNeighboursReport(const Picture& picture, std::uint64_t t
   KCellularGsmGrrEventMeasCr message;
   message.setTimestamp(timeMs);
   for (const GsmNeighbour& cell : *neighbours) {
-    auto entry = std::make_shared<GsmNcellMeas>();
+    auto entry = makeMessage<GsmNcellMeas>();
     entry->setArfcn(cell.arfcn);
     set(*entry, &GsmNcellMeas::setBsic, cell.bsic);
     entry->setRxlev(rxlevIndex(cell.levelDbm));

@@ -4,6 +4,7 @@
 
 #include "messages/lte_neighbours.h"
 #include "messages/lte_serving.h"
+#include "messages/runtime/MessageReader.h"
 #include "radio/Bands.h"
 #include "radio/Levels.h"
 #include "sources/Filling.h"
@@ -40,7 +41,7 @@ void setLevels(const LteAntennas& antennas, SecondaryComponentCarrier& entry) {
 }
 
 std::shared_ptr<SecondaryComponentCarrier> entryOf(const SecondaryCarrier& carrier) {
-  auto entry = std::make_shared<SecondaryComponentCarrier>();
+  auto entry = makeMessage<SecondaryComponentCarrier>();
   entry->setIndex(carrier.index);
   entry->setState(carrier.active.value_or(false) ? kActivated : kConfigured);
   set(*entry, &SecondaryComponentCarrier::setPci, carrier.pci);
@@ -125,7 +126,7 @@ std::optional<Bytes> lteNeighbours(const Picture& picture, std::uint64_t timeMs)
   bool any = false;
   for (const LteNeighbour& neighbour : picture.lte.neighbours.cells()) {
     if (neighbour.cell == picture.lte.measuredFrom) continue;
-    auto entry = std::make_shared<EgwErrcNbrEutraMeas>();
+    auto entry = makeMessage<EgwErrcNbrEutraMeas>();
     entry->setNbrPhysCellId(neighbour.cell.pci);
     if (neighbour.cell.earfcn != kUnknownEarfcn) {
       entry->setNbrEarfcn(neighbour.cell.earfcn);

@@ -4,6 +4,7 @@
 #include <memory>
 
 #include "messages/lte_neighbours.h"
+#include "messages/runtime/MessageReader.h"
 #include "sources/Filling.h"
 #include "sources/Metrics.h"
 
@@ -66,7 +67,7 @@ void note(LteOther other, std::uint64_t timeMs, std::vector<LteOther>& cells) {
 }
 
 void addUmts(const LteOther& other, KCellularLteNbrInterRatCellMeas& report) {
-  auto entry = std::make_shared<EgwErrcNbrUtraMeas>();
+  auto entry = makeMessage<EgwErrcNbrUtraMeas>();
   set(*entry, &EgwErrcNbrUtraMeas::setUarfcn, other.channel);
   entry->setPsc(other.code);
   set(*entry, &EgwErrcNbrUtraMeas::setRscp, other.level);
@@ -75,7 +76,7 @@ void addUmts(const LteOther& other, KCellularLteNbrInterRatCellMeas& report) {
 }
 
 void addGsm(const LteOther& other, KCellularLteNbrInterRatCellMeas& report) {
-  auto entry = std::make_shared<EgwErrcNbrGeranMeas>();
+  auto entry = makeMessage<EgwErrcNbrGeranMeas>();
   set(*entry, &EgwErrcNbrGeranMeas::setArfcn, other.channel);
   entry->setBsic(other.code);
   set(*entry, &EgwErrcNbrGeranMeas::setRxlev, other.level);

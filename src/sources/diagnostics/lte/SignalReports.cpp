@@ -3,6 +3,7 @@
 #include <memory>
 
 #include "messages/lte_serving.h"
+#include "messages/runtime/MessageReader.h"
 #include "radio/Levels.h"
 #include "sources/Filling.h"
 
@@ -16,7 +17,7 @@ void addReceivers(const LteAntennas& antennas, KCellularLteServingCellMeasuremen
   std::size_t count = antennas.size();
   while (count > 0 && !antennas[count - 1]) --count;
   for (std::size_t i = 0; i < count; ++i) {
-    auto receiver = std::make_shared<RxInfo>();
+    auto receiver = makeMessage<RxInfo>();
     if (const auto& antenna = antennas[i]) {
       receiver->setRssi(rounded(antenna->rssiDbm));
       receiver->setRsrpRange(rsrpIndex(antenna->rsrpDbm));
@@ -29,7 +30,7 @@ void addReceivers(const LteAntennas& antennas, KCellularLteServingCellMeasuremen
 
 // All antennas as one receiver.
 void addTogether(const LteLevel& level, KCellularLteServingCellMeasurement& message) {
-  auto receiver = std::make_shared<RxInfo>();
+  auto receiver = makeMessage<RxInfo>();
   if (level.rssiDbm) receiver->setRssi(rounded(*level.rssiDbm));
   receiver->setRsrpRange(rsrpIndex(level.rsrpDbm));
   receiver->setRsrqRange(rsrqIndex(level.rsrqDb));
@@ -45,7 +46,7 @@ std::optional<bool> isConnected(const LtePicture& lte) {
 }
 
 std::shared_ptr<RsrpRsrqSinr> sampleOf(const LteSignal& signal) {
-  auto sample = std::make_shared<RsrpRsrqSinr>();
+  auto sample = makeMessage<RsrpRsrqSinr>();
   sample->setPhyCellId(signal.cell.pci);
   if (const auto& antenna = signal.antennas[0]) {
     sample->setRsrp0(rounded(antenna->rsrpDbm));
@@ -63,7 +64,7 @@ std::shared_ptr<RsrpRsrqSinr> sampleOf(const LteSignal& signal) {
 void addPower(const LteTransmissions& transmissions, void (TxPowerInfo::*setPower)(std::int32_t),
               KCellularLteTxPower& message) {
   for (const LteTransmission& transmission : transmissions.list) {
-    auto entry = std::make_shared<TxPowerInfo>();
+    auto entry = makeMessage<TxPowerInfo>();
     ((*entry).*setPower)(transmission.powerDbm);
     entry->setSubframeIndex(transmission.subframe);
     message.addTxPowerInfo(entry);

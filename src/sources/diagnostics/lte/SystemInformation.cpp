@@ -4,6 +4,7 @@
 #include <memory>
 
 #include "messages/lte_serving.h"
+#include "messages/runtime/MessageReader.h"
 #include "radio/Bands.h"
 #include "sources/Filling.h"
 #include "sources/Metrics.h"
@@ -75,7 +76,7 @@ void add(const Sib3& sib, Rules& report) {
 bool isTdd(unsigned band) { return (band >= 33 && band <= 54); }
 
 std::shared_ptr<NbrEutra> entryOf(const EutraCarrier& carrier) {
-  auto entry = std::make_shared<NbrEutra>();
+  auto entry = makeMessage<NbrEutra>();
   entry->setEarfcn(carrier.earfcn);
   entry->setQRxlevMin(carrier.qRxLevMin * kStepDb);
   set(*entry, &NbrEutra::setQQualMin, carrier.qQualMinDb);

@@ -3,6 +3,7 @@
 #include <memory>
 
 #include "messages/nas.h"
+#include "messages/runtime/MessageReader.h"
 #include "sources/Filling.h"
 
 namespace qel::diagnostics {
@@ -16,21 +17,21 @@ constexpr std::int32_t kPdpIPv6 = 1;
 std::int32_t addressType(const Bytes& address) { return address.size() == 4 ? kPdpIPv4 : kPdpIPv6; }
 
 std::shared_ptr<KCellularTrackingAreaId> message(const TrackingArea& area) {
-  auto entry = std::make_shared<KCellularTrackingAreaId>();
+  auto entry = makeMessage<KCellularTrackingAreaId>();
   entry->setEncodedPlmn(bytesOf(area.plmn));
   entry->setTac(area.tac);
   return entry;
 }
 
 std::shared_ptr<KCellularLocationAreaId> message(const LocationArea& area) {
-  auto entry = std::make_shared<KCellularLocationAreaId>();
+  auto entry = makeMessage<KCellularLocationAreaId>();
   entry->setEncodedPlmn(bytesOf(area.plmn));
   entry->setLac(area.lac);
   return entry;
 }
 
 std::shared_ptr<Guti> message(const TemporaryIdentity& identity) {
-  auto entry = std::make_shared<Guti>();
+  auto entry = makeMessage<Guti>();
   entry->setMmegi(identity.group);
   entry->setMmec(identity.entity);
   entry->setMTmsi(identity.mTmsi);
@@ -38,7 +39,7 @@ std::shared_ptr<Guti> message(const TemporaryIdentity& identity) {
 }
 
 std::shared_ptr<BearerContext> message(const PacketConnection& connection) {
-  auto entry = std::make_shared<BearerContext>();
+  auto entry = makeMessage<BearerContext>();
   entry->setNsapi(connection.nsapi);
   if (!connection.apn.empty()) entry->setApn(connection.apn);
   set(*entry, &BearerContext::setPdpType, connection.type);
@@ -95,7 +96,7 @@ std::optional<Bytes> networksAndAreas(const Picture& picture, std::uint64_t time
   report.setTimestamp(timeMs);
   if (!common.imsi.empty()) report.setImsi(common.imsi);
   for (const PlmnCode& network : common.equivalents.value_or(std::vector<PlmnCode>{})) {
-    auto entry = std::make_shared<Plmn>();
+    auto entry = makeMessage<Plmn>();
     entry->setEncodedPlmn(bytesOf(network));
     report.addEplmnList(entry);
   }

@@ -3,6 +3,7 @@
 #include <memory>
 
 #include "messages/nas.h"
+#include "messages/runtime/MessageReader.h"
 #include "sources/Filling.h"
 
 namespace qel::diagnostics {
@@ -32,7 +33,7 @@ std::optional<Bytes> mmContext(const Picture& picture, std::uint64_t timeMs) {
   set(message, &Context::setRegStatus, mm.registration);
   set(message, &Context::setUpdateStatus, mm.updateStatus);
   if (mm.area) {
-    auto area = std::make_shared<KCellularLocationAreaId>();
+    auto area = makeMessage<KCellularLocationAreaId>();
     area->setEncodedPlmn(bytesOf(mm.area->plmn));
     area->setLac(mm.area->lac);
     message.setLai(area);
@@ -54,7 +55,7 @@ std::optional<Bytes> gmmContext(const Picture& picture, std::uint64_t timeMs) {
   set(message, &Context::setRegStatus, gmm.registration);
   set(message, &Context::setUpdateStatus, gmm.updateStatus);
   if (gmm.area) {
-    auto area = std::make_shared<RoutingAreaId>();
+    auto area = makeMessage<RoutingAreaId>();
     area->setEncodedPlmn(bytesOf(gmm.area->location.plmn));
     area->setLac(gmm.area->location.lac);
     area->setRac(gmm.area->rac);

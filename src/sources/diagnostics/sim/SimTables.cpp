@@ -3,6 +3,7 @@
 #include <array>
 #include <memory>
 
+#include "messages/runtime/MessageReader.h"
 #include "messages/sim.h"
 #include "sources/Metrics.h"
 #include "sources/diagnostics/sim/CardTraceLog.h"
@@ -15,7 +16,7 @@ std::optional<Bytes> simFiles(const Picture& picture, std::uint64_t timeMs) {
   KCellularSimCardFiles message;
   message.setTimestamp(timeMs);
   for (const SimFile& file : picture.sim.files) {
-    auto entry = std::make_shared<ElementaryFile>();
+    auto entry = makeMessage<ElementaryFile>();
     entry->setEfId(file.identifier);
     entry->setContent(file.content);
     message.addEfList(entry);

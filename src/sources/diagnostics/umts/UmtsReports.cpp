@@ -5,6 +5,7 @@
 
 #include "messages/lte_neighbours.h"
 #include "messages/lte_serving.h"
+#include "messages/runtime/MessageReader.h"
 #include "messages/wcdma.h"
 #include "radio/Bands.h"
 #include "radio/Levels.h"
@@ -30,7 +31,7 @@ std::optional<double> valueOf(const std::optional<UmtsLevel>& level) {
 
 // RSCP and Ec/No stand, as their own indexes, where LTE has RSRP and RSRQ.
 std::shared_ptr<RxInfo> receiverOf(const UmtsSignal& signal, std::size_t receiver) {
-  auto info = std::make_shared<RxInfo>();
+  auto info = makeMessage<RxInfo>();
   const auto& rssiDbm = signal.rssiDbm[receiver];
   if (rssiDbm) info->setRssi(rounded(rssiDbm->value));
   if (receiver != 0) return rssiDbm ? info : nullptr;
@@ -40,7 +41,7 @@ std::shared_ptr<RxInfo> receiverOf(const UmtsSignal& signal, std::size_t receive
 }
 
 void add(const UmtsNeighbour& cell, KCellularWcdmaNbrCellMeas& message) {
-  auto entry = std::make_shared<UtraCellMeasResult>();
+  auto entry = makeMessage<UtraCellMeasResult>();
   entry->setUarfcn(cell.uarfcn);
   entry->setPsc(cell.scramblingCode);
   entry->setEcno(ecnoIndex(cell.ecnoDb));
@@ -49,7 +50,7 @@ void add(const UmtsNeighbour& cell, KCellularWcdmaNbrCellMeas& message) {
 }
 
 void add(const UmtsGsmNeighbour& cell, KCellularWcdmaNbrCellMeas& message) {
-  auto entry = std::make_shared<GsmCellMeasResult>();
+  auto entry = makeMessage<GsmCellMeasResult>();
   entry->setArfcn(cell.arfcn);
   set(*entry, &GsmCellMeasResult::setBsic, cell.bsic);
   entry->setRxlev(rxlevIndex(cell.levelDbm));
@@ -59,7 +60,7 @@ void add(const UmtsGsmNeighbour& cell, KCellularWcdmaNbrCellMeas& message) {
 template <class Info>
 std::shared_ptr<Info> prioritised(const UmtsFrequency& frequency,
                                   void (Info::*setChannel)(std::uint32_t)) {
-  auto info = std::make_shared<Info>();
+  auto info = makeMessage<Info>();
   (info.get()->*setChannel)(frequency.channel);
   set(*info, &Info::setPrio, frequency.priority);
   return info;
@@ -147,7 +148,7 @@ std::optional<Bytes> umtsSignal(const Picture& picture, std::uint64_t timeMs) {
 std::optional<Bytes> umtsTransmitPower(const Picture& picture, std::uint64_t timeMs) {
   const auto& transmitDbm = picture.umts.transmitDbm;
   if (!transmitDbm) return std::nullopt;
-  auto power = std::make_shared<TxPowerInfo>();
+  auto power = makeMessage<TxPowerInfo>();
   power->setPuschTxPower(rounded(transmitDbm->value));
   KCellularWcdmaTxPower message;
   message.setTimestamp(timeMs);
