@@ -57,6 +57,8 @@ void WatchAtPty::type(const std::string& keys) const {
   if (::write(_master, keys.data(), keys.size()) < 0) throw std::runtime_error("nothing typed");
 }
 
+void WatchAtPty::holdOutput() const { ::tcflow(_slave, TCOOFF); }
+
 void WatchAtPty::hangUp() {
   ::close(std::exchange(_slave, -1));
   ::close(std::exchange(_master, -1));

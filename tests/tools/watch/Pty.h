@@ -20,6 +20,8 @@ class WatchAtPty {
 
   void signal(int number) const;
   void type(const std::string& keys) const;
+  // The terminal takes nothing more, as after Ctrl-S.
+  void holdOutput() const;
   // The terminal goes away, as when a connection breaks.
   void hangUp();
 
