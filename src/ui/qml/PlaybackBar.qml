@@ -2,13 +2,14 @@ import QtQuick
 import Qelwatch.Ui
 
 // The moment of an opened recording that every screen shows, and how it moves; before that, how far
-// it is opened.
+// it is opened. Where it is wide it is low, as such screens are.
 Rectangle {
     id: bar
 
     required property PlaybackModel playback
 
     readonly property real inset: Theme.inset(width)
+    readonly property bool wide: width >= 560
 
     implicitHeight: playback.opening || playback.opened ? column.height + 8 : 0
     visible: implicitHeight > 0
@@ -47,7 +48,10 @@ Rectangle {
             }
             TextButton {
                 id: giveUp
-                anchors.right: parent.right
+                anchors {
+                    right: parent.right
+                    rightMargin: -8
+                }
                 text: qsTr("Cancel")
                 onTapped: bar.playback.giveUpOpening()
             }
@@ -70,14 +74,17 @@ Rectangle {
             }
             TextButton {
                 id: close
-                anchors.right: parent.right
+                anchors {
+                    right: parent.right
+                    rightMargin: -8
+                }
                 text: qsTr("Close")
                 onTapped: bar.playback.close()
             }
         }
         Scrubber {
             width: parent.width
-            visible: bar.playback.opened
+            visible: bar.playback.opened && !bar.wide
             playback: bar.playback
         }
         Item {
@@ -112,13 +119,24 @@ Rectangle {
                     onTapped: bar.playback.nextSpeed()
                 }
             }
+            Scrubber {
+                anchors {
+                    left: buttons.right
+                    leftMargin: 8
+                    right: place.left
+                    rightMargin: Theme.margin
+                    verticalCenter: buttons.verticalCenter
+                }
+                visible: bar.wide
+                playback: bar.playback
+            }
             Small {
                 id: place
                 anchors {
-                    left: buttons.right
                     right: parent.right
                     verticalCenter: buttons.verticalCenter
                 }
+                width: bar.wide ? implicitWidth : parent.width - buttons.x - buttons.width
                 text: bar.playback.positionText
                 horizontalAlignment: Text.AlignRight
                 wrapMode: Text.Wrap

@@ -11,7 +11,7 @@ Item {
         playback.jumpTo((x - knob.width / 2) / Math.max(1, width - knob.width));
     }
 
-    implicitHeight: 36
+    implicitHeight: Theme.touch
     activeFocusOnTab: true
 
     Accessible.role: Accessible.Slider
