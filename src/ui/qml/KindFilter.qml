@@ -2,20 +2,17 @@ import QtQuick
 import Qelwatch.Ui
 
 // The kinds of happenings, of which any may be chosen; none chosen shows them all.
-ListView {
+Flickable {
     id: filter
 
     required property HappeningsModel happenings
+    property alias count: choices.count
 
     implicitHeight: Math.max(Theme.touch, Math.round(metrics.height) + 2 * Theme.padding)
-    orientation: ListView.Horizontal
+    contentWidth: strip.width
+    flickableDirection: Flickable.HorizontalFlick
     boundsBehavior: Flickable.StopAtBounds
-    leftMargin: Theme.inset(width) - 8
-    rightMargin: leftMargin
-    onLeftMarginChanged: positionViewAtBeginning()  // the screen was turned
-    spacing: 4
     clip: true
-    model: happenings.kinds
     Accessible.role: Accessible.List
     Accessible.name: qsTr("Kinds to show")
 
@@ -25,60 +22,77 @@ ListView {
         font.pointSize: Theme.nameSize
     }
 
-    // qmllint disable unqualified
-    delegate: Tappable {
-        id: choice
+    Row {
+        id: strip
+        leftPadding: Theme.inset(filter.width) - 8
+        rightPadding: leftPadding
+        spacing: 4
 
-        required property var row
-        readonly property bool chosen: filter.happenings.filtered && row.shown
+        Repeater {
+            id: choices
+            model: filter.happenings.kinds
 
-        width: Math.ceil(label.x + label.implicitWidth) + 14
-        height: filter.implicitHeight
-        text: row.name
-        activeFocusOnTab: true
-        onTapped: filter.happenings.toggle(row.kind)
+            // qmllint disable unqualified
+            Tappable {
+                id: choice
 
-        Accessible.role: Accessible.CheckBox
-        Accessible.name: qsTr("%1, %2").arg(row.name).arg(row.count)
-        Accessible.checkable: true
-        Accessible.checked: chosen
+                required property var row
+                readonly property bool chosen: filter.happenings.filtered && row.shown
 
-        Rectangle {
-            anchors {
-                fill: parent
-                topMargin: 8
-                bottomMargin: 8
+                width: Math.ceil(label.x + label.implicitWidth) + 14
+                height: filter.implicitHeight
+                text: row.name
+                activeFocusOnTab: true
+                onActiveFocusChanged: {
+                    const wanted = x + (width - filter.width) / 2;
+                    if (activeFocus)
+                        filter.contentX = Math.max(0, Math.min(filter.contentWidth - filter.width, wanted));
+                }
+                onTapped: filter.happenings.toggle(row.kind)
+
+                Accessible.role: Accessible.CheckBox
+                Accessible.name: qsTr("%1, %2").arg(row.name).arg(row.count)
+                Accessible.checkable: true
+                Accessible.checked: chosen
+
+                Rectangle {
+                    anchors {
+                        fill: parent
+                        topMargin: 8
+                        bottomMargin: 8
+                    }
+                    radius: height / 2
+                    color: choice.chosen ? Theme.accent : "transparent"
+                    border {
+                        width: 1
+                        color: choice.chosen ? Theme.accent : Theme.separator
+                    }
+                }
+                HappeningSign {
+                    id: sign
+                    x: 12
+                    y: Math.round((choice.height - height) / 2)
+                    kind: choice.row.kind
+                    color: choice.chosen ? Theme.page : Theme.value
+                }
+                Text {
+                    id: label
+                    anchors {
+                        left: sign.right
+                        leftMargin: 6
+                        verticalCenter: parent.verticalCenter
+                    }
+                    text: choice.row.name + " " + choice.row.count
+                    textFormat: Text.PlainText
+                    color: choice.chosen ? Theme.page : Theme.value
+                    font.pointSize: Theme.nameSize
+                    Accessible.ignored: true
+                }
+                FocusRing {
+                    visible: choice.activeFocus && Appearance.keyboardInUse
+                }
             }
-            radius: height / 2
-            color: choice.chosen ? Theme.accent : "transparent"
-            border {
-                width: 1
-                color: choice.chosen ? Theme.accent : Theme.separator
-            }
-        }
-        HappeningSign {
-            id: sign
-            x: 12
-            y: Math.round((choice.height - height) / 2)
-            kind: choice.row.kind
-            color: choice.chosen ? Theme.page : Theme.value
-        }
-        Text {
-            id: label
-            anchors {
-                left: sign.right
-                leftMargin: 6
-                verticalCenter: parent.verticalCenter
-            }
-            text: choice.row.name + " " + choice.row.count
-            textFormat: Text.PlainText
-            color: choice.chosen ? Theme.page : Theme.value
-            font.pointSize: Theme.nameSize
-            Accessible.ignored: true
-        }
-        FocusRing {
-            visible: choice.activeFocus && Appearance.keyboardInUse
+            // qmllint enable unqualified
         }
     }
-    // qmllint enable unqualified
 }
