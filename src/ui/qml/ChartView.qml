@@ -74,8 +74,8 @@ FocusScope {
             text: view.reading
                   ? view.curves.readOff.time + "  "
                     + view.values.slice(0, 3).map(value => (value.label + " " + value.text).trim()).join("  ")
-                  : ((view.newest.figure ?? "") + " " + (view.facts.unit ?? "") + "  "
-                     + (view.newest.word ?? "")).trim()
+                  : !view.newest.figure ? ""
+                  : view.newest.figure + " " + (view.facts.unit ?? "") + "  " + (view.newest.word ?? "")
             textFormat: Text.PlainText
             color: Theme.value
             font.family: Theme.fixedFamily

@@ -1,7 +1,8 @@
 import QtQuick
 import Qelwatch.Ui
 
-// One happening: when, what, and the record that told it.
+// One happening: when, what, and the record that told it; the words below the time where large text
+// leaves no room beside it.
 Rectangle {
     id: line
 
@@ -9,10 +10,13 @@ Rectangle {
     required property int index
 
     readonly property real inset: Theme.inset(width)
+    readonly property real besideTime: sign.x + sign.width + 8 + time.width + Theme.padding
+    readonly property bool beside: width - inset - besideTime >= 1.75 * time.width
+    readonly property real above: beside ? 0 : time.height + 2
     readonly property bool isCurrent: ListView.isCurrentItem && ((ListView.view as RowList)?.keysHere ?? false)
 
     width: ListView.view?.width ?? 0
-    implicitHeight: Math.max(Theme.touch, texts.height + 2 * Theme.padding - 4)
+    implicitHeight: Math.max(Theme.touch, above + texts.height + 2 * Theme.padding - 4)
     color: Theme.row
 
     Accessible.role: Accessible.ListItem
@@ -23,7 +27,7 @@ Rectangle {
     HappeningSign {
         id: sign
         x: line.inset
-        y: texts.y + Math.round((time.height - height) / 2)
+        y: time.y + Math.round((time.height - height) / 2)
         kind: line.row.kind
     }
     Text {
@@ -32,7 +36,7 @@ Rectangle {
             left: sign.right
             leftMargin: 8
         }
-        y: texts.y
+        y: texts.y - line.above
         text: line.row.time
         textFormat: Text.PlainText
         color: Theme.secondary
@@ -42,13 +46,9 @@ Rectangle {
     }
     Column {
         id: texts
-        anchors {
-            left: time.right
-            leftMargin: Theme.padding
-            right: parent.right
-            rightMargin: line.inset
-            verticalCenter: parent.verticalCenter
-        }
+        x: line.beside ? line.besideTime : line.inset
+        y: Math.round((line.height + line.above - height) / 2)
+        width: line.width - x - line.inset
         spacing: 2
 
         Text {

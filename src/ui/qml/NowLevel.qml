@@ -84,10 +84,12 @@ Column {
                 Text {
                     required property var modelData
 
+                    width: Math.min(implicitWidth, parent.width)
                     text: modelData.name + " " + modelData.figure + " " + modelData.unit
                     textFormat: Text.PlainText
                     color: Theme.secondary
                     font.pointSize: Theme.nameSize
+                    wrapMode: Text.Wrap
                     Accessible.ignored: true
                 }
             }

@@ -1,7 +1,8 @@
 import QtQuick
 import Qelwatch.Ui
 
-// A recording: a tap opens it, the button at the right deletes it.
+// A recording: a tap opens it, the button at the right deletes it. That stands below where large text
+// leaves no room beside it.
 Tappable {
     id: line
 
@@ -10,13 +11,14 @@ Tappable {
 
     readonly property real inset: Theme.inset(width)
     readonly property bool isCurrent: ListView.isCurrentItem && ((ListView.view as RowList)?.keysHere ?? false)
+    readonly property bool beside: title.implicitWidth <= width - 2 * inset - remove.width
     readonly property string facts:
         [row.length, row.size, row.cells].filter(part => part).join("  \u00B7  ")
 
     signal deleted
 
     width: ListView.view?.width ?? 0
-    implicitHeight: Math.max(Theme.touch + 8, texts.height + 2 * Theme.padding)
+    implicitHeight: Math.max(Theme.touch + 8, texts.height + 2 * Theme.padding + (beside ? 0 : remove.height))
     text: row.title
 
     Accessible.role: Accessible.ListItem
@@ -34,22 +36,19 @@ Tappable {
     }
     Column {
         id: texts
-        anchors {
-            left: parent.left
-            leftMargin: line.inset
-            right: remove.left
-            rightMargin: 8
-            verticalCenter: parent.verticalCenter
-        }
+        x: line.inset
+        y: line.beside ? Math.round((line.height - height) / 2) : Theme.padding
+        width: line.width - 2 * x - (line.beside ? remove.width : 0)
         spacing: 2
 
         Text {
+            id: title
             width: parent.width
             text: line.row.title
             textFormat: Text.PlainText
             color: Theme.value
             font.pointSize: Theme.valueSize
-            wrapMode: Text.WrapAnywhere
+            wrapMode: Text.Wrap
             Accessible.ignored: true
         }
         Text {
@@ -78,8 +77,8 @@ Tappable {
         anchors {
             right: parent.right
             rightMargin: line.inset - 8
-            verticalCenter: parent.verticalCenter
         }
+        y: line.beside ? Math.round((line.height - height) / 2) : texts.y + texts.height
         width: visible ? implicitWidth : 0
         visible: !line.row.growing
         text: qsTr("Delete")

@@ -59,6 +59,7 @@ Screen {
         Column {
             width: list.width
             topPadding: Theme.padding
+            bottomPadding: 8
 
             PageLine {
                 text: screen.recorder.recording ? screen.recorder.text : screen.recorder.outcome

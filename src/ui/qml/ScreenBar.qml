@@ -53,7 +53,10 @@ Rectangle {
         textFormat: Text.PlainText
         color: Theme.value
         font: bar.crowded ? small.font : metrics.font
-        wrapMode: Text.Wrap
+        // A single word cannot take another line.
+        wrapMode: text.includes(" ") ? Text.Wrap : Text.NoWrap
+        fontSizeMode: text.includes(" ") ? Text.FixedSize : Text.HorizontalFit
+        minimumPointSize: Theme.nameSize
         Accessible.role: Accessible.Heading
         Accessible.name: bar.subtitle === "" ? bar.title : bar.title + ", " + bar.subtitle
     }

@@ -64,7 +64,7 @@ Screen {
                 Item {
                     x: screen.inset
                     width: parent.width - 2 * x
-                    height: Math.max(zoomRow.height, span.height)
+                    height: Math.max(zoomRow.height, span.height + 8)
                     visible: screen.curves.chartCount > 0
 
                     Text {

@@ -43,7 +43,7 @@ QtObject {
     // Lines longer than that are hard to follow on a desktop.
     readonly property int contentWidth: 640
     readonly property int hairline: 1
-    readonly property real chartHeight: Math.round(166 + 140 * (Appearance.textScale - 1))
+    readonly property real chartHeight: Math.round(166 * Appearance.textScale)
 
     readonly property int pressMs: 80
     // A second tap so soon after a screen came was meant for the screen before.
