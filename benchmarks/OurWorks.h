@@ -12,7 +12,9 @@ Step encodeOurs(const std::vector<Payload>& payloads);
 Step textOurs(const std::vector<Payload>& payloads);
 Step timeOurs(const std::vector<Payload>& payloads);
 Step eventOurs(const std::vector<Payload>& payloads);
-// The same with a history that listens, at 100 events a second.
+// The same, and every list of the screens is looked at after each event.
+Step eventLookedAt(const std::vector<Payload>& payloads);
+// The first with a history that listens, at 100 events a second.
 Step eventWithHistory(const std::vector<Payload>& payloads);
 
 // When each was reported, in milliseconds; those that do not say so, at the start of a drawn mix.

@@ -50,7 +50,8 @@ const std::vector<Group>& groups() {
        {{"libprotobuf, message and line kept", eventStock},
         {"protozero, struct and line kept", eventProtozero},
         {"libprotobuf, std::map, streams", eventNaive},
-        {"ours", eventOurs}}},
+        {"ours", eventOurs},
+        {"ours, all lists looked at", eventLookedAt}}},
       {"one metric event, and what is kept of it",
        {{"ours without history", eventOurs}, {"ours with history", eventWithHistory}}},
   };
