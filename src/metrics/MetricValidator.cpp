@@ -1,7 +1,6 @@
 #include "metrics/MetricValidator.h"
 
-#include <algorithm>
-#include <bit>
+#include <array>
 #include <string>
 
 #include "base/FatalError.h"
@@ -13,10 +12,16 @@ namespace {
 
 // "%2X" of a 64-bit integer.
 void appendHexadecimal(std::string& out, std::int64_t number) {
-  const auto left = static_cast<std::uint64_t>(number);
-  if (left < 16) out += ' ';
-  const int digits = std::max(1, (static_cast<int>(std::bit_width(left)) + 3) / 4);
-  for (int i = digits - 1; i >= 0; --i) out += "0123456789ABCDEF"[left >> 4 * i & 0xF];
+  std::array<char, 16> digits;
+  char* const end = digits.data() + digits.size();
+  char* first = end;
+  auto left = static_cast<std::uint64_t>(number);
+  do {
+    *--first = "0123456789ABCDEF"[left & 0xF];
+    left >>= 4;
+  } while (left != 0);
+  if (end - first < 2) out += ' ';
+  out.append(first, end);
 }
 
 [[noreturn]] void refusePayload(std::int64_t identifier) {
