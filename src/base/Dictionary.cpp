@@ -41,11 +41,12 @@ const Value* Dictionary::find(std::string_view key) const {
 }
 
 Value* Dictionary::find(std::string_view key) {
-  return const_cast<Value*>(std::as_const(*this).find(key));
+  const Entry* found = search(*this, key);
+  return found == end() ? nullptr : &_entries[static_cast<std::size_t>(found - begin())].value;
 }
 
 Value* Dictionary::find(std::string_view key, std::size_t& place) {
-  if (place >= size() || !isUnder(_entries[place], key)) {
+  if (place >= size() || !isUnder(begin()[place], key)) {
     const Entry* found = search(*this, key);
     if (found == end()) return nullptr;
     place = static_cast<std::size_t>(found - begin());

@@ -2,7 +2,10 @@
 #pragma once
 
 #include <algorithm>
+#include <bit>
+#include <concepts>
 #include <cstdint>
+#include <cstring>
 #include <initializer_list>
 #include <iterator>
 #include <memory>
@@ -15,10 +18,21 @@
 
 namespace qel {
 
+// An element that tells whether it owns anything beyond its own bytes. It may be moved byte for
+// byte, copied so while it owns nothing, and then needs no end.
+template <class T>
+concept TellsWhatItOwns = requires(const T& element) {
+  { element.ownsNothing() } -> std::same_as<bool>;
+};
+
 // As std::vector in what it has of it, but smaller, with its memory from SmallBlocks. May be held
-// by a type that is not yet complete. No more than 2^32 - 1 elements.
+// by a type that is not yet complete. No more than 2^31 - 1 elements. While all elements own
+// nothing and nobody could have changed one, they are copied as one piece and ended without a look
+// at each.
 template <class T>
 class Sequence {
+  struct Block;
+
  public:
   using value_type = T;
   using const_iterator = const T*;
@@ -35,7 +49,16 @@ class Sequence {
     reserve(count);
     for (std::size_t i = 0; i < count; ++i) push_back(element);
   }
-  Sequence(const Sequence& other) : Sequence(other.begin(), other.end()) {}
+  Sequence(const Sequence& other) {
+    if (other.empty()) return;
+    if (other.ownsNothing()) {
+      _block = take(other.size());
+      moveBytes(_block, other._block);
+    } else {
+      Filling filling(*this, other.size());
+      for (const T& element : other) filling.append(element);
+    }
+  }
   Sequence(Sequence&& other) noexcept : _block(std::exchange(other._block, nullptr)) {}
   Sequence& operator=(Sequence other) noexcept {
     std::swap(_block, other._block);
@@ -47,7 +70,7 @@ class Sequence {
 
   std::size_t size() const { return _block ? _block->size : 0; }
   bool empty() const { return size() == 0; }
-  T* begin() { return _block ? elements(_block) : nullptr; }
+  T* begin() { return _block ? changed() : nullptr; }
   T* end() { return begin() + size(); }
   const T* begin() const { return _block ? elements(_block) : nullptr; }
   const T* end() const { return begin() + size(); }
@@ -70,13 +93,22 @@ class Sequence {
       grow(count);
     }
   }
+  // The same where there is no memory yet.
+  [[gnu::always_inline]] void start(std::size_t count) { _block = take(count); }
   template <class... Arguments>
-  T& emplace_back(Arguments&&... arguments) {
+  const T& emplace_back(Arguments&&... arguments) {
     if (!_block || _block->size == _block->capacity) [[unlikely]]
       return *insertInMore(std::forward<Arguments>(arguments)...);
-    T* added = new (end()) T(std::forward<Arguments>(arguments)...);
+    T* added = new (elements(_block) + _block->size) T(std::forward<Arguments>(arguments)...);
     ++_block->size;
+    note(_block, *added);
     return *added;
+  }
+  // The same, to be changed in its place.
+  template <class... Arguments>
+  T& addToChange(Arguments&&... arguments) {
+    emplace_back(std::forward<Arguments>(arguments)...);
+    return changed()[_block->size - 1];
   }
   void push_back(const T& element) { emplace_back(element); }
   void push_back(T&& element) { emplace_back(std::move(element)); }
@@ -88,8 +120,9 @@ class Sequence {
   // Keeps the memory.
   void clear() {
     if (!_block) return;
-    std::destroy(begin(), end());
+    endElements();
     _block->size = 0;
+    _block->mayOwn = 0;
   }
 
   friend bool operator==(const Sequence& a, const Sequence& b) {
@@ -104,27 +137,88 @@ class Sequence {
       sequence.reserve(sequence.size() + atMost);
       _next = elements(sequence._block) + sequence._block->size;
     }
+    // In the room for which memory was reserved before.
+    [[gnu::always_inline]] explicit Filling(Sequence& sequence)
+        : _sequence(sequence), _next(elements(sequence._block) + sequence._block->size) {}
     Filling(const Filling&) = delete;
     Filling& operator=(const Filling&) = delete;
     ~Filling() {
-      _sequence._block->size = static_cast<std::uint32_t>(_next - elements(_sequence._block));
+      Block* block = _sequence._block;
+      block->size = static_cast<std::uint32_t>(_next - elements(block));
+      if (TellsWhatItOwns<T> && _mayOwn) block->mayOwn = 1;
     }
 
     template <class... Arguments>
     [[gnu::always_inline]] void append(Arguments&&... arguments) {
       new (_next) T{std::forward<Arguments>(arguments)...};
+      _mayOwn = _mayOwn || mayOwn(*_next);
       ++_next;
     }
 
    private:
     Sequence& _sequence;
     T* _next;
+    bool _mayOwn = false;
+  };
+
+  // Elements that come in any order, each in a place of its own, at most 64. Moves all together in
+  // the end; until then the sequence is not used.
+  class Spread {
+   public:
+    // `there` has a bit for the place of each that is there, in order.
+    Spread(Sequence& sequence, std::size_t places, std::uint64_t there)
+        : _block(spreadable(sequence, places)), _there(there) {
+      std::size_t from = _block->size;
+      _block->size = 0;
+      for (; there != 0; there ^= std::bit_floor(there)) {
+        const auto to = static_cast<std::size_t>(std::bit_width(there)) - 1;
+        if (--from == to) return;  // as all before it
+        moveBytes(to, from);
+      }
+    }
+    Spread(const Spread&) = delete;
+    Spread& operator=(const Spread&) = delete;
+    ~Spread() {
+      auto size = static_cast<std::uint32_t>(std::countr_one(_there));
+      for (std::uint64_t apart = _there & (_there + 1); apart != 0; apart &= apart - 1) {
+        moveBytes(size++, static_cast<std::uint32_t>(std::countr_zero(apart)));
+      }
+      _block->size = size;
+    }
+
+    bool has(std::size_t place) const { return (_there >> place & 1) != 0; }
+    T& operator[](std::size_t place) { return elements(_block)[place]; }
+    template <class... Arguments>
+    T& make(std::size_t place, Arguments&&... arguments) {
+      _there |= std::uint64_t{1} << place;
+      T* made = new (elements(_block) + place) T{std::forward<Arguments>(arguments)...};
+      Sequence::note(_block, *made);
+      return *made;
+    }
+    // After a change of the element in this place.
+    void note(std::size_t place) { Sequence::note(_block, (*this)[place]); }
+
+   private:
+    static Block* spreadable(Sequence& sequence, std::size_t places) {
+      static_assert(TellsWhatItOwns<T>, "moves elements byte for byte");
+      sequence.reserve(places);
+      return sequence._block;
+    }
+    void moveBytes(std::size_t to, std::size_t from) {
+      T* first = elements(_block);
+      std::memcpy(static_cast<void*>(first + to), static_cast<const void*>(first + from),
+                  sizeof(T));
+    }
+
+    Block* _block;
+    std::uint64_t _there;  // a bit for each place
   };
 
  private:
   struct Block {
     std::uint32_t size;
-    std::uint32_t capacity;
+    std::uint32_t capacity : 31;
+    std::uint32_t mayOwn : 1;  // of types that tell: whether an element may own something
   };
 
   static T* elements(Block* block) {
@@ -133,13 +227,33 @@ class Sequence {
   }
   static std::size_t bytes(std::size_t capacity) { return sizeof(Block) + capacity * sizeof(T); }
 
+  static bool mayOwn(const T& element) {
+    if constexpr (TellsWhatItOwns<T>) return !element.ownsNothing();
+    return true;
+  }
+  static void note(Block* block, const T& added) {
+    if (TellsWhatItOwns<T> && mayOwn(added)) block->mayOwn = 1;
+  }
+  bool ownsNothing() const { return TellsWhatItOwns<T> && !_block->mayOwn; }
+  // For whoever may change them.
+  T* changed() {
+    if constexpr (TellsWhatItOwns<T>) _block->mayOwn = 1;
+    return elements(_block);
+  }
+  // The elements of `from` and what it knows of them.
+  static void moveBytes(Block* to, const Block* from) {
+    std::memcpy(static_cast<void*>(to + 1), from + 1, from->size * sizeof(T));
+    to->size = from->size;
+    to->mayOwn = from->mayOwn;
+  }
+
   // A block with room for `count` elements and for as many more as its memory has anyway.
   static Block* take(std::size_t count) {
-    constexpr std::size_t kStep = SmallBlocks::kStep;
-    const std::size_t size = (bytes(count) + kStep - 1) / kStep * kStep;
-    const std::size_t room = (size - sizeof(Block)) / sizeof(T);
-    return new (SmallBlocks::take(bytes(room))) Block{0, static_cast<std::uint32_t>(room)};
+    const std::size_t room = (SmallBlocks::rowSize(bytes(count)) - sizeof(Block)) / sizeof(T);
+    return new (SmallBlocks::takeRow(bytes(room)))
+        Block{0, static_cast<std::uint32_t>(room) & 0x7FFFFFFF, 0};
   }
+  static void give(Block* block) { SmallBlocks::giveRow(block, bytes(block->capacity)); }
 
   [[gnu::noinline]] void grow(std::size_t count) {
     Block* larger = take(std::max(count, 2 * capacity()));
@@ -154,17 +268,27 @@ class Sequence {
     T* added = new (elements(larger) + size()) T(std::forward<Arguments>(arguments)...);
     if (_block) moveTo(larger);
     ++larger->size;
+    note(larger, *added);
     _block = larger;
     return added;
   }
   void moveTo(Block* larger) {
-    std::uninitialized_move(begin(), end(), elements(larger));
-    larger->size = _block->size;
-    release();
+    if constexpr (TellsWhatItOwns<T>) {
+      moveBytes(larger, _block);
+      give(_block);
+    } else {
+      T* first = elements(_block);
+      std::uninitialized_move(first, first + _block->size, elements(larger));
+      larger->size = _block->size;
+      release();
+    }
   }
   [[gnu::noinline]] void release() {
-    std::destroy(begin(), end());
-    SmallBlocks::give(_block, bytes(_block->capacity));
+    if (!ownsNothing()) endElements();
+    give(_block);
+  }
+  [[gnu::noinline]] void endElements() {
+    std::destroy(elements(_block), elements(_block) + _block->size);
   }
 
   Block* _block = nullptr;

@@ -1,5 +1,6 @@
 #include "base/SmallBlocks.h"
 
+#include <array>
 #include <mutex>
 #include <new>
 
@@ -8,6 +9,7 @@ namespace {
 
 constexpr std::uint32_t kBlocksOfASize = 64;  // on a thread's shelf
 constexpr std::uint32_t kBlocksOfABatch = 32;
+constexpr std::size_t kMoreBytes = 4 * 1024 * 1024;  // beyond these, of a thread
 
 // Each compiler has its own way to say it.
 #if defined(__SANITIZE_ADDRESS__)
@@ -18,14 +20,14 @@ constexpr bool kKeepsBlocks = !__has_feature(address_sanitizer);
 constexpr bool kKeepsBlocks = true;
 #endif
 
-constexpr std::size_t roundedUp(std::size_t size) {
-  return (size + SmallBlocks::kStep - 1) / SmallBlocks::kStep * SmallBlocks::kStep;
+// Of a block that may come onto a shelf, if only that of another thread.
+constexpr std::size_t heapSize(std::size_t size) {
+  return kKeepsBlocks && size <= SmallBlocks::kLargestRow ? SmallBlocks::rowSize(size) : size;
 }
 
 }  // namespace
 
-constinit thread_local std::array<SmallBlocks::Shelf, SmallBlocks::kLargest / SmallBlocks::kStep>
-    SmallBlocks::_shelves{};
+constinit thread_local SmallBlocks::Shelf SmallBlocks::_shelves[kShelves]{};
 
 // Opens the thread's shelves, and gives what they hold to the heap when the thread ends.
 struct SmallBlocks::Sweeper {
@@ -41,7 +43,7 @@ struct SmallBlocks::Sweeper {
   }
 
   Sweeper() {
-    for (Shelf& shelf : _shelves) shelf.room = kBlocksOfASize;
+    for (std::size_t i = 0; i < kSmallShelves; ++i) _shelves[i].room = kBlocksOfASize;
   }
   ~Sweeper() {
     _hasEnded = true;
@@ -54,11 +56,20 @@ struct SmallBlocks::Sweeper {
     }
   }
 
+  // Whoever asks the heap for a block will have it back: long lists need many of a size.
+  static void makeRoom(Shelf& shelf, std::size_t size) {
+    if (size > _moreBytes) return;
+    _moreBytes -= size;
+    ++shelf.room;
+  }
+
  private:
   static constinit thread_local bool _hasEnded;
+  static constinit thread_local std::size_t _moreBytes;
 };
 
 constinit thread_local bool SmallBlocks::Sweeper::_hasEnded = false;
+constinit thread_local std::size_t SmallBlocks::Sweeper::_moreBytes = kMoreBytes;
 
 class SmallBlocks::Sweeper::Depot {
  public:
@@ -93,14 +104,37 @@ SmallBlocks::Sweeper::Depot& SmallBlocks::Sweeper::depotFor(std::size_t size) {
   return depots[(size - 1) / kStep];
 }
 
+SmallBlocks::Shelf* SmallBlocks::largeShelfFor(std::size_t size) {
+  if (size > kLargestRow || !Sweeper::hasShelves()) return nullptr;
+  return &_shelves[kSmallShelves + std::bit_width(size - 1) - std::bit_width(kLargest)];
+}
+
+void* SmallBlocks::takeLarge(std::size_t size) {
+  Shelf* shelf = largeShelfFor(size);
+  if (!shelf) return ::operator new(heapSize(size));
+  if (Block* block = shelf->first) {
+    shelf->first = block->next;
+    ++shelf->room;
+    return block;
+  }
+  Sweeper::makeRoom(*shelf, rowSize(size));
+  return ::operator new(rowSize(size));
+}
+
+void SmallBlocks::giveLarge(void* memory, std::size_t size) noexcept {
+  Shelf* shelf = largeShelfFor(size);
+  if (!shelf || shelf->room == 0) return ::operator delete(memory);
+  put(*shelf, memory);
+}
+
 void* SmallBlocks::fromHeap(std::size_t size) {
   if (size > kLargest) return ::operator new(size);
-  if (Sweeper::hasShelves()) {
-    Shelf& shelf = shelfFor(size);
-    Sweeper::depotFor(size).fill(shelf);
-    if (shelf.first) return take(size);
-  }
-  return ::operator new(kKeepsBlocks ? roundedUp(size) : size);
+  if (!Sweeper::hasShelves()) return ::operator new(heapSize(size));
+  Shelf& shelf = shelfFor(size);
+  Sweeper::depotFor(size).fill(shelf);
+  if (shelf.first) return take(size);
+  Sweeper::makeRoom(shelf, rowSize(size));
+  return ::operator new(rowSize(size));
 }
 
 void SmallBlocks::toHeap(void* memory, std::size_t size) noexcept {

@@ -93,7 +93,7 @@ class Value {
   }
   Value(float value) : _kind(Kind::floating) { _as.floating = value; }
   Value(double) = delete;  // values are single precision: convert in sight
-  Value(Text value) : _size(value._size), _kind(Kind::text), _owns(value._owned != 0) {
+  Value(Text value) : _kind(Kind::text), _owns(value._owned != 0), _size(value._size) {
     _as.characters = value._data;
     value._owned = 0;
   }
@@ -133,6 +133,8 @@ class Value {
   }
 
   Kind kind() const { return _kind; }
+  // Whether it is all there is, without memory of its own elsewhere.
+  bool ownsNothing() const { return !_owns; }
   bool isNull() const { return _kind == Kind::null; }
 
   // The held value when it is of that kind, else nothing.
@@ -150,6 +152,15 @@ class Value {
   const List* asList() const { return _kind == Kind::list ? &_as.list : nullptr; }
   const Dictionary* asDictionary() const {
     return _kind == Kind::dictionary ? &_as.dictionary : nullptr;
+  }
+  // The list or the dictionary, to add to; an empty one in place of whatever else is held.
+  List& growingList() {
+    if (_kind != Kind::list) *this = List();
+    return _as.list;
+  }
+  Dictionary& growingDictionary() {
+    if (_kind != Kind::dictionary) *this = Dictionary();
+    return _as.dictionary;
   }
 
   // Numbers by what they can stand for. A boolean is not a number.
@@ -176,6 +187,7 @@ class Value {
   std::optional<float> otherAsFloat() const;
   void copy(const Value& other);
   void destroy();
+  [[gnu::noinline]] void destroyBytes();
   // Byte for byte; what the other one owns is then also this one's.
   void takeOver(const Value& other) {
     std::memcpy(static_cast<void*>(this), static_cast<const void*>(&other), sizeof *this);
@@ -193,14 +205,18 @@ class Value {
     List list;
     Dictionary dictionary;
   } _as;
-  std::uint32_t _size = 0;  // of a text
+  // In this order, and without a gap, all of a number's are one small number to store.
   Kind _kind = Kind::null;
   bool _owns = false;  // whether there is something to give back
+  std::uint16_t _unused = 0;
+  std::uint32_t _size = 0;  // of a text
 };
 
 static_assert(sizeof(Value) == 16);
 
 struct Dictionary::Entry {
+  bool ownsNothing() const { return key.isName() && value.ownsNothing(); }
+
   Text key;
   Value value;
 };

@@ -74,6 +74,54 @@ TEST(Sequence, fillsBehindWhatThereIs) {
   EXPECT_EQ(numbers.back(), 39);
 }
 
+// Elements that tell what they own, and count how many own something.
+struct Part {
+  explicit Part(int number, bool owning = false) : value(number), owns(owning) { owners += owns; }
+  Part(const Part& other) : Part(other.value, other.owns) {}
+  Part& operator=(const Part&) = delete;
+  ~Part() { owners -= owns; }
+  bool ownsNothing() const { return !owns; }
+  friend bool operator==(const Part& a, const Part& b) { return a.value == b.value; }
+
+  inline static int owners = 0;
+  int value;
+  bool owns;
+};
+using Parts = Sequence<Part>;
+
+TEST(Sequence, endsWhatOwnsSomethingAmongWhatDoesNot) {
+  {
+    Parts parts;
+    for (int i = 0; i < 100; ++i) parts.emplace_back(i, i % 10 == 9);
+    EXPECT_EQ(Part::owners, 10);
+    const Parts copy = parts;
+    EXPECT_EQ(copy, parts);
+    EXPECT_EQ(Part::owners, 20);
+    parts.clear();
+    EXPECT_EQ(Part::owners, 10);
+    parts.emplace_back(1);
+    const Parts plain = parts;
+    EXPECT_EQ(plain, parts);
+    Parts::Filling(parts, 2).append(2, true);
+    EXPECT_EQ(Part::owners, 11);
+  }
+  EXPECT_EQ(Part::owners, 0);
+}
+
+TEST(Sequence, endsWhatOwnsSomethingOnlySinceItWasChanged) {
+  {
+    Parts parts;
+    for (int i = 0; i < 3; ++i) parts.emplace_back(i);
+    for (Part& part : parts) {
+      part.owns = true;
+      ++Part::owners;
+    }
+    const Parts copy = parts;
+    EXPECT_EQ(Part::owners, 6);
+  }
+  EXPECT_EQ(Part::owners, 0);
+}
+
 // Blocks may be taken on one thread and given back on another, also while threads come and go.
 TEST(SmallBlocks, mayChangeThreads) {
   for (int round = 0; round < 4; ++round) {
