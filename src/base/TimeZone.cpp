@@ -35,7 +35,7 @@ class SystemTimeZone final : public TimeZone {
   std::uint64_t version() const override {
     std::timespec now{};
     ::clock_gettime(CLOCK_MONOTONIC_COARSE, &now);
-    if (_lookedAt.exchange(now.tv_sec, std::memory_order_relaxed) != now.tv_sec) look();
+    if (_lookedAt.load(std::memory_order_relaxed) != now.tv_sec) look(now.tv_sec);
     return _version.load(std::memory_order_relaxed);
   }
 
@@ -59,7 +59,8 @@ class SystemTimeZone final : public TimeZone {
             .changed = file.st_mtim.tv_sec * std::int64_t{1000000000} + file.st_mtim.tv_nsec};
   }
 
-  void look() const {
+  [[gnu::noinline]] void look(std::time_t now) const {
+    _lookedAt.store(now, std::memory_order_relaxed);
     const std::lock_guard lock(_mutex);
     Origin found = origin();
     if (found == _origin) return;
@@ -128,14 +129,20 @@ std::string dateText(double milliseconds, const TimeZone& zone) {
 }
 
 std::string_view DateTexts::at(double milliseconds) {
-  if (!holds(milliseconds)) moveTo(milliseconds);
-  if (holds(milliseconds)) {
-    const auto passed = static_cast<unsigned>(milliseconds - _start) / 1000;
-    char* minute = _text.data() + _minute;
-    putTwoDigits(putTwoDigits(minute, (_firstSecond + passed) / 60) + 1,
-                 (_firstSecond + passed) % 60);
-  }
+  const bool sameRules = _version == _zone.version();
+  if (sameRules && milliseconds >= _second && milliseconds < _nextSecond) return _text;
+  if (!sameRules || !isInQuarter(milliseconds)) moveTo(milliseconds);
+  if (isInQuarter(milliseconds)) moveWithin(milliseconds);
   return _text;
+}
+
+void DateTexts::moveWithin(double milliseconds) {
+  const auto passed = static_cast<unsigned>(milliseconds - _start) / 1000;
+  char* minute = _text.data() + _minute;
+  putTwoDigits(putTwoDigits(minute, (_firstSecond + passed) / 60) + 1,
+               (_firstSecond + passed) % 60);
+  _second = _start + passed * 1000.0;
+  _nextSecond = _second + 1000.0;
 }
 
 void DateTexts::moveTo(double milliseconds) {
@@ -143,6 +150,7 @@ void DateTexts::moveTo(double milliseconds) {
   _version = _zone.version();
   _text = dateText(milliseconds, _zone);
   _end = _start;
+  _nextSecond = _second;
   if (!(std::abs(milliseconds) < kExact)) return;
   const auto second = static_cast<std::int64_t>(std::floor(milliseconds / 1000.0));
   const std::int64_t start = second - (second % kQuarter + kQuarter) % kQuarter;

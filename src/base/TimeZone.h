@@ -37,8 +37,8 @@ const TimeZone& systemTimeZone();
 std::string dateText(double milliseconds, const TimeZone& zone);
 
 // The same texts for times that are close to each other: within a quarter of an hour only minutes
-// and seconds are written anew, as long as the zone's rules allow. One thread; the zone must
-// outlive it.
+// and seconds are written anew, as long as the zone's rules allow, and within a second nothing. One
+// thread; the zone must outlive it.
 class DateTexts {
  public:
   explicit DateTexts(const TimeZone& zone) : _zone(zone) {}
@@ -47,15 +47,18 @@ class DateTexts {
   std::string_view at(double milliseconds);
 
  private:
-  bool holds(double milliseconds) const {
-    return milliseconds >= _start && milliseconds < _end && _version == _zone.version();
+  bool isInQuarter(double milliseconds) const {
+    return milliseconds >= _start && milliseconds < _end;
   }
   void moveTo(double milliseconds);
+  void moveWithin(double milliseconds);
 
   const TimeZone& _zone;
   std::uint64_t _version = 0;
   double _start = 0;  // of the quarter, in milliseconds; no quarter while the end is not behind it
   double _end = 0;
+  double _second = 0;  // for which the text stands, as the quarter
+  double _nextSecond = 0;
   unsigned _firstSecond = 0;  // of the hour on the wall, at the start
   std::string _text;
   std::size_t _minute = 0;  // its place in the text
