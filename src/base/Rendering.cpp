@@ -32,7 +32,8 @@ class Line {
  private:
   static constexpr std::size_t kUsual = 512;
 
-  void widen(std::size_t used, std::size_t count) {
+  // Not inline: how much is filled with zeros is then left to the library, which is fast at it.
+  [[gnu::noinline]] void widen(std::size_t used, std::size_t count) {
     _out.resize(used + count);
     _start = _out.data() + used;
     _end = _start + count;
@@ -51,10 +52,16 @@ void putEnds(char* at, std::string_view text) {
   std::memcpy(at + last, text.data() + last, sizeof(Word));
 }
 
+struct SixteenBytes {
+  std::array<char, 16> bytes;
+};
+
 // Keys and names are short.
 [[gnu::always_inline]] inline char* put(char* at, std::string_view text) {
   if (text.size() - 8 <= 8) {
     putEnds<std::uint64_t>(at, text);
+  } else if (text.size() - 16 <= 16) {
+    putEnds<SixteenBytes>(at, text);
   } else if (text.size() - 4 <= 4) {
     putEnds<std::uint32_t>(at, text);
   } else {
@@ -139,19 +146,31 @@ std::string escaped(std::string_view text) {
 }
 
 // Within the room that there is.
-char* putQuoted(char* at, std::string_view plain) {
+[[gnu::always_inline]] inline char* putQuoted(char* at, std::string_view plain) {
   *at++ = '"';
   at = put(at, plain);
   *at++ = '"';
   return at;
 }
 
-[[gnu::noinline]] char* putString(Line& line, char* at, std::string_view text) {
-  if (!isPlain(text)) {
-    const std::string escapes = escaped(isValidUtf8(text) ? text : withReplacements(text));
-    return putQuoted(line.room(at, escapes.size() + kRoom), escapes);
-  }
+[[gnu::noinline]] char* putEscaped(Line& line, char* at, std::string_view text) {
+  const std::string escapes = escaped(isValidUtf8(text) ? text : withReplacements(text));
+  return putQuoted(line.room(at, escapes.size() + kRoom), escapes);
+}
+
+char* putString(Line& line, char* at, std::string_view text) {
+  if (!isPlain(text)) return putEscaped(line, at, text);
   return putQuoted(line.room(at, text.size() + kRoom), text);
+}
+
+char* putText(Line& line, char* at, const Value& value) {
+  const std::string_view text = *value.asText();
+  if (!value.isName()) return putString(line, at, text);
+  return putQuoted(line.room(at, text.size() + kRoom), text);
+}
+
+[[gnu::noinline]] char* putBytes(Line& line, char* at, const Bytes& bytes) {
+  return putString(line, at, bytesText(bytes));
 }
 
 [[gnu::noinline]] char* putFloat(char* at, float value) {
@@ -199,7 +218,7 @@ char* putLargeInteger(char* at, std::uint64_t value);
   return putPair(putPair(at, last / 100), last % 100);
 }
 
-char* putInteger(char* at, std::int64_t value) {
+[[gnu::always_inline]] inline char* putInteger(char* at, std::int64_t value) {
   const auto bits = static_cast<std::uint64_t>(value);
   if (value >= 0) return putInteger(at, bits);
   *at++ = '-';
@@ -223,9 +242,9 @@ char* putDictionary(Line& line, char* at, const Dictionary& dictionary);
     case Value::Kind::floating:
       return putFloat(at, *value.asFloat());
     case Value::Kind::text:
-      return putString(line, at, *value.asText());
+      return putText(line, at, value);
     case Value::Kind::bytes:
-      return putString(line, at, bytesText(*value.asBytes()));
+      return putBytes(line, at, *value.asBytes());
     case Value::Kind::list:
       return putList(line, at, *value.asList());
     case Value::Kind::dictionary:
