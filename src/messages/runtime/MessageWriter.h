@@ -65,49 +65,64 @@ inline std::uint8_t* putTag(std::uint8_t* at, std::uint32_t number, std::uint32_
   return PBPutVarint(at, number << 3 | wireType);
 }
 
+// Where a message is written from and to. Its presence word is a copy: every byte that is written
+// might else have changed it.
+template <class Message>
+struct Writing {
+  const Message& message;
+  PBDataWriter& writer;
+  const decltype(Presence::word(message)) present = Presence::word(message);
+
+  template <class Field>
+  bool has(const Field& field) const {
+    return (present >> field.presenceBit & 1) != 0;
+  }
+  template <class Field>
+  const auto& held(const Field& field) const {
+    return message.*field.member;
+  }
+  // Writes through the functions of the writer, with room for the message's scalars again
+  // afterwards.
+  template <class Write>
+  std::uint8_t* between(std::uint8_t* at, Write&& write) const {
+    writer.writtenTo(at);
+    write();
+    return writer.room(kRoom<Message>);
+  }
+};
+
 // One overload a kind of field; what is absent writes nothing. Each takes the place where writing
 // stands, with room for the scalars that are still to come, and gives back such a place.
 template <class Message, class T, Encoding encoding>
 [[gnu::always_inline]] inline std::uint8_t* writeField(
-    const Message& message, PBDataWriter&, std::uint8_t* at,
+    const Writing<Message>& from, std::uint8_t* at,
     const ScalarField<Message, T, encoding>& field) {
-  if (!Presence::get(message, field.presenceBit)) return at;
-  return PBPutVarint(putTag(at, field.number, 0), encodedScalar<encoding>(message.*field.member));
+  if (!from.has(field)) return at;
+  return PBPutVarint(putTag(at, field.number, 0), encodedScalar<encoding>(from.held(field)));
 }
 
 template <class Message>
-[[gnu::always_inline]] inline std::uint8_t* writeField(const Message& message, PBDataWriter&,
+[[gnu::always_inline]] inline std::uint8_t* writeField(const Writing<Message>& from,
                                                        std::uint8_t* at,
                                                        const EnumField<Message>& field) {
-  if (!Presence::get(message, field.presenceBit)) return at;
-  return PBPutVarint(putTag(at, field.number, 0),
-                     encodedScalar<Encoding::int32>(message.*field.member));
-}
-
-// Writes through the functions of the writer, with room for the message's scalars again afterwards.
-template <class Message, class Write>
-std::uint8_t* writeBetween(PBDataWriter& writer, std::uint8_t* at, Write&& write) {
-  writer.writtenTo(at);
-  write();
-  return writer.room(kRoom<Message>);
+  if (!from.has(field)) return at;
+  return PBPutVarint(putTag(at, field.number, 0), encodedScalar<Encoding::int32>(from.held(field)));
 }
 
 template <class Message>
-std::uint8_t* writeField(const Message& message, PBDataWriter& writer, std::uint8_t* at,
+std::uint8_t* writeField(const Writing<Message>& from, std::uint8_t* at,
                          const DataField<Message>& field) {
-  const auto& data = message.*field.member;
+  const auto& data = from.held(field);
   if (!data) return at;
-  return writeBetween<Message>(writer, at,
-                               [&] { PBDataWriterWriteDataField(writer, *data, field.number); });
+  return from.between(at, [&] { PBDataWriterWriteDataField(from.writer, *data, field.number); });
 }
 
 template <class Message>
-std::uint8_t* writeField(const Message& message, PBDataWriter& writer, std::uint8_t* at,
+std::uint8_t* writeField(const Writing<Message>& from, std::uint8_t* at,
                          const StringField<Message>& field) {
-  const auto& text = message.*field.member;
+  const auto& text = from.held(field);
   if (!text) return at;
-  return writeBetween<Message>(writer, at,
-                               [&] { PBDataWriterWriteStringField(writer, *text, field.number); });
+  return from.between(at, [&] { PBDataWriterWriteStringField(from.writer, *text, field.number); });
 }
 
 // Of a small nested message: its tag, its length and itself.
@@ -119,7 +134,8 @@ template <class Nested>
                                                      std::uint8_t* at, std::uint32_t number) {
   std::uint8_t* length = putTag(at, number, 2);
   at = length + 1;
-  forEachField<Nested>([&](const auto& field) { at = writeField(nested, writer, at, field); });
+  const Writing<Nested> from{nested, writer};
+  forEachField<Nested>([&](const auto& field) { at = writeField(from, at, field); });
   *length = static_cast<std::uint8_t>(at - length - 1);
   return at;
 }
@@ -149,25 +165,26 @@ std::uint8_t* writeAll(PBDataWriter& writer, std::uint8_t* at, std::uint32_t num
 }
 
 template <class Message, class Nested>
-std::uint8_t* writeField(const Message& message, PBDataWriter& writer, std::uint8_t* at,
+std::uint8_t* writeField(const Writing<Message>& from, std::uint8_t* at,
                          const MessageField<Message, Nested>& field) {
-  const auto& nested = message.*field.member;
+  const auto& nested = from.held(field);
   if (!nested) return at;
-  return writeAll<Message, Nested>(writer, at, field.number, {&nested, 1});
+  return writeAll<Message, Nested>(from.writer, at, field.number, {&nested, 1});
 }
 
 template <class Message, class Nested>
-std::uint8_t* writeField(const Message& message, PBDataWriter& writer, std::uint8_t* at,
+std::uint8_t* writeField(const Writing<Message>& from, std::uint8_t* at,
                          const RepeatedMessageField<Message, Nested>& field) {
-  return writeAll<Message, Nested>(writer, at, field.number, message.*field.member);
+  return writeAll<Message, Nested>(from.writer, at, field.number, from.held(field));
 }
 
 template <class Message, class T, Encoding encoding>
-std::uint8_t* writeField(const Message& message, PBDataWriter& writer, std::uint8_t* at,
+std::uint8_t* writeField(const Writing<Message>& from, std::uint8_t* at,
                          const PackedField<Message, T, encoding>& field) {
-  const auto& values = (message.*field.member).values;
+  const auto& values = from.held(field).values;
   if (values.empty()) return at;
-  return writeBetween<Message>(writer, at, [&] {
+  return from.between(at, [&] {
+    PBDataWriter& writer = from.writer;
     PBDataWriterMark mark;
     PBDataWriterPlaceMark(writer, mark, field.number);
     for (const T value : values) {
@@ -180,7 +197,8 @@ std::uint8_t* writeField(const Message& message, PBDataWriter& writer, std::uint
 template <class Message>
 void writeMessage(const Message& message, PBDataWriter& writer) {
   std::uint8_t* at = writer.room(kRoom<Message>);
-  forEachField<Message>([&](const auto& field) { at = writeField(message, writer, at, field); });
+  const Writing<Message> from{message, writer};
+  forEachField<Message>([&](const auto& field) { at = writeField(from, at, field); });
   writer.writtenTo(at);
 }
 

@@ -5,6 +5,16 @@ namespace qel {
 
 // The one place that reaches into a message's `_has`.
 struct Presence {
+  // All of it; 0 for a message without scalars.
+  template <class Message>
+  static auto word(const Message& message) {
+    if constexpr (requires { message._has; }) {
+      return message._has;
+    } else {
+      return 0U;
+    }
+  }
+
   template <class Message>
   static bool get(const Message& message, unsigned bit) {
     return (message._has >> bit & 1) != 0;
