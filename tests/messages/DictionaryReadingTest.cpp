@@ -5,6 +5,8 @@
 
 #include "Damage.h"
 #include "ForAllClasses.h"
+#include "OtherSenders.h"
+#include "Schemas.h"
 #include "Wire.h"
 #include "base/Rendering.h"
 #include "messages/lte_neighbours.h"
@@ -48,6 +50,62 @@ TEST(DictionaryReading, saysTheSameOfDamagedBytes) {
       const Bytes bytes = testing::damaged(random, whole);
       EXPECT_EQ(straight<Message>(bytes), byMessage<Message>(bytes)) << hexText(bytes);
     }
+  });
+}
+
+// Calls law.operator()<Message>(random, schema, bytes) for random messages of every class.
+template <class Law>
+void forRandomBytes(Law&& law) {
+  testing::forAllClasses([&]<class Message>(std::uint64_t number) {
+    testing::RandomMessages random(number);
+    const Bytes whole = random.encoded(Message::kClassName);
+    law.template operator()<Message>(random, testing::schemaOf(Message::kClassName), whole);
+  });
+}
+
+template <class Message>
+void expectBothSayTheSame(const Bytes& bytes) {
+  const testing::ExactBuffer exact(bytes);
+  EXPECT_EQ(straight<Message>(exact.view()), byMessage<Message>(exact.view())) << hexText(bytes);
+}
+
+TEST(DictionaryReading, saysTheSameOfFieldsInAnyOrder) {
+  forRandomBytes([]<class Message>(auto& random, const auto& schema, const Bytes& whole) {
+    for (int i = 0; i < 5; ++i) {
+      const Bytes bytes = testing::shuffled(random, schema, whole);
+      EXPECT_NE(straight<Message>(bytes), std::nullopt);
+      expectBothSayTheSame<Message>(bytes);
+      expectBothSayTheSame<Message>(testing::damaged(random, bytes));
+    }
+  });
+}
+
+TEST(DictionaryReading, saysTheSameOfFieldsThatComeTwice) {
+  forRandomBytes([]<class Message>(auto& random, const auto& schema, const Bytes& whole) {
+    const Bytes bytes = testing::doubled(random, schema, whole);
+    EXPECT_NE(straight<Message>(bytes), std::nullopt);
+    expectBothSayTheSame<Message>(bytes);
+    expectBothSayTheSame<Message>(testing::damaged(random, bytes));
+  });
+}
+
+TEST(DictionaryReading, saysTheSameAtEveryCut) {
+  forRandomBytes([]<class Message>(auto& random, const auto& schema, const Bytes& whole) {
+    const Bytes mixed = testing::shuffled(random, schema, whole);
+    for (std::size_t length = 0; length < whole.size(); ++length) {
+      expectBothSayTheSame<Message>({whole.begin(), whole.begin() + static_cast<long>(length)});
+      expectBothSayTheSame<Message>({mixed.begin(), mixed.begin() + static_cast<long>(length)});
+    }
+  });
+}
+
+TEST(DictionaryReading, leavesOutWhatOnlyALaterSchemaKnows) {
+  forRandomBytes([]<class Message>(auto& random, const auto& schema, const Bytes& whole) {
+    const Bytes later = testing::fromTheFuture(random, schema, whole);
+    EXPECT_EQ(straight<Message>(later), straight<Message>(whole)) << hexText(later);
+    const Bytes mixed = testing::shuffled(random, schema, later);
+    EXPECT_NE(straight<Message>(mixed), std::nullopt);
+    expectBothSayTheSame<Message>(mixed);
   });
 }
 

@@ -25,16 +25,6 @@ auto decodedScalar(std::uint64_t varint) {
   if constexpr (encoding == Encoding::boolean) return varint != 0;
 }
 
-// The part of the input that a varint length in front of it gives; damaged when it is not all
-// there.
-[[gnu::always_inline]] inline Cursor readDelimited(Cursor cursor) {
-  const auto [length, next] = readVarint(cursor);
-  if (next > cursor.end || length > static_cast<std::uint64_t>(cursor.end - next)) {
-    return Cursor::damaged();
-  }
-  return {next, next + length};
-}
-
 // Makes room for the elements of a repeated message field, which seldom has more; the first of them
 // stands here. A few bytes cannot hold as many: room for no more than they can is what keeps memory
 // in proportion to the input.
@@ -56,6 +46,10 @@ inline constexpr std::uint32_t kWireType<ScalarField<Message, T, encoding>> = 0;
 template <class Message>
 inline constexpr std::uint32_t kWireType<EnumField<Message>> = 0;
 
+// Whether the field's value is one varint.
+template <class Field>
+inline constexpr bool kIsVarint = kWireType<Field> == 0;
+
 // A tag in as few bytes as it needs.
 template <std::uint32_t tag>
 struct Tag {
@@ -70,35 +64,49 @@ struct Tag {
   static Cursor behind(Cursor cursor) { return {cursor.at + kSize, cursor.end}; }
 };
 
-// Gives the field with this index to the target if it comes next. Whether reading is over.
+// Gives the field with this index to the target if it comes next. Whether reading is over: a field
+// takes two bytes at least, so what stands at the `last` one is none that is in order.
 template <class Message, std::size_t index, class Target>
-[[gnu::always_inline]] inline bool readExpected(Target& target, Cursor& cursor) {
+[[gnu::always_inline]] inline bool readExpected(Target& target, Cursor& cursor,
+                                                const std::uint8_t* last) {
   constexpr auto& field = std::get<index>(kFieldsOf<Message>);
   using Field = std::remove_cvref_t<decltype(field)>;
   using FieldTag = Tag<field.number << 3 | kWireType<Field>>;
   // A number that may be a metric's is left to the rules for any order.
   if constexpr (!KBBMetricUtility::mayBeMetric(field.number)) {
-    if ((Target::kStopsAtEnd || !cursor.isAtEnd()) && FieldTag::standsAt(cursor)) {
-      cursor = target.template read<FieldTag>(FieldTag::behind(cursor), field);
-      return Target::kStopsAtEnd && cursor.isAtEnd();
+    if ((Target::kStopsAtEnd || cursor.at < last) && FieldTag::standsAt(cursor)) {
+      const Cursor behind = FieldTag::behind(cursor);
+      if constexpr (kIsVarint<Field>) {
+        const auto [value, next] =
+            FieldTag::kSize == 1 ? readVarintHere(behind) : readVarint(behind);
+        target.template set<index>(field, value);
+        cursor.at = next;
+      } else {
+        cursor = target.template read<FieldTag, index>(behind, field);
+      }
+      return Target::kStopsAtEnd && cursor.at >= last;
     }
   }
-  target.leaveOut(field);
+  target.template leaveOut<index>(field);
   return false;
 }
 
 template <class Message, class Target, std::size_t... index>
 [[gnu::always_inline]] inline Cursor readInOrder(Target& target, Cursor cursor,
                                                  std::index_sequence<index...>) {
-  if (Target::kStopsAtEnd && cursor.isAtEnd()) return cursor;
-  static_cast<void>((readExpected<Message, index>(target, cursor) || ...));
+  if (Target::kStopsAtEnd && cursor.left() < 2) return cursor;
+  const bool isEmpty = !Target::kStopsAtEnd && cursor.isAtEnd();
+  const std::uint8_t* const last = isEmpty ? cursor.end : cursor.end - 1;
+  static_cast<void>((readExpected<Message, index>(target, cursor, last) || ...));
   return cursor;
 }
 
 // Goes through the fields of the class once and gives those that are there to the target, which has
-//   Cursor read<Tag>(Cursor, field)  reads what stands behind the tag; a repeated field whole
-//   void leaveOut(field)             the field is not there
-//   kStopsAtEnd                      whether it need not hear of absent fields behind the last one
+//   set<index>(field, varint)          the value of a field that is a varint; 0 where damaged
+//   read<Tag, index>(Cursor, field)    reads what stands behind the tag, a repeated field whole;
+//                                      gives the place behind it
+//   leaveOut<index>(field)             the field is not there
+//   kStopsAtEnd                        whether it need not hear of absent fields behind the last
 // Stops in front of what is not in order.
 template <class Message, class Target>
 [[gnu::always_inline]] inline Cursor readInOrder(Target& target, Cursor cursor) {

@@ -97,8 +97,11 @@ using PresenceWord = std::conditional_t<
     std::conditional_t<count <= 16, std::uint16_t,
                        std::conditional_t<count <= 32, std::uint32_t, std::uint64_t>>>;
 
-// The name of an enumeration's value, or empty.
+// The name of an enumeration's value, or empty. Most enumerations have all values from the first
+// on.
 constexpr Name nameOf(std::span<const EnumName> names, std::int32_t value) {
+  const auto likely = static_cast<std::size_t>(std::int64_t{value} - names.front().value);
+  if (likely < names.size() && names[likely].value == value) return names[likely].name;
   const auto found = std::ranges::lower_bound(names, value, {}, &EnumName::value);
   return found != names.end() && found->value == value ? found->name : Name();
 }

@@ -5,6 +5,7 @@
 #include <memory>
 #include <string>
 #include <tuple>
+#include <utility>
 
 #include "messages/runtime/AnyOrderReader.h"
 #include "messages/runtime/FieldOrder.h"
@@ -24,21 +25,16 @@ std::shared_ptr<Message> makeMessage() {
 // One overload a kind of field. The value is read by the kind of the field, whatever wire type the
 // tag has. What is read of a damaged value stays in the message.
 template <class Message, class T, Encoding encoding>
-[[gnu::always_inline]] inline Cursor readField(Message& message, Cursor cursor,
-                                               const ScalarField<Message, T, encoding>& field) {
-  const auto [value, next] = readVarint(cursor);
+void setField(Message& message, const ScalarField<Message, T, encoding>& field,
+              std::uint64_t varint) {
   Presence::set(message, field.presenceBit, true);
-  message.*field.member = decodedScalar<encoding>(value);
-  return {next, cursor.end};
+  message.*field.member = decodedScalar<encoding>(varint);
 }
 
 template <class Message>
-[[gnu::always_inline]] inline Cursor readField(Message& message, Cursor cursor,
-                                               const EnumField<Message>& field) {
-  const auto [value, next] = readVarint(cursor);
+void setField(Message& message, const EnumField<Message>& field, std::uint64_t varint) {
   Presence::set(message, field.presenceBit, true);
-  message.*field.member = decodedScalar<Encoding::int32>(value);
-  return {next, cursor.end};
+  message.*field.member = decodedScalar<Encoding::int32>(varint);
 }
 
 template <class Message>
@@ -59,7 +55,7 @@ Cursor readField(Message& message, Cursor cursor, const StringField<Message>& fi
 
 // A nested message that ends early leaves the rest of its part to the outer one.
 template <class Nested>
-Cursor readNested(Nested& nested, Cursor cursor) {
+[[gnu::always_inline]] inline Cursor readNested(Nested& nested, Cursor cursor) {
   const Cursor part = readDelimited(cursor);
   if (part.isDamaged()) return part;
   return {readMessage(nested, part).at, cursor.end};
@@ -71,12 +67,23 @@ Cursor readField(Message& message, Cursor cursor, const MessageField<Message, Ne
   return readNested(*(message.*field.member), cursor);
 }
 
+// Becomes a message in the place where it is asked for, without one before to move from.
+template <class Nested>
+struct MadeInPlace {
+  operator std::shared_ptr<Nested>() const { return makeMessage<Nested>(); }
+};
+
+template <class Nested>
+[[gnu::always_inline]] inline Cursor readElement(MessageList<Nested>& elements, Cursor cursor) {
+  return readNested(*elements.emplace_back(MadeInPlace<Nested>()), cursor);
+}
+
 template <class Message, class Nested>
 Cursor readField(Message& message, Cursor cursor,
                  const RepeatedMessageField<Message, Nested>& field) {
   auto& elements = message.*field.member;
   if (elements.empty()) reserveUsual(elements, cursor);
-  return readNested(*elements.emplace_back(makeMessage<Nested>()), cursor);
+  return readElement(elements, cursor);
 }
 
 template <class Message, class T, Encoding encoding>
@@ -95,33 +102,58 @@ template <class Message>
 struct MessageTarget {
   static constexpr bool kStopsAtEnd = true;
 
-  template <class Tag, class Field>
+  template <std::size_t index, class Field>
+  [[gnu::always_inline]] void set(const Field& field, std::uint64_t varint) {
+    setField(message, field, varint);
+  }
+  template <class Tag, std::size_t index, class Field>
   [[gnu::always_inline]] Cursor read(Cursor cursor, const Field& field) {
     return readField(message, cursor, field);
   }
-  template <class Tag, class Nested>
+  template <class Tag, std::size_t index, class Nested>
   Cursor read(Cursor cursor, const RepeatedMessageField<Message, Nested>& field) {
-    cursor = readField(message, cursor, field);
-    while (!cursor.isAtEnd() && Tag::standsAt(cursor)) {
-      cursor = readField(message, Tag::behind(cursor), field);
+    auto& elements = message.*field.member;
+    if (elements.empty()) reserveUsual(elements, cursor);
+    for (;; cursor = Tag::behind(cursor)) {
+      cursor = readElement(elements, cursor);
+      if (cursor.isAtEnd() || !Tag::standsAt(cursor)) return cursor;
     }
-    return cursor;
   }
-  template <class Field>
-  void leaveOut(const Field&) {}
   template <std::size_t index, class Field>
-  Cursor take(Cursor cursor, const Field& field) {
-    return readField(message, cursor, field);
-  }
+  void leaveOut(const Field&) {}
 
   Message& message;
 };
 
+template <class Message, class Field>
+[[gnu::always_inline]] inline Cursor readAnyField(Message& message, Cursor cursor,
+                                                  const Field& field) {
+  if constexpr (kIsVarint<Field>) {
+    const auto [varint, next] = readVarint(cursor);
+    setField(message, field, varint);
+    return {next, cursor.end};
+  } else {
+    return readField(message, cursor, field);
+  }
+}
+
+template <class Message, std::size_t... index>
+[[gnu::always_inline]] inline Cursor readPlaced(Message& message, Cursor cursor, std::size_t place,
+                                                std::index_sequence<index...>) {
+  static_cast<void>(
+      ((place == index &&
+        (cursor = readAnyField(message, cursor, std::get<index>(kFieldsOf<Message>)), true)) ||
+       ...));
+  return cursor;
+}
+
 // Apart from readMessage, which then needs no target in memory.
 template <class Message>
 [[gnu::noinline]] Cursor readRest(Message& message, Cursor cursor) {
-  MessageTarget<Message> target{message};
-  return readInAnyOrder<Message>(target, cursor);
+  using Fields = std::make_index_sequence<std::tuple_size_v<FieldsOf<Message>>>;
+  return readInAnyOrder(PlanOf<Message>::kPlan, cursor, [&message](Cursor at, std::size_t place) {
+    return readPlaced(message, at, place, Fields());
+  });
 }
 
 // The order in which fields are written is the one in which nearly all arrive: it is tried first,

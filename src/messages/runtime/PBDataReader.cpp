@@ -1,6 +1,7 @@
 #include "messages/runtime/PBDataReader.h"
 
-#include <type_traits>
+#include <bit>
+#include <cstring>
 #include <vector>
 
 #include "messages/runtime/Cursor.h"
@@ -9,28 +10,62 @@ namespace qel {
 
 namespace {
 
-constexpr unsigned kLongest = 10;
+constexpr std::uint64_t kTops = 0x8080808080808080;
 
-// Up to `count` bytes, all of which are there; a length that is known is unrolled.
-template <class Count>
-[[gnu::always_inline]] inline Varint readVarintWithin(const std::uint8_t* at, Count count,
-                                                      Varint unended) {
-  std::uint64_t value = 0;
-  for (unsigned i = 0; i < count; ++i) {
-    const std::uint64_t byte = at[i];
-    value |= (byte & 0x7F) << 7 * i;
-    if (byte < 0x80) return {value, at + i + 1};
-  }
-  return unended;
+// The first of the bytes in the lowest place, whatever the machine's order.
+std::uint64_t eightBytes(const std::uint8_t* at) {
+  std::uint64_t word = 0;
+  std::memcpy(&word, at, sizeof word);
+  if constexpr (std::endian::native == std::endian::big) word = __builtin_bswap64(word);
+  return word;
+}
+
+// The low seven bits of eight bytes whose top bits are clear, one behind the other.
+std::uint64_t joinedSevens(std::uint64_t bytes) {
+  bytes = (bytes & 0x007F007F007F007F) | (bytes & 0x7F007F007F007F00) >> 1;
+  bytes = (bytes & 0x00003FFF00003FFF) | (bytes & 0x3FFF00003FFF0000) >> 2;
+  return (bytes & 0x000000000FFFFFFF) | (bytes & 0x0FFFFFFF00000000) >> 4;
 }
 
 }  // namespace
 
 Varint readLongVarint(const std::uint8_t* at, const std::uint8_t* end) {
-  if (end - at >= std::ptrdiff_t{kLongest}) {
-    return readVarintWithin(at, std::integral_constant<unsigned, kLongest>(), {0, at + kLongest});
+  constexpr std::ptrdiff_t kLongest = 10;
+  const std::ptrdiff_t left = end - at;
+  if (left >= std::ptrdiff_t{sizeof(std::uint64_t)}) {
+    const std::uint64_t word = eightBytes(at);
+    if (const std::uint64_t ends = ~word & kTops) [[likely]] {
+      const std::uint64_t upToFirst = ends ^ (ends - 1);
+      return {joinedSevens(word & upToFirst & ~kTops), at + std::countr_zero(ends) / 8 + 1};
+    }
   }
-  return readVarintWithin(at, static_cast<unsigned>(end - at), {0, kDamaged});
+  std::uint64_t value = 0;
+  for (std::ptrdiff_t i = 0; i < std::min(left, kLongest); ++i) {
+    const std::uint64_t byte = at[i];
+    value |= (byte & 0x7F) << 7 * i;
+    if (byte < 0x80) return {value, at + i + 1};
+  }
+  return {0, left < kLongest ? kDamaged : at + kLongest};
+}
+
+Cursor skipScalar(Cursor cursor, std::uint8_t wireType) {
+  const auto skip = [cursor](std::size_t count) {
+    return count <= cursor.left() ? Cursor{cursor.at + count, cursor.end} : Cursor::damaged();
+  };
+  switch (wireType) {
+    case 0:
+      return {readVarint(cursor).next, cursor.end};
+    case 1:
+      return skip(8);
+    case 2: {
+      const Cursor part = readDelimited(cursor);
+      return part.isDamaged() ? part : Cursor{part.end, cursor.end};
+    }
+    case 5:
+      return skip(4);
+    default:
+      return Cursor::damaged();
+  }
 }
 
 std::uint64_t PBReaderReadVarint(PBDataReader& reader) {
@@ -63,19 +98,15 @@ std::optional<ByteView> takeDelimited(PBDataReader& reader) {
 std::uint16_t numberOf(std::uint64_t tag) { return static_cast<std::uint16_t>(tag >> 3); }
 
 bool skipScalar(PBDataReader& reader, std::uint8_t wireType) {
-  switch (wireType) {
-    case 0:
-      PBReaderReadVarint(reader);
-      return !reader._error;
-    case 1:
-      return take(reader, 8).has_value();
-    case 2:
-      return takeDelimited(reader).has_value();
-    case 5:
-      return take(reader, 4).has_value();
-    default:
-      return false;
+  const ByteView left = reader.left();
+  const Cursor next = skipScalar(Cursor{left.data(), left.data() + left.size()}, wireType);
+  const bool isKnown = wireType <= 2 || wireType == 5;
+  if (next.isDamaged()) {
+    reader._error = reader._error || isKnown;
+    return false;
   }
+  reader._pos = static_cast<std::uint64_t>(next.at - reader._bytes);
+  return !reader._error;
 }
 
 // Skips everything up to the end tag of the group `fieldNumber`. Groups within are kept on a heap

@@ -4,7 +4,7 @@
 #include <string>
 
 #include "base/FatalError.h"
-#include "messages/runtime/AnyOrderDictionary.h"
+#include "messages/runtime/DictionaryReader.h"
 #include "messages/runtime/MessageCheck.h"
 #include "messages/runtime/MessageReader.h"
 #include "messages/runtime/MessageRelations.h"
@@ -39,15 +39,14 @@ template <class Message>
 std::optional<Dictionary> PBMessage<Message>::dictionaryWithData(ByteView bytes) {
   std::optional<Dictionary> dictionary(std::in_place);
   const Cursor whole{bytes.data(), bytes.data() + bytes.size()};
-  if (!readDictionary<Message>(*dictionary, whole).isDamaged()) return dictionary;
-  dictionary.emplace();
-  if (readDictionaryInAnyOrder<Message>(*dictionary, whole).isDamaged()) dictionary.reset();
+  if (readDictionary<Message>(*dictionary, whole).isDamaged()) dictionary.reset();
   return dictionary;
 }
 
 template <class Message>
 bool PBMessage<Message>::isReadable(ByteView bytes) {
-  return !checkMessage<Message>({bytes.data(), bytes.data() + bytes.size()}).isDamaged();
+  const Cursor whole{bytes.data(), bytes.data() + bytes.size()};
+  return !checkMessage(PlanOf<Message>::kPlan, whole).isDamaged();
 }
 
 template <class Message>
