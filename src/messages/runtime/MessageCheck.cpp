@@ -24,18 +24,21 @@ bool isKnownTag(const MessagePlan& plan, std::uint8_t first) {
          plan.placeOf[first >> 3] != MessagePlan::kNone;
 }
 
+Cursor pastKnownFields(const MessagePlan& plan, Cursor cursor) {
+  while (!cursor.isAtEnd() && isKnownTag(plan, *cursor.at)) {
+    const FieldPlan& field = plan.fields[plan.placeOf[*cursor.at >> 3]];
+    cursor = pastValue(field, {cursor.at + 1, cursor.end});
+  }
+  return cursor;
+}
+
 }  // namespace
 
 Cursor checkMessage(const MessagePlan& plan, Cursor part) {
-  const auto take = [&plan](Cursor cursor, std::size_t place) {
-    cursor = pastValue(plan.fields[place], cursor);
-    while (!cursor.isAtEnd() && isKnownTag(plan, *cursor.at)) {
-      const FieldPlan& field = plan.fields[plan.placeOf[*cursor.at >> 3]];
-      cursor = pastValue(field, {cursor.at + 1, cursor.end});
-    }
-    return cursor;
-  };
-  return readInAnyOrder(plan, part, take);
+  part = pastKnownFields(plan, part);
+  return readInAnyOrder(plan, part, [&plan](Cursor cursor, std::size_t place) {
+    return pastKnownFields(plan, pastValue(plan.fields[place], cursor));
+  });
 }
 
 }  // namespace qel
