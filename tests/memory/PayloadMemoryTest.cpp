@@ -5,6 +5,7 @@
 #include <algorithm>
 #include <functional>
 #include <string>
+#include <thread>
 #include <vector>
 
 #include "messages/Schemas.h"
@@ -15,6 +16,7 @@
 #include "metrics/MetricValidator.h"
 #include "support/CountedMemory.h"
 #include "support/RecordingSink.h"
+#include "support/Sanitized.h"
 
 namespace qel {
 namespace {
@@ -125,6 +127,35 @@ TEST_F(PayloadMemory, ToSeeWhetherAPayloadCanBeReadTakesNone) {
     EXPECT_TRUE(metric.isReadable(payload));
     EXPECT_EQ(memory.most(), 0U);
   });
+}
+
+// How often the heap is asked when a list of that length is read again, on a thread of its own.
+std::size_t askedForTheSecondList(std::size_t length) {
+  const MetricMessage& metric = *findMetricMessage(54017);
+  Bytes payload;
+  for (std::size_t i = 0; i < length; ++i) {
+    testing::append(payload, testing::delimitedField(3, testing::hex("08011002180320f401")));
+  }
+  std::size_t asked = 0;
+  std::thread([&] {
+    const auto work = [&] {
+      EXPECT_EQ(metric.describe(payload)->find("rx_info")->asList()->size(), length);
+      EXPECT_TRUE(metric.decode(payload));
+    };
+    work();
+    const CountedMemory memory;
+    work();
+    asked = memory.times();
+  }).join();
+  return asked;
+}
+
+// Beyond some hundred entries every one came from the heap and went back to it.
+TEST_F(PayloadMemory, AListAsLongAsOneBeforeTakesNothingFromTheHeap) {
+  if (testing::kIsSanitized) GTEST_SKIP() << "every block is the heap's";
+  for (const std::size_t length : {10U, 1000U, 10'000U}) {
+    EXPECT_EQ(askedForTheSecondList(length), 0U) << length;
+  }
 }
 
 // The store keeps the record and the lists that screens show, and a line of text is made of it.

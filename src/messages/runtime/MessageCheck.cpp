@@ -6,7 +6,7 @@ namespace qel {
 namespace {
 
 // Goes past the value of a field by the field's own kind.
-Cursor pastValue(const FieldPlan& field, Cursor cursor) {
+[[gnu::always_inline]] inline Cursor pastValue(const FieldPlan& field, Cursor cursor) {
   using Kind = FieldPlan::Kind;
   if (field.kind == Kind::varint) return {readVarint(cursor).next, cursor.end};
   Cursor part = readDelimited(cursor);
@@ -17,28 +17,26 @@ Cursor pastValue(const FieldPlan& field, Cursor cursor) {
   return {part.at, cursor.end};
 }
 
-// Nearly all tags are known and of one byte: they can be told by a look.
-bool isKnownTag(const MessagePlan& plan, std::uint8_t first) {
-  constexpr std::uint8_t kEndOfGroup = 4;
-  return first < 0x80 && (first & 7) != kEndOfGroup &&
-         plan.placeOf[first >> 3] != MessagePlan::kNone;
-}
-
-Cursor pastKnownFields(const MessagePlan& plan, Cursor cursor) {
-  while (!cursor.isAtEnd() && isKnownTag(plan, *cursor.at)) {
-    const FieldPlan& field = plan.fields[plan.placeOf[*cursor.at >> 3]];
-    cursor = pastValue(field, {cursor.at + 1, cursor.end});
-  }
-  return cursor;
+// Apart, so that the usual way keeps nothing in memory.
+[[gnu::noinline]] Cursor checkRest(const MessagePlan& plan, Cursor rest) {
+  return readInAnyOrder(plan, rest, [&plan](Cursor cursor, std::size_t place) {
+    return pastValue(plan.fields.data()[place], cursor);
+  });
 }
 
 }  // namespace
 
+// Nearly all fields are known, with a tag of one byte.
 Cursor checkMessage(const MessagePlan& plan, Cursor part) {
-  part = pastKnownFields(plan, part);
-  return readInAnyOrder(plan, part, [&plan](Cursor cursor, std::size_t place) {
-    return pastKnownFields(plan, pastValue(plan.fields[place], cursor));
-  });
+  constexpr std::uint8_t kEndOfGroup = 4;
+  while (!part.isAtEnd()) {
+    const std::uint8_t tag = *part.at;
+    if (tag >= 0x80 || (tag & 7) == kEndOfGroup) return checkRest(plan, part);
+    const std::uint8_t place = plan.placeOf[tag >> 3];
+    if (place == MessagePlan::kNone) return checkRest(plan, part);
+    part = pastValue(plan.fields.data()[place], {part.at + 1, part.end});
+  }
+  return part;
 }
 
 }  // namespace qel

@@ -151,8 +151,9 @@ void writeNested(const Nested& nested, PBDataWriter& writer, std::uint32_t numbe
 
 // Any number of nested messages of one field.
 template <class Message, class Nested>
-std::uint8_t* writeAll(PBDataWriter& writer, std::uint8_t* at, std::uint32_t number,
-                       std::span<const std::shared_ptr<Nested>> all) {
+[[gnu::always_inline]] inline std::uint8_t* writeAll(PBDataWriter& writer, std::uint8_t* at,
+                                                     std::uint32_t number,
+                                                     std::span<const std::shared_ptr<Nested>> all) {
   writer.writtenTo(at);
   if constexpr (kIsSmall<Nested>) {
     at = writer.room(all.size() * kSmallRoom<Nested> + kRoom<Message>);

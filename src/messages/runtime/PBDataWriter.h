@@ -53,7 +53,7 @@ inline constexpr std::uint32_t kPBNoTag = 0xFFFFFFFF;
 inline constexpr std::size_t kLongestVarint = 10;
 
 // Fills in the varint at this place; the place behind it. Nearly all take one or two bytes.
-inline std::uint8_t* PBPutVarint(std::uint8_t* at, std::uint64_t value) {
+[[gnu::always_inline]] inline std::uint8_t* PBPutVarint(std::uint8_t* at, std::uint64_t value) {
   if (value < 0x80) [[likely]] {
     *at = static_cast<std::uint8_t>(value);
     return at + 1;
