@@ -5,6 +5,7 @@
 
 #include "ListMix.h"
 #include "OurWorks.h"
+#include "ShapedPayloads.h"
 #include "messages/catalogue/MetricMessages.h"
 #include "peers/PeerWorks.h"
 
@@ -36,6 +37,14 @@ const std::vector<Group>& groups() {
         {"protozero", entriesProtozero},
         {"protozero, a row of views", entriesFlat},
         {"ours", dictionaryOurs}}},
+      {"the same, a field of a later schema at the end",
+       {{"libprotobuf", onShaped<withUnknownField, entriesStock>},
+        {"protozero", onShaped<withUnknownField, entriesProtozero>},
+        {"ours", onShaped<withUnknownField, dictionaryOurs>}}},
+      {"the same, fields in any order",
+       {{"libprotobuf", onShaped<inAnyOrder, entriesStock>},
+        {"protozero", onShaped<inAnyOrder, entriesProtozero>},
+        {"ours", onShaped<inAnyOrder, dictionaryOurs>}}},
       {"encode a kept message",
        {{"libprotobuf", encodeStock},
         {"protozero", encodeProtozero},
