@@ -17,8 +17,8 @@ class SteadyWaitClock final : public WaitClock {
 
   bool waitUntilMs(std::uint64_t momentMs, const std::stop_token& stop) override {
     using namespace std::chrono;
-    std::mutex mutex;
-    std::condition_variable_any never;
+    static thread_local std::mutex mutex;  // kept, since each takes memory
+    static thread_local std::condition_variable_any never;
     std::unique_lock lock(mutex);
     never.wait_until(lock, stop,
                      steady_clock::time_point(milliseconds(static_cast<std::int64_t>(momentMs))),
