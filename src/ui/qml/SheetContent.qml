@@ -7,8 +7,20 @@ Column {
 
     required property SheetModel sheet
 
+    // From the top of the value's line to the top of smaller words that stand on it.
+    readonly property real drop: Math.round(large.ascent - small.ascent)
+
     spacing: Theme.padding
 
+    FontMetrics {
+        id: large
+        font.family: Theme.fixedFamily
+        font.pointSize: Theme.titleSize * 1.4
+    }
+    FontMetrics {
+        id: small
+        font.pointSize: Theme.valueSize
+    }
     Text {
         width: parent.width
         text: content.sheet.label
@@ -44,6 +56,7 @@ Column {
         Text {
             visible: text !== ""
             text: content.sheet.unit
+            topPadding: content.drop
             textFormat: Text.PlainText
             color: Theme.secondary
             font.pointSize: Theme.valueSize
@@ -51,6 +64,7 @@ Column {
         Text {
             visible: text !== ""
             text: content.sheet.word
+            topPadding: content.drop
             textFormat: Text.PlainText
             color: Theme.qualityColor(text)
             font.pointSize: Theme.valueSize
