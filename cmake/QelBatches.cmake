@@ -8,6 +8,8 @@ set(QEL_NAME_WARNINGS -Wshadow)
 if(QEL_BATCHES AND CMAKE_CXX_COMPILER_ID STREQUAL "GNU")
   set(QEL_NAME_WARNINGS -Wshadow=local -Wno-subobject-linkage)  # neighbours' names do not count
   add_compile_options(--param=ggc-min-heapsize=400000)  # kB; a batch fills the usual ones often
+elseif(QEL_BATCHES)
+  set(QEL_NAME_WARNINGS)  # others cannot tell neighbours' names from a function's own
 endif()
 
 # The names that a source declares outside of functions and classes. Each NAME comes with what it

@@ -5,6 +5,7 @@
 namespace qel::testing {
 
 using namespace rrc;
+using rrc::Kind;
 
 namespace {
 
