@@ -3,7 +3,7 @@
 # different things of their own go into different batches. Builds without batches, as the presets
 # are by themselves, are for work on a few files, and find a forgotten #include.
 option(QEL_BATCHES "Compile the sources of a target in batches, which takes half the time" OFF)
-set(QEL_BATCH_SIZE 16)
+set(QEL_BATCH_SIZE 40)
 set(QEL_NAME_WARNINGS -Wshadow)
 if(QEL_BATCHES AND CMAKE_CXX_COMPILER_ID STREQUAL "GNU")
   set(QEL_NAME_WARNINGS -Wshadow=local -Wno-subobject-linkage)  # neighbours' names do not count
