@@ -24,11 +24,13 @@ Tappable {
     onTapped: table.choose(index)
 
     // A row that comes into sight is not one that changed.
-    Component.onCompleted: fade.complete()
-    ListView.onReused: fade.complete()
+    Component.onCompleted: tint.left = 0
+    ListView.onReused: tint.left = 0
     onChangesChanged: {
-        if (changes > 0 && Theme.changeMs > 0)
-            fade.restart();
+        if (changes === 0 || Theme.changeMs === 0)
+            return;
+        tint.left = tint.steps;
+        fade.restart();
     }
 
     Accessible.role: Accessible.ListItem
@@ -48,20 +50,19 @@ Tappable {
         id: tint
 
         // So thin a colour fades in a few steps as smoothly as in many, and every step is drawn.
-        readonly property int steps: 8
-        property real strength: 0
+        readonly property int steps: 4
+        property int left: 0
 
         anchors.fill: parent
         color: Theme.pressTint
-        opacity: Math.ceil(strength * steps) / steps
+        opacity: left / steps
 
-        NumberAnimation {
+        Timer {
             id: fade
-            target: tint
-            property: "strength"
-            from: 1
-            to: 0
-            duration: Theme.changeMs
+            interval: Theme.changeMs / tint.steps
+            repeat: true
+            running: tint.left > 0
+            onTriggered: --tint.left
         }
     }
 
