@@ -33,41 +33,39 @@ Window {
         navigation: navigation
         source: window.source
     }
+    // Made when a recording is first opened, and each time anew.
     Loader {
         id: playback
+
+        readonly property PlaybackModel model: navigation.pages?.playback ?? null
+        readonly property bool wanted: (model?.opening ?? false) || (model?.opened ?? false)
+
         anchors {
             left: parent.left
             right: parent.right
             bottom: parent.bottom
         }
         height: (item as Item)?.implicitHeight ?? 0
-        active: (navigation.pages?.playback.opening ?? false) || (navigation.pages?.playback.opened ?? false)
-        // qmllint disable unqualified
-        sourceComponent: PlaybackBar {
-            playback: navigation.pages.playback
+        onWantedChanged: {
+            if (wanted)
+                setSource("PlaybackBar.qml", { playback: model });
+            else
+                source = "";
         }
-        // qmllint enable unqualified
     }
+    // Made with the first field that is asked for, and kept.
     Loader {
         id: sheet
 
         readonly property bool opened: navigation.pages?.sheet.opened ?? false
 
         anchors.fill: parent
-        // Made with the first field that is asked for, and kept.
-        active: false
         focus: opened
         onOpenedChanged: {
-            if (opened)
-                active = true;
-            else
+            if (!opened)
                 stack.forceActiveFocus();
+            else if (!item)
+                setSource("FieldSheet.qml", { sheet: navigation.pages.sheet, focus: true });
         }
-        // qmllint disable unqualified
-        sourceComponent: FieldSheet {
-            sheet: navigation.pages.sheet
-            focus: true
-        }
-        // qmllint enable unqualified
     }
 }

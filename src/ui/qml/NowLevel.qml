@@ -6,9 +6,9 @@ Column {
     id: block
 
     required property NowModel now
-    required property bool old
 
     readonly property var level: now.level
+    readonly property bool old: level.isOld ?? false
 
     spacing: 2
 
@@ -82,10 +82,10 @@ Column {
                 model: block.now.others
 
                 Text {
-                    required property var modelData
+                    required property var row
 
                     width: Math.min(implicitWidth, parent.width)
-                    text: modelData.name + " " + modelData.figure + " " + modelData.unit
+                    text: row.name + " " + row.figure + " " + row.unit
                     textFormat: Text.PlainText
                     color: Theme.secondary
                     font.pointSize: Theme.nameSize

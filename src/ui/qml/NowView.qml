@@ -8,7 +8,7 @@ Tappable {
 
     required property NowModel now
 
-    readonly property bool knows: now.reason === ""
+    readonly property bool knows: now.lines.count > 0
     readonly property bool wide: width >= 560
     readonly property real inset: Theme.inset(width)
     readonly property real inner: width - 2 * inset
@@ -63,10 +63,15 @@ Tappable {
         visible: view.knows
         spacing: Theme.padding
 
-        NowLevel {
+        // Made with the first cell that is known.
+        Loader {
+            readonly property bool wanted: view.knows
+
             width: view.wide ? Math.floor((view.inner - Theme.padding) * 0.45) : view.inner
-            now: view.now
-            old: view.old
+            onWantedChanged: {
+                if (wanted && !item)
+                    setSource("NowLevel.qml", { now: view.now });
+            }
         }
         Column {
             width: view.wide ? Math.floor((view.inner - Theme.padding) * 0.55) : view.inner
@@ -77,12 +82,12 @@ Tappable {
 
                 // qmllint disable unqualified
                 Text {
-                    required property var modelData
+                    required property var row
 
                     width: parent.width
-                    text: modelData.text
+                    text: row.text
                     textFormat: Text.PlainText
-                    color: modelData.known && !view.old ? Theme.value : Theme.secondary
+                    color: row.known && !view.old ? Theme.value : Theme.secondary
                     font.pointSize: Theme.valueSize
                     wrapMode: Text.Wrap
                     Accessible.ignored: true

@@ -9,22 +9,25 @@ Row {
     // Is this a screen on which one may begin?
     required property bool mayBegin
 
-    SignButton {
-        visible: actions.recorder.recording
-        text: qsTr("Mark this moment")
-        sign: "mark"
-        onTapped: actions.recorder.mark()
-    }
-    SignButton {
-        visible: actions.recorder.recording
-        text: qsTr("Stop recording")
-        sign: "stop"
-        onTapped: actions.recorder.stop()
-    }
-    SignButton {
-        visible: actions.mayBegin && actions.recorder.available && !actions.recorder.recording
-        text: qsTr("Record")
-        sign: "record"
-        onTapped: actions.recorder.start()
+    readonly property bool recording: recorder.recording
+    readonly property bool begins: mayBegin && recorder.available && !recording
+    readonly property var ways: ({
+        mark: { text: qsTr("Mark this moment"), go: () => recorder.mark() },
+        stop: { text: qsTr("Stop recording"), go: () => recorder.stop() },
+        record: { text: qsTr("Record"), go: () => recorder.start() }
+    })
+
+    Repeater {
+        model: actions.recording ? ["mark", "stop"] : actions.begins ? ["record"] : []
+
+        // qmllint disable unqualified
+        SignButton {
+            required property string modelData
+
+            text: actions.ways[modelData].text
+            sign: modelData
+            onTapped: actions.ways[modelData].go()
+        }
+        // qmllint enable unqualified
     }
 }

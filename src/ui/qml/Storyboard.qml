@@ -9,27 +9,19 @@ InterfaceDescription {
     CellPrototype {
         identifier: "LaunchView"
         opens: "FirstLevelViewController"
-        look: Component {
-            LaunchView {}
-        }
+        look: Qt.resolvedUrl("LaunchView.qml")
     }
     CellPrototype {
         identifier: "FirstClickView"
         opens: "SecondLevelViewController"
-        look: Component {
-            FirstClickView {}
-        }
+        look: Qt.resolvedUrl("FirstClickView.qml")
     }
     CellPrototype {
         identifier: "SecondClickView"
-        look: Component {
-            SecondClickView {}
-        }
+        look: Qt.resolvedUrl("SecondClickView.qml")
     }
     CellPrototype {
         identifier: "ThirdClickView"
-        look: Component {
-            ThirdClickView {}
-        }
+        look: Qt.resolvedUrl("ThirdClickView.qml")
     }
 }

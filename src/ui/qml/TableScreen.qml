@@ -18,21 +18,26 @@ Screen {
         model: screen.table
         storyboard: screen.navigation.storyboard
         focus: true
-        visible: !emptyText.visible
+        visible: !emptyText.wanted
         header: screen.isFirst ? firstHeader : null
         footer: screen.isFirst ? firstFooter : null
     }
-    EmptyText {
+    // Made for the first table without text.
+    Loader {
         id: emptyText
+
+        readonly property bool wanted: screen.table.blank
+
         anchors {
             top: parent.top
             left: parent.left
             right: parent.right
         }
-        visible: screen.table.blank
-        title: screen.table.title
-        technology: screen.table.previousTitle
-        hasRows: screen.table.count > 0
+        visible: wanted
+        onWantedChanged: {
+            if (wanted && !item)
+                setSource("EmptyText.qml", { table: screen.table });
+        }
     }
     Component {
         id: firstHeader

@@ -1,20 +1,26 @@
 #include "ui/quick/InterfaceDescription.h"
 
+#include <QtQml/QQmlEngine>
 #include <algorithm>
 
 #include "ui/screens/StandardScreens.h"
 
 namespace qel {
 
-const CellPrototype* InterfaceDescription::find(const QString& identifier) const {
+QQmlComponent* CellPrototype::component() {
+  if (!_component) _component = new QQmlComponent(qmlEngine(this), look, this);
+  return _component;
+}
+
+CellPrototype* InterfaceDescription::find(const QString& identifier) const {
   const auto named = [&identifier](const auto* cell) { return cell->identifier == identifier; };
   const auto found = std::find_if(_cells.begin(), _cells.end(), named);
   return found == _cells.end() ? nullptr : *found;
 }
 
 QQmlComponent* InterfaceDescription::lookOf(const QString& identifier) const {
-  const CellPrototype* cell = find(identifier);
-  return cell ? cell->look : nullptr;
+  CellPrototype* cell = find(identifier);
+  return cell ? cell->component() : nullptr;
 }
 
 std::string InterfaceDescription::destinationOfCell(std::string_view cellIdentifier) const {

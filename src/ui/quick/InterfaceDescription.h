@@ -4,6 +4,7 @@
 #include <QtQml/qqmlregistration.h>
 #include <QtCore/QList>
 #include <QtCore/QObject>
+#include <QtCore/QUrl>
 #include <QtQml/QQmlComponent>
 #include <QtQml/QQmlListProperty>
 
@@ -11,20 +12,26 @@
 
 namespace qel {
 
-// How the cells of one identifier look and which screen a tap on them opens.
+// How the cells of one identifier look and which screen a tap on them opens. The look is read when
+// it is first asked for.
 class CellPrototype : public QObject {
   Q_OBJECT
   QML_ELEMENT
   Q_PROPERTY(QString identifier MEMBER identifier)
-  Q_PROPERTY(QQmlComponent* look MEMBER look)
+  Q_PROPERTY(QUrl look MEMBER look)
   Q_PROPERTY(QString opens MEMBER opens)
 
  public:
   using QObject::QObject;
 
   QString identifier;
-  QQmlComponent* look = nullptr;
+  QUrl look;
   QString opens;  // a screen's class name; empty: none
+
+  QQmlComponent* component();
+
+ private:
+  QQmlComponent* _component = nullptr;  // a child
 };
 
 class InterfaceDescription : public QObject, public Storyboard {
@@ -50,7 +57,7 @@ class InterfaceDescription : public QObject, public Storyboard {
   std::shared_ptr<TableViewController> makeScreen(std::string_view className) const override;
 
  private:
-  const CellPrototype* find(const QString& identifier) const;
+  CellPrototype* find(const QString& identifier) const;
 
   QList<CellPrototype*> _cells;
 };

@@ -9,23 +9,29 @@
 namespace qel {
 namespace {
 
-QVariantList linesOf(const NowPage& page) {
-  QVariantList lines;
+std::vector<RowsModel::Row> linesOf(const NowPage& page) {
+  std::vector<RowsModel::Row> lines;
   for (const NowLine& line : page.lines) {
-    lines << QVariantMap{{"id", shown(line.id)},
-                         {"text", shown(line.text)},
-                         {"spoken", shown(line.spoken)},
-                         {"known", line.isKnown}};
+    if (line.id.empty()) continue;  // nothing is known at all
+    lines.push_back(
+        {shown(line.id),
+         {},
+         {{"text", shown(line.text)}, {"spoken", shown(line.spoken)}, {"known", line.isKnown}}});
   }
   return lines;
 }
 
-QVariantList othersOf(const NowPage& page) {
-  QVariantList others;
+std::vector<RowsModel::Row> othersOf(const NowPage& page) {
+  std::vector<RowsModel::Row> others;
   for (const auto& reading : {page.quality, page.sinr}) {
-    if (reading && !reading->figure.empty()) others << contentOf(*reading);
+    if (!reading || reading->figure.empty()) continue;
+    others.push_back({shown(reading->name), {}, contentOf(*reading)});
   }
   return others;
+}
+
+bool haveSameWords(const NowPage& a, const NowPage& b) {
+  return a.reason == b.reason && a.advice == b.advice && a.badge == b.badge && a.spoken == b.spoken;
 }
 
 bool haveSameRuns(const NowPage& a, const NowPage& b) {
@@ -42,13 +48,15 @@ bool haveSameRuns(const NowPage& a, const NowPage& b) {
 }  // namespace
 
 void NowModel::take(NowPage page) {
-  const bool sameRuns = haveSameRuns(_page, page);
-  _page = std::move(page);
-  _lines = linesOf(_page);
-  _level = contentOf(_page.level);
-  _others = othersOf(_page);
-  emit changed();
-  if (!sameRuns) emit runsChanged();
+  const NowPage before = std::exchange(_page, std::move(page));
+  if (before.lines != _page.lines) _lines.take(linesOf(_page));
+  if (before.quality != _page.quality || before.sinr != _page.sinr) _others.take(othersOf(_page));
+  if (before.level != _page.level) {
+    _level = contentOf(_page.level);
+    emit levelChanged();
+  }
+  if (!haveSameWords(before, _page)) emit changed();
+  if (!haveSameRuns(before, _page)) emit runsChanged();
 }
 
 QString NowModel::reason() const { return shown(_page.reason); }

@@ -3,14 +3,15 @@
 
 #include <QtQml/qqmlregistration.h>
 #include <QtCore/QObject>
-#include <QtCore/QVariantList>
 #include <QtCore/QVariantMap>
 
 #include "ui/pages/NowPage.h"
+#include "ui/quick/pages/RowsModel.h"
 
 namespace qel {
 
-// GUI thread only. Every text comes ready from the page.
+// GUI thread only. Every text comes ready from the page; what a new page says as the one before did
+// is not announced.
 class NowModel : public QObject {
   Q_OBJECT
   QML_ELEMENT
@@ -19,9 +20,9 @@ class NowModel : public QObject {
   Q_PROPERTY(QString advice READ advice NOTIFY changed)
   Q_PROPERTY(QString badge READ badge NOTIFY changed)
   Q_PROPERTY(QString spoken READ spoken NOTIFY changed)
-  Q_PROPERTY(QVariantList lines READ lines NOTIFY changed)
-  Q_PROPERTY(QVariant level READ level NOTIFY changed)
-  Q_PROPERTY(QVariantList others READ others NOTIFY changed)
+  Q_PROPERTY(qel::RowsModel* lines READ lines CONSTANT)
+  Q_PROPERTY(QVariant level READ level NOTIFY levelChanged)
+  Q_PROPERTY(qel::RowsModel* others READ others CONSTANT)
 
  public:
   using QObject::QObject;
@@ -33,20 +34,21 @@ class NowModel : public QObject {
   QString advice() const;
   QString badge() const;
   QString spoken() const;
-  QVariantList lines() const { return _lines; }    // text, spoken, known
-  QVariant level() const { return _level; }        // name, figure, unit, grade, word, step, …
-  QVariantList others() const { return _others; }  // quality and signal to noise, alike
+  RowsModel* lines() { return &_lines; }     // text, spoken, known
+  QVariant level() const { return _level; }  // name, figure, unit, grade, word, step, …
+  RowsModel* others() { return &_others; }   // quality and signal to noise, alike
 
  signals:
   void changed();
+  void levelChanged();
   // Other points than before, or the same at other places.
   void runsChanged();
 
  private:
   NowPage _page;
-  QVariantList _lines;
+  RowsModel _lines;
   QVariantMap _level;
-  QVariantList _others;
+  RowsModel _others;
 };
 
 }  // namespace qel
