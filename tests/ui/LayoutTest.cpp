@@ -1,6 +1,7 @@
 #include <gtest/gtest.h>
 
 #include <QtTest/QTest>
+#include <algorithm>
 
 #include "ui/Window.h"
 
@@ -135,6 +136,13 @@ TEST(LongValues, breakAfterUnderscores) {
   EXPECT_TRUE(value->property("text").toString().contains(QStringLiteral("KLTE_\u200B")));
 }
 
+int rowOf(const TableModel& table, const QString& text) {
+  for (int row = 0; row < table.count(); ++row) {
+    if (table.data(table.index(row), TableModel::textRole).toString() == text) return row;
+  }
+  return -1;
+}
+
 TEST(Motion, bothScreensAreInSightWhileTheySlide) {
   const Window window(true);
   window.tap("LTE");
@@ -192,6 +200,28 @@ TEST(Motion, aDragThatTurnsBackStays) {
   for (int x = 200; x >= 10; x -= 10) QTest::mouseMove(&window.window(), QPoint(x, 300), 1);
   QTest::mouseRelease(&window.window(), Qt::LeftButton, Qt::NoModifier, QPoint(10, 300));
   EXPECT_EQ(window.navigation().depth(), 2);
+}
+
+// Every frame costs as much as that of the values themselves.
+TEST(Motion, aChangedValueFadesInFewFrames) {
+  const Window window(true);
+  window.store().myLTERRCStateDict = {{"state", "before"}};
+  window.top().choose(1);
+  window.top().choose(rowOf(window.top(), "RRC State"));
+  ASSERT_TRUE(QTest::qWaitFor([&window] { return window.row(0) && window.shows("before"); }));
+  const auto parts = window.row(0)->childItems();
+  const auto isTint = [](const QQuickItem* item) { return item->property("steps").isValid(); };
+  const auto tint = std::find_if(parts.begin(), parts.end(), isTint);
+  ASSERT_NE(tint, parts.end());
+  EXPECT_EQ((*tint)->opacity(), 0);
+  window.store().myLTERRCStateDict = {{"state", "after"}};
+  window.refresh();
+  EXPECT_GT((*tint)->opacity(), 0);
+  int frames = 0;
+  QObject::connect(&window.window(), &QQuickWindow::frameSwapped, &window.window(),
+                   [&frames] { ++frames; });
+  EXPECT_TRUE(QTest::qWaitFor([&tint] { return (*tint)->opacity() == 0; }));
+  EXPECT_LE(frames, 10);
 }
 
 }  // namespace

@@ -3,6 +3,7 @@
 #include <gtest/gtest.h>
 
 #include <QtCore/QElapsedTimer>
+#include <QtCore/QPointer>
 #include <QtGui/QClipboard>
 #include <QtGui/QGuiApplication>
 #include <QtTest/QTest>
@@ -61,6 +62,18 @@ TEST(PagesInTheWindow, theFirstScreenShowsTheCellAndItsLevel) {
   EXPECT_TRUE(window.shows("PCI 123, EARFCN 1300"));
   EXPECT_TRUE(window.shows("LTE 3"));
   EXPECT_EQ(window.warnings(), 0);
+}
+
+TEST(PagesInTheWindow, aLineThatSaysTheSameIsNotMadeAnew) {
+  const Window window;
+  reportCell(123);
+  reportLevel(-86);
+  ASSERT_TRUE(comesToShow(window, "-86"));
+  const QPointer<QQuickItem> line = window.find("PCI 123, EARFCN 1300");
+  ASSERT_TRUE(line);
+  reportLevel(-90);
+  ASSERT_TRUE(comesToShow(window, "-90"));
+  EXPECT_TRUE(line);
 }
 
 TEST(PagesInTheWindow, aTapOnTheLevelOpensItsCurves) {

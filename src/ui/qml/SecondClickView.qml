@@ -24,12 +24,12 @@ Tappable {
     onTapped: table.choose(index)
 
     // A row that comes into sight is not one that changed.
-    Component.onCompleted: tint.left = 0
-    ListView.onReused: tint.left = 0
+    Component.onCompleted: tint.stepsLeft = 0
+    ListView.onReused: tint.stepsLeft = 0
     onChangesChanged: {
         if (changes === 0 || Theme.changeMs === 0)
             return;
-        tint.left = tint.steps;
+        tint.stepsLeft = tint.steps;
         fade.restart();
     }
 
@@ -51,18 +51,18 @@ Tappable {
 
         // So thin a colour fades in a few steps as smoothly as in many, and every step is drawn.
         readonly property int steps: 4
-        property int left: 0
+        property int stepsLeft: 0
 
         anchors.fill: parent
         color: Theme.pressTint
-        opacity: left / steps
+        opacity: stepsLeft / steps
 
         Timer {
             id: fade
             interval: Theme.changeMs / tint.steps
             repeat: true
-            running: tint.left > 0
-            onTriggered: --tint.left
+            running: tint.stepsLeft > 0
+            onTriggered: --tint.stepsLeft
         }
     }
 

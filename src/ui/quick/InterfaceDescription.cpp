@@ -3,12 +3,14 @@
 #include <QtQml/QQmlEngine>
 #include <algorithm>
 
+#include "base/FatalError.h"
 #include "ui/screens/StandardScreens.h"
 
 namespace qel {
 
 QQmlComponent* CellPrototype::component() {
   if (!_component) _component = new QQmlComponent(qmlEngine(this), look, this);
+  if (!_component->isReady()) fatalError(_component->errorString().toStdString());
   return _component;
 }
 

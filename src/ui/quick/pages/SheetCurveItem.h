@@ -7,7 +7,8 @@
 namespace qel {
 
 // GUI thread.
-class SheetCurveItem : public SmallCurveItem {
+// The tools of QML look for the base by its whole name.
+class SheetCurveItem : public qel::SmallCurveItem {
   Q_OBJECT
   QML_NAMED_ELEMENT(SheetCurve)
   Q_PROPERTY(qel::SheetModel* sheet READ page WRITE setPage NOTIFY pageChanged)

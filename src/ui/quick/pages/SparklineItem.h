@@ -7,7 +7,8 @@
 namespace qel {
 
 // GUI thread.
-class SparklineItem : public SmallCurveItem {
+// The tools of QML look for the base by its whole name.
+class SparklineItem : public qel::SmallCurveItem {
   Q_OBJECT
   QML_NAMED_ELEMENT(Sparkline)
   Q_PROPERTY(qel::NowModel* page READ page WRITE setPage NOTIFY pageChanged)
