@@ -12,36 +12,79 @@ elseif(QEL_BATCHES)
   set(QEL_NAME_WARNINGS)  # others cannot tell neighbours' names from a function's own
 endif()
 
-# The names that a source declares outside of functions and classes. Each NAME comes with what it
-# stands for in a variable own_NAME: what is taken over with using is the same everywhere.
-macro(qel_read_own_names source)
+# Adds the names that a source or header declares outside of functions and classes to own_names. Each
+# NAME comes with what it stands for in a variable own_NAME: what is taken over with using is the same
+# everywhere.
+macro(qel_read_names source)
   file(READ ${source} text)
   string(REGEX REPLACE "[][;\\]" " " text "${text}")  # lists trip over these
   string(REGEX MATCHALL "\n[A-Za-z][^\n]*" lines "${text}")
-  set(own_names)
   foreach(line IN LISTS lines)
     set(meaning ${source})
-    if(line MATCHES "^\n(TEST|TYPED_TEST|INSTANTIATE|namespace [a-z:]+ {|using namespace|.*operator)" OR
+    if(line MATCHES "^\n(TEST|TYPED_TEST|INSTANTIATE|namespace [A-Za-z:]+ {|using namespace|.*operator)" OR
        line MATCHES "^\n[^({=]*[A-Za-z0-9_>]::~?[A-Za-z0-9_]+\\(")  # of a class
       continue()
-    elseif(line MATCHES "^\n(using|namespace) ([A-Za-z0-9_]+) =" OR
-           line MATCHES "^\n(using) .*:([A-Za-z0-9_]+) *$")
+    elseif(line MATCHES "^\n(using|namespace) ([A-Za-z0-9_]+) =")
       set(names ${CMAKE_MATCH_2})
+      string(REPLACE " ::" " " meaning "${line}")
+    elseif(line MATCHES "^\nusing .*:([A-Za-z0-9_]+) *$")
+      set(names ${CMAKE_MATCH_1})
       string(REPLACE " ::" " " meaning "${line}")
     elseif(line MATCHES "^\nenum ")
       string(REGEX MATCHALL "[A-Za-z0-9_]+" names "${line}")
       list(REMOVE_ITEM names enum class std uint8_t uint16_t)
-    elseif(line MATCHES "^\n(struct|class|MATCHER[_P0-9]*) ?\\(?([A-Za-z0-9_]+)" OR
-           line MATCHES "(^| |[*&])([A-Za-z0-9_]+) *[({=]")
+    elseif(line MATCHES "^\n(struct|class) [A-Za-z0-9_]+ *$")
+      continue()  # declared only
+    elseif(line MATCHES "^\n(struct|class|MATCHER[_P0-9]*) ?\\(?([A-Za-z0-9_]+)")
       set(names ${CMAKE_MATCH_2})
+    elseif(line MATCHES "(^| |[*&])([A-Za-z0-9_]+) *[({=]")
+      set(names ${CMAKE_MATCH_2})
+    elseif(line MATCHES "^\n[^(]*[ *&]([A-Za-z0-9_]+) $")  # without a value
+      set(names ${CMAKE_MATCH_1})
     else()
       continue()
     endif()
     foreach(name IN LISTS names)
-      list(APPEND own_names ${name})
-      set(own_${name} "${meaning}")
+      if(NOT name IN_LIST own_names)  # else a header has it
+        list(APPEND own_names ${name})
+        set(own_${name} "${meaning}")
+      endif()
     endforeach()
   endforeach()
+endmacro()
+
+# The names of a header, read once: own_names as above, all of which stand for the header's.
+function(qel_names_of_header header variable)
+  get_property(known GLOBAL PROPERTY "QEL_NAMES ${header}" SET)
+  if(NOT known)
+    set(own_names)
+    qel_read_names(${header})
+    list(REMOVE_DUPLICATES own_names)
+    set_property(GLOBAL PROPERTY "QEL_NAMES ${header}" "${own_names}")
+  endif()
+  get_property(names GLOBAL PROPERTY "QEL_NAMES ${header}")
+  set(${variable} "${names}" PARENT_SCOPE)
+endfunction()
+
+# The names of a source and of the headers that it includes itself. A function of a neighbour's own
+# would stand in the way of a header's function of the same name, often without an error.
+macro(qel_read_visible_names source)
+  set(own_names)
+  file(STRINGS ${source} includes REGEX "^#include \"")
+  foreach(include IN LISTS includes)
+    string(REGEX REPLACE "^#include \"([^\"]*)\".*" "\\1" include "${include}")
+    foreach(folder src tests fuzz trials benchmarks)
+      if(EXISTS ${CMAKE_SOURCE_DIR}/${folder}/${include})
+        qel_names_of_header(${CMAKE_SOURCE_DIR}/${folder}/${include} names)
+        foreach(name IN LISTS names)
+          list(APPEND own_names ${name})
+          set(own_${name} ${include})
+        endforeach()
+        break()
+      endif()
+    endforeach()
+  endforeach()
+  qel_read_names(${source})
 endmacro()
 
 # Every source goes into the first batch that has room for it and no other thing of the same name.
@@ -59,7 +102,7 @@ function(qel_compile_in_batches target)
   set(size_0 0)
   foreach(source IN LISTS sources)
     cmake_path(ABSOLUTE_PATH source NORMALIZE)
-    qel_read_own_names(${source})
+    qel_read_visible_names(${source})
     set(batch 0)
     while(batch LESS_EQUAL last)
       set(fits TRUE)
