@@ -2,7 +2,7 @@ import QtQuick
 import Qelwatch.Ui
 
 // One chart with its title, its newest value, and what is read off it. A tap or a held finger reads
-// off, a drag moves through time; the keys do both.
+// off, a drag moves through time; the keys do both. Two fingers and the wheel zoom.
 FocusScope {
     id: view
 
@@ -14,8 +14,22 @@ FocusScope {
     readonly property bool reading: curves.readOff.chart === index
     readonly property var values: reading ? curves.readOff.values : []
 
+    // While a finger that was held reads off.
+    property bool held: false
+    // While the page below is not to scroll.
+    readonly property bool gesturing: held || drag.active || (finger.active && finger.joined)
+
     function placeOf(x: real): real {
         return (x - chart.plotLeft) / Math.max(1, chart.plotWidth);
+    }
+
+    function toggleReadingAt(x: real): void {
+        const place = placeOf(x);
+        const near = Math.abs((curves.readOff.place ?? -1) - place) * chart.plotWidth < 16;
+        if (near)
+            curves.stopReading();
+        else
+            curves.readAt(index, place);
     }
 
     implicitHeight: heading.height + Theme.chartHeight
@@ -128,51 +142,93 @@ FocusScope {
             }
             // qmllint enable unqualified
         }
-    }
-    MouseArea {
-        id: finger
 
-        property real pressedAt: 0
-        property real movedTo: 0
-        property bool held: false
-        property bool drags: false
+        // The first finger, whatever its gesture becomes.
+        PointHandler {
+            id: finger
 
-        anchors.fill: chart
-        preventStealing: held || drags
-        pressAndHoldInterval: 250
-        Accessible.ignored: true
+            property real lastX: 0
+            property bool mayTap: false
+            property bool joined: false // by a second
 
-        onPressed: mouse => {
-            view.forceActiveFocus(Qt.MouseFocusReason);
-            pressedAt = movedTo = mouse.x;
-            held = drags = false;
-        }
-        onPressAndHold: mouse => {
-            if (drags)
-                return;
-            held = true;
-            view.curves.readAt(view.index, view.placeOf(mouse.x));
-        }
-        onPositionChanged: mouse => {
-            if (held) {
-                view.curves.readAt(view.index, view.placeOf(mouse.x));
-            } else if (drags || Math.abs(mouse.x - pressedAt) > 12) {
-                drags = true;
-                view.curves.move((mouse.x - movedTo) / Math.max(1, chart.plotWidth));
-                movedTo = mouse.x;
+            acceptedButtons: Qt.LeftButton
+            onGrabChanged: (transition, eventPoint) => {
+                if (transition === PointerDevice.GrabPassive) {
+                    view.forceActiveFocus(Qt.MouseFocusReason);
+                    mayTap = true;
+                    joined = false;
+                    hold.restart();
+                    return;
+                }
+                // One that was taken away, not lifted, is no tap.
+                if (mayTap && !view.held && eventPoint.state & Qt.TouchPointReleased)
+                    view.toggleReadingAt(lastX);
+                mayTap = view.held = false;
+                hold.stop();
+            }
+            onPointChanged: {
+                if (!active)
+                    return;
+                lastX = point.position.x;
+                const way = Qt.vector2d(point.scenePosition.x - point.scenePressPosition.x,
+                                        point.scenePosition.y - point.scenePressPosition.y);
+                if (way.length() > Qt.styleHints.startDragDistance)
+                    mayTap = false;
+                if (view.held)
+                    view.curves.readAt(view.index, view.placeOf(lastX));
             }
         }
-        onClicked: mouse => {
-            if (held || drags)
-                return;
-            const place = view.placeOf(mouse.x);
-            const near = Math.abs((view.curves.readOff.place ?? -1) - place) * chart.plotWidth < 16;
-            if (near)
-                view.curves.stopReading();
-            else
-                view.curves.readAt(view.index, place);
+        Timer {
+            id: hold
+            interval: 250
+            onTriggered: {
+                view.held = finger.mayTap;
+                if (view.held)
+                    view.curves.readAt(view.index, view.placeOf(finger.lastX));
+            }
         }
-        onWheel: wheel => view.curves.zoom(wheel.angleDelta.y > 0 ? 0.8 : 1.25, view.placeOf(wheel.x))
+        DragHandler {
+            id: drag
+
+            property real movedTo: 0
+
+            target: null
+            enabled: !view.held
+            yAxis.enabled: false
+            grabPermissions: PointerHandler.CanTakeOverFromItems
+                             | PointerHandler.ApprovesTakeOverByHandlersOfDifferentType
+            // Who is left of two goes on from where it is.
+            onActiveChanged: movedTo = finger.joined ? centroid.position.x : centroid.pressPosition.x
+            onCentroidChanged: {
+                if (!active)
+                    return;
+                view.curves.move((centroid.position.x - movedTo) / Math.max(1, chart.plotWidth));
+                movedTo = centroid.position.x;
+            }
+        }
+        PinchHandler {
+            property real before: 1
+
+            target: null
+            onGrabChanged: transition => {
+                if (transition !== PointerDevice.GrabPassive)
+                    return;
+                finger.joined = true;
+                finger.mayTap = view.held = false;
+            }
+            onActiveChanged: before = 1
+            onActiveScaleChanged: {
+                if (!active || activeScale <= 0)
+                    return;
+                view.curves.zoom(before / activeScale, view.placeOf(centroid.position.x));
+                before = activeScale;
+            }
+        }
+        WheelHandler {
+            target: null
+            acceptedDevices: PointerDevice.Mouse | PointerDevice.TouchPad
+            onWheel: event => view.curves.zoom(event.angleDelta.y > 0 ? 0.8 : 1.25, view.placeOf(event.x))
+        }
     }
     FocusRing {
         anchors.margins: -6

@@ -124,21 +124,10 @@ Screen {
                                 height: implicitHeight
                                 curves: screen.curves
                                 focus: index === 0
+                                onGesturingChanged: flick.interactive = !gesturing
+                                Component.onDestruction: flick.interactive = true
                             }
                             // qmllint enable unqualified
-                        }
-                    }
-                    PinchHandler {
-                        property real before: 1
-
-                        target: null
-                        onActiveChanged: before = 1
-                        onActiveScaleChanged: {
-                            if (!active || activeScale <= 0)
-                                return;
-                            screen.curves.zoom(before / activeScale,
-                                               centroid.position.x / Math.max(1, charts.width));
-                            before = activeScale;
                         }
                     }
                 }
