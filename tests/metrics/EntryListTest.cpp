@@ -38,7 +38,8 @@ TEST(EntryList, holdsTheNewestOfReportsThatNobodyLookedAt) {
 
 TEST(EntryList, changesWithEveryReportThatIsLookedAt) {
   FedValidator validator;
-  for (const auto& powers : {std::initializer_list{1, 2}, {3}, {}, {4, 5, 6}}) {
+  using Powers = std::initializer_list<int>;
+  for (const Powers& powers : {Powers{1, 2}, Powers{3}, Powers{}, Powers{4, 5, 6}}) {
     validator.feed(kTxPower, reportOf(powers));
     EXPECT_EQ(validator->myLTE.TxPower, listOf(powers));
     EXPECT_EQ(validator->myLTE.TxPower.size(), powers.size());
