@@ -35,9 +35,9 @@ TEST(SmallBlocks, goRoundBetweenAThreadThatTakesAndOneThatGivesBack) {
   constexpr std::size_t kBlocksOfARound = 50;
   std::set<void*> seen;
   std::vector<void*> blocks;
-  SerialQueue taker("taker");
-  SerialQueue giver("giver");
   MainQueue main;
+  SerialQueue giver("giver");
+  SerialQueue taker("taker");
   for (int round = 0; round < kRounds; ++round) {
     bool done = false;
     taker.async([&] {

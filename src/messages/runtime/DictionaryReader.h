@@ -207,6 +207,7 @@ struct SpreadTarget {
       entries.make(index, key, std::forward<T>(value));
     } else {
       entries[index].value = Value(std::forward<T>(value));
+      entries.note(index);
     }
   }
   Cursor readAt(std::size_t place, Cursor cursor) {
