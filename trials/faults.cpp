@@ -19,6 +19,8 @@ constexpr std::array kScenarios = {
     Scenario{"kill-bus", "bus killed", 250, 1, killBus},
     Scenario{"kill-viewer", "viewer killed", 250, 1, killViewer},
     Scenario{"kill-recorder", "recorder killed", 250, 1, killRecorder},
+    Scenario{"kill-broker", "broker killed", 50, 0, killBroker},
+    Scenario{"kill-publisher", "publisher killed", 50, 0, killPublisher},
     Scenario{"stop-service", "service stopped for up to 6 s", 20, 0, stopService},
     Scenario{"stop-bus", "bus stopped for up to 6 s", 20, 0, stopBus},
     Scenario{"stop-watchers", "viewer, `live` or recorder stopped for up to 6 s", 30, 0,

@@ -20,6 +20,8 @@ struct RecorderIdentity {
 // The viewer itself is application 2.
 inline const RecorderIdentity kConsoleRecorder = {"qelctl-record", 3};
 inline const RecorderIdentity kViewersRecorder = {"qelwatch-record", 4};
+inline const RecorderIdentity kPublisher = {"qelctl-publish", 5};
+inline const RecorderIdentity kExporter = {"qelctl-exporter", 6};
 
 // Main thread. Events go to the sink on a thread of the connection's own. The end of this ends the
 // delivery and, when no other of its name is at work, clears its configuration.

@@ -14,6 +14,15 @@ using std::chrono::steady_clock;
 
 }  // namespace
 
+std::optional<RecordedEvent> recordedEvent(std::string_view eventName, const tesk::Message& event,
+                                           std::uint64_t timeMs) {
+  if (eventName == tesk::kEventMetric) {
+    return RecordedEvent{timeMs, RecordedKind::metric, event.entries()};
+  }
+  if (eventName != tesk::kEventTrigger) return std::nullopt;
+  return RecordedEvent{timeMs, RecordedKind::trigger, event.entries()};
+}
+
 Recorder::Recorder(std::unique_ptr<RotatingRecording> recording,
                    std::unique_ptr<IdentityHider> hider, const Clock& clock)
     : _recording(std::move(recording)), _hider(std::move(hider)), _clock(clock) {}
@@ -27,11 +36,9 @@ bool Recorder::isRecordable(RecordedEvent& event) {
 }
 
 void Recorder::take(std::string_view eventName, const tesk::Message& event) {
-  if (eventName != tesk::kEventMetric && eventName != tesk::kEventTrigger) return;
-  const auto kind = eventName == tesk::kEventMetric ? RecordedKind::metric : RecordedKind::trigger;
   const std::lock_guard lock(_mutex);
-  RecordedEvent recorded{_clock.nowMs(), kind, event.entries()};
-  if (isRecordable(recorded)) _recording->write(recorded, steady_clock::now());
+  auto recorded = recordedEvent(eventName, event, _clock.nowMs());
+  if (recorded && isRecordable(*recorded)) _recording->write(*recorded, steady_clock::now());
 }
 
 bool Recorder::mark() {

@@ -4,6 +4,7 @@
 #include <cstdint>
 #include <memory>
 #include <mutex>
+#include <optional>
 #include <string>
 #include <string_view>
 
@@ -13,6 +14,11 @@
 #include "tesk/Message.h"
 
 namespace qel::capture {
+
+// An event of the stream of that name as a recording holds it. Nothing for other streams, which are
+// no part of one.
+std::optional<RecordedEvent> recordedEvent(std::string_view eventName, const tesk::Message& event,
+                                           std::uint64_t timeMs);
 
 // Any thread. Each event is written before take() returns: a disk that is slow holds the event
 // stream up, and the service counts what is lost by it.

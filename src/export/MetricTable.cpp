@@ -7,34 +7,16 @@
 #include "base/IsoTime.h"
 #include "base/Rendering.h"
 #include "base/Utf8.h"
+#include "export/ShownUnits.h"
 #include "messages/catalogue/FieldFacts.h"
 #include "messages/catalogue/KBBMetricUtility.h"
 
 namespace qel {
 namespace {
 
-const Rewrite* rewriteOf(std::span<const Rewrite> rewrites, std::string_view key) {
-  const auto found =
-      std::ranges::find(rewrites, key, [](const Rewrite& each) { return each.key.view(); });
-  return found == rewrites.end() ? nullptr : &*found;
-}
-
-bool makesText(const Rewrite& rewrite) {
-  return rewrite.kind == Rewrite::Kind::listText || rewrite.kind == Rewrite::Kind::integerListText;
-}
-
 bool makesFraction(const Rewrite& rewrite) {
   return rewrite.kind == Rewrite::Kind::scaleFloat || rewrite.kind == Rewrite::Kind::divideFloat ||
          rewrite.kind == Rewrite::Kind::bandwidth;
-}
-
-// Milliseconds since 1970.
-bool isTime(const FieldFacts* facts) { return facts && facts->form == FieldForm::time; }
-
-// A value that the dispatcher does not turn into the unit of the tables stays as it travels.
-std::string unitOf(const FieldFacts* facts, const Rewrite* rewrite) {
-  if (!facts || isTime(facts)) return "";
-  return std::string(rewrite || facts->raw.empty() ? facts->unit : facts->raw);
 }
 
 ColumnType typeOf(const FieldShape& field, const FieldFacts* facts, const Rewrite* rewrite) {

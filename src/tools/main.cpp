@@ -56,6 +56,7 @@ int main(int argc, char* argv[]) {
   tools::addStatusCommand(app, chosen);
   tools::addLiveCommand(app, chosen, verbose);
   tools::addRecordCommand(app, chosen);
+  tools::addPublishCommand(app, chosen);
   tools::addImportCommand(app, chosen);
   tools::addExportCommand(app, chosen);
   tools::addDiagReportCommand(app, chosen);

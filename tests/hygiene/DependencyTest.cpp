@@ -32,12 +32,13 @@ const std::map<std::string, std::set<std::string>> kAllowed = {
     {"ui",
      {"base", "capture", "connection", "history", "messages", "metrics", "radio", "recording"}},
     {"feed", {"base", "history", "service", "sources", "tesk", "ui"}},
+    {"fleet", {"base", "capture", "export", "messages", "metrics", "recording", "tesk"}},
     {"app",
      {"base", "bus", "capture", "feed", "history", "metrics", "recording", "service", "sources",
       "tesk", "ui"}},
     {"tools",
-     {"base", "bus", "capture", "export", "feed", "history", "messages", "metrics", "radio",
-      "recording", "sources", "tesk", "ui"}},
+     {"base", "bus", "capture", "export", "feed", "fleet", "history", "messages", "metrics",
+      "radio", "recording", "sources", "tesk", "ui"}},
 };
 
 // Foreign header prefix → the folders (path prefixes in src/) that may include it.
@@ -47,7 +48,8 @@ const std::vector<std::pair<std::string, std::vector<std::string>>> kForeign = {
     {"google/protobuf/", {"src/messages/generator/"}},
     {"nlohmann/", {"src/recording/", "src/tools/"}},
     {"CLI/", {"src/tools/", "src/app/", "src/service/daemon/"}},
-    {"sqlite3.h", {"src/export/"}},
+    {"sqlite3.h", {"src/export/", "src/fleet/"}},
+    {"mosquitto.h", {"src/fleet/"}},
     {"curses.h", {"src/tools/watch/"}},
     {"zlib.h", {"src/recording/"}},
 };

@@ -10,6 +10,9 @@ void killBus(Trial& trial);
 void killViewer(Trial& trial);
 void killRecorder(Trial& trial);
 
+void killBroker(Trial& trial);
+void killPublisher(Trial& trial);
+
 void stopService(Trial& trial);
 void stopBus(Trial& trial);
 void stopWatchers(Trial& trial);

@@ -1,0 +1,96 @@
+// One connection to an MQTT 5 broker.
+#pragma once
+
+#include <chrono>
+#include <cstdint>
+#include <functional>
+#include <memory>
+#include <optional>
+#include <string>
+#include <string_view>
+
+#include "fleet/BrokerAddress.h"
+#include "fleet/Login.h"
+
+struct mosquitto;
+struct mqtt5__property;
+
+namespace qel::fleet {
+
+struct RetainedMessage {
+  std::string topic;
+  std::string text;
+};
+
+struct LinkSettings {
+  BrokerAddress broker;
+  std::string client;  // by which the broker knows it
+  std::optional<Login> login;
+  std::string caFile;           // empty: the authorities that the system trusts
+  std::string certificateFile;  // and its key: empty, or both
+  std::string keyFile;
+  std::chrono::seconds keepAlive{900};  // 0: the broker never hears of a silent client
+  RetainedMessage will;
+};
+
+// Why there is no connection.
+struct LinkFailure {
+  std::string why;         // a few words
+  bool isRefusal = false;  // trying again changes nothing: login, certificate, protocol
+};
+
+// One thread; every call but the first is for when poll() says so and waits for nothing. TLS is 1.2
+// or newer.
+class BrokerLink {
+ public:
+  enum class State : std::uint8_t { greeting, open, ended };
+  // Told in turn() that a message has arrived, or with the broker's reason why it was not taken.
+  using Arrival = std::function<void(int message, const std::string& refusal)>;
+
+  // Looks the host up and connects, as long as that takes. Nothing when it fails.
+  static std::unique_ptr<BrokerLink> open(const LinkSettings& settings, Arrival arrival,
+                                          LinkFailure& failure);
+  ~BrokerLink();
+  BrokerLink(const BrokerLink&) = delete;
+  BrokerLink& operator=(const BrokerLink&) = delete;
+
+  int descriptor() const;
+  bool wantsToWrite() const;
+  // Reads and writes what goes, and keeps the connection alive.
+  State turn(bool isReadable);
+  State state() const { return _state; }
+  const LinkFailure& failure() const { return _failure; }  // once it has ended
+  std::chrono::seconds keepAlive() const { return _keepAlive; }
+
+  enum class Retained : std::uint8_t { no, yes };
+  // With QoS 1. The number by which its arrival is told; nothing when it does not go out: it is
+  // larger than the broker takes (isTooLarge), or the link ends.
+  std::optional<int> send(const std::string& topic, std::string_view text, Retained retained,
+                          bool& isTooLarge);
+  // Several messages become few packets of the network: held back until this is false again.
+  void holdBack(bool held) const;
+  // Without the last will.
+  void sayGoodbye();
+
+ private:
+  BrokerLink(const LinkSettings& settings, Arrival arrival);
+  bool prepare(const LinkSettings& settings);
+  bool prepareTls(const LinkSettings& settings);
+  void note(int code);
+  void greeted(int reason, const mqtt5__property* properties);
+  void ended(int code);
+  static void setCallbacks(mosquitto* client);
+
+  struct EndClient {
+    void operator()(mosquitto* client) const;
+  };
+
+  const Arrival _arrival;
+  std::unique_ptr<mosquitto, EndClient> _client;
+  State _state = State::greeting;
+  LinkFailure _failure;
+  std::string _lastComplaint;  // of the library
+  std::chrono::seconds _keepAlive;
+};
+
+}  // namespace qel::fleet

@@ -1,0 +1,52 @@
+// qelctl publish between the service and a broker.
+#pragma once
+
+#include <algorithm>
+#include <csignal>
+#include <fstream>
+#include <iterator>
+#include <memory>
+#include <set>
+#include <string>
+#include <utility>
+#include <vector>
+
+#include "fleet/Broker.h"
+#include "tools/WithService.h"
+
+namespace qel::testing {
+
+class WithBroker : public WithService {
+ protected:
+  void SetUp() override { ASSERT_TRUE(Client(bus, "first").waitForReachable(true)); }
+
+  // The words of publish to that URL as the phone "one", with a queue in the test's directory.
+  std::vector<std::string> publishing(const std::string& url,
+                                      std::vector<std::string> more = {}) const {
+    std::vector<std::string> arguments = {"publish", url,    "--phone", "one",
+                                          "--every", "50ms", "--state", file("state")};
+    arguments.insert(arguments.end(), more.begin(), more.end());
+    return words(std::move(arguments));
+  }
+
+  // Ends it in order. What it said.
+  static std::string end(RunningQelctl& publisher) {
+    publisher.signal(SIGTERM);
+    EXPECT_EQ(publisher.waitForEnd(), 0) << publisher.err();
+    return publisher.err();
+  }
+
+  static bool isWithoutGap(const std::vector<std::uint64_t>& numbers) {
+    const std::set<std::uint64_t> distinct(numbers.begin(), numbers.end());
+    return !distinct.empty() && *distinct.begin() == 1 && *distinct.rbegin() == distinct.size();
+  }
+
+  std::string write(const std::string& name, const std::string& content,
+                    std::filesystem::perms rights = std::filesystem::perms(0600)) const {
+    std::ofstream(file(name)) << content;
+    std::filesystem::permissions(file(name), rights);
+    return file(name);
+  }
+};
+
+}  // namespace qel::testing
