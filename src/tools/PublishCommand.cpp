@@ -31,7 +31,7 @@ namespace qel::tools {
 namespace {
 
 using namespace std::chrono_literals;
-using Clock = MainLoop::Clock;
+using LoopClock = MainLoop::Clock;
 using Seconds = std::chrono::duration<double>;
 
 constexpr std::size_t kLargestConfigurationBytes = 1024 * 1024;
@@ -115,12 +115,13 @@ std::string summary(const fleet::Publisher& publisher, const fleet::EventQueue& 
 
 void runUntilTheEnd(const Options& options, MainLoop& loop, fleet::Publisher& publisher,
                     const fleet::EventIntake& intake) {
-  std::optional<Clock::time_point> end;
+  std::optional<LoopClock::time_point> end;
   if (options.durationS) {
-    end = Clock::now() + std::chrono::duration_cast<Clock::duration>(Seconds(*options.durationS));
+    end = LoopClock::now() +
+          std::chrono::duration_cast<LoopClock::duration>(Seconds(*options.durationS));
   }
   while (loop.runOnce(end)) {
-    if (end && Clock::now() >= *end) return;
+    if (end && LoopClock::now() >= *end) return;
     publisher.setLeftOut(intake.counts().undecodable);
     if (const auto refusal = publisher.refusal()) throw ToolError(EX_UNAVAILABLE, *refusal);
   }
@@ -155,7 +156,7 @@ void run(const Options& options) {
         intake.take(eventName, event);
       });
   const auto begun = connection->begin();
-  const bool isToEnd = !loop.runOnce(Clock::now());
+  const bool isToEnd = !loop.runOnce(LoopClock::now());
   if (begun.code != 0 && !settings.keepsTrying && !isToEnd) failWithoutService(begun.message);
   runUntilTheEnd(options, loop, publisher, intake);
   connection->end();
