@@ -106,6 +106,7 @@ bool BrokerLink::prepareTls(const LinkSettings& settings) {
 bool BrokerLink::prepare(const LinkSettings& settings) {
   mosquitto* client = _client.get();
   setCallbacks(client);
+  mosquitto_threaded_set(client, true);  // nothing is written but in turn()
   mosquitto_int_option(client, MOSQ_OPT_PROTOCOL_VERSION, MQTT_PROTOCOL_V5);
   mosquitto_int_option(client, MOSQ_OPT_SEND_MAXIMUM, kMostUnderWay);
   int code = MOSQ_ERR_SUCCESS;
@@ -178,8 +179,13 @@ bool BrokerLink::wantsToWrite() const { return mosquitto_want_write(_client.get(
 BrokerLink::State BrokerLink::turn(bool isReadable) {
   mosquitto* client = _client.get();
   int code = MOSQ_ERR_SUCCESS;
+  // Several messages become few packets of the network. And a broker that turns down the
+  // certificate says why and hangs up, after which writing fails: so what follows the certificate
+  // leaves with it.
+  holdBack(true);
   if (isReadable) code = mosquitto_loop_read(client, kMostUnderWay);
   if (code == MOSQ_ERR_SUCCESS && wantsToWrite()) code = mosquitto_loop_write(client, 1);
+  holdBack(false);
   if (code == MOSQ_ERR_SUCCESS) code = mosquitto_loop_misc(client);
   if (code != MOSQ_ERR_SUCCESS) note(code);
   return _state;
@@ -202,6 +208,9 @@ void BrokerLink::holdBack(bool held) const {
   ::setsockopt(descriptor(), IPPROTO_TCP, TCP_CORK, &value, sizeof value);
 }
 
-void BrokerLink::sayGoodbye() { mosquitto_disconnect_v5(_client.get(), 0, nullptr); }
+void BrokerLink::sayGoodbye() {
+  mosquitto_disconnect_v5(_client.get(), 0, nullptr);
+  turn(false);
+}
 
 }  // namespace qel::fleet

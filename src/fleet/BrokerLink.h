@@ -63,12 +63,10 @@ class BrokerLink {
   std::chrono::seconds keepAlive() const { return _keepAlive; }
 
   enum class Retained : std::uint8_t { no, yes };
-  // With QoS 1. The number by which its arrival is told; nothing when it does not go out: it is
-  // larger than the broker takes (isTooLarge), or the link ends.
+  // With QoS 1, in the next turn. The number by which its arrival is told; nothing when it does not
+  // go out: it is larger than the broker takes (isTooLarge), or the link ends.
   std::optional<int> send(const std::string& topic, std::string_view text, Retained retained,
                           bool& isTooLarge);
-  // Several messages become few packets of the network: held back until this is false again.
-  void holdBack(bool held) const;
   // Without the last will.
   void sayGoodbye();
 
@@ -76,6 +74,7 @@ class BrokerLink {
   BrokerLink(const LinkSettings& settings, Arrival arrival);
   bool prepare(const LinkSettings& settings);
   bool prepareTls(const LinkSettings& settings);
+  void holdBack(bool held) const;
   void note(int code);
   void greeted(int reason, const mqtt5__property* properties);
   void ended(int code);

@@ -135,10 +135,10 @@ void Publisher::beginLink() {
 // What was under way goes again over the next link.
 void Publisher::endLink() {
   if (!_link) return;
-  forgetArrived();
-  _queue.sendAgain();
   _underWay.clear();
+  forgetArrived();
   _arrived.clear();
+  _queue.sendAgain();
   _sentUpTo = 0;
   _isSending = false;
   _turnedDown.clear();
@@ -185,11 +185,13 @@ void Publisher::arrived(int message, const std::string& refusal) {
 }
 
 void Publisher::forgetArrived() {
-  if (_arrived.empty() || (isUnderWay() && _arrived.size() < kMostUnderWay / 4)) return;
+  if (_arrived.empty() || (isUnderWay() && _arrived.size() < _forgetAt)) return;
   if (_queue.remove(_arrived)) {
     _arrived.clear();
+    _forgetAt = kForgetTogether;
   } else {
     sayOnce(_queue.error());
+    _forgetAt = 2 * _arrived.size();  // a full disk may stay full for long
   }
 }
 
@@ -228,10 +230,8 @@ void Publisher::sendBatch() {
     _fresh = 1;  // and so again after a while
     return;
   }
-  _link->holdBack(true);
   while (_isSending && _underWay.size() < kMostUnderWay) _isSending = sendNext();
   if (!_isSending) tellOfQueue();
-  _link->holdBack(false);
 }
 
 // Some events more. False when none is left, or the link has ended.

@@ -58,6 +58,7 @@ class Publisher {
 
  private:
   using Clock = std::chrono::steady_clock;
+  static constexpr std::size_t kForgetTogether = 125;
 
   void run();
   void connect();
@@ -97,7 +98,8 @@ class Publisher {
   std::unique_ptr<BrokerLink> _link;
   Retries _retries;
   std::map<int, std::uint64_t> _underWay;  // by the link's number; 0: no event
-  std::vector<std::uint64_t> _arrived;     // to be removed from the queue
+  std::vector<std::uint64_t> _arrived;     // to be removed from the queue, so many together
+  std::size_t _forgetAt = kForgetTogether;
   std::uint64_t _sentUpTo = 0;
   bool _isSending = false;
   bool _wasConnected = false;
