@@ -54,6 +54,14 @@ bool Database::execute(const std::string& sql) {
          fail();
 }
 
+bool Database::sync() {
+  sqlite3_file* log = nullptr;
+  sqlite3_file_control(_database.get(), "main", SQLITE_FCNTL_JOURNAL_POINTER, &log);
+  const bool isSynced = !log || !log->pMethods ||  // nothing was written so far
+                        log->pMethods->xSync(log, SQLITE_SYNC_NORMAL) == SQLITE_OK;
+  return isSynced || fail("cannot be brought to the disk");
+}
+
 Database::Run Database::run(const char* sql) {
   auto& statement = _statements[sql];
   if (!statement) {
@@ -65,10 +73,6 @@ Database::Run Database::run(const char* sql) {
     statement.reset(made);
   }
   return {*this, statement.get()};
-}
-
-std::uint64_t Database::changes() const {
-  return static_cast<std::uint64_t>(sqlite3_changes64(_database.get()));
 }
 
 Database::Run::~Run() {

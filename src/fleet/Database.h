@@ -46,8 +46,8 @@ class Database {
   bool execute(const std::string& sql);
   // Of a text that outlives this.
   Run run(const char* sql);
-  // How many rows the last statement changed.
-  std::uint64_t changes() const;
+  // Waits until what was committed, in its write-ahead log, outlives a failure of power.
+  bool sync();
 
   // Undoes a transaction that has failed, and keeps why. Always false.
   bool rollBack();

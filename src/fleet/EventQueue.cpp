@@ -3,6 +3,7 @@
 #include <sys/random.h>
 #include <sys/stat.h>
 
+#include <algorithm>
 #include <cerrno>
 #include <cstring>
 #include <filesystem>
@@ -87,34 +88,44 @@ bool EventQueue::readState() {
     }
     if (facts.hasFailed()) return false;
   }
-  auto events = _database.run("SELECT count(*), sum(length(CAST(line AS BLOB))) FROM events");
+  auto events =
+      _database.run("SELECT count(*), sum(length(CAST(line AS BLOB))), max(number) FROM events");
   if (events.row()) {
     _counts.waiting = events.number(0);
     _counts.waitingBytes = events.number(1);
+    _counts.newest = std::max(_counts.newest, events.number(2));
   }
   return !events.hasFailed();
 }
 
 bool EventQueue::insert(std::uint64_t timeMs, std::string_view metric, std::string_view line) {
-  return _database.execute("BEGIN IMMEDIATE") &&
-         _database.run("INSERT INTO events VALUES (?1, ?2, ?3, ?4)")
-             .with(_counts.newest)
-             .with(timeMs)
-             .with(metric)
-             .with(line)
-             .done() &&
-         _database.run("UPDATE facts SET value = ?1 WHERE name = 'newest'")
-             .with(_counts.newest)
-             .done() &&
-         _database.execute("COMMIT");
+  return _database.run("INSERT INTO events VALUES (?1, ?2, ?3, ?4)")
+      .with(_counts.newest)
+      .with(timeMs)
+      .with(metric)
+      .with(line)
+      .done();
+}
+
+// For when no event is left that tells it.
+bool EventQueue::keepNewest() {
+  return _database.run("UPDATE facts SET value = ?1 WHERE name = 'newest'")
+      .with(_counts.newest)
+      .done();
+}
+
+// Once more after the log was given back, which on a full disk may be all the room there is.
+template <class Change>
+bool EventQueue::written(Change change) {
+  return change() || _database.rollBack() ||
+         (_database.execute("PRAGMA wal_checkpoint(TRUNCATE)") && change()) || _database.rollBack();
 }
 
 bool EventQueue::add(std::uint64_t timeMs, std::string_view metric, std::string_view line) {
   const std::lock_guard lock(_mutex);
   ++_counts.newest;
-  if (!insert(timeMs, metric, line)) {
+  if (!written([&] { return insert(timeMs, metric, line); })) {
     ++_counts.lost;
-    _database.rollBack();
     return false;
   }
   ++_counts.waiting;
@@ -173,7 +184,7 @@ bool EventQueue::dropUntil(std::uint64_t number) {
                       _database.run("UPDATE facts SET value = value + ?1 WHERE name = 'dropped'")
                           .with(count)
                           .done() &&
-                      _database.execute("COMMIT");
+                      keepNewest() && _database.execute("COMMIT");
   if (!isDone) return _database.rollBack();
   _counts.waiting -= count;
   _counts.waitingBytes -= bytes;
@@ -211,35 +222,33 @@ void EventQueue::sendAgain() {
 
 bool EventQueue::remove(std::span<const std::uint64_t> numbers) {
   const std::lock_guard lock(_mutex);
-  Counts after = _counts;
-  bool isDone = _database.execute("BEGIN IMMEDIATE");
-  for (std::size_t i = 0; isDone && i < numbers.size(); ++i) {
-    auto removed = _database.run(
-        "DELETE FROM events WHERE number = ?1"
-        " RETURNING length(CAST(line AS BLOB))");
-    if (!removed.with(numbers[i]).row()) {
-      isDone = !removed.hasFailed();
-      continue;
-    }
-    --after.waiting;
-    after.waitingBytes -= removed.number(0);
-  }
-  if (!isDone || !_database.execute("COMMIT")) return _database.rollBack();
-  _counts = after;
+  Counts after;
+  const bool isDone = written([&] {
+    after = _counts;
+    return _database.execute("BEGIN IMMEDIATE") &&
+           std::ranges::all_of(numbers, [&](auto number) { return take(number, after); }) &&
+           keepNewest() && _database.execute("COMMIT");
+  });
+  if (isDone) _counts = after;
+  return isDone;
+}
+
+bool EventQueue::take(std::uint64_t number, Counts& after) {
+  auto removed = _database.run(
+      "DELETE FROM events WHERE number = ?1"
+      " RETURNING length(CAST(line AS BLOB))");
+  if (!removed.with(number).row()) return !removed.hasFailed();
+  --after.waiting;
+  after.waitingBytes -= removed.number(0);
   return true;
 }
 
 bool EventQueue::settle() {
   const std::lock_guard lock(_mutex);
   if (_settled == _counts.newest) return true;
-  // A commit that waits for the disk takes all earlier ones with it.
-  const bool isDone = _database.execute("PRAGMA synchronous = FULL") &&
-                      _database.run("UPDATE facts SET value = ?1 WHERE name = 'newest'")
-                          .with(_counts.newest)
-                          .done();
-  _database.execute("PRAGMA synchronous = NORMAL");
-  if (isDone) _settled = _counts.newest;
-  return isDone;
+  if (!_database.sync()) return false;
+  _settled = _counts.newest;
+  return true;
 }
 
 EventQueue::Counts EventQueue::counts() const {

@@ -68,6 +68,10 @@ class EventQueue {
   bool prepare(const std::string& folder);
   bool readState();
   bool insert(std::uint64_t timeMs, std::string_view metric, std::string_view line);
+  template <class Change>
+  bool written(Change change);
+  bool take(std::uint64_t number, Counts& after);
+  bool keepNewest();
   bool keepLimits();
   bool dropUntil(std::uint64_t number);
   std::optional<std::uint64_t> lastBeyondAge();
