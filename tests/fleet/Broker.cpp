@@ -7,6 +7,7 @@
 
 #include <algorithm>
 #include <csignal>
+#include <filesystem>
 #include <fstream>
 #include <nlohmann/json.hpp>
 #include <stdexcept>
@@ -49,6 +50,10 @@ std::vector<std::string> subscription(const Broker& broker, std::vector<std::str
                                     "%t %r %p"};
   words.insert(words.end(), more.begin(), more.end());
   return words;
+}
+
+std::string twofold(std::uint64_t number) {
+  return "two events have the number " + std::to_string(number);
 }
 
 }  // namespace
@@ -96,7 +101,14 @@ void Broker::start() {
   if (!eventually([this] { return isListening(_port); })) throw std::runtime_error("no broker");
 }
 
-void Broker::save() { _process->signal(SIGUSR1); }
+void Broker::save() {
+  const std::string kept = _directory + "/mosquitto.db";
+  std::filesystem::remove(kept);
+  _process->signal(SIGUSR1);
+  if (!eventually([&] { return std::filesystem::exists(kept); })) {
+    throw std::runtime_error("the broker keeps no sessions");
+  }
+}
 
 void Broker::kill() {
   _process->signal(SIGKILL);
@@ -116,43 +128,39 @@ Subscriber::Subscriber(const Broker& broker, std::string file, std::vector<std::
   }
 }
 
-std::vector<Received> Subscriber::received() const {
-  std::vector<Received> all;
+const std::vector<Received>& Subscriber::received() const {
   std::ifstream stream(_file);
+  stream.seekg(_readUpTo);
   for (std::string line; std::getline(stream, line) && !stream.eof();) {
+    _readUpTo += static_cast<std::streamoff>(line.size() + 1);
     const auto first = line.find(' ');
     const auto second = line.find(' ', first + 1);
     if (second == std::string::npos) continue;
-    all.push_back({line.substr(0, first), line[first + 1] == '1', line.substr(second + 1)});
+    _received.push_back({line.substr(0, first), line[first + 1] == '1', line.substr(second + 1)});
+    const auto payload = nlohmann::json::parse(_received.back().payload, nullptr, false);
+    if (!payload.is_object() || !payload.contains("number")) continue;
+    _numbers.push_back(payload["number"]);
+    const auto [same, isNew] = _events.emplace(_numbers.back(), _received.back().payload);
+    if (!isNew && same->second != _received.back().payload) {
+      throw std::runtime_error(twofold(_numbers.back()));
+    }
   }
-  return all;
+  return _received;
 }
 
-std::vector<std::uint64_t> Subscriber::numbers() const {
-  std::vector<std::uint64_t> numbers;
-  for (const Received& each : received()) {
-    const auto payload = nlohmann::json::parse(each.payload, nullptr, false);
-    if (payload.is_object() && payload.contains("number")) numbers.push_back(payload["number"]);
-  }
-  return numbers;
+const std::vector<std::uint64_t>& Subscriber::numbers() const {
+  received();
+  return _numbers;
 }
 
-bool SureSubscriber::receiveMore() const {
-  const auto newest = [](const Subscriber& subscriber) {
-    const auto numbers = subscriber.numbers();
-    return numbers.empty() ? 0 : *std::ranges::max_element(numbers);
-  };
-  const std::uint64_t before = newest(_listening);
-  if (!eventually([&] { return newest(_listening) > before + 20; })) return false;
-  const std::uint64_t reached = newest(_listening);
-  return eventually([&] { return newest(_acknowledging) >= reached; });
+std::uint64_t Subscriber::newest() const {
+  received();
+  return _events.empty() ? 0 : _events.rbegin()->first;
 }
 
-std::vector<std::uint64_t> SureSubscriber::numbers() const {
-  auto all = _acknowledging.numbers();
-  const auto others = _listening.numbers();
-  all.insert(all.end(), others.begin(), others.end());
-  return all;
+const std::map<std::uint64_t, std::string>& Subscriber::events() const {
+  received();
+  return _events;
 }
 
 std::string Subscriber::last(const std::string& phone, const std::string& name) const {
@@ -161,6 +169,22 @@ std::string Subscriber::last(const std::string& phone, const std::string& name) 
     if (each.topic == "qelwatch/" + phone + "/" + name) payload = each.payload;
   }
   return payload;
+}
+
+bool SureSubscriber::receiveMore() const {
+  const std::uint64_t before = _listening.newest();
+  if (!eventually([&] { return _listening.newest() > before + 20; })) return false;
+  const std::uint64_t reached = _listening.newest();
+  return eventually([&] { return _acknowledging.newest() >= reached; });
+}
+
+std::map<std::uint64_t, std::string> SureSubscriber::events() const {
+  auto all = _acknowledging.events();
+  for (const auto& [number, payload] : _listening.events()) {
+    const auto [same, isNew] = all.emplace(number, payload);
+    if (!isNew && same->second != payload) throw std::runtime_error(twofold(number));
+  }
+  return all;
 }
 
 }  // namespace qel::testing

@@ -1,7 +1,10 @@
 // Debian's MQTT broker and its subscriber, on a loopback port of the test's own.
 #pragma once
 
+#include <algorithm>
 #include <cstdint>
+#include <ios>
+#include <map>
 #include <memory>
 #include <string>
 #include <vector>
@@ -24,7 +27,7 @@ class Broker {
 
   std::uint16_t port() const { return _port; }
   std::string url() const { return "mqtt://127.0.0.1:" + std::to_string(_port); }
-  // Brings sessions to the disk.
+  // Brings sessions to the disk: they are there when it returns.
   void save();
   void kill();
   void start();
@@ -42,20 +45,28 @@ struct Received {
   std::string payload;
 };
 
-// Everything below qelwatch/ from its making on, in a session that outlives connections.
+// Everything below qelwatch/ from its making on, in a session that outlives connections. Throws
+// when one number comes with two payloads.
 class Subscriber {
  public:
   Subscriber(const Broker& broker, std::string file, std::vector<std::string> more = {});
 
-  std::vector<Received> received() const;
-  // The numbers of events, in the order of their arrival.
-  std::vector<std::uint64_t> numbers() const;
+  const std::vector<Received>& received() const;
+  // The numbers of events, in the order of their arrival; the largest, 0 for none; and each event
+  // once.
+  const std::vector<std::uint64_t>& numbers() const;
+  std::uint64_t newest() const;
+  const std::map<std::uint64_t, std::string>& events() const;
   // The newest payload of the topic qelwatch/PHONE/NAME.
   std::string last(const std::string& phone, const std::string& name) const;
 
  private:
   const std::string _file;
   ChildProcess _process;
+  mutable std::streamoff _readUpTo = 0;
+  mutable std::vector<Received> _received;
+  mutable std::vector<std::uint64_t> _numbers;
+  mutable std::map<std::uint64_t, std::string> _events;
 };
 
 // Receivers of a broker that is killed. What the broker has acknowledged it may forget, and who
@@ -65,12 +76,15 @@ class Subscriber {
 class SureSubscriber {
  public:
   SureSubscriber(const Broker& broker, const std::string& file)
-      : _acknowledging(broker, file), _listening(broker, file + ".0", {"-i", "other", "-q", "0"}) {}
+      : _acknowledging(broker, file, {"-i", "acknowledging"}),
+        _listening(broker, file + ".0", {"-i", "listening", "-q", "0"}) {}
 
   // Waits until both have events that are newer than any before. What waited for them meanwhile
   // they have then, too.
   bool receiveMore() const;
-  std::vector<std::uint64_t> numbers() const;
+  std::uint64_t newest() const { return std::max(_acknowledging.newest(), _listening.newest()); }
+  // Each event once, by its number.
+  std::map<std::uint64_t, std::string> events() const;
 
  private:
   Subscriber _acknowledging;

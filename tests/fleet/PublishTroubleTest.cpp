@@ -11,6 +11,10 @@ class PublishTrouble : public WithBroker {
     more.insert(more.end(), {"--duration", "15"});
     return qelctl(publishing(url, std::move(more)));
   }
+  std::string said() const {
+    std::ifstream stream(file("said"));
+    return {std::istreambuf_iterator<char>(stream), {}};
+  }
 };
 
 void expectOneLine(const Outcome& outcome, int exitCode, const std::string& line) {
@@ -80,7 +84,7 @@ TEST_F(PublishTrouble, isABrokerThatTakesNoMessages) {
   RunningQelctl publisher(publishing(broker.url()));
   ASSERT_TRUE(eventually([&] { return subscriber.numbers().size() > 30; })) << publisher.err();
   end(publisher);
-  EXPECT_TRUE(isWithoutGap(subscriber.numbers()));
+  EXPECT_TRUE(isWithoutGap(subscriber.events()));
 }
 
 TEST_F(PublishTrouble, isACertificateThatNobodyKnows) {
@@ -117,6 +121,56 @@ TEST_F(PublishTrouble, isAFolderThatCannotBeUsed) {
   write("state/publish.db", std::string(8192, 'x'));
   expectOneLine(publish("mqtt://localhost"), 74,
                 file("state/publish.db") + ": file is not a database");
+}
+
+// Through a shell that lets no file of it grow beyond so many blocks of 512 bytes.
+std::vector<std::string> inLittleRoom(const std::string& blocks, std::vector<std::string> words) {
+  words.insert(words.begin(),
+               {"/bin/sh", "-c", "ulimit -f \"$0\" && exec \"$@\"", blocks, QEL_QELCTL});
+  return words;
+}
+
+TEST_F(PublishTrouble, isADiskWithoutRoom) {
+  const auto words = inLittleRoom("1", publishing("mqtt://localhost"));
+  const Outcome outcome = run(words.front(), {words.begin() + 1, words.end()});
+  expectOneLine(outcome, 74, file("state/publish.db") + ": disk I/O error");
+}
+
+TEST_F(PublishTrouble, isNotLittleRoomAsLongAsAllIsSent) {
+  const Broker broker(directory);
+  const Subscriber subscriber(broker, file("received"));
+  ChildProcess publisher(
+      {.words = inLittleRoom("200", publishing(broker.url())), .err = file("said")});
+  ASSERT_TRUE(eventually([&] { return subscriber.newest() > 800; })) << said();
+  publisher.signal(SIGTERM);
+  EXPECT_EQ(publisher.waitForEnd(), 0);
+  EXPECT_EQ(said().find("lost"), std::string::npos) << said();
+  EXPECT_TRUE(isWithoutGap(subscriber.events()));
+}
+
+TEST_F(PublishTrouble, isADiskThatIsFullBeforeAllIsSent) {
+  Broker broker(directory);
+  const Subscriber subscriber(broker, file("received"));
+  broker.save();
+  broker.kill();
+  {
+    ChildProcess publisher(
+        {.words = inLittleRoom("200", publishing(broker.url())), .err = file("said")});
+    const auto isFull = [&] {
+      return said().find("publish.db: disk I/O error; events are lost\n") != std::string::npos;
+    };
+    ASSERT_TRUE(eventually(isFull)) << said();
+    broker.start();
+    ASSERT_TRUE(eventually([&] { return subscriber.newest() > 100; })) << said();
+    publisher.signal(SIGTERM);
+    EXPECT_EQ(publisher.waitForEnd(), 0);
+    EXPECT_NE(said().find(" lost, which the disk did not take"), std::string::npos) << said();
+  }
+  const std::uint64_t kept = subscriber.newest();
+  RunningQelctl publisher(publishing(broker.url()));
+  ASSERT_TRUE(eventually([&] { return subscriber.newest() > kept + 20; })) << publisher.err();
+  EXPECT_NE(end(publisher).find(", 0 wait"), std::string::npos);
+  EXPECT_TRUE(isWithoutGap(subscriber.events()));
 }
 
 TEST_F(PublishTrouble, isNoReasonToStopWhenItIsToldSo) {

@@ -5,8 +5,8 @@
 #include <csignal>
 #include <fstream>
 #include <iterator>
+#include <map>
 #include <memory>
-#include <set>
 #include <string>
 #include <utility>
 #include <vector>
@@ -36,9 +36,16 @@ class WithBroker : public WithService {
     return publisher.err();
   }
 
-  static bool isWithoutGap(const std::vector<std::uint64_t>& numbers) {
-    const std::set<std::uint64_t> distinct(numbers.begin(), numbers.end());
-    return !distinct.empty() && *distinct.begin() == 1 && *distinct.rbegin() == distinct.size();
+  // By what it said at its end.
+  static std::uint64_t sentBy(const std::string& said) {
+    const auto end = said.find(" events sent");
+    const auto begin = said.rfind(' ', end - 1) + 1;
+    return end == std::string::npos ? 0 : std::stoull(said.substr(begin, end - begin));
+  }
+
+  using Events = std::map<std::uint64_t, std::string>;
+  static bool isWithoutGap(const Events& events) {
+    return !events.empty() && events.begin()->first == 1 && events.rbegin()->first == events.size();
   }
 
   std::string write(const std::string& name, const std::string& content,
