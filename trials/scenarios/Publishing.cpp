@@ -1,11 +1,13 @@
-// kill -9 between the events and who receives them at a broker.
+// What may happen between the events and who receives them at a broker.
+
+#include <unistd.h>
 
 #include <csignal>
-#include <filesystem>
-#include <set>
 #include <thread>
 
 #include "fleet/Broker.h"
+#include "fleet/EventQueue.h"
+#include "harness/Mounts.h"
 #include "harness/Stand.h"
 #include "scenarios/Scenarios.h"
 #include "tools/RunningQelctl.h"
@@ -13,24 +15,32 @@
 namespace qel::trials {
 namespace {
 
+using namespace std::chrono_literals;
 using testing::Broker;
+using testing::eventually;
 using testing::SureSubscriber;
+
+// By its summary.
+std::uint64_t lostBy(const Program& publisher) {
+  const std::string said = publisher.errors();
+  const auto end = said.find(" lost, which the disk did not take");
+  if (end == std::string::npos) return 0;
+  const auto begin = said.rfind(' ', end - 1) + 1;
+  return std::stoull(said.substr(begin, end - begin));
+}
 
 // A service, one who publishes, a broker that keeps sessions, and one who receives.
 class PublishingStand {
  public:
-  explicit PublishingStand(Trial& trial)
-      : _figures(trial.figures), _stand(trial, {.screen = false, .source = "simulated,speed=20"}) {
-    _publisher = _stand.start(
-        "publisher",
-        {QEL_QELCTL, "publish", _broker.url(), "--bus", _stand.bus().address(), "--state",
-         _stand.directory() + "/publisher", "--phone", "one", "--every", "20ms"});
+  // With its queue in that folder; empty: one of its own.
+  explicit PublishingStand(Trial& trial, std::string state = {})
+      : _figures(trial.figures),
+        _stand(trial, {.screen = false, .source = "simulated,speed=20"}),
+        _state(state.empty() ? _stand.directory() + "/publisher" : std::move(state)) {
+    _publisher = _stand.start("publisher", {QEL_QELCTL, "publish", _broker.url(), "--state", _state,
+                                            "--phone", "one", "--every", "20ms"});
     expectMore("at first");
     _broker.save();  // whoever receives stays known when the broker comes back
-    const auto isSaved = [this] {
-      return std::filesystem::exists(_stand.directory() + "/mosquitto.db");
-    };
-    promise(testing::eventually(isSaved), "the broker keeps its sessions");
   }
 
   Broker& broker() { return _broker; }
@@ -39,23 +49,51 @@ class PublishingStand {
 
   // New events arrive.
   void expectMore(const std::string& after) {
-    promise(_subscriber.receiveMore(),
-            "events arrive " + after + "; it says " + _publisher->errors());
+    const bool isKept = _subscriber.receiveMore();
+    promise(isKept, "events arrive " + after + "; it says " + _publisher->errors());
   }
 
-  // Nothing is missing, and what came twice is the same.
-  void expectAll() {
-    const auto numbers = _subscriber.numbers();
-    const std::set<std::uint64_t> distinct(numbers.begin(), numbers.end());
-    promise(*distinct.begin() == 1 && *distinct.rbegin() == distinct.size(),
-            "no number is missing of " + std::to_string(*distinct.rbegin()) + ", there are " +
-                std::to_string(distinct.size()));
-    _figures.remarks.push_back(std::to_string(distinct.size()) + " events, none missing");
+  // What waited arrives, though nothing new comes.
+  template <class Fault>
+  void expectWaitingAfter(Fault fault) {
+    const std::uint64_t before = _subscriber.newest();
+    fault();
+    const bool isKept = eventually([&] { return _subscriber.newest() > before + 20; });
+    promise(isKept, "what waited arrives; it says " + _publisher->errors());
+  }
+
+  void expectWords(const std::string& words) {
+    const auto isSaid = [&] { return _publisher->errors().find(words) != std::string::npos; };
+    const bool isKept = eventually(isSaid);
+    promise(isKept, "it says \"" + words + "\", and not only " + _publisher->errors());
+  }
+
+  // Of all numbers that were given none is missing but those that were never on the disk.
+  void expectAll(bool isDiskFull = false) {
+    _publisher->process().signal(SIGTERM);
+    const bool endsWell = _publisher->process().waitForEnd() == 0;
+    promise(endsWell, "it ends well: " + _publisher->errors());
+    const std::uint64_t lost = lostBy(*_publisher);
+    promise((lost > 0) == isDiskFull, "so many are lost: " + std::to_string(lost));
+    std::string error;
+    const auto queue = fleet::EventQueue::open(_state, {}, error);
+    promise(queue != nullptr, "its queue can be opened: " + error);
+    const auto counts = queue->counts();
+    promise(counts.waiting == 0 && counts.dropped == 0,
+            "none waits and none was dropped, not " + std::to_string(counts.waiting) + " and " +
+                std::to_string(counts.dropped));
+    const auto arrived = [this] { return _subscriber.events().size(); };
+    const bool isComplete = eventually([&] { return arrived() + lost == counts.newest; });
+    promise(isComplete, "all " + std::to_string(counts.newest) + " events arrive but " +
+                            std::to_string(lost) + ", and not " + std::to_string(arrived()));
+    _figures.remarks.push_back(std::to_string(arrived()) + " events, none missing" +
+                               (lost > 0 ? ", " + std::to_string(lost) + " lost" : ""));
   }
 
  private:
   Figures& _figures;
   Stand _stand;
+  const std::string _state;
   Broker _broker{_stand.directory()};
   SureSubscriber _subscriber{_broker, _stand.directory() + "/received"};
   std::unique_ptr<Program> _publisher;
@@ -88,6 +126,24 @@ void killPublisher(Trial& trial) {
     stand.publisher().process().waitForEnd();
     stand.startPublisher();
   });
+}
+
+// New events are lost then, and nothing that was on the disk.
+void fullQueueDisk(Trial& trial) {
+  for (int i = 0; i < trial.times; ++i) {
+    const std::string name = "/tmp/qel-trial-queue-" + std::to_string(::getpid());
+    const SmallDisk disk(name, 1024 * 1024);
+    PublishingStand stand(trial, name);
+    stand.broker().kill();
+    std::this_thread::sleep_for(500ms);
+    disk.fill();
+    ++trial.figures.tried;
+    stand.expectWords("; events are lost");
+    stand.expectWaitingAfter([&stand] { stand.broker().start(); });
+    disk.empty();
+    stand.expectMore("once there is room again");
+    stand.expectAll(true);
+  }
 }
 
 }  // namespace qel::trials

@@ -12,6 +12,7 @@ void killRecorder(Trial& trial);
 
 void killBroker(Trial& trial);
 void killPublisher(Trial& trial);
+void fullQueueDisk(Trial& trial);
 
 void stopService(Trial& trial);
 void stopBus(Trial& trial);
