@@ -81,8 +81,9 @@ MetricTable::Places MetricTable::addFields(const MessageShape& shape, const Scop
     }
     const Rewrite* rewrite = rewriteOf(scope.rewrites, field.key);
     const FieldFacts* facts = all ? all->find(field.key) : nullptr;
-    const auto column =
-        addColumn({name, typeOf(field, facts, rewrite), unitOf(facts, rewrite)}, scope);
+    const auto column = addColumn(
+        {name, typeOf(field, facts, rewrite), unitOf(facts, rewrite), facts, !scope.list.empty()},
+        scope);
     places.push_back({field.key, column, isTime(facts)});
   }
   return places;

@@ -9,12 +9,16 @@
 
 namespace qel {
 
+struct FieldFacts;
+
 enum class ColumnType : std::uint8_t { integer, real, text, bytes };
 
 struct Column {
   std::string name;  // unique in its table
   ColumnType type = ColumnType::text;
-  std::string unit = {};  // empty: none
+  std::string unit = {};              // empty: none
+  const FieldFacts* facts = nullptr;  // of the field that it holds; null: of none
+  bool isOfEntry = false;             // of a list
 };
 
 struct Table {

@@ -8,23 +8,6 @@
 namespace qel {
 namespace {
 
-struct CellWords {
-  std::string_view code;
-  std::string_view channel;
-};
-
-constexpr CellWords wordsOf(Technology technology) {
-  switch (technology) {
-    case Technology::lte:
-      return {"PCI", "EARFCN"};
-    case Technology::umts:
-      return {"PSC", "UARFCN"};
-    case Technology::gsm:
-      return {"BSIC", "ARFCN"};
-  }
-  return {};
-}
-
 std::optional<std::uint32_t> orNone(std::uint32_t number) {
   return number == ReportedCell::kNone ? std::nullopt : std::optional(number);
 }
@@ -93,8 +76,20 @@ std::optional<ReportedCell> CellReader::read(std::int64_t metric, const Dictiona
   return cell;
 }
 
+PlaceWords placeWords(Technology technology) {
+  switch (technology) {
+    case Technology::lte:
+      return {"PCI", "EARFCN"};
+    case Technology::umts:
+      return {"PSC", "UARFCN"};
+    case Technology::gsm:
+      return {"BSIC", "ARFCN"};
+  }
+  return {};
+}
+
 std::string textOf(const Cell& cell) {
-  const CellWords words = wordsOf(cell.technology);
+  const PlaceWords words = placeWords(cell.technology);
   std::string text(nameOf(cell.technology));
   std::string_view between = " ";
   const auto append = [&](std::string_view word, std::optional<std::uint32_t> number) {

@@ -5,6 +5,7 @@
 #include <cstdint>
 #include <optional>
 #include <string>
+#include <string_view>
 #include <vector>
 
 #include "base/Value.h"
@@ -60,6 +61,13 @@ class CellReader {
 
   std::vector<Places> _places;
 };
+
+// What numbers a cell is told by where it stands: "PCI" and "EARFCN".
+struct PlaceWords {
+  std::string_view code;
+  std::string_view channel;
+};
+PlaceWords placeWords(Technology technology);
 
 // "LTE PCI 217, EARFCN 38098, cell 17955330": what is known of it.
 std::string textOf(const Cell& cell);

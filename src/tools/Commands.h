@@ -29,6 +29,7 @@ void addWatchCommand(CLI::App& app, Action& chosen);
 void addLiveCommand(CLI::App& app, Action& chosen, const bool& verbose);
 void addRecordCommand(CLI::App& app, Action& chosen);
 void addPublishCommand(CLI::App& app, Action& chosen);
+void addExporterCommand(CLI::App& app, Action& chosen);
 void addImportCommand(CLI::App& app, Action& chosen);
 void addExportCommand(CLI::App& app, Action& chosen);
 void addDiagReportCommand(CLI::App& app, Action& chosen);

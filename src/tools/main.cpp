@@ -57,6 +57,7 @@ int main(int argc, char* argv[]) {
   tools::addLiveCommand(app, chosen, verbose);
   tools::addRecordCommand(app, chosen);
   tools::addPublishCommand(app, chosen);
+  tools::addExporterCommand(app, chosen);
   tools::addImportCommand(app, chosen);
   tools::addExportCommand(app, chosen);
   tools::addDiagReportCommand(app, chosen);

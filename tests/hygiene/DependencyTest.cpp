@@ -32,7 +32,8 @@ const std::map<std::string, std::set<std::string>> kAllowed = {
     {"ui",
      {"base", "capture", "connection", "history", "messages", "metrics", "radio", "recording"}},
     {"feed", {"base", "history", "service", "sources", "tesk", "ui"}},
-    {"fleet", {"base", "capture", "export", "messages", "metrics", "recording", "tesk"}},
+    {"fleet",
+     {"base", "capture", "export", "history", "messages", "metrics", "radio", "recording", "tesk"}},
     {"app",
      {"base", "bus", "capture", "feed", "history", "metrics", "recording", "service", "sources",
       "tesk", "ui"}},
@@ -50,6 +51,8 @@ const std::vector<std::pair<std::string, std::vector<std::string>>> kForeign = {
     {"CLI/", {"src/tools/", "src/app/", "src/service/daemon/"}},
     {"sqlite3.h", {"src/export/", "src/fleet/"}},
     {"mosquitto.h", {"src/fleet/"}},
+    {"prometheus/", {"src/fleet/"}},
+    {"civetweb.h", {"src/fleet/"}},
     {"curses.h", {"src/tools/watch/"}},
     {"zlib.h", {"src/recording/"}},
 };
