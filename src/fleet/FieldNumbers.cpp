@@ -1,5 +1,6 @@
 #include "fleet/FieldNumbers.h"
 
+#include <algorithm>
 #include <optional>
 #include <utility>
 
@@ -35,15 +36,16 @@ bool isNumber(const Column& column) {
   return hasNumbers && column.facts && !column.unit.empty();
 }
 
+// What the schemas say of a number that is told in another unit than it comes in is of the latter.
 std::string helpOf(const FieldFacts& facts) {
   std::string help(facts.label);
-  if (!facts.meaning.empty()) (help += ". ") += facts.meaning;
+  if (!facts.meaning.empty() && facts.raw.empty()) (help += ". ") += facts.meaning;
   return help;
 }
 
-std::string familyWords(std::string_view className, const Column& column) {
+std::string familyWords(std::string_view className, std::string_view field) {
   if (className.starts_with(kCommonBegin)) className.remove_prefix(kCommonBegin.size());
-  return asWords(className) + "_" + column.name;
+  return asWords(className).append("_").append(field);
 }
 
 std::optional<double> numberIn(const Value& value) {
@@ -54,6 +56,10 @@ std::optional<double> numberIn(const Value& value) {
 
 }  // namespace
 
+bool FieldNumbers::Report::has(std::string_view name) const {
+  return std::ranges::any_of(numbers, [&](const Number& each) { return each.name.text == name; });
+}
+
 FieldNumbers::FieldNumbers() {
   for (const MetricMessage& message : metricMessages()) {
     Report report(message);
@@ -63,7 +69,10 @@ FieldNumbers::FieldNumbers() {
       const Column& column = columns[i];
       if (tellsApart(column)) report.labels.push_back({i, asWords(column.name)});
       if (!isNumber(column) || (hasLevels && column.facts->quality)) continue;
-      auto name = numberName(familyWords(message.className, column), column.unit);
+      auto name = numberName(familyWords(message.className, column.name), column.unit);
+      if (name && report.has(name->text)) {
+        name = numberName(familyWords(message.className, "entry_" + column.name), column.unit);
+      }
       if (name) report.numbers.push_back({i, std::move(*name), helpOf(*column.facts)});
     }
     if (!report.numbers.empty()) _reports.emplace(message.identifier, std::move(report));

@@ -14,8 +14,9 @@ namespace qel::fleet {
 
 // Every number that has a unit: qelwatch_<message>_<field>_<base unit>. Those of a list's entries
 // have as labels the fields that tell the entries apart, and lists without such fields are left
-// out; so are the levels of cells, which have names of their own (CellNumbers). No text of a report
-// is ever a label. One thread.
+// out; so are the levels of cells, which have names of their own (LatestNumbers). Where a report
+// and its entries have a field of one name, that of entries is called entry_<field>. No text of a
+// report is ever a label. One thread.
 class FieldNumbers {
  public:
   FieldNumbers();
@@ -37,6 +38,7 @@ class FieldNumbers {
   };
   struct Report {
     explicit Report(const MetricMessage& itsMessage) : message(itsMessage), table(itsMessage) {}
+    bool has(std::string_view name) const;
     const MetricMessage& message;
     MetricTable table;
     std::vector<Number> numbers;

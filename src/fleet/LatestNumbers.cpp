@@ -130,6 +130,7 @@ void LatestNumbers::metricWasStored(const StoredMetric& metric) {
 
 void LatestNumbers::metricWasPassedOver(const PassedMetric& metric) {
   _history.metricWasPassedOver(metric);
+  tellServing(metric.receivedMs, ServingReader::placeOf(metric.identifier).has_value());
 }
 
 void LatestNumbers::tellServing(std::uint64_t timeMs, bool hasLevels) {

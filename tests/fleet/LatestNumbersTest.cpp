@@ -167,11 +167,11 @@ TEST_F(LatestNumbersTest, tellNobodysIdentity) {
   guti->setMTmsi(kSecret);
   context.setGuti(std::move(guti));
   context.setT3412DurS(3240);
-  numbers.take(report(54044, context.data(), kNowMs));
+  numbers.take(report(54540, context.data(), kNowMs));
   KCellularMmContext lower;
   lower.setTmsi(kSecret);
   lower.setT3212DurS(360);
-  numbers.take(report(54042, lower.data(), kNowMs));
+  numbers.take(report(54538, lower.data(), kNowMs));
   EXPECT_TRUE(has("qelwatch_emm_context_t3412_dur_seconds 3240")) << textAt(kNowMs);
   EXPECT_TRUE(has("qelwatch_mm_context_t3212_dur_seconds 360"));
   EXPECT_FALSE(names("3735928559") || names("3.735928559e+09") || names("deadbeef"));

@@ -52,14 +52,14 @@ TEST_F(Board, countsWhatComes) {
   board.countUndecodable();
   board.countDropped();
   board.countHappening("handover");
-  board.countHappening("nobody knows this");
+  board.countHappening("unheard-of");
   EXPECT_TRUE(has("qelwatch_reports_total{metric=\"one\"} 2"));
   EXPECT_TRUE(has("qelwatch_report_age_seconds{metric=\"one\"} 0.5"));
   EXPECT_TRUE(has("qelwatch_undecodable_reports_total 1"));
   EXPECT_TRUE(has("qelwatch_exporter_dropped_total 1"));
   EXPECT_TRUE(has("qelwatch_happenings_total{kind=\"handover\"} 1"));
   EXPECT_TRUE(has("qelwatch_happenings_total{kind=\"reject\"} 0")) << "there from the start";
-  EXPECT_EQ(textAt(kNowMs).find("nobody"), std::string::npos);
+  EXPECT_EQ(textAt(kNowMs).find("unheard-of"), std::string::npos);
 }
 
 TEST_F(Board, holdsOnlySoManySeriesOfAFamily) {
