@@ -4,19 +4,13 @@
 #include <utility>
 
 #include "fleet/Families.h"
-#include "tesk/bus/ServiceStatus.h"
 
 namespace qel::fleet {
 
 using prometheus::MetricFamily;
 using prometheus::MetricType;
 
-ServiceCounts::ServiceCounts(std::string bus) : _bus(std::move(bus)) {}
-ServiceCounts::~ServiceCounts() = default;
-
-std::vector<MetricFamily> ServiceCounts::ask() const {
-  std::string why;
-  const auto status = tesk::bus::readServiceStatus({_bus}, why);
+std::vector<MetricFamily> serviceFamilies(const std::optional<tesk::bus::ServiceStatus>& status) {
   std::vector<MetricFamily> told = {oneFamily("qelwatch_service_up",
                                               "Whether the baseband manager service answers.",
                                               MetricType::Gauge, status ? 1 : 0)};
@@ -37,10 +31,14 @@ std::vector<MetricFamily> ServiceCounts::ask() const {
   return told;
 }
 
+ServiceCounts::ServiceCounts(std::string bus) : _bus(std::move(bus)) {}
+ServiceCounts::~ServiceCounts() = default;
+
 void ServiceCounts::addTo(std::vector<MetricFamily>& families) {
   const std::lock_guard lock(_mutex);
   if (Clock::now() >= _next) {
-    _newest = ask();
+    std::string why;
+    _newest = serviceFamilies(tesk::bus::readServiceStatus({_bus}, why));
     _next = Clock::now() + std::chrono::seconds(1);
   }
   families.insert(families.end(), _newest.begin(), _newest.end());

@@ -3,14 +3,21 @@
 
 #include <chrono>
 #include <mutex>
+#include <optional>
 #include <string>
 #include <vector>
+
+#include "tesk/bus/ServiceStatus.h"
 
 namespace prometheus {
 struct MetricFamily;
 }
 
 namespace qel::fleet {
+
+// Of a service that has answered so, or has not.
+std::vector<prometheus::MetricFamily> serviceFamilies(
+    const std::optional<tesk::bus::ServiceStatus>& status);
 
 // Asks the service once a second at most, however often it is asked itself. Any thread; waits a few
 // seconds at most for an answer.
@@ -23,8 +30,6 @@ class ServiceCounts {
 
  private:
   using Clock = std::chrono::steady_clock;
-
-  std::vector<prometheus::MetricFamily> ask() const;
 
   const std::string _bus;
   std::mutex _mutex;

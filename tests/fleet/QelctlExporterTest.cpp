@@ -5,6 +5,7 @@
 
 #include "fleet/Broker.h"
 #include "fleet/HttpClient.h"
+#include "fleet/PrometheusServer.h"
 #include "sources/simulated/Identities.h"
 #include "tools/WithService.h"
 
@@ -86,6 +87,24 @@ TEST_F(QelctlExporter, speaksOpenMetricsAndTheOlderForm) {
   const Outcome checked = run("/usr/bin/promtool", {"check", "metrics"}, plain.body);
   EXPECT_EQ(checked.exitCode, 0) << checked.out << checked.err;
   EXPECT_EQ(checked.err, "");
+}
+
+TEST_F(QelctlExporter, isReadByPrometheus) {
+  RunningQelctl exporter(exporting());
+  const PrometheusServer prometheus(directory, {address()});
+  const std::string who = "instance=\"" + address() + "\", job=\"qelwatch\"}";
+  EXPECT_TRUE(eventually([&] {
+    return prometheus.ask("up") == std::vector<std::string>{"up{" + who + " => 1"} &&
+           prometheus.ask("count(qelwatch_lte_rsrp_dbm)") == std::vector<std::string>{"{} => 1"};
+  })) << prometheus.ask("up")[0];
+  EXPECT_EQ(prometheus.ask("qelwatch_service_up"),
+            std::vector<std::string>{"qelwatch_service_up{" + who + " => 1"});
+  EXPECT_EQ(prometheus.ask("count(qelwatch_serving_cell_info)"),
+            std::vector<std::string>{"{} => 1"});
+  exporter.signal(SIGTERM);
+  EXPECT_EQ(exporter.waitForEnd(), 0);
+  EXPECT_TRUE(eventually([&] { return prometheus.ask("qelwatch_service_up").empty(); }))
+      << "series of a target that is gone go";
 }
 
 TEST_F(QelctlExporter, answersNothingElse) {
