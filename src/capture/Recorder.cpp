@@ -5,12 +5,15 @@
 
 #include "recording/EventLine.h"
 #include "recording/Mark.h"
+#include "recording/Sleep.h"
 #include "tesk/Constants.h"
 
 namespace qel::capture {
 namespace {
 
 using std::chrono::steady_clock;
+
+constexpr std::chrono::seconds kShortestSleep{5};
 
 }  // namespace
 
@@ -24,8 +27,19 @@ std::optional<RecordedEvent> recordedEvent(std::string_view eventName, const tes
 }
 
 Recorder::Recorder(std::unique_ptr<RotatingRecording> recording,
-                   std::unique_ptr<IdentityHider> hider, const Clock& clock)
-    : _recording(std::move(recording)), _hider(std::move(hider)), _clock(clock) {}
+                   std::unique_ptr<IdentityHider> hider, const Clock& clock, Asleep asleep)
+    : _recording(std::move(recording)),
+      _hider(std::move(hider)),
+      _clock(clock),
+      _asleep(std::move(asleep)),
+      _slept(_asleep()) {}
+
+void Recorder::noteSleep() {
+  const auto slept = _asleep();
+  const auto length = slept - std::exchange(_slept, slept);
+  if (length < kShortestSleep) return;
+  _recording->write(sleepEvent(_clock.nowMs(), length), steady_clock::now());
+}
 
 bool Recorder::isRecordable(RecordedEvent& event) {
   if (!hasReadableForm(event)) {
@@ -37,12 +51,14 @@ bool Recorder::isRecordable(RecordedEvent& event) {
 
 void Recorder::take(std::string_view eventName, const tesk::Message& event) {
   const std::lock_guard lock(_mutex);
+  noteSleep();
   auto recorded = recordedEvent(eventName, event, _clock.nowMs());
   if (recorded && isRecordable(*recorded)) _recording->write(*recorded, steady_clock::now());
 }
 
 bool Recorder::mark() {
   const std::lock_guard lock(_mutex);
+  noteSleep();
   if (!_recording->write(markEvent(_clock.nowMs(), _marks + 1), steady_clock::now())) return false;
   ++_marks;
   return true;
@@ -50,6 +66,7 @@ bool Recorder::mark() {
 
 bool Recorder::tend() {
   const std::lock_guard lock(_mutex);
+  noteSleep();
   return _recording->tend(steady_clock::now());
 }
 

@@ -1,7 +1,9 @@
 // Live events into a recording.
 #pragma once
 
+#include <chrono>
 #include <cstdint>
+#include <functional>
 #include <memory>
 #include <mutex>
 #include <optional>
@@ -9,6 +11,7 @@
 #include <string_view>
 
 #include "base/Clock.h"
+#include "base/TimeAsleep.h"
 #include "recording/RotatingRecording.h"
 #include "recording/privacy/IdentityHider.h"
 #include "tesk/Message.h"
@@ -21,7 +24,8 @@ std::optional<RecordedEvent> recordedEvent(std::string_view eventName, const tes
                                            std::uint64_t timeMs);
 
 // Any thread. Each event is written before take() returns: a disk that is slow holds the event
-// stream up, and the service counts what is lost by it.
+// stream up, and the service counts what is lost by it. Where the device slept for five seconds or
+// more the recording says so.
 class Recorder {
  public:
   struct Progress {
@@ -33,9 +37,12 @@ class Recorder {
     std::uint64_t stripped = 0;      // events recorded without a value of unknown meaning
   };
 
+  // How long the device has slept so far.
+  using Asleep = std::function<std::chrono::milliseconds()>;
+
   // Without a hider identities are kept.
   Recorder(std::unique_ptr<RotatingRecording> recording, std::unique_ptr<IdentityHider> hider,
-           const Clock& clock = systemClock());
+           const Clock& clock = systemClock(), Asleep asleep = timeAsleep);
 
   // An event of the stream of that name, received now. Other streams are no part of a recording.
   void take(std::string_view eventName, const tesk::Message& event);
@@ -52,11 +59,15 @@ class Recorder {
 
  private:
   bool isRecordable(RecordedEvent& event);
+  // Before anything else that comes after a sleep.
+  void noteSleep();
 
   mutable std::mutex _mutex;
   const std::unique_ptr<RotatingRecording> _recording;
   const std::unique_ptr<IdentityHider> _hider;
   const Clock& _clock;
+  const Asleep _asleep;
+  std::chrono::milliseconds _slept;  // as last looked at
   std::uint64_t _shapeless = 0;
   std::uint64_t _marks = 0;
 };

@@ -3,7 +3,7 @@
 #include <utility>
 
 #include "export/HappeningTable.h"
-#include "history/MarkHappening.h"
+#include "history/ToldHappening.h"
 #include "messages/catalogue/TagLog.h"
 #include "recording/RecordedMetric.h"
 
@@ -43,8 +43,8 @@ bool Exporter::take(RecordedEvent event) {
   if (event.kind == RecordedKind::metric) {
     if (!report(event)) return false;
     _dispatcher.take(event.entries, event.timeMs);
-  } else if (auto mark = happeningOfMark(event)) {
-    _history.add(std::move(*mark));
+  } else if (auto told = happeningToldBy(event)) {
+    _history.add(std::move(*told));
   }
   return tellHappenings();
 }

@@ -4,7 +4,7 @@
 
 #include "base/TerminalText.h"
 #include "history/History.h"
-#include "history/MarkHappening.h"
+#include "history/ToldHappening.h"
 #include "metrics/MetricValidator.h"
 #include "recording/RecordingReader.h"
 #include "tools/ToolError.h"
@@ -24,8 +24,8 @@ void feed(const RecordingOptions& options, RecordedClock& clock, History* histor
   MetricValidator& validator = *MetricValidator::shared();
   while (auto event = reader->next()) {
     clock.set(event->timeMs);
-    if (auto mark = history ? happeningOfMark(*event) : std::nullopt)
-      history->add(std::move(*mark));
+    if (auto told = history ? happeningToldBy(*event) : std::nullopt)
+      history->add(std::move(*told));
     const std::optional dictionary = std::move(event->entries);
     if (event->kind == RecordedKind::metric) {
       validator.metricsDidUpdate(dictionary);

@@ -31,19 +31,6 @@ bool isInSight(const QQuickItem& item) {
   return item.isVisible() && QRectF(item.window()->contentItem()->boundingRect()).intersects(area);
 }
 
-std::vector<QQuickItem*> itemsInSight(const QQuickWindow& window) {
-  std::vector<QQuickItem*> found;
-  QQueue<QQuickItem*> waiting;
-  waiting.enqueue(window.contentItem());
-  while (!waiting.isEmpty()) {
-    QQuickItem* item = waiting.dequeue();
-    if (!item->isVisible()) continue;
-    if (item != window.contentItem() && isInSight(*item)) found.push_back(item);
-    for (QQuickItem* child : item->childItems()) waiting.enqueue(child);
-  }
-  return found;
-}
-
 }  // namespace
 
 Window::Window(bool animated, std::shared_ptr<FakeService> service)
@@ -99,7 +86,7 @@ bool Window::open(const std::string& technology, const std::string& category) co
 
 std::vector<std::string> Window::texts() const {
   std::vector<std::pair<QPoint, std::string>> placed;
-  for (const QQuickItem* item : itemsInSight(*_window)) {
+  for (const QQuickItem* item : itemsInSight()) {
     const QString text = textOf(*item);
     if (text.isEmpty()) continue;
     const QPoint place = item->mapToScene(QPointF(0, item->baselineOffset())).toPoint();
@@ -113,6 +100,19 @@ std::vector<std::string> Window::texts() const {
   return texts;
 }
 
+std::vector<QQuickItem*> Window::itemsInSight() const {
+  std::vector<QQuickItem*> found;
+  QQueue<QQuickItem*> waiting;
+  waiting.enqueue(_window->contentItem());
+  while (!waiting.isEmpty()) {
+    QQuickItem* item = waiting.dequeue();
+    if (!item->isVisible()) continue;
+    if (item != _window->contentItem() && isInSight(*item)) found.push_back(item);
+    for (QQuickItem* child : item->childItems()) waiting.enqueue(child);
+  }
+  return found;
+}
+
 bool Window::shows(const std::string& text) const {
   const auto all = texts();
   return std::find(all.begin(), all.end(), text) != all.end();
@@ -120,7 +120,7 @@ bool Window::shows(const std::string& text) const {
 
 QQuickItem* Window::find(const std::string& text) const {
   QQuickItem* found = nullptr;
-  for (QQuickItem* item : itemsInSight(*_window)) {
+  for (QQuickItem* item : itemsInSight()) {
     if (plain(item->property("text").toString()) == text) found = item;
   }
   return found;
@@ -128,7 +128,7 @@ QQuickItem* Window::find(const std::string& text) const {
 
 QQuickItem* Window::list() const {
   QQuickItem* found = nullptr;
-  for (QQuickItem* item : itemsInSight(*_window)) {
+  for (QQuickItem* item : itemsInSight()) {
     if (item->inherits("QQuickListView")) found = item;
   }
   return found;

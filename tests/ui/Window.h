@@ -39,6 +39,7 @@ class Window {
   // What is written on the window, top to bottom, then left to right; hidden items left out.
   std::vector<std::string> texts() const;
   bool shows(const std::string& text) const;
+  std::vector<QQuickItem*> itemsInSight() const;
   // The item in sight whose text or accessible name this is, or null.
   QQuickItem* find(const std::string& text) const;
   // The list of the top screen.

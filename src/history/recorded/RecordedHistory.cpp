@@ -5,7 +5,7 @@
 #include <utility>
 
 #include "base/TimeZone.h"
-#include "history/MarkHappening.h"
+#include "history/ToldHappening.h"
 #include "history/recorded/OpenedRecording.h"
 #include "history/recorded/QuietDispatcher.h"
 
@@ -144,9 +144,9 @@ void RecordedHistory::State::take(const RecordedEvent& event, std::uint64_t time
   ++eventsSince;
   if (event.kind == RecordedKind::metric) {
     writer.take(event.entries, timeMs);
-  } else if (auto mark = happeningOfMark(event)) {
-    mark->timeMs = timeMs;
-    history.add(std::move(*mark));
+  } else if (auto told = happeningToldBy(event)) {
+    told->timeMs = timeMs;
+    history.add(std::move(*told));
   }
 }
 

@@ -1,22 +1,10 @@
 #include "sources/diagnostics/DiagnosticsSource.h"
 
-#include <time.h>
-
 #include <utility>
 
 #include "sources/diagnostics/DiagnosticsRun.h"
 
 namespace qel::diagnostics {
-
-std::chrono::milliseconds timeAsleep() {
-  const auto read = [](clockid_t clock) {
-    timespec time{};
-    ::clock_gettime(clock, &time);
-    return std::chrono::seconds{time.tv_sec} + std::chrono::nanoseconds{time.tv_nsec};
-  };
-  const auto awake = read(CLOCK_MONOTONIC);
-  return std::chrono::duration_cast<std::chrono::milliseconds>(read(CLOCK_BOOTTIME) - awake);
-}
 
 DiagnosticsSource::DiagnosticsSource(DiagnosticsChoice choice, DiagnosticsWorld world,
                                      const DiagnosticsTiming& timing)

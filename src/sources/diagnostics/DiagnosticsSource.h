@@ -7,6 +7,7 @@
 #include <mutex>
 #include <string>
 
+#include "base/TimeAsleep.h"
 #include "sources/EventSource.h"
 #include "sources/RunThreads.h"
 #include "sources/diagnostics/DiagnosticsChoice.h"
@@ -25,13 +26,10 @@ struct DiagnosticsTiming {
   SessionTiming session;
 };
 
-// How long the machine has slept since it was started.
-std::chrono::milliseconds timeAsleep();
-
 // What a test stands in for.
 struct DiagnosticsWorld {
   std::function<std::unique_ptr<PortSearch>()> search = makeUdevPortSearch;
-  std::function<std::chrono::milliseconds()> asleep = timeAsleep;
+  std::function<std::chrono::milliseconds()> asleep = qel::timeAsleep;
 };
 
 // While it runs it has one thread with the port, which it finds again after the loss of port or

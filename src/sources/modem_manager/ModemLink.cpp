@@ -120,12 +120,18 @@ ModemLink::Clock::time_point ModemLink::due() const {
   return std::min(due, _watched->due(watchedInterfaces()));
 }
 
+void ModemLink::readAnew() {
+  _tree.readAnew();
+  if (_watched) _watched->readAnew();
+}
+
 std::optional<ModemPicture> ModemLink::picture() const {
-  if (!_watched) return std::nullopt;
+  if (!_watched || !_tree.isCurrent()) return std::nullopt;
   return pictureOf(_tree.objects(), _watched->path(), _watched->answers());
 }
 
 std::optional<SourceCondition> ModemLink::condition() const {
+  if (!_tree.isCurrent()) return std::nullopt;
   if (_watched) return conditionOf(watchedInterfaces());
   return conditionWithoutModem(_tree.manager(), !_wish.imei.empty() || !_wish.path.empty());
 }

@@ -7,6 +7,7 @@
 #include <optional>
 #include <string>
 
+#include "base/TimeAsleep.h"
 #include "bus/BusAddress.h"
 #include "sources/SourceCondition.h"
 #include "sources/modem_manager/BusCalls.h"
@@ -28,6 +29,7 @@ struct ModemWish {
 struct ModemTiming {
   std::chrono::milliseconds period{5000};        // from report to report, and of polled methods
   std::chrono::milliseconds callTimeout{10000};  // of one call
+  std::chrono::milliseconds (*asleep)() = timeAsleep;
 };
 
 // Belongs to one thread and lives as long as the connection: when that is lost, calls throw
@@ -41,6 +43,9 @@ class ModemLink {
 
   // Waits for the bus, for `wakeDescriptor` or until then, and takes what came.
   void waitAndProcess(int wakeDescriptor, Clock::time_point until);
+
+  // What is known may be of long ago: it counts no more, and all is asked for again.
+  void readAnew();
 
   // The modem as it is known now; nothing while there is none.
   std::optional<ModemPicture> picture() const;

@@ -28,7 +28,8 @@ struct ModemManagerSource::Run {
       : wish(std::move(modemWish)),
         address(std::move(busAddress)),
         timing(modemTiming),
-        keeper(keptModemReports(), modemTiming.period) {}
+        keeper(keptModemReports(), modemTiming.period),
+        slept(modemTiming.asleep()) {}
 
   void stop() {
     stopping = true;
@@ -58,6 +59,7 @@ struct ModemManagerSource::Run {
   void live(ModemLink& link) {
     while (!stopping) {
       noticeListeners();
+      noticeSleep(link);
       if (const auto condition = link.condition()) report(*condition);
       update(link.picture());
       if (stopping) break;
@@ -77,6 +79,13 @@ struct ModemManagerSource::Run {
   void noticeListeners() {
     const std::uint64_t now = listeners->generation();
     if (std::exchange(generation, now) != now) keeper.sendAll();
+  }
+
+  // The modem may be anywhere by now.
+  void noticeSleep(ModemLink& link) {
+    constexpr auto kNap = 1s;
+    const auto now = timing.asleep();
+    if (now - std::exchange(slept, now) >= kNap) link.readAnew();
   }
 
   void hand(const SourceEvent& event) {
@@ -117,6 +126,7 @@ struct ModemManagerSource::Run {
   // The thread only.
   SaidOnce said;
   std::uint64_t generation = 0;
+  std::chrono::milliseconds slept;
   SourceCondition reported;
 };
 

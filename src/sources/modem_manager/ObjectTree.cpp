@@ -61,6 +61,7 @@ void ObjectTree::ownerChanged(sdbus::Message& signal) {
   signal >> name >> before >> now;
   forgetAll();
   _owner.clear();
+  _isCurrent = true;
   ++_epoch;
   _pause = kFirstPause;
   _manager = now.empty() ? Manager::absent : Manager::unknown;
@@ -134,6 +135,15 @@ std::set<std::string> ObjectTree::step(Clock::time_point now) {
   return gone;
 }
 
+void ObjectTree::readAnew() {
+  if (_owner.empty()) return;  // asked for anyway
+  for (const std::string& path : std::set<std::string>(_parts)) drop(path);
+  for (std::set<Place>* places : {&_toRead, &_reading, &_unread}) places->clear();
+  _isCurrent = false;
+  _pause = kFirstPause;
+  _askAt = Clock::time_point();
+}
+
 // Asked again with growing pauses until there is an answer.
 void ObjectTree::askForAll() {
   _askAt = Clock::time_point::max();
@@ -144,6 +154,7 @@ void ObjectTree::askForAll() {
       mm::kRoot, mm::kObjectManager, "GetManagedObjects",
       [this, epoch](sdbus::MethodReply& reply) {
         if (epoch != _epoch) return;
+        _isCurrent = true;
         std::map<sdbus::ObjectPath, BusInterfaces> objects;
         reply >> objects;
         for (const auto& [path, interfaces] : BusObjects(_objects)) {

@@ -33,6 +33,9 @@ class ObjectTree {
   std::set<std::string> step(Clock::time_point now);
   // The objects that ModemManager does not list by itself, all that are wanted.
   void want(const std::vector<ModemPart>& parts);
+  // All is asked for again, and is not current before there is an answer.
+  void readAnew();
+  bool isCurrent() const { return _isCurrent; }
   // What could not be read is asked for again.
   void askAgain();
   // When step() has something to do, at the latest.
@@ -59,6 +62,7 @@ class ObjectTree {
   std::uint64_t _epoch = 0;  // of the owner: answers of an earlier one are late
   Clock::time_point _askAt;
   std::chrono::seconds _pause;
+  bool _isCurrent = true;
   bool _newsMeanwhile = false;  // objects came or went while all were asked for
   BusObjects _objects;
   std::set<std::string> _wanted;  // paths

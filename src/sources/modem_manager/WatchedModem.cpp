@@ -111,6 +111,13 @@ WatchedModem::WatchedModem(const std::string& modem, std::chrono::milliseconds p
                       return found;
                     }) {}
 
+void WatchedModem::readAnew() {
+  _answers = {};
+  _askedPlace.clear();
+  _cells.callSoon();
+  _place.callSoon();
+}
+
 void WatchedModem::step(BusCalls& calls, SaidOnce& said, const BusInterfaces& modem,
                         Clock::time_point now) {
   if (!isEnabled(modem)) {

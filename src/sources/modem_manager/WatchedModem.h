@@ -29,6 +29,8 @@ class WatchedModem {
   const std::string& path() const { return _path; }
   const ModemAnswers& answers() const { return _answers; }
 
+  // What was answered counts no more, and is asked for with the next step.
+  void readAnew();
   // Calls what is due; `modem` is what is known of it.
   void step(BusCalls& calls, SaidOnce& said, const BusInterfaces& modem, Clock::time_point now);
   Clock::time_point due(const BusInterfaces& modem) const;

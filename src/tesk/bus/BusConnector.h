@@ -1,6 +1,7 @@
 // The way to the baseband manager service over D-Bus.
 #pragma once
 
+#include <chrono>
 #include <functional>
 #include <memory>
 #include <string>
@@ -30,9 +31,11 @@ using AnswerWaitMaker = std::function<std::shared_ptr<AnswerWait>()>;
 // Its connections are there at once and find the service by themselves: when it appears, again when
 // it or the bus comes back or it refused before, and then they register and switch delivery on as
 // before. While it is away commands answer kServiceUnreachable; while it only takes its time they
-// wait as `makeWait` has it, or without doing anything else.
+// wait as `makeWait` has it, or without doing anything else. With a `rest` events may be late by
+// that much, so that they come together: see EventRest.h.
 std::shared_ptr<Connector> makeBusConnector(BusAddress address, ReachabilityObserver observer = {},
                                             AnswerWaitMaker makeWait = {},
-                                            ConditionObserver conditionObserver = {});
+                                            ConditionObserver conditionObserver = {},
+                                            std::chrono::milliseconds rest = {});
 
 }  // namespace tesk::bus

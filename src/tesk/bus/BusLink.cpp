@@ -27,19 +27,20 @@ constexpr std::chrono::milliseconds kFirstPause = 250ms;
 constexpr std::chrono::milliseconds kLongestPause = 2s;
 // The bus keeps a record of every call that it denies.
 constexpr std::chrono::milliseconds kLongestPauseWithoutPermission = 30s;
-constexpr int kPacketsAtOnce = 256;
+constexpr std::size_t kPacketsAtOnce = 256;
 
 CommandResult unreachable(std::string_view why) { return {kServiceUnreachable, std::string(why)}; }
 
 }  // namespace
 
 BusLink::BusLink(const BusAddress& address, std::string clientName, EventSink sink, bool deliver,
-                 ConditionObserver conditionObserver)
+                 ConditionObserver conditionObserver, std::chrono::milliseconds rest)
     : _clientName(std::move(clientName)),
       _sink(std::move(sink)),
       _connection(connectTo(address)),
       _proxy(sdbus::createProxy(*_connection, kServiceName, kObjectPath)),
       _condition(*_connection, *_proxy, std::move(conditionObserver)),
+      _rest(rest),
       _deliver(deliver),
       _pause(kFirstPause) {
   watchOwner();
@@ -205,7 +206,8 @@ bool BusLink::isOverdue(Clock::time_point now) const {
 
 int BusLink::pollTimeout(const sdbus::IConnection::PollData& bus) const {
   const auto now = Clock::now();
-  std::optional<Clock::time_point> next = _tryAgainAt;
+  auto next = _tryAgainAt;
+  if (_restsUntil) next = next ? std::min(*next, *_restsUntil) : _restsUntil;
   if (!_sent.empty() && !isOverdue(now)) {
     const auto overdueAt = _sent.begin()->second.at + kAnswerTimeout;
     next = next ? std::min(*next, overdueAt) : overdueAt;
@@ -221,9 +223,10 @@ bool BusLink::waitAndProcess(int wakeDescriptor) {
   const auto bus = _connection->getEventLoopPollData();
   std::array<pollfd, 3> waited = {{{bus.fd, bus.events, 0},
                                    {wakeDescriptor, POLLIN, 0},
-                                   {isAttached() ? _stream.get() : -1, POLLIN, 0}}};
+                                   {isAttached() && !_restsUntil ? _stream.get() : -1, POLLIN, 0}}};
   ::poll(waited.data(), waited.size(), pollTimeout(bus));
-  if (waited[2].revents != 0) processStream();
+  const bool hasRested = _restsUntil && Clock::now() >= *_restsUntil;
+  if (waited[2].revents != 0 || hasRested) processStream();
   if (waited[0].revents != 0 || bus.getPollTimeout() == 0) processBus();
   if (_tryAgainAt && Clock::now() >= *_tryAgainAt) tryAgain();
   return waited[1].revents != 0;
@@ -241,18 +244,26 @@ void BusLink::processBus() {
 }
 
 void BusLink::processStream() {
+  const std::size_t events = readEvents();
+  _restsUntil = isAttached() ? _rest.after(events, Clock::now()) : std::nullopt;
+}
+
+std::size_t BusLink::readEvents() {
   std::array<std::uint8_t, kLargestPacket + 1> packet;
-  for (int i = 0; i < kPacketsAtOnce; ++i) {
+  std::size_t events = 0;
+  for (; isAttached() && events < kPacketsAtOnce; ++events) {
     const ssize_t size = ::recv(_stream.get(), packet.data(), packet.size(), MSG_DONTWAIT);
-    if (size < 0 && (errno == EAGAIN || errno == EINTR)) return;
+    if (size < 0 && (errno == EAGAIN || errno == EINTR)) break;
     if (size <= 0) {
       detach(kNotThere);
-      return tryAgainLater(kLongestPause);
+      tryAgainLater(kLongestPause);
+      break;
     }
     if (auto event = decodeEvent({packet.data(), static_cast<std::size_t>(size)})) {
       _sink(event->name, std::move(event->message));
     }
   }
+  return events;
 }
 
 }  // namespace tesk::bus

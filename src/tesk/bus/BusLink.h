@@ -14,6 +14,7 @@
 #include "tesk/Transport.h"
 #include "tesk/bus/BusAddress.h"
 #include "tesk/bus/ConditionWatch.h"
+#include "tesk/bus/EventRest.h"
 
 namespace tesk::bus {
 
@@ -38,9 +39,10 @@ class BusLink {
     std::string why;  // when not
   };
 
-  // Connects, which may take as long as the bus pleases, and begins to register.
+  // Connects, which may take as long as the bus pleases, and begins to register. Events may come
+  // together after a rest.
   BusLink(const BusAddress& address, std::string clientName, EventSink sink, bool deliver,
-          ConditionObserver conditionObserver);
+          ConditionObserver conditionObserver, std::chrono::milliseconds rest = {});
   ~BusLink();
   BusLink(const BusLink&) = delete;
   BusLink& operator=(const BusLink&) = delete;
@@ -76,6 +78,7 @@ class BusLink {
   void answered(std::uint64_t number, const sdbus::Error* error, CommandReply reply);
   void processBus();
   void processStream();
+  std::size_t readEvents();
   // The service has taken a call, or has refused one that is to be made again.
   void becomeIdle();
   void becomeBusy();
@@ -92,6 +95,8 @@ class BusLink {
   std::unique_ptr<sdbus::IProxy> _proxy;
   ConditionWatch _condition;
   sdbus::UnixFd _stream;
+  EventRest _rest;
+  std::optional<Clock::time_point> _restsUntil;
   bool _deliver;
   bool _ownerChanged = false;
   bool _busy = false;  // refused the last call, and none was taken since

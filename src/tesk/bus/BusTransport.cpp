@@ -78,19 +78,20 @@ class BusTransport::Worker {
   using Task = std::function<void(BusLink* link)>;
 
   Worker(BusAddress address, std::string clientName, EventSink sink, ReachabilityObserver observer,
-         ConditionObserver conditionObserver)
+         ConditionObserver conditionObserver, std::chrono::milliseconds rest)
       : _address(std::move(address)),
         _clientName(std::move(clientName)),
         _sink(std::move(sink)),
         _observer(std::move(observer)),
-        _conditionObserver(std::move(conditionObserver)) {}
+        _conditionObserver(std::move(conditionObserver)),
+        _rest(rest) {}
 
   void run() {
     auto pause = kFirstPause;
     while (!isStopping()) {
       try {
         setConnecting(true);
-        BusLink link(_address, _clientName, _sink, _deliver, _conditionObserver);
+        BusLink link(_address, _clientName, _sink, _deliver, _conditionObserver, _rest);
         setConnecting(false);
         pause = kFirstPause;
         live(link);
@@ -194,6 +195,7 @@ class BusTransport::Worker {
   const EventSink _sink;
   const ReachabilityObserver _observer;
   const ConditionObserver _conditionObserver;
+  const std::chrono::milliseconds _rest;
   const qel::WakeUp _wakeUp;
   std::mutex _mutex;
   std::condition_variable _changed;
@@ -208,10 +210,10 @@ class BusTransport::Worker {
 
 BusTransport::BusTransport(BusAddress address, std::string clientName, EventSink sink,
                            ReachabilityObserver observer, AnswerWaitMaker makeWait,
-                           ConditionObserver conditionObserver)
+                           ConditionObserver conditionObserver, std::chrono::milliseconds rest)
     : _makeWait(std::move(makeWait)),
       _worker(std::make_shared<Worker>(std::move(address), std::move(clientName), std::move(sink),
-                                       std::move(observer), std::move(conditionObserver))),
+                                       std::move(observer), std::move(conditionObserver), rest)),
       _thread([worker = _worker] { worker->run(); }) {}
 
 BusTransport::~BusTransport() {

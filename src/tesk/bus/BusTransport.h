@@ -15,7 +15,7 @@ class BusTransport final : public Transport {
  public:
   BusTransport(BusAddress address, std::string clientName, EventSink sink,
                ReachabilityObserver observer, AnswerWaitMaker makeWait,
-               ConditionObserver conditionObserver);
+               ConditionObserver conditionObserver, std::chrono::milliseconds rest);
   ~BusTransport() override;
 
   CommandResult performCommand(std::string_view command, const Message& request,

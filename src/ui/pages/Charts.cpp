@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <array>
 
+#include "ui/pages/CurveInWords.h"
 #include "ui/pages/ReadingOf.h"
 #include "ui/pages/Words.h"
 
@@ -60,6 +61,7 @@ Chart makeChart(const ChartFrame& frame, Quantity quantity,
   const std::size_t others = chart.curves.size();
   auto runs = thinnedAll(
       frame.viewpoint.history->series(quantity).between(frame.fromMs, frame.toMs), frame);
+  const std::string course = curveInWords(runs, chart.unit);
   if (!runs.empty()) {
     chart.curves.push_back(
         {.id = "serving", .label = "", .isServing = true, .runs = std::move(runs)});
@@ -70,6 +72,7 @@ Chart makeChart(const ChartFrame& frame, Quantity quantity,
   end.nowMs = frame.toMs;
   chart.newest = readingOf(end, quantity).reading;
   chart.spoken = chart.title + ", " + chart.newest.spoken;
+  if (!course.empty()) chart.spoken += ", " + course;
   if (others > 0) {
     chart.spoken +=
         ", with " + std::to_string(others) + (others == 1 ? " neighbour" : " neighbours");

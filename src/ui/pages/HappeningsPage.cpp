@@ -102,6 +102,7 @@ HappeningRow rowOf(const Happening& happening, std::uint64_t number, DayHeader& 
   row.kindName = labelOf(happening.kind);
   if (happening.technology) row.technology = nameOf(*happening.technology);
   row.spoken = row.time + ", " + row.kindName + ": " + row.text;
+  if (!row.record.empty()) row.spoken += ", told by " + row.record;
   return row;
 }
 

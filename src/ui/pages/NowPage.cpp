@@ -186,10 +186,11 @@ void setReadings(const Viewpoint& viewpoint, NowPage& page) {
 }
 
 void setSpoken(NowPage& page) {
-  for (const NowLine& each : page.lines) {
-    if (each.isKnown) page.spoken += each.spoken + ". ";
-  }
+  for (const NowLine& each : page.lines) page.spoken += each.spoken + ". ";
   page.spoken += page.level.spoken + ".";
+  for (const auto& reading : {page.quality, page.sinr}) {
+    if (reading && !reading->figure.empty()) page.spoken += " " + reading->spoken + ".";
+  }
 }
 
 }  // namespace

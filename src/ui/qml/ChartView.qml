@@ -37,7 +37,10 @@ FocusScope {
 
     Accessible.role: Accessible.Chart
     Accessible.name: reading ? curves.readOff.spoken : facts.spoken ?? ""
+    Accessible.description: reading ? "" : qsTr("Decrease and increase read values off")
     Accessible.focusable: true
+    Accessible.onDecreaseAction: curves.readPrevious(index)
+    Accessible.onIncreaseAction: curves.readNext(index)
 
     Keys.onLeftPressed: event => {
         if (event.modifiers & Qt.AltModifier)

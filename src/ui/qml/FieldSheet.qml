@@ -16,8 +16,10 @@ FocusScope {
     visible: opened || panel.y < height
     onOpenedChanged: {
         drag = 0;
-        if (opened)
+        if (opened) {
             forceActiveFocus();
+            ScreenReader.enter(panel);
+        }
     }
 
     Keys.onPressed: event => {
@@ -63,7 +65,8 @@ FocusScope {
         color: Theme.row
 
         Accessible.role: Accessible.Dialog
-        Accessible.name: overlay.sheet.label
+        Accessible.name: overlay.sheet.label + ": " + content.spokenValue
+        Accessible.focusable: true
 
         Behavior on y {
             enabled: !swipe.active

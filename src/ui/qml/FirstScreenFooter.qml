@@ -42,6 +42,8 @@ Item {
         font.pointSize: Theme.headerSize
         horizontalAlignment: Text.AlignHCenter
         wrapMode: Text.Wrap
+        Accessible.role: Accessible.StaticText
+        Accessible.name: text
     }
 
     implicitHeight: column.height + Theme.padding

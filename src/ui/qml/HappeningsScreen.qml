@@ -42,6 +42,7 @@ Screen {
         section.delegate: SectionHeader {}
         footer: older
         Accessible.role: Accessible.List
+        Accessible.name: screen.title
 
         Component {
             id: older

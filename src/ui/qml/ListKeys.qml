@@ -1,4 +1,5 @@
 import QtQuick
+import Qelwatch.Ui
 
 // The keys of a list: they move its current row and choose it.
 Item {
@@ -19,7 +20,13 @@ Item {
         return Math.max(1, Math.floor(list.height * list.count / list.contentHeight) - 1);
     }
 
+    function announce(): void {
+        if (activeFocus)
+            ScreenReader.enter(list.currentItem);
+    }
+
     activeFocusOnTab: true
+    onActiveFocusChanged: announce()
 
     Keys.onUpPressed: goTo(list.currentIndex - 1)
     Keys.onDownPressed: goTo(list.currentIndex + 1)
@@ -38,5 +45,13 @@ Item {
             return;
         event.accepted = true;
         goTo(list.currentIndex + step);
+    }
+
+    Connections {
+        target: keys.list
+
+        function onCurrentItemChanged(): void {
+            keys.announce();
+        }
     }
 }

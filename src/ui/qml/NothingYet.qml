@@ -9,4 +9,6 @@ Text {
     horizontalAlignment: Text.AlignHCenter
     wrapMode: Text.Wrap
     lineHeight: 1.25
+    Accessible.role: Accessible.StaticText
+    Accessible.name: text
 }

@@ -10,4 +10,6 @@ Text {
     color: Theme.secondary
     font.pointSize: Theme.nameSize
     wrapMode: Text.Wrap
+    Accessible.role: Accessible.StaticText
+    Accessible.name: text
 }

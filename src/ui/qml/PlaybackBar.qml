@@ -19,6 +19,8 @@ Rectangle {
         textFormat: Text.PlainText
         color: Theme.secondary
         font.pointSize: Theme.headerSize
+        Accessible.role: Accessible.StaticText
+        Accessible.name: text
     }
 
     Hairline {
@@ -44,7 +46,6 @@ Rectangle {
                 text: bar.playback.progressText
                 elide: Text.ElideMiddle
                 Accessible.role: Accessible.ProgressBar
-                Accessible.name: text
             }
             TextButton {
                 id: giveUp

@@ -42,6 +42,7 @@ Screen {
         keyNavigationEnabled: false
         highlightFollowsCurrentItem: false
         Accessible.role: Accessible.List
+        Accessible.name: screen.title
         // qmllint disable unqualified
         delegate: RecordingRow {
             onTapped: screen.openRow(index)

@@ -71,6 +71,8 @@ Rectangle {
         color: Theme.secondary
         font.pointSize: Theme.headerSize
         wrapMode: Text.Wrap
+        Accessible.role: Accessible.StaticText
+        Accessible.name: text
     }
     BackButton {
         id: backButton

@@ -7,12 +7,22 @@ Item {
 
     required property PlaybackModel playback
 
+    // As assistive tools read it, and move it.
+    property real value: 0
+    readonly property real minimumValue: 0
+    readonly property real maximumValue: 1
+    readonly property real stepSize: 0.01
+
     function jump(x: real): void {
         playback.jumpTo((x - knob.width / 2) / Math.max(1, width - knob.width));
     }
 
     implicitHeight: Theme.touch
     activeFocusOnTab: true
+    onValueChanged: {
+        if (value !== playback.position)
+            playback.jumpTo(value);
+    }
 
     Accessible.role: Accessible.Slider
     Accessible.name: qsTr("Moment of the recording, %1").arg(playback.positionText)
@@ -28,6 +38,13 @@ Item {
             event.accepted = true;
             playback.jumpTo(event.key === Qt.Key_Home ? 0 : 1);
         }
+    }
+
+    Binding {
+        target: scrubber
+        property: "value"
+        value: scrubber.playback.position
+        restoreMode: Binding.RestoreNone
     }
 
     Rectangle {

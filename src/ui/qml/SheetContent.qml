@@ -7,6 +7,9 @@ Column {
 
     required property SheetModel sheet
 
+    // For a screen reader.
+    readonly property string spokenValue:
+        [sheet.value || qsTr("empty"), sheet.unit, sheet.word].filter(part => part).join(" ")
     // From the top of the value's line to the top of smaller words that stand on it.
     readonly property real drop: Math.round(large.ascent - small.ascent)
 
@@ -35,6 +38,8 @@ Column {
     Text {
         width: parent.width
         text: Theme.breakable(content.sheet.key + "  \u00B7  " + content.sheet.place)
+        Accessible.role: Accessible.StaticText
+        Accessible.name: content.sheet.key + ", " + content.sheet.place
         textFormat: Text.PlainText
         color: Theme.secondary
         font.pointSize: Theme.headerSize
@@ -45,6 +50,8 @@ Column {
         spacing: 8
 
         Text {
+            Accessible.role: Accessible.StaticText
+            Accessible.name: content.spokenValue
             width: Math.min(implicitWidth, parent.width)
             text: Theme.breakable(content.sheet.value === "" ? "\u2013" : content.sheet.value)
             textFormat: Text.PlainText
@@ -54,6 +61,7 @@ Column {
             wrapMode: Text.Wrap
         }
         Text {
+            Accessible.ignored: true
             visible: text !== ""
             text: content.sheet.unit
             topPadding: content.drop
@@ -62,6 +70,7 @@ Column {
             font.pointSize: Theme.valueSize
         }
         Text {
+            Accessible.ignored: true
             visible: text !== ""
             text: content.sheet.word
             topPadding: content.drop
@@ -77,6 +86,8 @@ Column {
         visible: content.sheet.hasCurve
         sheet: content.sheet
         color: Theme.accent
+        Accessible.role: Accessible.Graphic
+        Accessible.name: qsTr("Curve of ten minutes: %1").arg(content.sheet.curveText)
     }
     Repeater {
         model: content.sheet.lines

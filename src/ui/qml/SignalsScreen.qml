@@ -79,6 +79,8 @@ Screen {
                         color: Theme.secondary
                         font.pointSize: Theme.nameSize
                         wrapMode: Text.Wrap
+                        Accessible.role: Accessible.StaticText
+                        Accessible.name: text
                     }
                     Row {
                         id: zoomRow

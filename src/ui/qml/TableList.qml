@@ -40,6 +40,7 @@ FocusScope {
         section.delegate: SectionHeader {}
 
         Accessible.role: Accessible.List
+        Accessible.name: table.model.title
     }
     ListPlace {
         list: list

@@ -13,7 +13,11 @@ MouseArea {
 
     Accessible.name: text
     Accessible.focusable: true
-    Accessible.onPressAction: tapped()
+    Accessible.description: enabled ? "" : qsTr("Not now")
+    Accessible.onPressAction: {
+        if (enabled)
+            tapped();
+    }
 
     Keys.onReturnPressed: tapped()
     Keys.onEnterPressed: tapped()

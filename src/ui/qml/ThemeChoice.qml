@@ -13,6 +13,7 @@ Tappable {
     activeFocusOnTab: true
 
     Accessible.role: Accessible.RadioButton
+    Accessible.checkable: true
     Accessible.checked: checked
 
     Text {

@@ -29,9 +29,8 @@ std::optional<std::uint64_t> earlier(std::optional<std::uint64_t> a,
 Pages::Pages(QObject* parent) : QObject(parent), _playback(_validator, _history, nullptr) {
   _validator->setObserver(&_history);
   _soon.setSingleShot(true);
-  _later.setSingleShot(true);
   connect(&_soon, &QTimer::timeout, this, &Pages::refresh);
-  connect(&_later, &QTimer::timeout, this, &Pages::refresh);
+  connect(&_later, &BootTimer::timeout, this, &Pages::refresh);
   _curves.setAsk([this] { refresh(); });
   _happenings.setAsk([this] { refresh(); });
   _sheet.setAsk([this] { refresh(); });

@@ -13,6 +13,7 @@
 #include "history/History.h"
 #include "metrics/MetricValidator.h"
 #include "ui/pages/Feed.h"
+#include "ui/quick/pages/BootTimer.h"
 #include "ui/quick/pages/FreshnessModel.h"
 #include "ui/quick/pages/HappeningsModel.h"
 #include "ui/quick/pages/NowModel.h"
@@ -88,7 +89,7 @@ class Pages : public QObject {
   std::optional<std::uint64_t> _seen;  // version of the history
   QElapsedTimer _sinceRefresh;
   QTimer _soon;   // the next refresh, while one is due
-  QTimer _later;  // when the page reads differently by itself
+  BootTimer _later;  // when the page reads differently by itself
   NowModel _now;
   SignalsModel _curves;
   HappeningsModel _happenings;

@@ -4,6 +4,7 @@
 #include <QtGui/QGuiApplication>
 #include <utility>
 
+#include "ui/pages/CurveInWords.h"
 #include "ui/quick/pages/Words.h"
 
 namespace qel {
@@ -57,6 +58,10 @@ void SheetModel::takeLines() {
                      {"prose", line.id == "meaning"}}});
   }
   _lines.take(std::move(rows));
+}
+
+QString SheetModel::curveText() const {
+  return hasCurve() ? shown(curveInWords(_sheet->curve, _sheet->unit)) : QString();
 }
 
 QString SheetModel::text(std::string FieldSheet::*member) const {

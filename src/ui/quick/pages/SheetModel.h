@@ -27,6 +27,7 @@ class SheetModel : public QObject {
   Q_PROPERTY(QString unit READ unit NOTIFY changed)
   Q_PROPERTY(QString word READ word NOTIFY changed)
   Q_PROPERTY(bool hasCurve READ hasCurve NOTIFY changed)
+  Q_PROPERTY(QString curveText READ curveText NOTIFY changed)
   Q_PROPERTY(qel::RowsModel* lines READ lines CONSTANT)
 
  public:
@@ -62,6 +63,8 @@ class SheetModel : public QObject {
   QString unit() const { return text(&FieldSheet::unit); }
   QString word() const { return text(&FieldSheet::word); }
   bool hasCurve() const { return _sheet && !_sheet->curve.empty(); }
+  // The curve for whoever does not see it.
+  QString curveText() const;
   RowsModel* lines() { return &_lines; }  // label, value, prose
 
  signals:
