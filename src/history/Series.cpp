@@ -79,11 +79,25 @@ Series::Kept Series::Mean::point(std::uint64_t lastMs) const {
   return {fromMs + (lastMs - fromMs) / 2, static_cast<float>(sum / count), begins};
 }
 
+// The run of the first point that is known itself began behind the last mean before that point.
+bool Series::isCutOffFromMeans() const {
+  const std::uint64_t firstMs = _recent[0].timeMs();
+  const std::size_t next = _day.until(firstMs - 1);
+  if (next == _day.size()) return _mean.begins && _mean.fromMs < firstMs;
+  if (!_day[next].begins()) return false;
+  for (std::size_t i = _recent.until(_day[next].timeMs()); i-- > 0;) {
+    if (_recent[i].begins()) return false;  // that is where it began
+  }
+  return true;
+}
+
 std::vector<Run> Series::between(std::uint64_t fromMs, std::uint64_t toMs) const {
   std::vector<Run> runs;
+  bool isCutOff = false;
   const auto append = [&](const Kept& point) {
     if (point.timeMs() < fromMs || point.timeMs() > toMs) return;
-    if (runs.empty() || point.begins()) runs.emplace_back();
+    if (runs.empty() || point.begins() || isCutOff) runs.emplace_back();
+    isCutOff = false;
     runs.back().push_back({point.timeMs(), point.value});
   };
   const auto appendRow = [&](const Row& row, std::uint64_t untilMs) {
@@ -93,6 +107,7 @@ std::vector<Run> Series::between(std::uint64_t fromMs, std::uint64_t toMs) const
   // Means until the first point that is known itself.
   if (_recent.size() > 0 && _recent[0].timeMs() > fromMs) {
     appendRow(_day, std::min(toMs, _recent[0].timeMs() - 1));
+    isCutOff = isCutOffFromMeans();
   }
   appendRow(_recent, toMs);
   return runs;

@@ -113,6 +113,7 @@ class Series {
   void turn(std::uint64_t timeMs);
   bool isSilence(std::uint64_t distanceMs) const;
   void dropOld();
+  bool isCutOffFromMeans() const;
   void beginMean(std::uint64_t timeMs);
 
   Limits _limits;

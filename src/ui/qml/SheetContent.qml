@@ -9,7 +9,7 @@ Column {
 
     // For a screen reader.
     readonly property string spokenValue:
-        [sheet.value || qsTr("empty"), sheet.unit, sheet.word].filter(part => part).join(" ")
+        (sheet.value || qsTr("empty")) + (sheet.unit && " " + sheet.unit) + (sheet.word && " " + sheet.word)
     // From the top of the value's line to the top of smaller words that stand on it.
     readonly property real drop: Math.round(large.ascent - small.ascent)
 

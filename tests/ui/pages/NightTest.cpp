@@ -56,7 +56,7 @@ TEST(Night, EverySleepIsOneGapAndNoLineIsDrawnAcrossIt) {
   EXPECT_EQ(gapsIn(scene.history.happenings()), kPieces);
   EXPECT_EQ(scene.history.happenings().back().text, "Nothing was reported for 2 h 0 min");
   const auto runs = scene.history.series(Quantity::lteRsrp).between(kStartMs, kStartMs + now);
-  for (const Run& run : runs) EXPECT_LT(run.back().timeMs - run.front().timeMs, kPieceMs);
+  for (const auto& run : runs) EXPECT_LT(run.back().timeMs - run.front().timeMs, kPieceMs);
 }
 
 TEST(Night, TimersGoOnWhereTheyStoodAndFireOnce) {
