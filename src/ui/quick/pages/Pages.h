@@ -88,7 +88,7 @@ class Pages : public QObject {
   QString _inSight;
   std::optional<std::uint64_t> _seen;  // version of the history
   QElapsedTimer _sinceRefresh;
-  QTimer _soon;   // the next refresh, while one is due
+  QTimer _soon;      // the next refresh, while one is due
   BootTimer _later;  // when the page reads differently by itself
   NowModel _now;
   SignalsModel _curves;
