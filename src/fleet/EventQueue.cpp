@@ -52,10 +52,12 @@ std::unique_ptr<EventQueue> EventQueue::open(const std::string& folder, const Li
 }
 
 bool EventQueue::prepare(const std::string& folder) {
-  // Exclusive: no other process, and so no memory to share with one.
+  // Small pages, for an event is small and goes to the disk by itself. Exclusive: no other process,
+  // and so no memory to share with one.
   if (!_database.open(folder + "/publish.db") ||
-      !_database.execute("PRAGMA locking_mode = EXCLUSIVE; PRAGMA journal_mode = WAL;"
-                         "PRAGMA synchronous = NORMAL; BEGIN IMMEDIATE")) {
+      !_database.execute("PRAGMA page_size = 1024; PRAGMA locking_mode = EXCLUSIVE;"
+                         "PRAGMA journal_mode = WAL; PRAGMA synchronous = NORMAL;"
+                         "BEGIN IMMEDIATE")) {
     return false;
   }
   std::uint64_t version = 0;
@@ -165,30 +167,34 @@ std::optional<std::uint64_t> EventQueue::lastBeyondBytes() {
   return last;
 }
 
-bool EventQueue::dropUntil(std::uint64_t number) {
-  std::uint64_t count = 0;
-  std::uint64_t bytes = 0;
+// Events from the first number to the last, which leaves `after`. Within a transaction.
+bool EventQueue::forget(std::uint64_t first, std::uint64_t last, Counts& after) {
   {
-    auto dropped = _database.run(
+    auto gone = _database.run(
         "SELECT count(*), sum(length(CAST(line AS BLOB))) FROM events"
-        " WHERE number > ?1 AND number <= ?2");
-    if (!dropped.with(_sending).with(number).row()) return false;
-    count = dropped.number(0);
-    bytes = dropped.number(1);
+        " WHERE number BETWEEN ?1 AND ?2");
+    if (!gone.with(first).with(last).row()) return false;
+    after.waiting -= gone.number(0);
+    after.waitingBytes -= gone.number(1);
   }
-  const bool isDone = _database.execute("BEGIN IMMEDIATE") &&
-                      _database.run("DELETE FROM events WHERE number > ?1 AND number <= ?2")
-                          .with(_sending)
-                          .with(number)
-                          .done() &&
-                      _database.run("UPDATE facts SET value = value + ?1 WHERE name = 'dropped'")
-                          .with(count)
+  return _database.run("DELETE FROM events WHERE number BETWEEN ?1 AND ?2")
+      .with(first)
+      .with(last)
+      .done();
+}
+
+bool EventQueue::dropUntil(std::uint64_t number) {
+  Counts after = _counts;
+  if (!_database.execute("BEGIN IMMEDIATE") || !forget(_sending + 1, number, after)) {
+    return _database.rollBack();
+  }
+  after.dropped += _counts.waiting - after.waiting;
+  const bool isDone = _database.run("UPDATE facts SET value = ?1 WHERE name = 'dropped'")
+                          .with(after.dropped)
                           .done() &&
                       keepNewest() && _database.execute("COMMIT");
   if (!isDone) return _database.rollBack();
-  _counts.waiting -= count;
-  _counts.waitingBytes -= bytes;
-  _counts.dropped += count;
+  _counts = after;
   return true;
 }
 
@@ -220,27 +226,26 @@ void EventQueue::sendAgain() {
   _sending = 0;
 }
 
-bool EventQueue::remove(std::span<const std::uint64_t> numbers) {
+bool EventQueue::remove(std::vector<std::uint64_t> numbers) {
+  std::ranges::sort(numbers);
   const std::lock_guard lock(_mutex);
   Counts after;
+  const auto forgetAll = [&] {
+    for (auto begin = numbers.begin(); begin != numbers.end();) {
+      auto end = begin + 1;
+      while (end != numbers.end() && *end <= *(end - 1) + 1) ++end;
+      if (!forget(*begin, *(end - 1), after)) return false;
+      begin = end;
+    }
+    return true;
+  };
   const bool isDone = written([&] {
     after = _counts;
-    return _database.execute("BEGIN IMMEDIATE") &&
-           std::ranges::all_of(numbers, [&](auto number) { return take(number, after); }) &&
-           keepNewest() && _database.execute("COMMIT");
+    return _database.execute("BEGIN IMMEDIATE") && forgetAll() && keepNewest() &&
+           _database.execute("COMMIT");
   });
   if (isDone) _counts = after;
   return isDone;
-}
-
-bool EventQueue::take(std::uint64_t number, Counts& after) {
-  auto removed = _database.run(
-      "DELETE FROM events WHERE number = ?1"
-      " RETURNING length(CAST(line AS BLOB))");
-  if (!removed.with(number).row()) return !removed.hasFailed();
-  --after.waiting;
-  after.waitingBytes -= removed.number(0);
-  return true;
 }
 
 bool EventQueue::settle() {

@@ -6,7 +6,6 @@
 #include <memory>
 #include <mutex>
 #include <optional>
-#include <span>
 #include <string>
 #include <string_view>
 #include <vector>
@@ -52,7 +51,7 @@ class EventQueue {
   // What was being sent waits again.
   void sendAgain();
   // These have arrived. False when the disk does not take that: they then still wait.
-  bool remove(std::span<const std::uint64_t> numbers);
+  bool remove(std::vector<std::uint64_t> numbers);
   // Brings all to the disk. Before that no number is shown to anybody: after a failure of power it
   // might be given again. False when that fails.
   bool settle();
@@ -70,7 +69,7 @@ class EventQueue {
   bool insert(std::uint64_t timeMs, std::string_view metric, std::string_view line);
   template <class Change>
   bool written(Change change);
-  bool take(std::uint64_t number, Counts& after);
+  bool forget(std::uint64_t first, std::uint64_t last, Counts& after);
   bool keepNewest();
   bool keepLimits();
   bool dropUntil(std::uint64_t number);
