@@ -168,6 +168,7 @@ void BrokerLink::greeted(int reason, const mqtt5__property* properties) {
   if (mosquitto_property_read_int16(properties, MQTT_PROP_SERVER_KEEP_ALIVE, &wanted, false)) {
     _keepAlive = std::chrono::seconds(wanted);
   }
+  mosquitto_property_read_int16(properties, MQTT_PROP_TOPIC_ALIAS_MAXIMUM, &_mostAliases, false);
   _state = State::open;
 }
 
@@ -193,12 +194,23 @@ BrokerLink::State BrokerLink::turn(bool isReadable) {
 
 std::optional<int> BrokerLink::send(const std::string& topic, std::string_view text,
                                     Retained retained, bool& isTooLarge) {
+  // A topic of events goes out once, and then as a number: as many as the broker remembers.
+  const bool isKnown = _aliases.contains(topic);
+  const bool isRemembered = isKnown || (retained == Retained::no && _aliases.size() < _mostAliases);
+  mosquitto_property* properties = nullptr;
+  if (isRemembered) {
+    const auto next = static_cast<std::uint16_t>(_aliases.size() + 1);
+    const std::uint16_t alias = _aliases.emplace(topic, next).first->second;
+    mosquitto_property_add_int16(&properties, MQTT_PROP_TOPIC_ALIAS, alias);
+  }
   int message = 0;
-  const int code =
-      mosquitto_publish_v5(_client.get(), &message, topic.c_str(), static_cast<int>(text.size()),
-                           text.data(), kAtLeastOnce, retained == Retained::yes, nullptr);
-  isTooLarge = code == MOSQ_ERR_OVERSIZE_PACKET || code == MOSQ_ERR_PAYLOAD_SIZE;
+  const int code = mosquitto_publish_v5(_client.get(), &message, isKnown ? nullptr : topic.c_str(),
+                                        static_cast<int>(text.size()), text.data(), kAtLeastOnce,
+                                        retained == Retained::yes, properties);
+  mosquitto_property_free_all(&properties);
   if (code == MOSQ_ERR_SUCCESS) return message;
+  if (!isKnown) _aliases.erase(topic);
+  isTooLarge = code == MOSQ_ERR_OVERSIZE_PACKET || code == MOSQ_ERR_PAYLOAD_SIZE;
   if (!isTooLarge) note(code);
   return std::nullopt;
 }

@@ -4,6 +4,7 @@
 #include <chrono>
 #include <cstdint>
 #include <functional>
+#include <map>
 #include <memory>
 #include <optional>
 #include <string>
@@ -90,6 +91,8 @@ class BrokerLink {
   LinkFailure _failure;
   std::string _lastComplaint;  // of the library
   std::chrono::seconds _keepAlive;
+  std::uint16_t _mostAliases = 0;
+  std::map<std::string, std::uint16_t> _aliases;  // of topics
 };
 
 }  // namespace qel::fleet

@@ -1,5 +1,7 @@
 #include <nlohmann/json.hpp>
 
+#include "fleet/Folder.h"
+#include "fleet/WireTap.h"
 #include "fleet/WithBroker.h"
 
 namespace qel::testing {
@@ -92,6 +94,25 @@ TEST_F(QelctlPublish, waitsForOthersOfABatch) {
   for (const Received& each : subscriber.received()) bytes += each.payload.size();
   EXPECT_GT(bytes, 20'000U);
   EXPECT_TRUE(isWithoutGap(subscriber.events()));
+}
+
+// Most brokers take but a few messages at a time.
+TEST_F(QelctlPublish, sendsALongTopicOnce) {
+  const Folder own;
+  const Broker narrow(own.path(), "max_inflight_messages 5\nmax_topic_alias 4\n");
+  const Subscriber receiver(narrow, file("narrow"));
+  const WireTap tap(narrow.port());
+  RunningQelctl publisher(publishing("mqtt://127.0.0.1:" + std::to_string(tap.port())));
+  ASSERT_TRUE(eventually([&] { return receiver.newest() > 300; })) << publisher.err();
+  const std::string said = end(publisher);
+  EXPECT_TRUE(eventually([&] { return receiver.events().size() >= sentBy(said); })) << said;
+  EXPECT_TRUE(isWithoutGap(receiver.events()));
+  const std::string topic = "qelwatch/one/KCellularLteRrcState";  // the first one
+  EXPECT_GT(std::ranges::count(receiver.received(), topic, &Received::topic), 5);
+  const std::string wire = tap.sent();
+  const auto first = wire.find(topic);
+  ASSERT_NE(first, std::string::npos);
+  EXPECT_EQ(wire.find(topic, first + 1), std::string::npos);
 }
 
 TEST_F(QelctlPublish, namesAPhoneByChance) {
