@@ -185,9 +185,9 @@ BrokerLink::State BrokerLink::turn(bool isReadable) {
   // leaves with it.
   holdBack(true);
   if (isReadable) code = mosquitto_loop_read(client, kMostUnderWay);
+  if (code == MOSQ_ERR_SUCCESS) code = mosquitto_loop_misc(client);
   if (code == MOSQ_ERR_SUCCESS && wantsToWrite()) code = mosquitto_loop_write(client, 1);
   holdBack(false);
-  if (code == MOSQ_ERR_SUCCESS) code = mosquitto_loop_misc(client);
   if (code != MOSQ_ERR_SUCCESS) note(code);
   return _state;
 }

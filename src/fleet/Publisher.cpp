@@ -212,6 +212,7 @@ void Publisher::tellOfQueue() {
   const std::string text = jsonText(Dictionary{{"stream", _queue.stream()},
                                                {"dropped", counts.dropped},
                                                {"lost", counts.lost},
+                                               {"too_large", _tooLarge.load()},
                                                {"undecodable", _undecodable.load()}});
   if (std::exchange(_toldOfQueue, text) == text) return;
   bool isTooLarge = false;
@@ -246,8 +247,10 @@ bool Publisher::sendNext() {
     if (message) {
       _underWay[*message] = event.number;
     } else {
-      sayOnce(broker() + "the broker takes no message so large as event " +
-              std::to_string(event.number) + ", which is left out");
+      if (_tooLarge++ == 0) {
+        _say(broker() + "the broker takes no message so large as event " +
+             std::to_string(event.number) + ", which is left out, as are others like it");
+      }
       _arrived.push_back(event.number);
     }
     _sentUpTo = event.number;

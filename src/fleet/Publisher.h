@@ -53,8 +53,9 @@ class Publisher {
   bool end(std::chrono::milliseconds patience);
   // Once the broker has refused for good: why. Nobody tries again then.
   std::optional<std::string> refusal() const;
-  // That the broker has.
+  // That the broker has, and that are larger than it takes.
   std::uint64_t sent() const { return _sent; }
+  std::uint64_t tooLarge() const { return _tooLarge; }
 
  private:
   using Clock = std::chrono::steady_clock;
@@ -92,6 +93,7 @@ class Publisher {
   std::atomic<bool> _isRefused = false;
   std::atomic<std::size_t> _fresh = 0;  // bytes queued since the last batch began
   std::atomic<std::uint64_t> _sent = 0;
+  std::atomic<std::uint64_t> _tooLarge = 0;
   std::atomic<std::uint64_t> _undecodable = 0;
 
   // Of the thread.

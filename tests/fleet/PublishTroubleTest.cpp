@@ -87,6 +87,28 @@ TEST_F(PublishTrouble, isABrokerThatTakesNoMessages) {
   EXPECT_TRUE(isWithoutGap(subscriber.events()));
 }
 
+TEST_F(PublishTrouble, isABrokerThatTakesNoLargeMessages) {
+  const Broker broker(directory, "max_packet_size 300\n");
+  const Subscriber subscriber(broker, file("received"));
+  RunningQelctl publisher(publishing(broker.url()));
+  ASSERT_TRUE(eventually([&] { return subscriber.newest() > 200; })) << publisher.err();
+  const std::string text = end(publisher);
+  const std::string line = ": the broker takes no message so large as event ";
+  const auto said = text.find(line);
+  EXPECT_NE(said, std::string::npos) << text;
+  EXPECT_EQ(text.find(line, said + 1), std::string::npos) << text;
+  EXPECT_TRUE(eventually([&] { return subscriber.events().size() == sentBy(text); })) << text;
+  const auto stop = text.find(" larger than the broker takes");
+  ASSERT_NE(stop, std::string::npos) << text;
+  const std::string start = " events sent, 0 wait, ";
+  const auto begin = text.find(start) + start.size();
+  const std::string count = "\"too_large\": " + text.substr(begin, stop - begin) + ",";
+  EXPECT_TRUE(eventually([&] {
+    return subscriber.last("one", "queue").find(count) != std::string::npos;
+  })) << subscriber.last("one", "queue")
+      << text;
+}
+
 TEST_F(PublishTrouble, isACertificateThatNobodyKnows) {
   const Certificates own(directory, "own");
   const Certificates foreign(directory, "foreign");
