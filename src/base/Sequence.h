@@ -162,41 +162,42 @@ class Sequence {
   };
 
   // Elements that come in any order, each in a place of its own, at most 64. Moves all together in
-  // the end; until then the sequence is not used.
+  // the end, and looks then whether one may own something; until then the sequence is not used.
   class Spread {
    public:
     // `there` has a bit for the place of each that is there, in order.
-    Spread(Sequence& sequence, std::size_t places, std::uint64_t there)
+    [[gnu::always_inline]] Spread(Sequence& sequence, std::size_t places, std::uint64_t there)
         : _block(spreadable(sequence, places)), _there(there) {
-      std::size_t from = _block->size;
-      _block->size = 0;
-      for (; there != 0; there ^= std::bit_floor(there)) {
+      std::size_t from = std::exchange(_block->size, 0);
+      while (from-- > 0) {
         const auto to = static_cast<std::size_t>(std::bit_width(there)) - 1;
-        if (--from == to) return;  // as all before it
+        if (from == to) return;  // as all before it
         moveBytes(to, from);
+        there ^= std::uint64_t{1} << to;
       }
     }
     Spread(const Spread&) = delete;
     Spread& operator=(const Spread&) = delete;
-    ~Spread() {
+    [[gnu::always_inline]] ~Spread() {
       auto size = static_cast<std::uint32_t>(std::countr_one(_there));
       for (std::uint64_t apart = _there & (_there + 1); apart != 0; apart &= apart - 1) {
         moveBytes(size++, static_cast<std::uint32_t>(std::countr_zero(apart)));
       }
+      const T* first = elements(_block);
       _block->size = size;
+      _block->mayOwn = std::any_of(first, first + size, mayOwn) ? 1 : 0;
     }
 
     bool has(std::size_t place) const { return (_there >> place & 1) != 0; }
     T& operator[](std::size_t place) { return elements(_block)[place]; }
+    // In place of the one that may be there.
     template <class... Arguments>
-    T& make(std::size_t place, Arguments&&... arguments) {
+    [[gnu::always_inline]] T& make(std::size_t place, Arguments&&... arguments) {
+      T* made = elements(_block) + place;
+      if (has(place)) std::destroy_at(made);
       _there |= std::uint64_t{1} << place;
-      T* made = new (elements(_block) + place) T{std::forward<Arguments>(arguments)...};
-      Sequence::note(_block, *made);
-      return *made;
+      return *new (made) T{std::forward<Arguments>(arguments)...};
     }
-    // After a change of the element in this place.
-    void note(std::size_t place) { Sequence::note(_block, (*this)[place]); }
 
    private:
     static Block* spreadable(Sequence& sequence, std::size_t places) {

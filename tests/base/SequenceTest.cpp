@@ -122,6 +122,27 @@ TEST(Sequence, endsWhatOwnsSomethingOnlySinceItWasChanged) {
   EXPECT_EQ(Part::owners, 0);
 }
 
+TEST(Sequence, endsWhatCameToOwnSomethingInItsPlace) {
+  {
+    Parts parts;
+    parts.emplace_back(0);
+    parts.emplace_back(5);
+    {
+      Parts::Spread spread(parts, 8, 0b100001);
+      spread.make(2, 2);
+      spread.make(7, 7, true);
+      spread.make(7, 8, true);
+      spread[2].owns = true;
+      ++Part::owners;
+      EXPECT_EQ(Part::owners, 2) << "the one before it in its place has ended";
+    }
+    EXPECT_EQ(parts, (Parts{Part(0), Part(2), Part(5), Part(8)}));
+    const Parts copy = parts;
+    EXPECT_EQ(Part::owners, 4);
+  }
+  EXPECT_EQ(Part::owners, 0);
+}
+
 // Blocks may be taken on one thread and given back on another, also while threads come and go.
 TEST(SmallBlocks, mayChangeThreads) {
   for (int round = 0; round < 4; ++round) {

@@ -10,7 +10,6 @@ namespace qel {
 namespace {
 
 constexpr std::uint8_t kGroup = 3;
-constexpr std::uint8_t kEndOfGroup = 4;
 
 void logUnknownTag(std::uint32_t fieldNumber, std::uint32_t value) {
   std::array<char, 48> line;
@@ -34,22 +33,23 @@ void logUnknownTag(std::uint32_t fieldNumber, std::uint32_t value) {
 
 }  // namespace
 
-FoundField findField(const MessagePlan& plan, Cursor cursor) {
+Cursor pastOthers(const MessagePlan& plan, Cursor cursor) {
   while (!cursor.isAtEnd()) {
     const auto [tag, next] = readVarintHere(cursor);
-    cursor.at = next;
+    if (next == kDamaged) return Cursor::damaged();
+    if (isEndOfGroup(tag)) return {next, next};
+    const std::uint16_t number = numberOfTag(tag);
     const auto wireType = static_cast<std::uint8_t>(tag & 7);
-    if (cursor.isDamaged() || wireType == kEndOfGroup) break;
-    const auto number = static_cast<std::uint32_t>(tag >> 3 & 0xFFFF);
+    const Cursor value{next, cursor.end};
     if (KBBMetricUtility::isValidMetricIdTag(number, plan.className)) {
-      cursor = pastMetric(cursor, number);
-    } else if (const std::uint8_t place = plan.find(number); place != MessagePlan::kNone) {
-      return {place, cursor};
+      cursor = pastMetric(value, number);
+    } else if (plan.find(number) != MessagePlan::kNone) {
+      return cursor;
     } else {
-      cursor = wireType == kGroup ? pastGroup(cursor, number) : skipScalar(cursor, wireType);
+      cursor = wireType == kGroup ? pastGroup(value, number) : skipScalar(value, wireType);
     }
   }
-  return {MessagePlan::kNone, cursor};
+  return cursor;
 }
 
 }  // namespace qel

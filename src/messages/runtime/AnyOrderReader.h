@@ -8,25 +8,34 @@
 
 namespace qel {
 
-// A field of the message, and where its value stands.
-struct FoundField {
-  std::uint8_t place;  // in the plan; kNone: there is none, and reading is over at the cursor
-  Cursor cursor;
-};
+// The number is cut to sixteen bits.
+constexpr std::uint16_t numberOfTag(std::uint64_t tag) {
+  return static_cast<std::uint16_t>(tag >> 3);
+}
+constexpr bool isEndOfGroup(std::uint64_t tag) { return (tag & 7) == 4; }
+
+// Which field of the message the tag is of; kNone where it is of no field.
+[[gnu::always_inline]] inline std::uint8_t placeOf(const MessagePlan& plan, std::uint64_t tag) {
+  return isEndOfGroup(tag) ? MessagePlan::kNone : plan.find(numberOfTag(tag));
+}
 
 // Goes past what is no field of the message: unknown fields, and metric identifiers, which are
-// logged.
-FoundField findField(const MessagePlan& plan, Cursor cursor);
+// logged. Stops at the tag of a field, or where reading is over, with nothing left then.
+Cursor pastOthers(const MessagePlan& plan, Cursor cursor);
 
 // Goes through the bytes and calls take(cursor, place), which reads the value, for every field of
-// the message. Where reading stopped, damaged if the bytes are.
+// the message. Where reading stopped, with nothing left; damaged if the bytes are.
 template <class Take>
 [[gnu::always_inline]] inline Cursor readInAnyOrder(const MessagePlan& plan, Cursor cursor,
                                                     Take&& take) {
   while (!cursor.isAtEnd()) {
-    const FoundField found = findField(plan, cursor);
-    if (found.place == MessagePlan::kNone) return found.cursor;
-    cursor = take(found.cursor, found.place);
+    const auto [tag, next] = readVarintHere(cursor);
+    const std::uint8_t place = placeOf(plan, tag);
+    if (place == MessagePlan::kNone) [[unlikely]] {
+      cursor = pastOthers(plan, cursor);
+    } else {
+      cursor = take(Cursor{next, cursor.end}, place);
+    }
   }
   return cursor;
 }

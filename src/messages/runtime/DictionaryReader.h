@@ -53,21 +53,12 @@ template <class Nested>
   return readNestedDictionary<Nested>(list.addToChange(Dictionary()).growingDictionary(), cursor);
 }
 
-// One for each kind of field: what stands behind the tag, as a value of its own or, for lists, at
-// the end of the one that is there.
-template <Encoding encoding>
-Cursor readNumber(Value& value, Cursor cursor, const FieldPlan& /*field*/) {
-  const auto [varint, next] = readVarint(cursor);
-  value = decodedScalar<encoding>(varint);
-  return {next, cursor.end};
-}
 inline Text nameRead(std::span<const EnumName> names, std::uint64_t varint) {
   return enumText(names, decodedScalar<Encoding::int32>(varint));
 }
-// The same into an entry in its place.
-Cursor readSpread(Dictionary::Entries::Spread& entries, const FieldPlan& field, std::size_t place,
-                  Cursor cursor);
-Cursor readName(Value& value, Cursor cursor, const FieldPlan& field);
+
+// One for each kind of field that is no varint: what stands behind the tag, as a value of its own
+// or, for lists, at the end of the one that is there.
 Cursor readBytes(Value& value, Cursor cursor, const FieldPlan& field);
 Cursor readText(Value& value, Cursor cursor, const FieldPlan& field);
 
@@ -89,38 +80,61 @@ Cursor readOne(Value& value, Cursor cursor, const FieldPlan& /*field*/) {
 }
 template <class Nested>
 Cursor readOneMore(Value& value, Cursor cursor, const FieldPlan& /*field*/) {
-  return readElement<Nested>(value.growingList(), cursor);
+  List& list = value.growingList();
+  if (list.capacity() == 0) reserveUsual(list, cursor);
+  return readElement<Nested>(list, cursor);
 }
 
 template <class Message, class T, Encoding encoding>
 constexpr FieldPlan planOfField(const ScalarField<Message, T, encoding>& field) {
-  return {field.number, FieldPlan::Kind::varint, field.key, readNumber<encoding>};
+  return {.number = field.number,
+          .kind = FieldPlan::Kind::number,
+          .encoding = encoding,
+          .key = field.key};
 }
 template <class Message>
 constexpr FieldPlan planOfField(const EnumField<Message>& field) {
-  return {field.number, FieldPlan::Kind::varint, field.key, readName, field.names};
+  return {.number = field.number,
+          .kind = FieldPlan::Kind::name,
+          .key = field.key,
+          .names = field.names};
 }
 template <class Message>
 constexpr FieldPlan planOfField(const DataField<Message>& field) {
-  return {field.number, FieldPlan::Kind::delimited, field.key, readBytes};
+  return {.number = field.number,
+          .kind = FieldPlan::Kind::delimited,
+          .key = field.key,
+          .read = readBytes};
 }
 template <class Message>
 constexpr FieldPlan planOfField(const StringField<Message>& field) {
-  return {field.number, FieldPlan::Kind::delimited, field.key, readText};
+  return {.number = field.number,
+          .kind = FieldPlan::Kind::delimited,
+          .key = field.key,
+          .read = readText};
 }
 template <class Message, class Nested>
 constexpr FieldPlan planOfField(const MessageField<Message, Nested>& field) {
-  return {field.number, FieldPlan::Kind::message, field.key, readOne<Nested>,
-          {},           &PlanOf<Nested>::kPlan};
+  return {.number = field.number,
+          .kind = FieldPlan::Kind::message,
+          .key = field.key,
+          .read = readOne<Nested>,
+          .nested = &PlanOf<Nested>::kPlan};
 }
 template <class Message, class Nested>
 constexpr FieldPlan planOfField(const RepeatedMessageField<Message, Nested>& field) {
-  return {field.number, FieldPlan::Kind::message, field.key, readOneMore<Nested>,
-          {},           &PlanOf<Nested>::kPlan};
+  return {.number = field.number,
+          .kind = FieldPlan::Kind::message,
+          .key = field.key,
+          .read = readOneMore<Nested>,
+          .nested = &PlanOf<Nested>::kPlan};
 }
 template <class Message, class T, Encoding encoding>
 constexpr FieldPlan planOfField(const PackedField<Message, T, encoding>& field) {
-  return {field.number, FieldPlan::Kind::packed, field.key, readNumbers<encoding>};
+  return {.number = field.number,
+          .kind = FieldPlan::Kind::packed,
+          .key = field.key,
+          .read = readNumbers<encoding>};
 }
 
 template <class Message>
@@ -181,63 +195,10 @@ struct EntriesTarget {
   std::uint64_t places = 0;  // of the entries, in the plan
 };
 
-// Takes fields as they come, to entries in places of their own.
-template <class Message>
-struct SpreadTarget {
-  static constexpr bool kStopsAtEnd = true;
-
-  template <std::size_t index, class T, Encoding encoding>
-  void set(const ScalarField<Message, T, encoding>& field, std::uint64_t varint) {
-    put<index>(field.key, decodedScalar<encoding>(varint));
-  }
-  template <std::size_t index>
-  void set(const EnumField<Message>& field, std::uint64_t varint) {
-    put<index>(field.key, nameRead(field.names, varint));
-  }
-  template <class Tag, std::size_t index, class Field>
-  [[gnu::always_inline]] Cursor read(Cursor cursor, const Field& /*field*/) {
-    return readAt(index, cursor);
-  }
-  template <std::size_t index, class Field>
-  void leaveOut(const Field&) {}
-
-  template <std::size_t index, class T>
-  [[gnu::always_inline]] void put(Name key, T&& value) {
-    if (!entries.has(index)) {
-      entries.make(index, key, std::forward<T>(value));
-    } else {
-      entries[index].value = Value(std::forward<T>(value));
-      entries.note(index);
-    }
-  }
-  Cursor readAt(std::size_t place, Cursor cursor) {
-    return readSpread(entries, PlanOf<Message>::kFields[place], place, cursor);
-  }
-
-  Dictionary::Entries::Spread& entries;
-};
-
 // Reads on where fields are no longer as they would be written: in another order, several times,
-// or unknown. `places` are those of the entries that are there. Apart from readDictionary, which
-// then needs nothing in memory.
-template <class Message>
-[[gnu::noinline]] Cursor readRestOfDictionary(Dictionary& dictionary, std::uint64_t places,
-                                              Cursor rest) {
-  FoundField found = findField(PlanOf<Message>::kPlan, rest);
-  if (found.place == MessagePlan::kNone) return found.cursor;
-  Dictionary::Entries::Spread entries(dictionary.entries(), PlanOf<Message>::kFields.size(),
-                                      places);
-  SpreadTarget<Message> target{entries};
-  for (;;) {
-    Cursor cursor = target.readAt(found.place, found.cursor);
-    for (const std::uint8_t* before = nullptr; before != cursor.at && !cursor.isAtEnd();) {
-      before = cursor.at;
-      cursor = readInOrder<Message>(target, cursor);
-    }
-    found = findField(PlanOf<Message>::kPlan, cursor);
-    if (found.place == MessagePlan::kNone) return found.cursor;
-  }
-}
+// or unknown. `places` are those of the entries that are there; at least one byte is left.
+Cursor readRestOfDictionary(Dictionary& dictionary, const MessagePlan& plan, std::uint64_t places,
+                            Cursor rest);
 
 template <class Message>
 Cursor readDictionary(Dictionary& dictionary, Cursor part) {
@@ -251,7 +212,7 @@ Cursor readDictionary(Dictionary& dictionary, Cursor part) {
   }
   if (part.isAtEnd()) [[likely]]
     return part;
-  return readRestOfDictionary<Message>(dictionary, places, part);
+  return readRestOfDictionary(dictionary, PlanOf<Message>::kPlan, places, part);
 }
 
 }  // namespace qel

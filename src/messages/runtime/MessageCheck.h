@@ -8,5 +8,7 @@ namespace qel {
 // Where reading stops, damaged if the bytes are: as the message reader says, and logging what it
 // logs.
 Cursor checkMessage(const MessagePlan& plan, Cursor part);
+// The same of the value of one field, which stands at the cursor.
+Cursor pastValue(const FieldPlan& field, Cursor cursor);
 
 }  // namespace qel

@@ -17,15 +17,19 @@ namespace qel {
 struct MessagePlan;
 
 struct FieldPlan {
-  enum class Kind : std::uint8_t { varint, delimited, packed, message };
+  enum class Kind : std::uint8_t { number, name, delimited, packed, message };
 
   std::uint32_t number;
   Kind kind;
+  Encoding encoding = Encoding::uint64;  // of a number
   Name key;
-  // Reads the value of the entry behind the tag. What the field gave before is there, or null.
-  Cursor (*read)(Value& value, Cursor cursor, const FieldPlan& field);
+  // Reads the value of the entry behind the tag, where that is no varint. What the field gave
+  // before is there, or null.
+  Cursor (*read)(Value& value, Cursor cursor, const FieldPlan& field) = nullptr;
   std::span<const EnumName> names = {};  // of an enumeration
   const MessagePlan* nested = nullptr;   // of a message or a list of them
+
+  bool isVarint() const { return kind <= Kind::name; }
 };
 
 // Constant.

@@ -61,7 +61,8 @@ bool PBMessage<Message>::readFrom(PBDataReader& reader) {
   const Cursor part{left.data(), left.data() + left.size()};
   const Cursor stopped = readMessage(self(), part);
   reader._error = stopped.isDamaged();
-  reader._pos = reader._error ? reader._length : reader._pos + (part.left() - stopped.left());
+  reader._pos = reader._error ? reader._length
+                              : reader._pos + static_cast<std::uint64_t>(stopped.at - part.at);
   return !reader._error;
 }
 
