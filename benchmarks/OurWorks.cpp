@@ -7,6 +7,7 @@
 #include <string>
 
 #include "MemorySink.h"
+#include "base/LineBuffer.h"
 #include "base/Rendering.h"
 #include "base/TimeZone.h"
 #include "history/History.h"
@@ -80,10 +81,10 @@ Step textOurs(const std::vector<Payload>& payloads) {
   for (const auto& message : messagesOf(payloads)) {
     dictionaries.push_back(message->dictionaryRepresentation());
   }
-  return [dictionaries, line = std::string()](std::size_t i) mutable {
-    line.clear();
-    appendJson(line, dictionaries[i]);
-    benchmark::DoNotOptimize(line.data());
+  return [dictionaries, line = std::make_shared<LineBuffer>()](std::size_t i) {
+    line->clear();
+    appendJson(*line, dictionaries[i]);
+    benchmark::DoNotOptimize(line->view().data());
   };
 }
 

@@ -3,11 +3,11 @@
 #include <unistd.h>
 
 #include <cstdlib>
-#include <string>
 
 #include "base/DescriptorSink.h"
 #include "base/DroppedOutput.h"
 #include "base/FatalError.h"
+#include "base/LineBuffer.h"
 #include "base/Rendering.h"
 #include "base/SystemLogSink.h"
 
@@ -44,9 +44,11 @@ Sink orNull(Sink sink) { return sink ? std::move(sink) : std::make_shared<NullSi
 }  // namespace
 
 void LogSink::writeEvent(std::string_view text, const Dictionary& event) {
-  std::string line(text);
+  static thread_local LineBuffer line;
+  line.clear();
+  line.append(text);
   appendJson(line, event);
-  write(line);
+  write(line.view());
 }
 
 DroppedOutput::DroppedOutput() { ++dropping; }

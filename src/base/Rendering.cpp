@@ -7,46 +7,77 @@
 #include <cstdint>
 #include <cstring>
 
+#include "base/LineBuffer.h"
 #include "base/Utf8.h"
 
 namespace qel {
 namespace {
 
-// The end of a string that is being written: room is looked for once a piece, not once a character.
+// The end of a line that is being written: room is looked for once a piece, not once a character.
 // Where writing stands is passed along as a plain pointer.
 class Line {
  public:
-  explicit Line(std::string& out) : _out(out) { widen(out.size(), kUsual); }
-
   char* start() const { return _start; }
   // Where to write when `count` more characters are to come.
   char* room(char* at, std::size_t count) {
     if (static_cast<std::size_t>(_end - at) >= count) [[likely]]
       return at;
-    const auto used = static_cast<std::size_t>(at - _out.data());
-    widen(used, std::max(count, used));
-    return _out.data() + used;
+    widen(at, count);
+    return _start;
   }
+
+ protected:
+  static constexpr std::size_t kUsual = 512;
+
+  Line() = default;
+  ~Line() = default;
+
+  // Moves start to what is then the place of `at`, with more room behind it.
+  virtual void widen(char* at, std::size_t count) = 0;
+
+  char* _start = nullptr;
+  char* _end = nullptr;
+};
+
+// The end of a string. What is not yet written is zeros.
+class StringLine final : public Line {
+ public:
+  explicit StringLine(std::string& out) : _out(out) { resize(out.size(), kUsual); }
   void finish(const char* at) { _out.resize(static_cast<std::size_t>(at - _out.data())); }
 
  private:
-  static constexpr std::size_t kUsual = 512;
-
+  void widen(char* at, std::size_t count) override {
+    const auto used = static_cast<std::size_t>(at - _out.data());
+    resize(used, std::max(count, used));
+  }
   // Not inline: how much is filled with zeros is then left to the library, which is fast at it.
-  [[gnu::noinline]] void widen(std::size_t used, std::size_t count) {
+  [[gnu::noinline]] void resize(std::size_t used, std::size_t count) {
     _out.resize(used + count);
     _start = _out.data() + used;
     _end = _start + count;
   }
 
   std::string& _out;
-  char* _start;
-  char* _end;
+};
+
+class BufferLine final : public Line {
+ public:
+  explicit BufferLine(LineBuffer& out) : _out(out) { widen(out.room(kUsual), kUsual); }
+  void finish(const char* at) { _out.writtenTo(at); }
+
+ private:
+  void widen(char* at, std::size_t count) override {
+    _out.writtenTo(at);
+    _start = _out.room(count);
+    _end = _out.endOfRoom();
+  }
+
+  LineBuffer& _out;
 };
 
 // The first and the last `Word` of the text, which are all of it when it is not too long for that.
 template <class Word>
-void putEnds(char* at, std::string_view text) {
+[[gnu::always_inline]] inline void putEnds(char* at, std::string_view text) {
   const std::size_t last = text.size() - sizeof(Word);
   std::memcpy(at, text.data(), sizeof(Word));
   std::memcpy(at + last, text.data() + last, sizeof(Word));
@@ -58,12 +89,16 @@ struct SixteenBytes {
 
 // Keys and names are short.
 [[gnu::always_inline]] inline char* put(char* at, std::string_view text) {
-  if (text.size() - 8 <= 8) {
-    putEnds<std::uint64_t>(at, text);
-  } else if (text.size() - 16 <= 16) {
+  if (text.size() <= 16) {
+    if (text.size() >= 8) {
+      putEnds<std::uint64_t>(at, text);
+    } else if (text.size() >= 4) {
+      putEnds<std::uint32_t>(at, text);
+    } else {
+      std::memcpy(at, text.data(), text.size());
+    }
+  } else if (text.size() <= 32) {
     putEnds<SixteenBytes>(at, text);
-  } else if (text.size() - 4 <= 4) {
-    putEnds<std::uint32_t>(at, text);
   } else {
     std::memcpy(at, text.data(), text.size());
   }
@@ -125,12 +160,17 @@ bool isPlain(std::uint64_t word) {
 bool isPlain(char c) { return static_cast<signed char>(c) >= 0x20 && c != '"' && c != '\\'; }
 
 bool isPlain(std::string_view text) {
-  for (; text.size() >= sizeof(std::uint64_t); text.remove_prefix(sizeof(std::uint64_t))) {
+  constexpr std::size_t kWord = sizeof(std::uint64_t);
+  const auto isPlainAt = [&text](std::size_t at) {
     std::uint64_t word = 0;
-    std::memcpy(&word, text.data(), sizeof word);
-    if (!isPlain(word)) return false;
+    std::memcpy(&word, text.data() + at, kWord);
+    return isPlain(word);
+  };
+  if (text.size() < kWord) return std::ranges::all_of(text, [](char c) { return isPlain(c); });
+  for (std::size_t at = 0; at < text.size() - kWord; at += kWord) {
+    if (!isPlainAt(at)) return false;
   }
-  return std::ranges::all_of(text, [](char c) { return isPlain(c); });
+  return isPlainAt(text.size() - kWord);
 }
 
 std::string escaped(std::string_view text) {
@@ -170,7 +210,14 @@ char* putText(Line& line, char* at, const Value& value) {
 }
 
 [[gnu::noinline]] char* putBytes(Line& line, char* at, const Bytes& bytes) {
-  return putString(line, at, bytesText(bytes));
+  constexpr std::string_view kDigits = "0123456789abcdef";
+  at = line.room(at, 2 * bytes.size() + kRoom);
+  at = put(at, "\"<");
+  for (const std::uint8_t byte : bytes) {
+    *at++ = kDigits[byte >> 4];
+    *at++ = kDigits[byte & 0xF];
+  }
+  return put(at, ">\"");
 }
 
 [[gnu::noinline]] char* putFloat(char* at, float value) {
@@ -179,37 +226,40 @@ char* putText(Line& line, char* at, const Value& value) {
   return std::find(at, end, '.') == end ? put(end, ".0") : end;
 }
 
-constexpr std::array<char, 200> makePairs() {
-  std::array<char, 200> pairs{};
-  for (std::size_t i = 0; i < pairs.size(); ++i) {
-    pairs[i] = static_cast<char>('0' + (i % 2 == 0 ? i / 20 : i / 2 % 10));
+// The digits of every number below 1,000, and behind them how many they are.
+constexpr auto kShortNumbers = [] {
+  std::array<std::array<char, 4>, 1000> numbers{};
+  for (std::size_t value = 0; value < numbers.size(); ++value) {
+    char count = 0;
+    for (std::size_t unit = value < 10 ? 1 : value < 100 ? 10 : 100; unit > 0; unit /= 10) {
+      numbers[value][static_cast<std::size_t>(count++)] =
+          static_cast<char>('0' + value / unit % 10);
+    }
+    numbers[value].back() = count;
   }
-  return pairs;
+  return numbers;
+}();
+
+[[gnu::always_inline]] inline char* putShort(char* at, std::uint32_t value) {
+  const auto& number = kShortNumbers.data()[value];
+  std::memcpy(at, number.data(), number.size());
+  return at + number.back();
 }
 
 // "00" to "99".
-constexpr auto kPairs = makePairs();
-
-char* putDigit(char* at, std::uint32_t value) {
-  *at = static_cast<char>('0' + value);
-  return at + 1;
-}
-
-char* putPair(char* at, std::uint32_t value) {
-  std::memcpy(at, &kPairs[2 * value], 2);
+[[gnu::always_inline]] inline char* putPair(char* at, std::uint32_t value) {
+  std::memcpy(at, kShortNumbers.data()[100 + value].data() + 1, 2);
   return at + 2;
 }
 
 char* putLargeInteger(char* at, std::uint64_t value);
 
-// Nearly all numbers of a metric have at most four digits.
+// Most numbers of a metric have at most three digits, nearly all have five.
 [[gnu::always_inline]] inline char* putInteger(char* at, std::uint64_t value) {
-  if (value >= 10000) return putLargeInteger(at, value);
+  if (value >= 100000) return putLargeInteger(at, value);
   const auto small = static_cast<std::uint32_t>(value);
-  if (small < 10) return putDigit(at, small);
-  if (small < 100) return putPair(at, small);
-  at = small < 1000 ? putDigit(at, small / 100) : putPair(at, small / 100);
-  return putPair(at, small % 100);
+  if (small < 1000) return putShort(at, small);
+  return putPair(putShort(at, small / 100), small % 100);
 }
 
 [[gnu::noinline]] char* putLargeInteger(char* at, std::uint64_t value) {
@@ -286,17 +336,22 @@ char* putDictionary(Line& line, char* at, const Dictionary& dictionary) {
 }  // namespace
 
 void appendJsonString(std::string& out, std::string_view text) {
-  Line line(out);
+  StringLine line(out);
   line.finish(putString(line, line.start(), text));
 }
 
 void appendJson(std::string& out, const Dictionary& dictionary) {
-  Line line(out);
+  StringLine line(out);
+  line.finish(putDictionary(line, line.start(), dictionary));
+}
+
+void appendJson(LineBuffer& out, const Dictionary& dictionary) {
+  BufferLine line(out);
   line.finish(putDictionary(line, line.start(), dictionary));
 }
 
 void appendJson(std::string& out, const Value& value) {
-  Line line(out);
+  StringLine line(out);
   line.finish(putValue(line, line.room(line.start(), kRoom), value));
 }
 

@@ -8,11 +8,14 @@
 
 namespace qel {
 
+class LineBuffer;
+
 // As JSON, one line, ", " and ": " as separators, keys in dictionary order. Floats are the shortest
 // decimal text that reads back to the same float, always with a point; bytes are "<0a1b2c>";
 // text that is not UTF-8 carries U+FFFD instead. A float that is no number is null.
 void appendJson(std::string& out, const Value& value);
 void appendJson(std::string& out, const Dictionary& dictionary);
+void appendJson(LineBuffer& out, const Dictionary& dictionary);
 std::string jsonText(const Value& value);
 std::string jsonText(const Dictionary& dictionary);
 void appendJsonString(std::string& out, std::string_view text);

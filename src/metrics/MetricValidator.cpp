@@ -1,6 +1,8 @@
 #include "metrics/MetricValidator.h"
 
+#include <algorithm>
 #include <array>
+#include <bit>
 #include <string>
 
 #include "base/FatalError.h"
@@ -10,24 +12,30 @@
 namespace qel {
 namespace {
 
-// "%2X" of a 64-bit integer.
-void appendHexadecimal(std::string& out, std::int64_t number) {
-  std::array<char, 16> digits;
-  char* const end = digits.data() + digits.size();
-  char* first = end;
-  auto left = static_cast<std::uint64_t>(number);
-  do {
-    *--first = "0123456789ABCDEF"[left & 0xF];
-    left >>= 4;
-  } while (left != 0);
-  if (end - first < 2) out += ' ';
-  out.append(first, end);
+constexpr std::size_t kLongestHexadecimal = 16;
+
+// "%2X" of a 64-bit integer; the place behind it.
+char* putHexadecimal(char* at, std::int64_t number) {
+  constexpr unsigned kBits = 4;  // of a digit
+  const auto bits = static_cast<std::uint64_t>(number);
+  unsigned left = std::max(1U, (static_cast<unsigned>(std::bit_width(bits)) + kBits - 1) / kBits);
+  if (left == 1) *at++ = ' ';
+  while (left-- > 0) *at++ = "0123456789ABCDEF"[bits >> kBits * left & 0xF];
+  return at;
+}
+
+void logHexadecimal(std::int64_t identifier, LogSink& output) {
+  if (!output.wantsLines()) return;
+  constexpr std::string_view kText = "Metric ID in Hex = ";
+  std::array<char, kText.size() + kLongestHexadecimal> line;
+  const char* end = putHexadecimal(std::ranges::copy(kText, line.data()).out, identifier);
+  output.write({line.data(), end});
 }
 
 [[noreturn]] void refusePayload(std::int64_t identifier) {
-  std::string reason = "metric ";
-  appendHexadecimal(reason, identifier);
-  fatalError(reason + " has an undecodable payload");
+  std::array<char, kLongestHexadecimal> number;
+  char* const end = putHexadecimal(number.data(), identifier);
+  fatalError("metric " + std::string(number.data(), end) + " has an undecodable payload");
 }
 
 }  // namespace
@@ -58,7 +66,8 @@ void MetricValidator::setObserver(MetricObserver* observer, const Clock& clock) 
 
 void MetricValidator::metricsDidUpdate(const std::optional<Dictionary>& event) {
   if (!event) fatalError("a metric event without a dictionary");
-  if (processMetric(*event)) standardOutput().write("Received Valid Metric");
+  LogSink& output = standardOutput();
+  if (process(*event, output)) output.write("Received Valid Metric");
 }
 
 void MetricValidator::eventsDidUpdate(const std::optional<Dictionary>&) {
@@ -66,10 +75,13 @@ void MetricValidator::eventsDidUpdate(const std::optional<Dictionary>&) {
 }
 
 bool MetricValidator::processMetric(const Dictionary& event) {
+  return process(event, standardOutput());
+}
+
+bool MetricValidator::process(const Dictionary& event, LogSink& output) {
   const Value* identifier = event.find(metricIDKey);
   metricID = identifier ? identifier->asInt64() : std::nullopt;
   if (!metricID) fatalError("a metric event without an integer under \"" + metricIDKey + "\"");
-  LogSink& output = standardOutput();
   logHexadecimal(*metricID, output);
 
   const Value* payload = event.find(payloadKey);
@@ -101,18 +113,12 @@ void MetricValidator::rewriteTimestamp(Dictionary& record) {
   *value = _dates.at(*milliseconds);
 }
 
-void MetricValidator::logHexadecimal(std::int64_t identifier, LogSink& output) {
-  if (!output.wantsLines()) return;
-  _line = "Metric ID in Hex = ";
-  appendHexadecimal(_line, identifier);
-  output.write(_line);
-}
-
 void MetricValidator::logRecord(std::string_view text, const Dictionary& record, LogSink& output) {
   if (!output.wantsLines()) return;
-  _line = text;
+  _line.clear();
+  _line.append(text);
   appendJson(_line, record);
-  output.write(_line);
+  output.write(_line.view());
 }
 
 }  // namespace qel

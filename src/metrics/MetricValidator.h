@@ -7,6 +7,7 @@
 #include <string>
 
 #include "base/Clock.h"
+#include "base/LineBuffer.h"
 #include "base/LogSink.h"
 #include "base/TimeZone.h"
 #include "connection/TeskWrapper.h"
@@ -83,14 +84,14 @@ class MetricValidator final : public MetricStore,
 
  private:
   MetricValidator(std::shared_ptr<TeskWrapper> wrapper, const TimeZone& zone);
+  bool process(const Dictionary& event, LogSink& output);
   void rewriteTimestamp(Dictionary& record);
-  void logHexadecimal(std::int64_t identifier, LogSink& output);
   void logRecord(std::string_view text, const Dictionary& record, LogSink& output);
 
   DateTexts _dates;
   MetricObserver* _observer = nullptr;
   const Clock* _clock = &systemClock();
-  std::string _line;  // the one being logged, kept for its memory
+  LineBuffer _line;  // the one being logged
 };
 
 }  // namespace qel

@@ -5,6 +5,8 @@
 #include <cstdlib>
 #include <limits>
 
+#include "base/LineBuffer.h"
+
 namespace qel {
 namespace {
 
@@ -52,6 +54,14 @@ TEST(JsonText, escapesWhatJsonCannotHold) {
   EXPECT_EQ(jsonText(Value("é€😀")), "\"é€😀\"");
 }
 
+TEST(JsonText, escapesAtTheEndOfTextsOfAnyLength) {
+  for (std::size_t length = 1; length < 40; ++length) {
+    const std::string text(length, 'x');
+    EXPECT_EQ(jsonText(Value(text + '"')), '"' + text + "\\\"\"");
+    EXPECT_EQ(jsonText(Value('\n' + text)), "\"\\n" + text + '"');
+  }
+}
+
 TEST(JsonText, escapesWhereverItStands) {
   for (std::size_t place = 0; place < 20; ++place) {
     std::string text(20, 'x');
@@ -71,6 +81,23 @@ TEST(JsonText, writesIntegersOfEveryLength) {
       const auto negative = -static_cast<std::int64_t>(number);
       EXPECT_EQ(jsonText(Value(negative)), std::to_string(negative));
     }
+  }
+}
+
+TEST(JsonText, writesEveryShortInteger) {
+  for (std::int64_t value = -1100; value < 110000; ++value) {
+    ASSERT_EQ(jsonText(Value(value)), std::to_string(value));
+  }
+}
+
+TEST(JsonText, isTheSameInALineThatIsUsedAgain) {
+  LineBuffer line;
+  for (const std::size_t length : {3U, 5000U, 0U, 700U}) {
+    const Dictionary dictionary = {{"text", std::string(length, 'z')}, {"number", 7}};
+    line.clear();
+    line.append("before ");
+    appendJson(line, dictionary);
+    EXPECT_EQ(line.view(), "before " + jsonText(dictionary));
   }
 }
 
