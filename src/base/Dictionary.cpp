@@ -1,6 +1,8 @@
 #include "base/Value.h"
 
 #include <algorithm>
+#include <cstdint>
+#include <cstring>
 
 #include "base/FatalError.h"
 
@@ -21,11 +23,24 @@ const Dictionary::Entry& Dictionary::at(std::size_t position) const {
 
 namespace {
 
-// Most keys that differ do so in length or in their first character.
+std::uint64_t eightAt(const char* at) {
+  std::uint64_t word = 0;
+  std::memcpy(&word, at, sizeof word);
+  return word;
+}
+
+// Both are so long. Most keys have eight to sixteen characters: their ends are all of them.
+bool areSame(const char* a, const char* b, std::size_t size) {
+  constexpr std::size_t kWord = sizeof(std::uint64_t);
+  if (a == b) return true;
+  if (size < kWord || size > 2 * kWord) return std::memcmp(a, b, size) == 0;
+  const std::size_t last = size - kWord;
+  return eightAt(a) == eightAt(b) && eightAt(a + last) == eightAt(b + last);
+}
+
 bool isUnder(const Dictionary::Entry& entry, std::string_view key) {
   const std::string_view other = entry.key;
-  return other.size() == key.size() &&
-         (key.empty() || (other.front() == key.front() && other == key));
+  return other.size() == key.size() && areSame(other.data(), key.data(), key.size());
 }
 
 // The entry under the key, or the end.

@@ -130,7 +130,8 @@ bool operator==(const Value& a, const Value& b) {
     case Kind::floating:
       return a._as.floating == b._as.floating;
     case Kind::text:
-      return a.asText() == b.asText();
+      return a._size == b._size && (a._as.characters == b._as.characters ||
+                                    std::memcmp(a._as.characters, b._as.characters, a._size) == 0);
     case Kind::bytes:
       return *a._as.bytes == *b._as.bytes;
     case Kind::list:

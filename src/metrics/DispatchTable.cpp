@@ -2,6 +2,9 @@
 
 #include <algorithm>
 #include <array>
+#include <bit>
+#include <limits>
+#include <numeric>
 
 #include "messages/gsm.h"
 #include "messages/lte_neighbours.h"
@@ -97,22 +100,36 @@ constexpr std::array kDispatchTable = {
 
 static_assert(kDispatchTable.size() == 29);
 
-// The rows by identifier.
 constexpr auto kByIdentifier = [] {
-  std::array<const DispatchRow*, kDispatchTable.size()> rows{};
-  std::ranges::transform(kDispatchTable, rows.begin(), [](const auto& row) { return &row; });
-  std::ranges::sort(rows, {}, &DispatchRow::identifier);
-  return rows;
+  std::array<std::uint8_t, kDispatchTable.size()> places{};
+  std::iota(places.begin(), places.end(), std::uint8_t{0});
+  std::ranges::sort(places, {}, [](auto place) { return kDispatchTable[place].identifier; });
+  return places;
 }();
+
+// Their identifiers, with others behind them that no metric has.
+constexpr std::size_t kPlaces = std::bit_ceil(kByIdentifier.size());
+constexpr auto kIdentifiers = [] {
+  std::array<std::int64_t, kPlaces> identifiers{};
+  identifiers.fill(std::numeric_limits<std::int64_t>::max());
+  std::ranges::transform(kByIdentifier, identifiers.begin(),
+                         [](auto place) { return kDispatchTable[place].identifier; });
+  return identifiers;
+}();
+static_assert(kPlaces > kByIdentifier.size());
 
 }  // namespace
 
 std::span<const DispatchRow> dispatchTable() { return kDispatchTable; }
 
+// Halves the places without a branch.
 const DispatchRow* findDispatchRow(std::int64_t identifier) {
-  const auto found =
-      std::ranges::lower_bound(kByIdentifier, identifier, {}, &DispatchRow::identifier);
-  return found != kByIdentifier.end() && (*found)->identifier == identifier ? *found : nullptr;
+  std::size_t found = 0;
+  for (std::size_t half = kPlaces / 2; half > 0; half /= 2) {
+    found += kIdentifiers[found + half - 1] < identifier ? half : 0;
+  }
+  if (found >= kByIdentifier.size() || kIdentifiers[found] != identifier) return nullptr;
+  return &kDispatchTable[kByIdentifier[found]];
 }
 
 }  // namespace qel
