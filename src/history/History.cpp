@@ -108,7 +108,11 @@ struct History::State {
   [[gnu::noinline]] void follow(const StoredMetric& metric, std::uint64_t atMs, Handling handling) {
     follow({metric.row.identifier, metric.record, metric.receivedMs, atMs}, handling);
   }
-  void plot(std::size_t place, const Dictionary& record, std::uint64_t atMs);
+  auto plotter(std::uint64_t atMs) {
+    return [this, atMs](Quantity quantity, float value) {
+      series.data()[static_cast<std::size_t>(quantity)].add(atMs, value);
+    };
+  }
 
   struct Measured {
     std::uint64_t version;
@@ -165,12 +169,6 @@ void History::State::follow(const Report& report, Handling handling) {
   }
 }
 
-inline void History::State::plot(std::size_t place, const Dictionary& record, std::uint64_t atMs) {
-  serving.read(place, record, [&](Quantity quantity, float value) {
-    series.data()[static_cast<std::size_t>(quantity)].add(atMs, value);
-  });
-}
-
 History::History() : History(Limits()) {}
 History::History(const Limits& limits) : _state(std::make_unique<State>(limits)) {}
 History::~History() = default;
@@ -184,29 +182,30 @@ void History::metricWasStored(const StoredMetric& metric) {
     state.addGap(silenceMs, {metric.row.identifier, metric.record, metric.receivedMs, atMs});
   state.journal.add(number, atMs, metric.payload);
   const Way way = state.ways.data()[number];
-  if (way.serving != Way::kNone) state.plot(way.serving, metric.record, atMs);
+  if (way.serving != Way::kNone) {
+    state.serving.read(way.serving, metric.record, state.plotter(atMs));
+  }
   if (way.handling != Handling::none) state.follow(metric, atMs, way.handling);
 }
 
 void History::metricWasPassedOver(const PassedMetric& metric) {
   State& state = *_state;
   const std::uint64_t atMs = state.arrive(metric.receivedMs);
-  std::optional<Dictionary> record;
+  std::optional<ServingReader::Measurement> measurement;
   if (metric.identifier == kLteServingMeasurement) {
-    record = lteServingMeasurementRow().describe(metric.payload);
+    measurement = state.serving.readMeasurement(metric.payload);
   }
   const std::size_t number = dispatchTable().size();
   static const Dictionary kNothing;
   const Report report = {metric.identifier, kNothing, metric.receivedMs, atMs};
   const std::uint64_t silenceMs =
-      record ? state.times.note(number, atMs) : state.times.noteOther(atMs);
+      measurement ? state.times.note(number, atMs) : state.times.noteOther(atMs);
   if (silenceMs != 0) state.addGap(silenceMs, report);
   if (metric.identifier == kLteLinkFailure) {
     state.radio.followLinkFailure(report, state.happenings);
-  } else if (record) {
+  } else if (measurement) {
     state.journal.add(number, atMs, metric.payload);
-    static const std::size_t kPlace = *ServingReader::placeOf(kLteServingMeasurement);
-    state.plot(kPlace, *record, atMs);
+    state.serving.tell(*measurement, state.plotter(atMs));
   }
 }
 

@@ -6,6 +6,8 @@
 #include <span>
 
 #include "history/PassedMetrics.h"
+#include "messages/lte_serving.h"
+#include "messages/runtime/ListReader.h"
 #include "metrics/MetricValidator.h"
 
 namespace qel {
@@ -78,20 +80,37 @@ ServingReader::ServingReader() {
     Place& place = _places.emplace_back(Place{KnownPlace(row.key), row.key.empty(), {}});
     for (const KeyedValue& value : row.fields) {
       const Ends& ends = kPossible[static_cast<std::size_t>(value.quantity)];
-      Field& field = place.fields.emplace_back(value.one, value.other);
-      field.quantity = value.quantity;
-      field.factor = value.factor;
-      field.offset = value.offset;
-      field.lowest = std::llround(std::ceil((ends.lowest - value.offset) / value.factor));
+      Scale& scale = place.fields.emplace_back(value.one, value.other).scale;
+      scale.quantity = value.quantity;
+      scale.factor = value.factor;
+      scale.offset = value.offset;
+      scale.lowest = std::llround(std::ceil((ends.lowest - value.offset) / value.factor));
       const auto highest = std::llround(std::floor((ends.highest - value.offset) / value.factor));
-      field.span = static_cast<std::uint64_t>(highest - field.lowest);
+      scale.span = static_cast<std::uint64_t>(highest - scale.lowest);
     }
   }
+  std::ranges::transform(_places[*placeOf(kLteServingMeasurement)].fields, _measured.begin(),
+                         &Field::scale);
+}
+
+std::optional<ServingReader::Measurement> ServingReader::readMeasurement(ByteView payload) const {
+  Measurement best = {kNone, kNone, kNone};
+  const auto note = [&](std::size_t place, std::int64_t number) {
+    best.data()[place] = std::max(best.data()[place], within(_measured.data()[place], number));
+  };
+  // In the order of kLteReceiver.
+  const auto take = [&](const RxInfo& receiver) {
+    if (receiver.hasRsrpRange()) note(0, receiver.rsrpRange());
+    if (receiver.hasRsrqRange()) note(1, receiver.rsrqRange());
+    if (receiver.hasSnr()) note(2, receiver.snr());
+  };
+  if (!readList<KCellularLteServingCellMeasurement, RxInfo>(payload, take)) return std::nullopt;
+  return best;
 }
 
 std::int64_t ServingReader::otherIn(const Field& field, const Value& value) {
   const auto number = value.asInt64();
-  return number ? within(field, *number) : kNone;
+  return number ? within(field.scale, *number) : kNone;
 }
 
 std::int64_t ServingReader::bestIn(Field& field, const List& receivers) {

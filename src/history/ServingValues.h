@@ -2,6 +2,7 @@
 #pragma once
 
 #include <algorithm>
+#include <array>
 #include <cstddef>
 #include <cstdint>
 #include <optional>
@@ -26,17 +27,31 @@ class ServingReader {
   template <class Take>
   void read(std::size_t place, const Dictionary& record, Take take);
 
+  // The same of a payload of kLteServingMeasurement, in two steps. Nothing when it cannot be
+  // decoded.
+  using Measurement = std::array<std::int64_t, 3>;  // the best of each field
+  std::optional<Measurement> readMeasurement(ByteView payload) const;
+  template <class Take>
+  void tell(const Measurement& measurement, Take take) const {
+    for (std::size_t i = 0; i < measurement.size(); ++i) {
+      tell(_measured.data()[i], measurement.data()[i], take);
+    }
+  }
+
  private:
-  struct Field {
-    Field(Name first, Name second) : one(first), other(second), hasOther(!second.empty()) {}
-    KnownPlace one;
-    KnownPlace other;  // the same of the second receiver
-    bool hasOther;
+  struct Scale {
     Quantity quantity = Quantity::lteRsrp;
     float factor = 1;
     float offset = 0;
     std::int64_t lowest = 0;  // as reported, and how much more it may be
     std::uint64_t span = 0;
+  };
+  struct Field {
+    Field(Name first, Name second) : one(first), other(second), hasOther(!second.empty()) {}
+    KnownPlace one;
+    KnownPlace other;  // the same of the second receiver
+    bool hasOther;
+    Scale scale;
   };
   struct Place {
     KnownPlace held;
@@ -59,12 +74,12 @@ class ServingReader {
     if (!value) return kNone;
     if (value->kind() != Value::Kind::signedInteger) [[unlikely]]
       return otherIn(field, *value);
-    return within(field, *value->asInt64());
+    return within(field.scale, *value->asInt64());
   }
-  static std::int64_t within(const Field& field, std::int64_t number) {
+  static std::int64_t within(const Scale& scale, std::int64_t number) {
     const auto above =
-        static_cast<std::uint64_t>(number) - static_cast<std::uint64_t>(field.lowest);
-    return above <= field.span ? number : kNone;
+        static_cast<std::uint64_t>(number) - static_cast<std::uint64_t>(scale.lowest);
+    return above <= scale.span ? number : kNone;
   }
   [[gnu::noinline]] static std::int64_t otherIn(const Field& field, const Value& value);
   static std::int64_t bestIn(Field& field, const Sample& sample) {
@@ -73,24 +88,27 @@ class ServingReader {
   }
   static std::int64_t bestIn(Field& field, const List& receivers);
 
+  template <class Take>
+  static void tell(const Scale& scale, std::int64_t best, Take& take) {
+    if (best == kNone) return;
+    take(scale.quantity, static_cast<float>(best) * scale.factor + scale.offset);
+  }
+
   std::vector<Place> _places;
+  std::array<Scale, 3> _measured;  // of the fields of kLteServingMeasurement
 };
 
 template <class Take>
 void ServingReader::read(std::size_t number, const Dictionary& record, Take take) {
   Place& place = _places.data()[number];
-  const auto tell = [&take](const Field& field, std::int64_t best) {
-    if (best == kNone) return;
-    take(field.quantity, static_cast<float>(best) * field.factor + field.offset);
-  };
   const Value* held = place.isTop ? nullptr : place.held.in(record);
   if (held && held->asList()) {
-    for (Field& field : place.fields) tell(field, bestIn(field, *held->asList()));
+    for (Field& field : place.fields) tell(field.scale, bestIn(field, *held->asList()), take);
   } else if (const Dictionary* top = held          ? held->asDictionary()
                                      : place.isTop ? &record
                                                    : nullptr) {
     const Sample sample(*top);
-    for (Field& field : place.fields) tell(field, bestIn(field, sample));
+    for (Field& field : place.fields) tell(field.scale, bestIn(field, sample), take);
   }
 }
 

@@ -59,6 +59,21 @@ TEST(ServingValues, takeTheReceiversOfAMeasurementThatNobodyHandles) {
   EXPECT_EQ(followed.history.lastReceivedMs(kStart), kStart);
 }
 
+TEST(ServingValues, takeReceiversThatComeInAnyOrderAndWithMoreThanIsKnown) {
+  const Bytes weak = {0x1A, 0x06, 0x20, 0x03, 0x18, 0x08, 0x10, 0x14};
+  const Bytes later = {0xA0, 0x06, 0x01};
+  const Bytes strong = {0x1A, 0x09, 0x10, 0x63, 0x10, 0x19, 0xA0, 0x06, 0x01, 0x18, 0x06};
+  Bytes payload = weak;
+  payload.insert(payload.end(), later.begin(), later.end());
+  payload.insert(payload.end(), strong.begin(), strong.end());
+  payload.insert(payload.end(), {0x10, 0x01, 0x08, 0x05});
+  Followed followed;
+  followed.feed(kStart, V::K_LTE_SCELL_MEAS, payload);
+  EXPECT_EQ(newest(followed, Quantity::lteRsrp), -115.0F) << "what comes twice is the last";
+  EXPECT_EQ(newest(followed, Quantity::lteRsrq), -15.5F);
+  EXPECT_EQ(newest(followed, Quantity::lteSinr), -2.0F);
+}
+
 TEST(ServingValues, takeNothingFromDamagedBytesThatNobodyHandles) {
   Followed followed;
   followed.feed(kStart, V::K_LTE_SCELL_MEAS, Bytes{0x1A, 0x05, 0x10});
