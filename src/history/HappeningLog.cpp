@@ -19,6 +19,14 @@ std::string connectionText(Technology technology, const ToldConnection& told) {
   return text;
 }
 
+std::string technologyText(const ToldTechnology& told) {
+  return "Changed from " + std::string(nameOf(told.from)) + " to " + std::string(nameOf(told.to));
+}
+
+std::string statusText(const ToldStatus& told) {
+  return std::string(told.domain) + ": " + wordsOf(&told.status, "status");
+}
+
 std::string movedText(const Happening& happening) {
   if (!happening.from) return "On " + textOf(*happening.to);
   const std::string_view start = happening.move == CellMove::handover      ? "Handover from "
@@ -83,6 +91,10 @@ Happening HappeningLog::worded(const Unworded& unworded) {
     happening.text = *text;
   } else if (const auto* connection = std::get_if<ToldConnection>(&unworded.told)) {
     happening.text = connectionText(*unworded.technology, *connection);
+  } else if (const auto* change = std::get_if<ToldTechnology>(&unworded.told)) {
+    happening.text = technologyText(*change);
+  } else if (const auto* registration = std::get_if<ToldStatus>(&unworded.told)) {
+    happening.text = statusText(*registration);
   } else if (const auto* entry = std::get_if<ToldEntry>(&unworded.told)) {
     const bool isBearer = unworded.kind == HappeningKind::bearer;
     happening.text = isBearer ? bearerText(*entry) : carrierText(*entry);

@@ -6,6 +6,7 @@
 #include <deque>
 #include <optional>
 #include <string>
+#include <string_view>
 #include <utility>
 #include <variant>
 
@@ -36,6 +37,14 @@ struct ToldCell {
   ReportedCell to;
   CellMove move;
 };
+struct ToldTechnology {
+  Technology from;
+  Technology to;
+};
+struct ToldStatus {
+  std::string_view domain;  // of the registration, as it is called
+  Value status;
+};
 // Of a list, something that has come or gone.
 struct ToldEntry {
   std::array<Value, 3> numbers;
@@ -43,7 +52,8 @@ struct ToldEntry {
   Value type;
   bool hasCome = false;
 };
-using Told = std::variant<std::string, ToldConnection, ToldCell, ToldEntry>;
+using Told =
+    std::variant<std::string, ToldConnection, ToldCell, ToldTechnology, ToldStatus, ToldEntry>;
 
 // Beyond `most` the oldest go.
 class HappeningLog {
@@ -97,7 +107,7 @@ class HappeningLog {
   std::uint64_t _gone = 0;
   mutable std::deque<Happening> _worded;        // the older ones,
   mutable std::deque<std::uint64_t> _wordedAt;  // and the times that count of them
-  mutable std::deque<Unworded> _unworded;       // the newer ones
+  mutable std::deque<Unworded, SmallBlockAllocator<Unworded>> _unworded;  // the newer ones
 };
 
 }  // namespace qel

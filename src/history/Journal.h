@@ -111,7 +111,7 @@ class Journal {
     putHead(number, payload.size());
     putBytes(payload);
   }
-  void putHead(std::size_t number, std::size_t size) {
+  [[gnu::always_inline]] void putHead(std::size_t number, std::size_t size) {
     const std::uint64_t what = number << kSizeBits | size;
     const std::uint64_t when = _lastMs - _newest->fromMs;
     const auto head = static_cast<std::uint32_t>(what << kTimeBits | when);

@@ -9,7 +9,7 @@
 namespace qel {
 
 // Looks first where the key was found last: records of one metric have the same keys, names of the
-// program, mostly in the same places.
+// program, mostly in the same places. No record has the empty key.
 class KnownPlace {
  public:
   explicit KnownPlace(Name key) : _key(key) {}
@@ -26,6 +26,7 @@ class KnownPlace {
 
  private:
   [[gnu::noinline]] const Value* search(const Dictionary& record) {
+    if (_key.empty()) return nullptr;
     for (const Dictionary::Entry& entry : record) {
       if (entry.key.view() != _key.view()) continue;
       _place = static_cast<std::size_t>(&entry - record.begin());

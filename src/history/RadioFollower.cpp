@@ -62,9 +62,8 @@ void RadioFollower::use(Technology technology, const Report& report, HappeningLo
   if (_inUse == technology) return;
   _inUse = technology;
   if (_lastTechnology && *_lastTechnology != technology) {
-    log.tellText(report, HappeningKind::technology, technology,
-                 "Changed from " + std::string(nameOf(*_lastTechnology)) + " to " +
-                     std::string(nameOf(technology)));
+    log.tell<ToldTechnology>(report, HappeningKind::technology, technology,
+                             ToldTechnology{*_lastTechnology, technology});
   }
   _lastTechnology = technology;
   _technology.set(report.atMs, technology);

@@ -23,13 +23,6 @@ constexpr std::array kDomains = {
     Domain{MetricValidator::K_CELLULAR_MM_CTXT, std::nullopt, "Calls of 2G and 3G"},
 };
 
-// Whether the value is another one than known, which it then is.
-bool isNew(const Value* value, Value& known) {
-  if (!value || *value == known) return false;
-  known = *value;
-  return true;
-}
-
 // "network not allowed (cause 11)"; empty: none.
 std::string causeText(const Value& cause) {
   const NamedWords* words = wordsFor(cause.asText().value_or(""));
@@ -46,29 +39,33 @@ std::string rejectText(const Domain& domain, const Dictionary& record, const std
 
 }  // namespace
 
+bool RegistrationFollower::Field::isNewIn(const Dictionary& record) {
+  const Value* value = place.in(record);
+  if (!value || *value == known) return false;
+  known = *value;
+  return true;
+}
+
 void RegistrationFollower::follow(const Report& report, HappeningLog& log) {
   const auto domain = std::ranges::find(kDomains, report.metric, &Domain::metric);
   if (domain == kDomains.end()) return;
-  Known& known = _known[static_cast<std::size_t>(domain - kDomains.begin())];
+  auto& [status, reject, failure] = _known[static_cast<std::size_t>(domain - kDomains.begin())];
   const Dictionary& record = report.record;
-  const Value* status = record.find("reg_status");
-  if (isNew(status, known.status)) {
-    log.tellText(report, HappeningKind::registration, domain->technology,
-                 std::string(domain->name) + ": " + wordsOf(status, "status"));
+  if (status.isNewIn(record)) {
+    log.tell<ToldStatus>(report, HappeningKind::registration, domain->technology,
+                         ToldStatus{domain->name, status.known});
   }
-  const Value* reject = record.find("reject_cause");
-  if (isNew(reject, known.reject)) {
-    const std::string cause = causeText(*reject);
+  if (reject.isNewIn(record)) {
+    const std::string cause = causeText(reject.known);
     if (!cause.empty()) {
       log.tellText(report, HappeningKind::reject, domain->technology,
                    rejectText(*domain, record, cause));
     }
   }
   // A rejected procedure has failed too: its cause has been told.
-  const Value* failure = record.find("proc_failure_cause");
-  if (isNew(failure, known.failure) &&
-      failure->asText() != "KNAS_MM_PROC_FAILURE_CAUSE_REJECTED_BY_NW") {
-    const std::string words = wordsOf(failure, "cause");
+  if (failure.isNewIn(record) &&
+      failure.known.asText() != "KNAS_MM_PROC_FAILURE_CAUSE_REJECTED_BY_NW") {
+    const std::string words = wordsOf(&failure.known, "cause");
     if (!words.empty()) {
       log.tellText(report, HappeningKind::registration, domain->technology,
                    std::string(domain->name) + ": failed, " + words);

@@ -6,6 +6,7 @@
 
 #include "base/Value.h"
 #include "history/HappeningLog.h"
+#include "history/KnownPlace.h"
 
 namespace qel {
 
@@ -16,10 +17,19 @@ class RegistrationFollower {
   void follow(const Report& report, HappeningLog& log);
 
  private:
+  // A field, and its value in the report that carried it last.
+  struct Field {
+    explicit Field(Name key) : place(key) {}
+    // Whether the record's value is another one than known, which it then is.
+    bool isNewIn(const Dictionary& record);
+
+    KnownPlace place;
+    Value known;
+  };
   struct Known {
-    Value status;
-    Value reject;
-    Value failure;
+    Field status{"reg_status"};
+    Field reject{"reject_cause"};
+    Field failure{"proc_failure_cause"};
   };
 
   std::array<Known, 3> _known;
