@@ -21,8 +21,8 @@ class LineBuffer {
     writtenTo(end + text.size());
   }
 
-  // Room for `count` more behind the line, for writing, and where it ends; writtenTo says where what
-  // is filled ends.
+  // Room for `count` more behind the line, for writing; writtenTo says where what is filled ends.
+  // endOfRoom is where all that there is ends.
   char* room(std::size_t count) {
     if (_capacity - _size < count) grow(count);
     return _characters.get() + _size;
