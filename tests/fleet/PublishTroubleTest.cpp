@@ -162,7 +162,7 @@ TEST_F(PublishTrouble, isNotLittleRoomAsLongAsAllIsSent) {
   const Broker broker(directory);
   const Subscriber subscriber(broker, file("received"));
   ChildProcess publisher(
-      {.words = inLittleRoom("200", publishing(broker.url())), .err = file("said")});
+      {.words = inLittleRoom("1000", publishing(broker.url())), .err = file("said")});
   ASSERT_TRUE(eventually([&] { return subscriber.newest() > 800; })) << said();
   publisher.signal(SIGTERM);
   EXPECT_EQ(publisher.waitForEnd(), 0);
