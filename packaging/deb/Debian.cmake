@@ -27,11 +27,11 @@ set(CPACK_DEBIAN_PACKAGE_SHLIBDEPS ON)
 set(CPACK_DEBIAN_PACKAGE_CONTROL_STRICT_PERMISSION ON)
 set(CPACK_DEBIAN_COMPRESSION_TYPE xz)
 
-# The modules that the interface imports; programs link none of them.
+# The modules that the interface imports, and the way to a phone's compositor; programs link none of them.
 set(CPACK_DEBIAN_VIEWER_PACKAGE_NAME qelwatch)
 set(CPACK_DEBIAN_VIEWER_PACKAGE_DEPENDS
-  "qml6-module-qtquick, qml6-module-qtqml, qml6-module-qtqml-models, qml6-module-qtqml-workerscript")
-set(CPACK_DEBIAN_VIEWER_PACKAGE_RECOMMENDS "basebandd, qt6-wayland")
+  "qml6-module-qtquick, qml6-module-qtqml, qml6-module-qtqml-models, qml6-module-qtqml-workerscript, qt6-wayland")
+set(CPACK_DEBIAN_VIEWER_PACKAGE_RECOMMENDS "basebandd")
 set(CPACK_COMPONENT_VIEWER_DESCRIPTION
 "cellular diagnostics viewer for phones
 qelwatch sits beside the phone's baseband manager service and shows what the

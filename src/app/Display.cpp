@@ -5,6 +5,8 @@
 
 #include <QtCore/QByteArray>
 #include <QtCore/QDir>
+#include <QtGui/QGuiApplication>
+#include <QtGui/QScreen>
 #include <algorithm>
 #include <array>
 #include <cstdlib>
@@ -33,6 +35,15 @@ bool hasDisplay() {
 }
 
 void useMemoryAsDisplay() { qputenv(kPlatformVariable, QByteArrayLiteral("offscreen")); }
+
+void useNoInputMethod() { qputenv("QT_IM_MODULE", QByteArrayLiteral("none")); }
+
+bool isOnPhone() {
+  constexpr int kWidestPhone = 600;  // of its shorter side, in points
+  const QScreen* screen = QGuiApplication::primaryScreen();
+  if (!screen || !QGuiApplication::platformName().startsWith(u"wayland")) return false;
+  return std::min(screen->size().width(), screen->size().height()) < kWidestPhone;
+}
 
 SessionFolder::SessionFolder() {
   if (!qEnvironmentVariableIsEmpty(kSessionVariable)) return;

@@ -20,6 +20,8 @@ namespace {
 
 const QString kRecording = QStringLiteral("recording:");
 constexpr std::chrono::milliseconds kPatienceOfASelfTest{5000};
+// Screens are drawn every five seconds and pages twice a second.
+constexpr std::chrono::milliseconds kRestOfEvents{250};
 constexpr std::size_t kLargestConfiguration = 1024 * 1024;
 const QString kSimulated = QStringLiteral("simulated");
 const QString kDiagnostics = QStringLiteral("diag:");
@@ -38,7 +40,9 @@ QString lossInWords(std::uint64_t dropped) {
 
 Source::~Source() {
   tesk::setConnector(nullptr);
-  if (_connector) _connector->close();
+  for (const auto& connector : {_connector, _recordConnector}) {
+    if (connector) connector->close();
+  }
 }
 
 int Source::open(const Options& options) {
@@ -59,8 +63,11 @@ int Source::open(const Options& options) {
   };
   _connector = std::make_shared<ClosingConnector>(tesk::bus::makeBusConnector(
       {options.bus}, watch, [patience] { return std::make_shared<EventLoopWait>(patience); },
-      condition));
+      condition, kRestOfEvents));
   tesk::setConnector(_connector);
+  // A recording tells when each event came.
+  _recordConnector = std::make_shared<ClosingConnector>(tesk::bus::makeBusConnector(
+      {options.bus}, {}, [patience] { return std::make_shared<EventLoopWait>(patience); }));
   return 0;
 }
 
@@ -88,7 +95,7 @@ void Source::letRecord(RecorderModel& recorder) const {
   const auto file = ResourceBundle::main().pathForResource("orb_test_lte", "deviceconfig");
   Bytes configuration = file ? contentOfFile(*file, kLargestConfiguration) : Bytes();
   if (folder.empty() || configuration.empty()) return;
-  RecordingControl::Way way{_connector, _bus, std::move(configuration)};
+  RecordingControl::Way way{_recordConnector, _bus, std::move(configuration)};
   recorder.setControl(std::make_unique<RecordingControl>(RecordingsFolder(folder), std::move(way)));
 }
 
@@ -106,6 +113,7 @@ int Source::openWithin(const std::string& source) {
     then(inWords(current));
   });
   _connector = std::make_shared<ClosingConnector>(service::makeInProcessConnector(std::move(core)));
+  _recordConnector = _connector;
   tesk::setConnector(_connector);
   return 0;
 }

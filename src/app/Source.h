@@ -37,6 +37,7 @@ class Source {
 
   std::optional<std::string> _bus;  // nothing: a source within this process
   std::shared_ptr<ClosingConnector> _connector;
+  std::shared_ptr<ClosingConnector> _recordConnector;
   const std::shared_ptr<ConditionLine> _condition = std::make_shared<ConditionLine>();
   std::shared_ptr<FeedBook> _book;
   std::shared_ptr<ServiceWatch> _watch;  // of the service on the bus

@@ -60,7 +60,9 @@ void findResources() {
 // The interface description creates the first screens and with them the connection.
 QQuickWindow* loadWindow(QQmlApplicationEngine& engine, const qel::Options& options) {
   engine.addImportPath(QStringLiteral("qrc:/qt/qml"));
-  engine.setInitialProperties({{"source", qel::sourceInWords(options.source)}});
+  QVariantMap properties{{"source", qel::sourceInWords(options.source)}};
+  if (qel::isOnPhone()) properties["flags"] = int{Qt::Window | Qt::FramelessWindowHint};
+  engine.setInitialProperties(properties);
   engine.load(QStringLiteral("qrc:/qt/qml/Qelwatch/Ui/qml/Main.qml"));
   if (engine.rootObjects().isEmpty()) return nullptr;
   return qobject_cast<QQuickWindow*>(engine.rootObjects().constFirst());
@@ -103,6 +105,7 @@ int main(int argc, char** argv) {
   exitCode = source.open(*options);
   if (exitCode != EXIT_SUCCESS) return exitCode;
   chooseDisplay(*options);
+  qel::useNoInputMethod();
   nameApplication();
   int programNameOnly = 1;
   const QGuiApplication application(programNameOnly, argv);

@@ -48,6 +48,7 @@ Window::Window(bool animated, std::shared_ptr<FakeService> service)
   QObject::connect(&_runLoop, &QuickRunLoop::worked, _navigation->pages(), &Pages::look);
   if (!animated) _appearance->reduceMotion();
   settle();
+  if (!QTest::qWaitForWindowActive(_window)) qFatal("the window does not come to the front");
 }
 
 bool Window::tap(const std::string& text) const {

@@ -21,6 +21,11 @@ Window {
         storyboard: Storyboard {}
     }
 
+    Binding {
+        target: navigation.pages
+        property: "shown"
+        value: Appearance.seen
+    }
     ScreenStack {
         id: stack
         anchors {

@@ -1,8 +1,9 @@
 import QtQuick
 import Qelwatch.Ui
 
-// The ways to the pages beside the tables.
-Row {
+// The ways to the pages beside the tables: beside each other where their words fit, else one above
+// the other.
+Grid {
     id: links
 
     required property Navigation navigation
@@ -22,6 +23,15 @@ Row {
         }
     ]
 
+    readonly property real widest:
+        pages.reduce((widest, page) => Math.max(widest, metrics.advanceWidth(page.name)), 0) + 16
+
+    columns: widest * pages.length <= width ? pages.length : 1
+
+    FontMetrics {
+        id: metrics
+        font.pointSize: Theme.nameSize
+    }
     Repeater {
         model: links.pages
 
@@ -29,7 +39,7 @@ Row {
         TextButton {
             required property var modelData
 
-            width: Math.floor(links.width / links.pages.length)
+            width: Math.floor(links.width / links.columns)
             text: modelData.name
             onTapped: links.navigation.open(modelData.page)
         }

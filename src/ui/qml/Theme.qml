@@ -49,7 +49,7 @@ QtObject {
     // A second tap so soon after a screen came was meant for the screen before.
     readonly property int guardMs: Appearance.reducedMotion ? 0 : 300
     readonly property int slideMs: Appearance.reducedMotion ? 0 : 200
-    readonly property int changeMs: Appearance.reducedMotion ? 0 : 600
+    readonly property int changeMs: Appearance.reducedMotion || !Appearance.seen ? 0 : 600
 
     // From the left edge of something so wide to where its content begins, and to where it ends.
     function inset(width: real): real {

@@ -4,6 +4,7 @@
 #include <QtCore/QSettings>
 #include <QtGui/QFontDatabase>
 #include <QtGui/QGuiApplication>
+#include <QtGui/QWindow>
 #include <algorithm>
 #include <utility>
 
@@ -60,6 +61,10 @@ bool Appearance::eventFilter(QObject* watched, QEvent* event) {
   const bool isTouch = type == QEvent::MouseButtonPress || type == QEvent::TouchBegin;
   if ((isKey || isTouch) && std::exchange(_keyboardInUse, isKey) != isKey) {
     emit keyboardInUseChanged();
+  }
+  if (type == QEvent::Expose && watched->isWindowType()) {
+    const bool exposed = static_cast<QWindow*>(watched)->isExposed();
+    if (std::exchange(_seen, exposed) != exposed) emit seenChanged();
   }
   return QObject::eventFilter(watched, event);
 }

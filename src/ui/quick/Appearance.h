@@ -23,6 +23,7 @@ class Appearance final : public QObject {
   Q_PROPERTY(qreal textScale READ textScale NOTIFY changed)
   Q_PROPERTY(bool reducedMotion READ isMotionReduced NOTIFY changed)
   Q_PROPERTY(QString fixedFamily READ fixedFamily CONSTANT)
+  Q_PROPERTY(bool seen READ isSeen NOTIFY seenChanged)
   Q_PROPERTY(bool keyboardInUse READ isKeyboardInUse NOTIFY keyboardInUseChanged)
 
  public:
@@ -47,11 +48,15 @@ class Appearance final : public QObject {
   // Was the last thing that the user touched the keyboard?
   bool isKeyboardInUse() const { return _keyboardInUse; }
 
+  // Can the window be seen, or is there another before it, or no light?
+  bool isSeen() const { return _seen; }
+
   bool eventFilter(QObject* watched, QEvent* event) override;
 
  signals:
   void changed();
   void keyboardInUseChanged();
+  void seenChanged();
 
  private:
   void takeDesktopSetting(const QString& name, const QVariant& value);
@@ -63,6 +68,7 @@ class Appearance final : public QObject {
   bool _desktopAnimates = true;
   bool _reducedMotion = false;
   bool _keyboardInUse = false;
+  bool _seen = true;
 };
 
 }  // namespace qel

@@ -61,7 +61,15 @@ void Pages::setInSight(const QString& screen) {
   refresh();
 }
 
+void Pages::setShown(bool shown) {
+  if (std::exchange(_isShown, shown) == shown) return;
+  _later.stop();
+  refresh();
+  emit shownChanged();
+}
+
 void Pages::look() {
+  if (!_isShown) return;
   if (_seen != _playback.playback().viewpoint().history->version()) refreshSoon(kShortestInterval);
 }
 
@@ -107,6 +115,7 @@ Feed Pages::feed() const {
 
 void Pages::refresh() {
   _soon.stop();
+  if (!_isShown) return;
   _sinceRefresh.start();
   const Viewpoint view = _playback.playback().viewpoint();
   const Feed source = feed();

@@ -41,6 +41,7 @@ class Pages : public QObject {
   Q_PROPERTY(qel::RecorderModel* recorder READ recorder CONSTANT)
   Q_PROPERTY(qel::RecordingsModel* recordings READ recordings CONSTANT)
   Q_PROPERTY(qel::SheetModel* sheet READ sheet CONSTANT)
+  Q_PROPERTY(bool shown READ isShown WRITE setShown NOTIFY shownChanged)
 
  public:
   explicit Pages(QObject* parent = nullptr);
@@ -61,6 +62,9 @@ class Pages : public QObject {
   void setFeed(const Feed& feed);
   // Which screen is in sight: "first", a page's name, or anything else.
   void setInSight(const QString& screen);
+  // Whether the window can be seen: if not, no page is made.
+  bool isShown() const { return _isShown; }
+  void setShown(bool shown);
   // Something may have been told: if so, the page in sight follows.
   void look();
   // The table in sight was drawn: what lies over it follows.
@@ -71,6 +75,7 @@ class Pages : public QObject {
  signals:
   // The values of another moment are shown than those that were: tables are to be drawn anew.
   void momentChanged();
+  void shownChanged();
 
  private:
   void playbackChanged();
@@ -86,6 +91,7 @@ class Pages : public QObject {
   Feed _feed;
   bool _knowsFeed = false;  // till then nothing is said of it
   QString _inSight;
+  bool _isShown = true;
   std::optional<std::uint64_t> _seen;  // version of the history
   QElapsedTimer _sinceRefresh;
   QTimer _soon;      // the next refresh, while one is due
