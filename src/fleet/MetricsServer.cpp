@@ -31,7 +31,7 @@ Answer refusal(int code, std::string_view words) {
 // A page of somebody's in a browser on this machine may have a name of its own that leads here; it
 // must not read what is here. Its browser tells the name.
 bool isLocalName(std::string_view host) {
-  if (host.empty() || host.starts_with("localhost")) return true;
+  if (host.empty() || host == "localhost" || host.starts_with("localhost:")) return true;
   return listenAddress(host) || listenAddress(std::string(host) + ":0");
 }
 
