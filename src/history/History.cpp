@@ -315,15 +315,15 @@ std::optional<JournalEntry> History::lastReport(std::int64_t metric, std::uint64
 }
 
 std::optional<std::uint64_t> History::periodMs(std::int64_t metric, std::uint64_t atMs) const {
-  const auto reports = _state->journal.newest(metric, atMs, kDistancesOfPeriod + 1);
-  if (reports.size() < 2) return std::nullopt;
-  std::vector<std::uint64_t> distances;
-  for (std::size_t i = 1; i < reports.size(); ++i) {
-    distances.push_back(reports[i - 1].receivedMs - reports[i].receivedMs);
-  }
-  std::ranges::nth_element(distances,
-                           distances.begin() + static_cast<std::ptrdiff_t>(distances.size() / 2));
-  return distances[distances.size() / 2];
+  std::array<std::uint64_t, kDistancesOfPeriod + 1> times;
+  const std::size_t count = _state->journal.newestTimes(metric, atMs, times);
+  if (count < 2) return std::nullopt;
+  // The distances take the place of the times.
+  const std::span<std::uint64_t> distances(times.data(), count - 1);
+  for (std::size_t i = 0; i < distances.size(); ++i) distances[i] = times[i] - times[i + 1];
+  const auto middle = distances.begin() + static_cast<std::ptrdiff_t>(distances.size() / 2);
+  std::ranges::nth_element(distances, middle);
+  return *middle;
 }
 
 std::optional<std::uint64_t> History::lastReceivedMs(std::uint64_t atMs) const {

@@ -168,6 +168,37 @@ std::vector<JournalEntry> Journal::newest(std::int64_t metric, std::uint64_t atM
   return entries;
 }
 
+template <class Take>
+void Journal::forTimes(const Chunk& chunk, std::size_t row, std::uint64_t atMs, Take take) {
+  for (std::size_t position = 0; position < chunk.size;) {
+    const Place place = read(chunk, position);
+    if (place.receivedMs > atMs) return;
+    if (place.row == row) take(place.receivedMs);
+  }
+}
+
+std::size_t Journal::newestTimes(std::int64_t metric, std::uint64_t atMs,
+                                 std::span<std::uint64_t> times) const {
+  std::size_t found = 0;
+  const auto row = find(metric);
+  if (!row) return found;
+  for (std::size_t i = chunksUntil(atMs); i-- > 0 && found < times.size();) {
+    const Chunk& chunk = _chunks[i];
+    if ((chunk.rows >> *row & 1U) == 0) continue;
+    std::size_t left = 0;
+    forTimes(chunk, *row, atMs, [&left](std::uint64_t) { ++left; });
+    const std::size_t before = found;
+    found = std::min(found + left, times.size());
+    forTimes(chunk, *row, atMs, [&](std::uint64_t time) {
+      const std::size_t place = before + --left;
+      if (place < found) times[place] = time;
+    });
+  }
+  const auto& kept = _kept[*row];
+  if (found < times.size() && kept && kept->receivedMs <= atMs) times[found++] = kept->receivedMs;
+  return found;
+}
+
 std::optional<JournalEntry> Journal::last(std::int64_t metric, std::uint64_t atMs) const {
   const auto entries = newest(metric, atMs, 1);
   return entries.empty() ? std::nullopt : std::optional(entries.front());

@@ -9,6 +9,7 @@
 #include <functional>
 #include <memory>
 #include <optional>
+#include <span>
 #include <vector>
 
 #include "base/Bytes.h"
@@ -64,6 +65,9 @@ class Journal {
   std::optional<std::uint64_t> lastMs(std::uint64_t atMs) const;
   // Up to `most` of one metric that are not after this time, newest first.
   std::vector<JournalEntry> newest(std::int64_t metric, std::uint64_t atMs, std::size_t most) const;
+  // Only when they came, as many as there is room for; how many these are. Takes no memory.
+  std::size_t newestTimes(std::int64_t metric, std::uint64_t atMs,
+                          std::span<std::uint64_t> times) const;
 
   // What it holds, without the newest of metrics that are no more among the others.
   std::size_t bytes() const { return _bytes; }
@@ -134,6 +138,9 @@ class Journal {
   static Place read(const Chunk& chunk, std::size_t& position);
   static std::vector<Place> placesOf(const Chunk& chunk, std::size_t row, std::uint64_t fromMs,
                                      std::uint64_t toMs);
+  // Calls take(time) for each of the row's in the chunk that is not after this time.
+  template <class Take>
+  static void forTimes(const Chunk& chunk, std::size_t row, std::uint64_t atMs, Take take);
   JournalEntry entry(const Chunk& chunk, const Place& place) const;
   // How many of the chunks begin not after this time.
   std::size_t chunksUntil(std::uint64_t atMs) const;

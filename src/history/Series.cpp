@@ -94,15 +94,22 @@ bool Series::isCutOffFromMeans() const {
 std::vector<Run> Series::between(std::uint64_t fromMs, std::uint64_t toMs) const {
   std::vector<Run> runs;
   bool isCutOff = false;
-  const auto append = [&](const Kept& point) {
+  // `most` are to come with it, most often in one run.
+  const auto append = [&](const Kept& point, std::size_t most) {
     if (point.timeMs() < fromMs || point.timeMs() > toMs) return;
-    if (runs.empty() || point.begins() || isCutOff) runs.emplace_back();
+    if (runs.empty()) {
+      runs.emplace_back().reserve(most);
+    } else if (point.begins() || isCutOff) {
+      runs.emplace_back();
+    }
     isCutOff = false;
     runs.back().push_back({point.timeMs(), point.value});
   };
   const auto appendRow = [&](const Row& row, std::uint64_t untilMs) {
     const std::size_t end = row.until(untilMs);
-    for (std::size_t i = fromMs == 0 ? 0 : row.until(fromMs - 1); i < end; ++i) append(row[i]);
+    for (std::size_t i = fromMs == 0 ? 0 : row.until(fromMs - 1); i < end; ++i) {
+      append(row[i], end - i);
+    }
   };
   // Means until the first point that is known itself.
   if (_recent.size() > 0 && _recent[0].timeMs() > fromMs) {

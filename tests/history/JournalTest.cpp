@@ -56,6 +56,26 @@ TEST(Journal, answersAsOfAMoment) {
   EXPECT_EQ(bytesOf(newest[1]), Bytes{4});
 }
 
+TEST(Journal, saysWhenTheNewestCameWithoutTheirPayloads) {
+  Journal journal({.ageMs = 60'000, .bytes = 1U << 20U});
+  journal.add(row(kCell), kStart, Bytes{7});
+  for (std::uint64_t i = 0; i < 500; ++i) {
+    journal.add(row(kState), kStart + 1000 * i, filled(i % 700, 1));
+    if (i % 3 == 0) journal.add(row(kCell), kStart + 1000 * i, Bytes{8});
+  }
+  for (const std::int64_t metric : {kState, kCell, std::int64_t{12345}}) {
+    for (const std::uint64_t atMs : {kStart - 1, kStart, kStart + 470'500, kStart + 900'000}) {
+      for (const std::size_t most :
+           {std::size_t{0}, std::size_t{1}, std::size_t{9}, std::size_t{300}}) {
+        const auto newest = journal.newest(metric, atMs, most);
+        std::vector<std::uint64_t> times(most);
+        ASSERT_EQ(journal.newestTimes(metric, atMs, times), newest.size());
+        for (std::size_t i = 0; i < newest.size(); ++i) EXPECT_EQ(times[i], newest[i].receivedMs);
+      }
+    }
+  }
+}
+
 TEST(Journal, keepsTheNewestOfEachMetricWhenTheOldestGo) {
   Journal journal({.ageMs = 10'000, .bytes = 1U << 20U});
   journal.add(row(kCell), kStart, Bytes{7, 7});

@@ -120,6 +120,7 @@ Run thinned(const Run& run, std::uint64_t fromMs, std::uint64_t toMs, unsigned c
   if (columns == 0 || toMs <= fromMs || run.size() <= kPointsOfAColumn) return run;
   const std::uint64_t width = std::max<std::uint64_t>(1, (toMs - fromMs) / columns);
   Run result;
+  result.reserve(std::min(run.size(), (columns + std::size_t{1}) * kPointsOfAColumn));
   for (auto first = run.begin(); first != run.end();) {
     const std::uint64_t column = first->timeMs / width;
     const auto last = std::find_if(

@@ -81,6 +81,7 @@ std::uint64_t patienceMs(const History& history) {
   std::optional<std::uint64_t> shortest;
   for (const DispatchRow& row : dispatchTable()) {
     shortest = earlier(shortest, history.periodMs(row.identifier));
+    if (shortest && *shortest <= kShortestPeriodMs) break;  // a shorter one would not count
   }
   return kSilentPeriods * std::max(shortest.value_or(0), kShortestPeriodMs);
 }

@@ -26,6 +26,9 @@ void setAge(const Viewpoint& viewpoint, std::uint64_t oldAfter, MadeReading& mad
 
 std::uint64_t oldAfterMs(const std::vector<Run>& runs) {
   std::vector<std::uint64_t> distances;
+  std::size_t points = 0;
+  for (const Run& run : runs) points += run.size();
+  distances.reserve(points);
   for (const Run& run : runs) {
     for (std::size_t i = 1; i < run.size(); ++i) {
       const auto distance = run[i].timeMs - run[i - 1].timeMs;
