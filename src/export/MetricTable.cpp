@@ -116,9 +116,18 @@ void MetricTable::fill(TableRow& row, const Dictionary& record, const Places& pl
   }
 }
 
-bool MetricTable::rows(std::uint64_t timeMs, Dictionary record,
-                       const std::function<bool(const TableRow&)>& put) const {
+bool MetricTable::rows(std::uint64_t timeMs, Dictionary record, const PutRow& put) const {
   for (const Rewrite& rewrite : _rewrites) applyRewrite(rewrite, record, _bandwidths);
+  return putRows(timeMs, record, Values::reported, put);
+}
+
+bool MetricTable::shownRows(std::uint64_t timeMs, const Dictionary& record,
+                            const PutRow& put) const {
+  return putRows(timeMs, record, Values::shown, put);
+}
+
+bool MetricTable::putRows(std::uint64_t timeMs, const Dictionary& record, Values ofEntries,
+                          const PutRow& put) const {
   TableRow own(_table.columns.size());
   own[0] = isoTime(timeMs);
   fill(own, record, _fields);
@@ -128,8 +137,12 @@ bool MetricTable::rows(std::uint64_t timeMs, Dictionary record,
     const List* entries = value ? value->asList() : nullptr;
     std::int64_t number = 0;
     for (std::size_t i = 0; entries && i < entries->size(); ++i) {
-      Dictionary entry = *(*entries)[i].asDictionary();
-      for (const Rewrite& rewrite : list.rewrites) applyRewrite(rewrite, entry, _bandwidths);
+      const Dictionary* reported = (*entries)[i].asDictionary();
+      if (!reported) continue;  // of a record that came from outside
+      Dictionary entry = *reported;
+      if (ofEntries == Values::reported) {
+        for (const Rewrite& rewrite : list.rewrites) applyRewrite(rewrite, entry, _bandwidths);
+      }
       TableRow row = own;
       row[_firstOfEntries] = list.key;
       row[_firstOfEntries + 1] = number++;

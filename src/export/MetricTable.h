@@ -25,9 +25,13 @@ class MetricTable {
 
   const Table& table() const { return _table; }
 
+  using PutRow = std::function<bool(const TableRow&)>;
+
   // Calls `put` for each row of a report as long as it answers true; whether it always did.
-  bool rows(std::uint64_t timeMs, Dictionary record,
-            const std::function<bool(const TableRow&)>& put) const;
+  bool rows(std::uint64_t timeMs, Dictionary record, const PutRow& put) const;
+  // The same of a record whose values are in the units of the tables, whoever made it: a cell has
+  // what stands there, whatever the type of its column.
+  bool shownRows(std::uint64_t timeMs, const Dictionary& record, const PutRow& put) const;
 
  private:
   // A field and its column, or a nested message and its fields.
@@ -49,6 +53,10 @@ class MetricTable {
     std::span<const Rewrite> rewrites;
   };
 
+  enum class Values : std::uint8_t { reported, shown };
+
+  bool putRows(std::uint64_t timeMs, const Dictionary& record, Values ofEntries,
+               const PutRow& put) const;
   Places addFields(const MessageShape& shape, const Scope& scope);
   std::size_t addColumn(Column column, const Scope& scope);
   std::optional<std::size_t> find(const std::string& name, std::size_t from) const;
