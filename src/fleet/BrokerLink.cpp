@@ -34,6 +34,8 @@ bool isLastWord(int reason) {
       MQTT_RC_BAD_AUTHENTICATION_METHOD,
       MQTT_RC_RETAIN_NOT_SUPPORTED,
       MQTT_RC_QOS_NOT_SUPPORTED,
+      MQTT_RC_SHARED_SUBS_NOT_SUPPORTED,
+      MQTT_RC_WILDCARD_SUBS_NOT_SUPPORTED,
   };
   return std::ranges::find(kLast, reason) != kLast.end();
 }
@@ -60,9 +62,11 @@ const char* orNone(const std::string& text) { return text.empty() ? nullptr : te
 void BrokerLink::EndClient::operator()(mosquitto* client) const { mosquitto_destroy(client); }
 
 BrokerLink::BrokerLink(const LinkSettings& settings, Arrival arrival)
-    : _arrival(std::move(arrival)), _keepAlive(settings.keepAlive) {
+    : _arrival(std::move(arrival)),
+      _keepAlive(settings.keepAlive),
+      _subscription(settings.subscription) {
   beginLibrary();
-  _client.reset(mosquitto_new(settings.client.c_str(), true, this));
+  _client.reset(mosquitto_new(settings.client.c_str(), !_subscription, this));
 }
 
 BrokerLink::~BrokerLink() = default;
@@ -82,6 +86,18 @@ void BrokerLink::setCallbacks(mosquitto* client) {
         const bool isRefused = reason >= MQTT_RC_UNSPECIFIED;
         static_cast<Link*>(link)->_arrival(message, isRefused ? reasonText(reason) : "");
       });
+  mosquitto_subscribe_v5_callback_set(
+      client, [](mosquitto*, void* link, int, int, const int* granted, const mosquitto_property*) {
+        static_cast<Link*>(link)->subscribed(*granted);
+      });
+  mosquitto_message_v5_callback_set(client, [](mosquitto*, void* link,
+                                               const mosquitto_message* message,
+                                               const mosquitto_property*) {
+    auto& self = *static_cast<Link*>(link);
+    self._holdsAnswers = true;
+    self._subscription->delivery(message->topic, {static_cast<const char*>(message->payload),
+                                                  static_cast<std::size_t>(message->payloadlen)});
+  });
   mosquitto_log_callback_set(client, [](mosquitto*, void* link, int level, const char* text) {
     if (level == MOSQ_LOG_ERR) static_cast<Link*>(link)->_lastComplaint = text;
   });
@@ -106,9 +122,14 @@ bool BrokerLink::prepareTls(const LinkSettings& settings) {
 bool BrokerLink::prepare(const LinkSettings& settings) {
   mosquitto* client = _client.get();
   setCallbacks(client);
-  mosquitto_threaded_set(client, true);  // nothing is written but in turn()
+  // Nothing is written but in turn(): not even the answer to a message, which the library has ready
+  // before it delivers it.
+  mosquitto_threaded_set(client, true);
   mosquitto_int_option(client, MOSQ_OPT_PROTOCOL_VERSION, MQTT_PROTOCOL_V5);
   mosquitto_int_option(client, MOSQ_OPT_SEND_MAXIMUM, kMostUnderWay);
+  if (_subscription) {
+    mosquitto_int_option(client, MOSQ_OPT_RECEIVE_MAXIMUM, _subscription->mostUnderWay);
+  }
   int code = MOSQ_ERR_SUCCESS;
   if (settings.login) {
     code = mosquitto_username_pw_set(client, settings.login->user.c_str(),
@@ -128,14 +149,27 @@ std::unique_ptr<BrokerLink> BrokerLink::open(const LinkSettings& settings, Arriv
                                              LinkFailure& failure) {
   std::unique_ptr<BrokerLink> link(new BrokerLink(settings, std::move(arrival)));
   if (link->prepare(settings)) {
-    const int code = mosquitto_connect_bind_v5(
-        link->_client.get(), settings.broker.host.c_str(), settings.broker.port,
-        static_cast<int>(settings.keepAlive.count()), nullptr, nullptr);
+    const int code = link->connect(settings);
     if (code == MOSQ_ERR_SUCCESS) return link;
     link->note(code);
   }
   failure = link->_failure;
   return nullptr;
+}
+
+int BrokerLink::connect(const LinkSettings& settings) {
+  mosquitto_property* wishes = nullptr;
+  if (_subscription) {
+    mosquitto_property_add_int32(&wishes, MQTT_PROP_SESSION_EXPIRY_INTERVAL,
+                                 static_cast<std::uint32_t>(_subscription->sessionAge.count()));
+    mosquitto_property_add_int32(&wishes, MQTT_PROP_MAXIMUM_PACKET_SIZE,
+                                 _subscription->largestPacket);
+  }
+  const int code =
+      mosquitto_connect_bind_v5(_client.get(), settings.broker.host.c_str(), settings.broker.port,
+                                static_cast<int>(settings.keepAlive.count()), nullptr, wishes);
+  mosquitto_property_free_all(&wishes);
+  return code;
 }
 
 // Why it ended, as far as that was not noted before.
@@ -169,13 +203,38 @@ void BrokerLink::greeted(int reason, const mqtt5__property* properties) {
     _keepAlive = std::chrono::seconds(wanted);
   }
   mosquitto_property_read_int16(properties, MQTT_PROP_TOPIC_ALIAS_MAXIMUM, &_mostAliases, false);
-  _state = State::open;
+  if (_subscription) {
+    subscribe();
+  } else {
+    _state = State::open;
+  }
+}
+
+void BrokerLink::subscribe() {
+  const int code = mosquitto_subscribe_v5(_client.get(), nullptr, _subscription->topics.c_str(),
+                                          kAtLeastOnce, 0, nullptr);
+  if (code != MOSQ_ERR_SUCCESS) note(code);
+}
+
+void BrokerLink::subscribed(int reason) {
+  if (reason < MQTT_RC_UNSPECIFIED) {
+    _state = State::open;
+    return;
+  }
+  _failure = {
+      "the broker gives no messages of " + _subscription->topics + ": " + reasonText(reason),
+      isLastWord(reason)};
+  _state = State::ended;
 }
 
 void BrokerLink::ended(int code) { note(code); }
 
 int BrokerLink::descriptor() const { return mosquitto_socket(_client.get()); }
-bool BrokerLink::wantsToWrite() const { return mosquitto_want_write(_client.get()); }
+bool BrokerLink::wantsToWrite() const {
+  return !_holdsAnswers && mosquitto_want_write(_client.get());
+}
+
+void BrokerLink::acknowledge() { _isAcknowledging = std::exchange(_holdsAnswers, false); }
 
 BrokerLink::State BrokerLink::turn(bool isReadable) {
   mosquitto* client = _client.get();
@@ -183,11 +242,14 @@ BrokerLink::State BrokerLink::turn(bool isReadable) {
   // Several messages become few packets of the network. And a broker that turns down the
   // certificate says why and hangs up, after which writing fails: so what follows the certificate
   // leaves with it.
-  holdBack(true);
-  if (isReadable) code = mosquitto_loop_read(client, kMostUnderWay);
+  const bool mayWrite = !_subscription || _state == State::greeting || wantsToWrite();
+  if (mayWrite) holdBack(true);
+  // An answer to what is read now would be written behind those that go out.
+  if (isReadable && !_isAcknowledging) code = mosquitto_loop_read(client, kMostUnderWay);
   if (code == MOSQ_ERR_SUCCESS) code = mosquitto_loop_misc(client);
   if (code == MOSQ_ERR_SUCCESS && wantsToWrite()) code = mosquitto_loop_write(client, 1);
-  holdBack(false);
+  if (mayWrite) holdBack(false);
+  _isAcknowledging = _isAcknowledging && wantsToWrite();
   if (code != MOSQ_ERR_SUCCESS) note(code);
   return _state;
 }

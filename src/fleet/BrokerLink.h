@@ -23,6 +23,18 @@ struct RetainedMessage {
   std::string text;
 };
 
+// What a client is told of others' messages.
+struct Subscription {
+  // Told in turn().
+  using Delivery = std::function<void(std::string_view topic, std::string_view payload)>;
+
+  std::string topics;  // with wildcards; "$share/GROUP/…": each message for one of them
+  std::uint16_t mostUnderWay = 20;    // messages that are not acknowledged
+  std::uint32_t largestPacket = 0;    // bytes; larger ones the broker keeps to itself
+  std::chrono::seconds sessionAge{};  // how long it keeps for this client what comes meanwhile
+  Delivery delivery;
+};
+
 struct LinkSettings {
   BrokerAddress broker;
   std::string client;  // by which the broker knows it
@@ -32,6 +44,7 @@ struct LinkSettings {
   std::string keyFile;
   std::chrono::seconds keepAlive{900};  // 0: the broker never hears of a silent client
   RetainedMessage will;
+  std::optional<Subscription> subscription;
 };
 
 // Why there is no connection.
@@ -57,6 +70,9 @@ class BrokerLink {
 
   int descriptor() const;
   bool wantsToWrite() const;
+  // The messages that were delivered so far are where they belong. Before that, or when that never
+  // comes, the broker hears of none of them, and of nothing else that would have to be written.
+  void acknowledge();
   // Reads and writes what goes, and keeps the connection alive.
   State turn(bool isReadable);
   State state() const { return _state; }
@@ -79,7 +95,10 @@ class BrokerLink {
   void note(int code);
   void greeted(int reason, const mqtt5__property* properties);
   void ended(int code);
+  void subscribe();
+  void subscribed(int reason);
   static void setCallbacks(mosquitto* client);
+  int connect(const LinkSettings& settings);
 
   struct EndClient {
     void operator()(mosquitto* client) const;
@@ -93,6 +112,9 @@ class BrokerLink {
   std::chrono::seconds _keepAlive;
   std::uint16_t _mostAliases = 0;
   std::map<std::string, std::uint16_t> _aliases;  // of topics
+  const std::optional<Subscription> _subscription;
+  bool _holdsAnswers = false;     // to messages that were delivered
+  bool _isAcknowledging = false;  // some of these answers are not written yet
 };
 
 }  // namespace qel::fleet
