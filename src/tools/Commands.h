@@ -30,6 +30,7 @@ void addLiveCommand(CLI::App& app, Action& chosen, const bool& verbose);
 void addRecordCommand(CLI::App& app, Action& chosen);
 void addPublishCommand(CLI::App& app, Action& chosen);
 void addExporterCommand(CLI::App& app, Action& chosen);
+void addCollectCommand(CLI::App& app, Action& chosen);
 void addImportCommand(CLI::App& app, Action& chosen);
 void addExportCommand(CLI::App& app, Action& chosen);
 void addDiagReportCommand(CLI::App& app, Action& chosen);

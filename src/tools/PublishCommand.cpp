@@ -1,13 +1,9 @@
 // qelctl publish: live events to a broker.
 
-#include <unistd.h>
-
 #include <CLI/CLI.hpp>
 #include <algorithm>
-#include <cerrno>
 #include <chrono>
 #include <cstdlib>
-#include <cstring>
 #include <memory>
 #include <optional>
 #include <string>
@@ -20,9 +16,11 @@
 #include "fleet/PhoneName.h"
 #include "fleet/Publisher.h"
 #include "tesk/bus/BusConnector.h"
+#include "tools/BrokerOptions.h"
 #include "tools/Commands.h"
 #include "tools/MainLoop.h"
 #include "tools/Service.h"
+#include "tools/SilentValidator.h"
 #include "tools/StateFolder.h"
 #include "tools/TimeOption.h"
 #include "tools/ToolError.h"
@@ -37,11 +35,10 @@ using Seconds = std::chrono::duration<double>;
 constexpr std::size_t kLargestConfigurationBytes = 1024 * 1024;
 
 struct Options {
-  std::string url;
+  BrokerOptions broker;
   std::string bus = "system";
   std::string phone;
   std::string stateFolder;
-  std::string loginFile;
   fleet::PublishSettings settings;
   fleet::EventQueue::Limits limits;
   std::uint64_t everyMs = 10'000;
@@ -54,29 +51,11 @@ struct Options {
 
 void say(const std::string& line) { complain("qelctl", line); }
 
-void requireReadable(const std::string& path) {
-  if (!path.empty() && ::access(path.c_str(), R_OK) != 0) {
-    throw ToolError(EX_NOINPUT, path, std::strerror(errno));
-  }
-}
-
-// What the broker is told, from the files that the options name.
 fleet::PublishSettings settingsOf(const Options& options) {
   fleet::PublishSettings settings = options.settings;
-  fleet::LinkSettings& link = settings.link;
-  for (const auto& path : {options.loginFile, link.caFile, link.certificateFile, link.keyFile}) {
-    requireReadable(path);
-  }
-  std::string error;
-  if (!options.loginFile.empty()) {
-    link.login = fleet::readLogin(options.loginFile, error);
-    if (!link.login) throw ToolError(EX_DATAERR, error);
-  }
-  if (!link.keyFile.empty() && !fleet::isForOwnerAlone(link.keyFile, error)) {
-    throw ToolError(EX_DATAERR, error);
-  }
+  settings.link = linkSettingsOf(options.broker);
   settings.every = std::chrono::milliseconds(options.everyMs);
-  link.keepAlive =
+  settings.link.keepAlive =
       std::chrono::ceil<std::chrono::seconds>(std::chrono::milliseconds(options.keepAliveMs));
   return settings;
 }
@@ -101,7 +80,7 @@ std::unique_ptr<fleet::EventQueue> queueIn(const std::string& folder, const Opti
 std::string summary(const fleet::Publisher& publisher, const fleet::EventQueue& queue,
                     const fleet::EventIntake& intake, const Options& options) {
   const auto counts = queue.counts();
-  std::string text = options.settings.link.broker.text() + ": " + std::to_string(publisher.sent()) +
+  std::string text = options.broker.link.broker.text() + ": " + std::to_string(publisher.sent()) +
                      " events sent, " + std::to_string(counts.waiting) + " wait";
   const auto add = [&text](std::uint64_t count, const char* what) {
     if (count > 0) text += ", " + std::to_string(count) + what;
@@ -168,29 +147,8 @@ void run(const Options& options) {
   if (!hasEnded) std::_Exit(EX_OK);
 }
 
-// A validator that leaves the help text to the option.
-template <class Checked>
-CLI::Validator silent(Checked validator) {
-  return validator.description("");
-}
-
-void addBrokerOptions(CLI::App& command, Options& options) {
-  fleet::LinkSettings& link = options.settings.link;
-  command
-      .add_option("--login", options.loginFile,
-                  "File with the lines \"user NAME\" and \"password TEXT\", for its owner alone")
-      ->type_name("FILE");
-  command
-      .add_option("--ca", link.caFile,
-                  "Who signs the broker's certificate, unless the system knows")
-      ->type_name("FILE");
-  auto* certificate =
-      command.add_option("--cert", link.certificateFile, "This phone's certificate")
-          ->type_name("FILE");
-  auto* key =
-      command.add_option("--key", link.keyFile, "Its key, for its owner alone")->type_name("FILE");
-  certificate->needs(key);
-  key->needs(certificate);
+void addLinkOptions(CLI::App& command, Options& options) {
+  addBrokerOptions(command, options.broker, "This phone's certificate");
   command
       .add_option("--keep-alive", options.keepAliveMs,
                   "When a silent broker is asked for a sign, 0 for never; 15m unless given")
@@ -239,8 +197,6 @@ void addPublishCommand(CLI::App& app, Action& chosen) {
       "where the phone is. What cannot be sent waits on the disk. It runs until SIGINT or "
       "SIGTERM.");
   const auto options = std::make_shared<Options>();
-  command->add_option("URL", options->url, "mqtt://HOST[:PORT] or, over TLS, mqtts://HOST[:PORT]")
-      ->required();
   addBusOption(*command, options->bus);
   command->add_option("--phone", options->phone, "Name of this phone; a random one unless given")
       ->type_name("NAME");
@@ -250,19 +206,13 @@ void addPublishCommand(CLI::App& app, Action& chosen) {
   command->add_option("--duration", options->durationS, "End after this many seconds")
       ->type_name("SECONDS")
       ->check(silent(CLI::Range(0.001, 1e9)));
-  addBrokerOptions(*command, *options);
+  addLinkOptions(*command, *options);
   addQueueOptions(*command, *options);
   command->callback([options, &chosen] {
-    std::string why;
-    const auto broker = fleet::brokerAddress(options->url, why);
-    if (!broker) throw CLI::ValidationError(why);
-    options->settings.link.broker = *broker;
-    if (!options->phone.empty()) why = fleet::faultOfPhoneName(options->phone);
+    checkBrokerOptions(options->broker);
+    const std::string why =
+        options->phone.empty() ? std::string() : fleet::faultOfPhoneName(options->phone);
     if (!why.empty()) throw CLI::ValidationError(why);
-    const fleet::LinkSettings& link = options->settings.link;
-    if (!broker->isEncrypted && !(link.caFile.empty() && link.certificateFile.empty())) {
-      throw CLI::ValidationError("--ca and --cert are for mqtts://");
-    }
     if (options->keepAliveMs != 0 && options->keepAliveMs < 5000) {
       throw CLI::ValidationError("--keep-alive is 0 or 5s at least");
     }

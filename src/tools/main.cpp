@@ -58,6 +58,7 @@ int main(int argc, char* argv[]) {
   tools::addRecordCommand(app, chosen);
   tools::addPublishCommand(app, chosen);
   tools::addExporterCommand(app, chosen);
+  tools::addCollectCommand(app, chosen);
   tools::addImportCommand(app, chosen);
   tools::addExportCommand(app, chosen);
   tools::addDiagReportCommand(app, chosen);

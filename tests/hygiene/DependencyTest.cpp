@@ -53,6 +53,8 @@ const std::vector<std::pair<std::string, std::vector<std::string>>> kForeign = {
     {"mosquitto.h", {"src/fleet/"}},
     {"prometheus/", {"src/fleet/"}},
     {"civetweb.h", {"src/fleet/"}},
+    {"pqxx/", {"src/fleet/collect/"}},
+    {"libpq-fe.h", {"src/fleet/collect/"}},
     {"curses.h", {"src/tools/watch/"}},
     {"zlib.h", {"src/recording/"}},
 };
