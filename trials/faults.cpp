@@ -21,6 +21,8 @@ constexpr std::array kScenarios = {
     Scenario{"kill-recorder", "recorder killed", 250, 1, killRecorder},
     Scenario{"kill-broker", "broker killed", 50, 2, killBroker},
     Scenario{"kill-publisher", "publisher killed", 50, 3, killPublisher},
+    Scenario{"kill-collector", "collector killed", 50, 2, killCollector},
+    Scenario{"kill-database", "database killed", 20, 1, killDatabase},
     Scenario{"stop-service", "service stopped for up to 6 s", 20, 0, stopService},
     Scenario{"stop-bus", "bus stopped for up to 6 s", 20, 0, stopBus},
     Scenario{"stop-watchers", "viewer, `live` or recorder stopped for up to 6 s", 30, 0,

@@ -14,6 +14,10 @@ void killBroker(Trial& trial);
 void killPublisher(Trial& trial);
 void fullQueueDisk(Trial& trial);
 
+// kill -9 of who stores what was sent, and of the database.
+void killCollector(Trial& trial);
+void killDatabase(Trial& trial);
+
 void stopService(Trial& trial);
 void stopBus(Trial& trial);
 void stopWatchers(Trial& trial);
