@@ -84,6 +84,7 @@ void makeSeeds(const std::filesystem::path& directory, const char* recording,
   writeAll(directory / "messages", messageSeeds());
   writeAll(directory / "events", eventSeeds(events));
   writeAll(directory / "lines", lineSeeds(events));
+  writeAll(directory / "phones", lineSeeds(events));
   writeAll(directory / "recordings", recordingSeeds(events));
   writeAll(directory / "identities", identitySeeds(events));
   writeAll(directory / "packets", packetSeeds(events));
