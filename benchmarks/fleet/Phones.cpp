@@ -1,0 +1,181 @@
+// fleet-phones URL RECORDING PHONES RATE SECONDS: so many phones in one process, each with a
+// connection of its own, send events of the recording at RATE a second each. Prints each second how
+// many were sent and how many of them the broker has.
+
+#include <poll.h>
+
+#include <algorithm>
+#include <chrono>
+#include <cstdint>
+#include <cstdio>
+#include <cstdlib>
+#include <memory>
+#include <string>
+#include <utility>
+#include <vector>
+
+#include "fleet/BrokerLink.h"
+#include "fleet/MetricNames.h"
+#include "recording/EventLine.h"
+#include "recording/RecordingReader.h"
+
+namespace qel {
+namespace {
+
+using Clock = std::chrono::steady_clock;
+using fleet::BrokerLink;
+
+// An event without its time, number and end.
+struct Template {
+  std::string metric;
+  std::string line;  // behind the time
+};
+
+std::vector<Template> templatesOf(const std::string& recording) {
+  std::vector<Template> all;
+  RecordingFault fault;
+  const auto reader = RecordingReader::open(recording, RecordingReader::BadLines::skip, fault);
+  while (auto event = reader ? reader->next() : std::nullopt) {
+    const std::string line = eventLine(*event);
+    all.push_back({fleet::metricNameOf(*event), line.substr(line.find(','))});
+    all.back().line.pop_back();
+  }
+  return all;
+}
+
+std::uint64_t nowMs() {
+  return static_cast<std::uint64_t>(std::chrono::duration_cast<std::chrono::milliseconds>(
+                                        std::chrono::system_clock::now().time_since_epoch())
+                                        .count());
+}
+
+class Phones {
+ public:
+  Phones(fleet::LinkSettings settings, std::vector<Template> templates)
+      : _settings(std::move(settings)), _templates(std::move(templates)) {}
+
+  bool connect(std::size_t count) {
+    for (std::size_t i = 0; i < count; ++i) {
+      Phone phone;
+      phone.name = "load-" + std::to_string(i + 1);
+      phone.next = i * 131 % _templates.size();
+      _settings.client = "qelwatch-" + phone.name;
+      fleet::LinkFailure failure;
+      phone.link = BrokerLink::open(
+          _settings, [this](int, const std::string& refusal) { _acknowledged += refusal.empty(); },
+          failure);
+      if (!phone.link) {
+        std::fprintf(stderr, "fleet-phones: %s\n", failure.why.c_str());
+        return false;
+      }
+      _waited.push_back({phone.link->descriptor(), POLLIN, 0});
+      phone.link->turn(false);
+      _phones.push_back(std::move(phone));
+    }
+    const auto last = Clock::now() + std::chrono::seconds(60);
+    while (_open < count && Clock::now() < last) {
+      turn(10);
+      _open = 0;
+      for (const Phone& phone : _phones) _open += phone.link->state() == BrokerLink::State::open;
+    }
+    return _open == count;
+  }
+
+  void send(std::size_t place) {
+    Phone& phone = _phones[place];
+    const Template& event = _templates[phone.next];
+    phone.next = (phone.next + 1) % _templates.size();
+    bool isTooLarge = false;
+    phone.link->send("qelwatch/" + phone.name + "/" + event.metric,
+                     "{\"time_ms\": " + std::to_string(nowMs()) + event.line +
+                         ", \"stream\": " + std::to_string(_stream) +
+                         ", \"number\": " + std::to_string(++phone.sent) + '}',
+                     BrokerLink::Retained::no, isTooLarge);
+    phone.link->turn(false);
+    ++_sent;
+  }
+
+  void turn(int patienceMs) {
+    if (::poll(_waited.data(), _waited.size(), patienceMs) <= 0) patienceMs = 0;
+    for (std::size_t i = 0; i < _phones.size(); ++i) {
+      if (_waited[i].revents != 0 || _phones[i].link->wantsToWrite()) {
+        _phones[i].link->turn(_waited[i].revents != 0);
+      }
+    }
+  }
+
+  std::uint64_t sent() const { return _sent; }
+  std::uint64_t acknowledged() const { return _acknowledged; }
+
+ private:
+  struct Phone {
+    std::string name;
+    std::unique_ptr<BrokerLink> link;
+    std::uint64_t sent = 0;
+    std::size_t next = 0;
+  };
+
+  fleet::LinkSettings _settings;
+  const std::vector<Template> _templates;
+  const std::uint64_t _stream = nowMs() / 1000;
+  std::vector<Phone> _phones;
+  std::vector<pollfd> _waited;
+  std::size_t _open = 0;
+  std::uint64_t _sent = 0;
+  std::uint64_t _acknowledged = 0;
+};
+
+// Everybody in turn, as many each moment as are due.
+void run(Phones& phones, std::size_t count, double rate, double seconds) {
+  const auto begin = Clock::now();
+  const auto elapsed = [begin] {
+    return std::chrono::duration<double>(Clock::now() - begin).count();
+  };
+  double nextLine = 1;
+  while (elapsed() < seconds ||
+         (phones.acknowledged() < phones.sent() && elapsed() < seconds + 30)) {
+    const double now = std::min(elapsed(), seconds);
+    const auto due = static_cast<std::uint64_t>(now * rate * static_cast<double>(count));
+    for (int some = 0; phones.sent() < due && some < 500; ++some) {
+      phones.send(phones.sent() % count);
+    }
+    phones.turn(phones.sent() < due ? 0 : 5);
+    if (elapsed() < nextLine) continue;
+    std::printf("%.0f %lu %lu\n", nextLine, static_cast<unsigned long>(phones.sent()),
+                static_cast<unsigned long>(phones.acknowledged()));
+    std::fflush(stdout);
+    nextLine += 1;
+  }
+  std::printf("end %lu %lu\n", static_cast<unsigned long>(phones.sent()),
+              static_cast<unsigned long>(phones.acknowledged()));
+}
+
+}  // namespace
+}  // namespace qel
+
+int main(int argc, char** argv) {
+  using namespace qel;
+  std::string why;
+  const auto broker = argc == 6 ? fleet::brokerAddress(argv[1], why) : std::nullopt;
+  if (!broker) {
+    std::fprintf(stderr, "usage: fleet-phones URL RECORDING PHONES RATE SECONDS\n");
+    return 64;
+  }
+  fleet::LinkSettings settings;
+  settings.broker = *broker;
+  const auto count = static_cast<std::size_t>(std::strtoul(argv[3], nullptr, 10));
+  auto templates = templatesOf(argv[2]);
+  if (templates.empty() || count == 0) {
+    std::fprintf(stderr, "fleet-phones: nothing to send\n");
+    return 65;
+  }
+  Phones phones(settings, std::move(templates));
+  if (!phones.connect(count)) {
+    std::fprintf(stderr, "fleet-phones: not everybody is connected\n");
+    return 69;
+  }
+  std::printf("begin\n");
+  std::fflush(stdout);
+  run(phones, count, std::strtod(argv[4], nullptr), std::strtod(argv[5], nullptr));
+  return phones.acknowledged() == phones.sent() ? 0 : 74;
+}
