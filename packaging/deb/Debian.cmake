@@ -1,4 +1,4 @@
-# The Debian packages: qelwatch (component viewer) and basebandd (component service).
+# The Debian packages: qelwatch (component viewer), basebandd (service) and qelwatch-collect (collect).
 
 function(qel_install_documents component QEL_PACKAGE)
   set(documents ${CMAKE_INSTALL_DATADIR}/doc/${QEL_PACKAGE})
@@ -7,9 +7,10 @@ function(qel_install_documents component QEL_PACKAGE)
 endfunction()
 qel_install_documents(viewer qelwatch)
 qel_install_documents(service basebandd)
+qel_install_documents(collect qelwatch-collect)
 
 set(CPACK_GENERATOR DEB)
-set(CPACK_COMPONENTS_ALL viewer service)
+set(CPACK_COMPONENTS_ALL viewer service collect)
 set(CPACK_SET_DESTDIR ON)  # some files go to /etc
 set(CPACK_INSTALL_PREFIX /usr)
 set(CPACK_STRIP_FILES ON)
@@ -55,5 +56,14 @@ basebandd offers what a phone's modem reports about its cells to programs on
 the system bus that are run by root or by members of the group baseband. It
 reads a modem through ModemManager, with the rights that this package gives
 it, a recording or a simulated phone.")
+
+set(CPACK_DEBIAN_COLLECT_PACKAGE_NAME qelwatch-collect)
+set(CPACK_DEBIAN_COLLECT_PACKAGE_RECOMMENDS qelwatch)  # its qelctl, not its viewer
+set(CPACK_DEBIAN_COLLECT_PACKAGE_SUGGESTS "mosquitto, postgresql")
+set(CPACK_COMPONENT_COLLECT_DESCRIPTION
+"what many phones report, in a PostgreSQL database
+With this package the subcommand collect of qelctl stores what phones send to
+an MQTT broker in tables, each event once. As many collectors as needed share
+the load. It is for whoever runs a fleet; phones need it not.")
 
 include(CPack)
