@@ -17,14 +17,14 @@
 namespace qel::fleet {
 
 struct CollectSettings {
-  LinkSettings link;  // its client and subscription are set here
-  std::string name;   // of this collector at the broker, which keeps messages for it
-  std::string group;  // of those who share the messages
-  std::string database;                      // of databaseAddress()
-  std::chrono::milliseconds every{500};      // how long a message waits for others
-  std::size_t batch = 2000;                  // messages that are stored earlier
+  LinkSettings link;     // its client and subscription are set here
+  std::string name;      // of this collector at the broker, which keeps messages for it
+  std::string group;     // of those who share the messages
+  std::string database;  // of databaseAddress()
+  std::chrono::milliseconds every{500};        // how long a message waits for others
+  std::size_t batch = 2000;                    // messages that are stored earlier
   std::chrono::seconds sessionAge{7 * 86400};  // how long the broker keeps messages for it
-  bool keepsTrying = false;                  // also when broker or database refuses
+  bool keepsTrying = false;                    // also when broker or database refuses
 };
 
 struct CollectCounts {

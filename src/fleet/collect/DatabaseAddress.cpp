@@ -20,7 +20,7 @@ struct Default {
 
 // A server that has gone without a word is noticed, and not waited for.
 constexpr std::array kDefaults = {
-    Default{"connect_timeout", "10"},    Default{"keepalives_idle", "30"},
+    Default{"connect_timeout", "10"},     Default{"keepalives_idle", "30"},
     Default{"keepalives_interval", "10"}, Default{"keepalives_count", "3"},
     Default{"tcp_user_timeout", "60000"}, Default{"fallback_application_name", "qelctl collect"},
 };

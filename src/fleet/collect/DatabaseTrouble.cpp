@@ -18,7 +18,8 @@ std::string firstLine(std::string_view text) {
 
 DatabaseTrouble::Kind kindOf(const std::string& state) {
   if (state == "42501" || state.starts_with("28")) return DatabaseTrouble::Kind::refused;
-  const bool isMissing = state == "42P01" || state == "42703" || state == "42883" || state == "3F000";
+  const bool isMissing =
+      state == "42P01" || state == "42703" || state == "42883" || state == "3F000";
   return isMissing ? DatabaseTrouble::Kind::layout : DatabaseTrouble::Kind::away;
 }
 

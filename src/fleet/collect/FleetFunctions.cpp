@@ -22,25 +22,24 @@ constexpr std::string_view kHead =
 
 // What lies in the default partition moves along. Nothing may come there meanwhile.
 std::string makeDay(Partitions partitions) {
-  std::string sql =
-      "CREATE OR REPLACE FUNCTION qelwatch.make_day(day date) RETURNS boolean" +
-      std::string(kHead) + "  IF day < today - " + std::to_string(kDaysBack) + " OR day > today + " +
-      std::to_string(kDaysAhead) + " THEN RETURN false; END IF;\n";
+  std::string sql = "CREATE OR REPLACE FUNCTION qelwatch.make_day(day date) RETURNS boolean" +
+                    std::string(kHead) + "  IF day < today - " + std::to_string(kDaysBack) +
+                    " OR day > today + " + std::to_string(kDaysAhead) +
+                    " THEN RETURN false; END IF;\n";
   if (partitions == Partitions::days) {
-    sql +=
-        "  PERFORM pg_advisory_xact_lock(hashtext('qelwatch.make_day'));\n" +
-        std::string(kEachParent) +
-        "    CONTINUE WHEN to_regclass(format('qelwatch.%I', part)) IS NOT NULL;\n"
-        "    EXECUTE format('LOCK TABLE qelwatch.%I IN SHARE ROW EXCLUSIVE MODE',"
-        " parent || '_default');\n"
-        "    EXECUTE format('CREATE TABLE qelwatch.%I (LIKE qelwatch.%I INCLUDING DEFAULTS)',"
-        " part, parent);\n"
-        "    EXECUTE format('WITH moved AS (DELETE FROM qelwatch.%I WHERE time >= %L AND"
-        " time < %L RETURNING *) INSERT INTO qelwatch.%I SELECT * FROM moved',"
-        " parent || '_default', since, until, part);\n"
-        "    EXECUTE format('ALTER TABLE qelwatch.%I ATTACH PARTITION qelwatch.%I"
-        " FOR VALUES FROM (%L) TO (%L)', parent, part, since, until);\n"
-        "  END LOOP;\n";
+    sql += "  PERFORM pg_advisory_xact_lock(hashtext('qelwatch.make_day'));\n" +
+           std::string(kEachParent) +
+           "    CONTINUE WHEN to_regclass(format('qelwatch.%I', part)) IS NOT NULL;\n"
+           "    EXECUTE format('LOCK TABLE qelwatch.%I IN SHARE ROW EXCLUSIVE MODE',"
+           " parent || '_default');\n"
+           "    EXECUTE format('CREATE TABLE qelwatch.%I (LIKE qelwatch.%I INCLUDING DEFAULTS)',"
+           " part, parent);\n"
+           "    EXECUTE format('WITH moved AS (DELETE FROM qelwatch.%I WHERE time >= %L AND"
+           " time < %L RETURNING *) INSERT INTO qelwatch.%I SELECT * FROM moved',"
+           " parent || '_default', since, until, part);\n"
+           "    EXECUTE format('ALTER TABLE qelwatch.%I ATTACH PARTITION qelwatch.%I"
+           " FOR VALUES FROM (%L) TO (%L)', parent, part, since, until);\n"
+           "  END LOOP;\n";
   }
   return sql + "  RETURN true;\nEND $$;\n";
 }
@@ -88,7 +87,8 @@ std::string reportBefore(std::string_view table, std::string_view columns) {
   return "LATERAL (SELECT " + std::string(columns) + " FROM " + withSchema(table) +
          " AS old\n    WHERE old.phone = report.phone AND old.time <= report.time\n"
          "      AND old.time > report.time - interval '1 day'\n"
-         "      AND (old.time, old.stream, old.number) < (report.time, report.stream, report.number)"
+         "      AND (old.time, old.stream, old.number) < (report.time, report.stream, "
+         "report.number)"
          "\n    ORDER BY old.time DESC, old.stream DESC, old.number DESC LIMIT 1) AS before\n";
 }
 
@@ -106,7 +106,8 @@ std::string cellChanges() {
          "  LEFT JOIN LATERAL (SELECT state FROM qelwatch.lte_rrc_state AS state\n"
          "    WHERE state.phone = report.phone AND state.time < report.time\n"
          "      AND state.time > report.time - interval '1 day'\n"
-         "    ORDER BY state.time DESC, state.stream DESC, state.number DESC LIMIT 1) AS rrc ON true"
+         "    ORDER BY state.time DESC, state.stream DESC, state.number DESC LIMIT 1) AS rrc ON "
+         "true"
          "\n  WHERE (report.cell_id, report.phy_cell_id, report.dl_freq)\n"
          "    IS DISTINCT FROM (before.cell_id, before.phy_cell_id, before.dl_freq);\n";
 }
@@ -114,9 +115,8 @@ std::string cellChanges() {
 std::string rejectsOf(std::string_view table, std::string_view domain, std::string_view condition) {
   return "SELECT report.phone, report.time, '" + std::string(domain) +
          "' AS domain, report.reject_cause AS cause\n  FROM " + withSchema(table) +
-         " AS report LEFT JOIN " + reportBefore(table, "reject_cause") +
-         "    ON true\n  WHERE " + std::string(condition) +
-         " AND report.reject_cause IS DISTINCT FROM before.reject_cause\n";
+         " AS report LEFT JOIN " + reportBefore(table, "reject_cause") + "    ON true\n  WHERE " +
+         std::string(condition) + " AND report.reject_cause IS DISTINCT FROM before.reject_cause\n";
 }
 
 }  // namespace
@@ -127,8 +127,9 @@ std::string views() {
   const std::string isRejected = "report.reject_cause <> 'KNAS_MM_REJ_CAUSE_NONE'";
   return std::string(kPhones) + std::string(kStreams) + cellChanges() +
          "CREATE OR REPLACE VIEW qelwatch.rejects AS\n" +
-         rejectsOf("emm_context", "EMM",
-                   "report.reject_cause <> 'EMM_CAUSE_NO_CAUSE' AND COALESCE(report.entry, 0) = 0") +
+         rejectsOf(
+             "emm_context", "EMM",
+             "report.reject_cause <> 'EMM_CAUSE_NO_CAUSE' AND COALESCE(report.entry, 0) = 0") +
          "UNION ALL\n" + rejectsOf("mm_context", "MM", isRejected) + "UNION ALL\n" +
          rejectsOf("gmm_context", "GMM", isRejected) + ";\n";
 }

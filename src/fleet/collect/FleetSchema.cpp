@@ -154,14 +154,15 @@ std::string rights() {
   const std::string schema(kSchema);
   const std::string collector(kCollectorRole);
   const std::string both = collector + ", " + std::string(kReaderRole);
-  const std::string views = "qelwatch.version, qelwatch.phones, qelwatch.streams,"
-                            " qelwatch.lte_cell_changes, qelwatch.rejects";
-  return "REVOKE ALL ON SCHEMA " + schema + " FROM PUBLIC;\n" +            //
+  const std::string views =
+      "qelwatch.version, qelwatch.phones, qelwatch.streams,"
+      " qelwatch.lte_cell_changes, qelwatch.rejects";
+  return "REVOKE ALL ON SCHEMA " + schema + " FROM PUBLIC;\n" +  //
          "REVOKE ALL ON ALL TABLES IN SCHEMA " + schema + " FROM PUBLIC, " + both + ";\n" +
          "REVOKE ALL ON ALL FUNCTIONS IN SCHEMA " + schema + " FROM PUBLIC, " + both + ";\n" +
-         "GRANT USAGE ON SCHEMA " + schema + " TO " + both + ";\n" +       //
-         "GRANT SELECT ON " + tables + ", " + views + " TO " + both + ";\n" +
-         "GRANT INSERT ON " + tables + " TO " + collector + ";\n" +
+         "GRANT USAGE ON SCHEMA " + schema + " TO " + both + ";\n" +  //
+         "GRANT SELECT ON " + tables + ", " + views + " TO " + both + ";\n" + "GRANT INSERT ON " +
+         tables + " TO " + collector + ";\n" +
          "GRANT EXECUTE ON FUNCTION qelwatch.make_day(date) TO " + collector + ";\n";
 }
 

@@ -21,9 +21,9 @@ enum class Partitions : std::uint8_t { days, hypertables };
 
 struct SchemaColumn {
   std::string name;
-  std::string type;          // as the database calls it
-  std::string more = {};     // of its definition
-  std::string unit = {};     // empty: none
+  std::string type;       // as the database calls it
+  std::string more = {};  // of its definition
+  std::string unit = {};  // empty: none
 };
 
 struct SchemaTable {

@@ -49,7 +49,8 @@ std::string hostName() {
 // What is a part of a topic, or of a client's name.
 bool isName(std::string_view name) {
   return !name.empty() && name.size() <= kLongestName &&
-         name.find_first_not_of("ABCDEFGHIJKLMNOPQRSTUVWXYZabcdefghijklmnopqrstuvwxyz0123456789._-") ==
+         name.find_first_not_of(
+             "ABCDEFGHIJKLMNOPQRSTUVWXYZabcdefghijklmnopqrstuvwxyz0123456789._-") ==
              std::string_view::npos;
 }
 
@@ -154,7 +155,8 @@ int run(int argc, char** argv) {
   CLI::App app("Store what phones send to a broker in a PostgreSQL database", "qelctl collect");
   app.footer(
       "A message is acknowledged when its event is committed; what comes again changes nothing.\n"
-      "As many may run as you like, each with a --name of its own. It runs until SIGINT or SIGTERM.");
+      "As many may run as you like, each with a --name of its own. It runs until SIGINT or "
+      "SIGTERM.");
   Options options;
   std::string database;
   addOptions(app, options);
