@@ -49,8 +49,8 @@ Tappable {
     Rectangle {
         id: tint
 
-        // So thin a colour fades in a few steps as smoothly as in many, and every step is drawn.
-        readonly property int steps: 4
+        // Every step is a frame, which costs as much as that of the values themselves.
+        readonly property int steps: 1
         property int stepsLeft: 0
 
         anchors.fill: parent
