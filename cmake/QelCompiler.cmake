@@ -13,6 +13,11 @@ endif()
 # The same objects in whatever folder, for the compiler cache and for packages that can be compared.
 add_compile_options(-ffile-prefix-map=${CMAKE_SOURCE_DIR}/=)
 
+# Every processor rounds a product before it is added to, as amd64 does: values look the same.
+if(NOT CMAKE_SYSTEM_PROCESSOR MATCHES "x86_64|AMD64")
+  add_compile_options(-ffp-contract=off)
+endif()
+
 set(QEL_SANITIZE "" CACHE STRING "Sanitizers to build with, as for -fsanitize=")
 if(QEL_SANITIZE)
   add_compile_options(-fsanitize=${QEL_SANITIZE} -fno-sanitize-recover=all -fno-omit-frame-pointer -g1)
