@@ -10,7 +10,10 @@ qel_install_documents(service basebandd)
 qel_install_documents(collect qelwatch-collect)
 
 set(CPACK_GENERATOR DEB)
-set(CPACK_COMPONENTS_ALL viewer service collect)
+set(CPACK_COMPONENTS_ALL viewer service)
+if(BUILD_COLLECTOR)
+  list(APPEND CPACK_COMPONENTS_ALL collect)
+endif()
 set(CPACK_SET_DESTDIR ON)  # some files go to /etc
 set(CPACK_INSTALL_PREFIX /usr)
 set(CPACK_STRIP_FILES ON)
