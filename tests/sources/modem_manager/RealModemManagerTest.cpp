@@ -97,7 +97,8 @@ TEST_F(RealModem, TellsItsSignalAndFollowsIt) {
 }
 
 TEST_F(RealModem, TellsItsCardAlsoWhenItIsOff) {
-  ASSERT_TRUE(becomesTrue([&] { return has(metric::kSimFiles); }));
+  ASSERT_TRUE(log->waitForCount(metric::kSimFiles, 1));
+  ASSERT_TRUE(log->waitForCount(metric::kMmCommonInfo, 1));
   const auto files = log->newest<KCellularSimCardFiles>(metric::kSimFiles);
   ASSERT_EQ(files->efLists().size(), 5U);
   EXPECT_EQ(files->efLists()[0]->content(),
