@@ -83,8 +83,7 @@ void BrokerLink::setCallbacks(mosquitto* client) {
       });
   mosquitto_publish_v5_callback_set(
       client, [](mosquitto*, void* link, int message, int reason, const mosquitto_property*) {
-        const bool isRefused = reason >= MQTT_RC_UNSPECIFIED;
-        static_cast<Link*>(link)->_arrival(message, isRefused ? reasonText(reason) : "");
+        static_cast<Link*>(link)->answered(message, reason);
       });
   mosquitto_subscribe_v5_callback_set(
       client, [](mosquitto*, void* link, int, int, const int* granted, const mosquitto_property*) {
@@ -256,25 +255,38 @@ BrokerLink::State BrokerLink::turn(bool isReadable) {
 
 std::optional<int> BrokerLink::send(const std::string& topic, std::string_view text,
                                     Retained retained, bool& isTooLarge) {
-  // A topic of events goes out once, and then as a number: as many as the broker remembers.
-  const bool isKnown = _aliases.contains(topic);
-  const bool isRemembered = isKnown || (retained == Retained::no && _aliases.size() < _mostAliases);
+  Alias* const alias = retained == Retained::no ? aliasOf(topic) : nullptr;
   mosquitto_property* properties = nullptr;
-  if (isRemembered) {
-    const auto next = static_cast<std::uint16_t>(_aliases.size() + 1);
-    const std::uint16_t alias = _aliases.emplace(topic, next).first->second;
-    mosquitto_property_add_int16(&properties, MQTT_PROP_TOPIC_ALIAS, alias);
-  }
+  if (alias) mosquitto_property_add_int16(&properties, MQTT_PROP_TOPIC_ALIAS, alias->number);
+  const bool isNamed = !alias || !alias->isTaken;
   int message = 0;
-  const int code = mosquitto_publish_v5(_client.get(), &message, isKnown ? nullptr : topic.c_str(),
+  const int code = mosquitto_publish_v5(_client.get(), &message, isNamed ? topic.c_str() : nullptr,
                                         static_cast<int>(text.size()), text.data(), kAtLeastOnce,
                                         retained == Retained::yes, properties);
   mosquitto_property_free_all(&properties);
-  if (code == MOSQ_ERR_SUCCESS) return message;
-  if (!isKnown) _aliases.erase(topic);
+  if (code == MOSQ_ERR_SUCCESS) {
+    if (alias && isNamed) _aliasesAsked.emplace(message, alias);
+    return message;
+  }
   isTooLarge = code == MOSQ_ERR_OVERSIZE_PACKET || code == MOSQ_ERR_PAYLOAD_SIZE;
   if (!isTooLarge) note(code);
   return std::nullopt;
+}
+
+// A number for the topic, as long as the broker remembers so many. A broker forgets the number of a
+// message that it refuses, and hangs up at the next one that has nothing but the number.
+BrokerLink::Alias* BrokerLink::aliasOf(const std::string& topic) {
+  const auto known = _aliases.find(topic);
+  if (known != _aliases.end()) return &known->second;
+  if (_aliases.size() >= _mostAliases) return nullptr;
+  const auto next = static_cast<std::uint16_t>(_aliases.size() + 1);
+  return &_aliases.emplace(topic, Alias{next}).first->second;
+}
+
+void BrokerLink::answered(int message, int reason) {
+  const bool isRefused = reason >= MQTT_RC_UNSPECIFIED;
+  if (const auto asked = _aliasesAsked.extract(message)) asked.mapped()->isTaken |= !isRefused;
+  _arrival(message, isRefused ? reasonText(reason) : "");
 }
 
 void BrokerLink::holdBack(bool held) const {

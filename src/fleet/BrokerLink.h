@@ -103,6 +103,13 @@ class BrokerLink {
   struct EndClient {
     void operator()(mosquitto* client) const;
   };
+  // A number that stands for a topic, once the broker has taken a message with both.
+  struct Alias {
+    std::uint16_t number = 0;
+    bool isTaken = false;
+  };
+  void answered(int message, int reason);
+  Alias* aliasOf(const std::string& topic);
 
   const Arrival _arrival;
   std::unique_ptr<mosquitto, EndClient> _client;
@@ -111,7 +118,8 @@ class BrokerLink {
   std::string _lastComplaint;  // of the library
   std::chrono::seconds _keepAlive;
   std::uint16_t _mostAliases = 0;
-  std::map<std::string, std::uint16_t> _aliases;  // of topics
+  std::map<std::string, Alias> _aliases;  // of topics
+  std::map<int, Alias*> _aliasesAsked;    // by the messages that told the broker of them
   const std::optional<Subscription> _subscription;
   bool _holdsAnswers = false;     // to messages that were delivered
   bool _isAcknowledging = false;  // some of these answers are not written yet

@@ -97,7 +97,7 @@ TEST_F(QelctlPublish, waitsForOthersOfABatch) {
 }
 
 // Most brokers take but a few messages at a time.
-TEST_F(QelctlPublish, sendsALongTopicOnce) {
+TEST_F(QelctlPublish, sendsALongTopicUntilTheBrokerKnowsIt) {
   const Folder own;
   const Broker narrow(own.path(), "max_inflight_messages 5\nmax_topic_alias 4\n");
   const Subscriber receiver(narrow, file("narrow"));
@@ -110,9 +110,10 @@ TEST_F(QelctlPublish, sendsALongTopicOnce) {
   const std::string topic = "qelwatch/one/KCellularLteRrcState";  // the first one
   EXPECT_GT(std::ranges::count(receiver.received(), topic, &Received::topic), 5);
   const std::string wire = tap.sent();
-  const auto first = wire.find(topic);
-  ASSERT_NE(first, std::string::npos);
-  EXPECT_EQ(wire.find(topic, first + 1), std::string::npos);
+  int sent = 0;
+  for (auto at = wire.find(topic); at != std::string::npos; at = wire.find(topic, at + 1)) ++sent;
+  EXPECT_GE(sent, 1);
+  EXPECT_LE(sent, 5) << "what is under way before the first answer";
 }
 
 TEST_F(QelctlPublish, namesAPhoneByChance) {
