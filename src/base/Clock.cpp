@@ -17,7 +17,7 @@ class SystemClock final : public Clock {
 }  // namespace
 
 const Clock& systemClock() {
-  static const SystemClock clock;
+  static const auto& clock = *new SystemClock;  // threads may still ask while the process ends
   return clock;
 }
 

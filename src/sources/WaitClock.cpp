@@ -30,7 +30,7 @@ class SteadyWaitClock final : public WaitClock {
 }  // namespace
 
 WaitClock& steadyWaitClock() {
-  static SteadyWaitClock clock;
+  static auto& clock = *new SteadyWaitClock;  // sources may still wait while the process ends
   return clock;
 }
 

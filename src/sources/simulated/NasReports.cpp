@@ -15,10 +15,11 @@ constexpr std::uint32_t kForbiddenArea = 0x2001;
 constexpr std::uint32_t kForbiddenMnc = 2;
 
 // Of the ranges kept for documentation (RFC 5737, RFC 3849).
-const Bytes kAddressV4 = {192, 0, 2, 17};
-const Bytes kDnsV4 = {192, 0, 2, 53};
-const Bytes kSecondDnsV4 = {192, 0, 2, 54};
+constexpr std::uint8_t kOwnHost = 17;
+constexpr std::uint8_t kDnsHost = 53;
+constexpr std::uint8_t kSecondDnsHost = 54;
 
+Bytes addressV4(std::uint8_t host) { return {192, 0, 2, host}; }
 Bytes addressV6(std::uint8_t subnet, std::uint8_t host) {
   return {0x20, 0x01, 0x0D, 0xB8, 0, subnet, 0, 0, 0, 0, 0, 0, 0, 0, 0, host};
 }
@@ -40,10 +41,11 @@ std::shared_ptr<BearerContext> internet(const PhoneView& view) {
   // clause 9.9.4.9).
   Bytes both = addressV6(1, 0x17);
   both.erase(both.begin(), both.begin() + 8);
-  both.insert(both.end(), kAddressV4.begin(), kAddressV4.end());
+  const Bytes address = addressV4(kOwnHost);
+  both.insert(both.end(), address.begin(), address.end());
   bearer->setPdpAddr(std::move(both));
   bearer->setPrimaryDnsType(kPdpIPv4);
-  bearer->setPrimaryDnsAddr(kDnsV4);
+  bearer->setPrimaryDnsAddr(addressV4(kDnsHost));
   bearer->setSecondaryDnsType(kPdpIPv6);
   bearer->setSecondaryDnsAddr(addressV6(0, 0x53));
   bearer->setIsAddrIratMobile(true);
@@ -74,9 +76,9 @@ std::shared_ptr<BearerContext> messaging() {
   bearer->setPdpType(kPdpIPv4);
   bearer->setPdpAddr(Bytes{192, 0, 2, 118});
   bearer->setPrimaryDnsType(kPdpIPv4);
-  bearer->setPrimaryDnsAddr(kDnsV4);
+  bearer->setPrimaryDnsAddr(addressV4(kDnsHost));
   bearer->setSecondaryDnsType(kPdpIPv4);
-  bearer->setSecondaryDnsAddr(kSecondDnsV4);
+  bearer->setSecondaryDnsAddr(addressV4(kSecondDnsHost));
   bearer->setIsAddrIratMobile(true);
   return bearer;
 }
