@@ -3,11 +3,10 @@
 #include <poll.h>
 
 #include <algorithm>
-#include <array>
-#include <limits>
 #include <utility>
 
 #include "base/Rendering.h"
+#include "fleet/LinkWait.h"
 
 namespace qel::fleet {
 namespace {
@@ -277,19 +276,8 @@ std::optional<Publisher::Clock::time_point> Publisher::nextTime(Clock::time_poin
 }
 
 void Publisher::wait(std::optional<Clock::time_point> until) {
-  int patience = -1;
-  if (until) {
-    const auto left = std::chrono::ceil<std::chrono::milliseconds>(*until - Clock::now()).count();
-    patience = static_cast<int>(std::clamp<std::int64_t>(left, 0, std::numeric_limits<int>::max()));
-  }
-  std::array<pollfd, 2> waited = {{{_wakeUp.descriptor(), POLLIN, 0}, {-1, POLLIN, 0}}};
-  if (_link) {
-    waited[1].fd = _link->descriptor();
-    if (_link->wantsToWrite()) waited[1].events |= POLLOUT;
-  }
-  ::poll(waited.data(), waited.size(), patience);
-  _wakeUp.clear();
-  if (_link) turn(waited[1].revents);
+  const short revents = waitForLink(_link.get(), _wakeUp, until);
+  if (_link) turn(revents);
 }
 
 // As much as goes within the patience of whoever waits for the end.

@@ -4,10 +4,10 @@
 #include <sys/ioctl.h>
 
 #include <algorithm>
-#include <array>
 #include <limits>
 #include <utility>
 
+#include "fleet/LinkWait.h"
 #include "fleet/collect/DatabaseAddress.h"
 
 namespace qel::fleet {
@@ -174,19 +174,8 @@ std::optional<Collector::Clock::time_point> Collector::nextTime() const {
 }
 
 void Collector::wait(std::optional<Clock::time_point> until, const WakeUp& wakeUp) {
-  int patience = -1;
-  if (until) {
-    const auto left = std::chrono::ceil<std::chrono::milliseconds>(*until - Clock::now()).count();
-    patience = static_cast<int>(std::clamp<std::int64_t>(left, 0, std::numeric_limits<int>::max()));
-  }
-  std::array<pollfd, 2> waited = {{{wakeUp.descriptor(), POLLIN, 0}, {-1, POLLIN, 0}}};
-  if (_link) {
-    waited[1].fd = _link->descriptor();
-    if (_link->wantsToWrite()) waited[1].events |= POLLOUT;
-  }
-  ::poll(waited.data(), waited.size(), patience);
-  wakeUp.clear();
-  if (_link) turn(waited[1].revents);
+  const short revents = waitForLink(_link.get(), wakeUp, until);
+  if (_link) turn(revents);
 }
 
 // What has come is stored, and the broker hears of it; it keeps the session.
