@@ -22,9 +22,6 @@ set(QEL_SANITIZE "" CACHE STRING "Sanitizers to build with, as for -fsanitize=")
 if(QEL_SANITIZE)
   add_compile_options(-fsanitize=${QEL_SANITIZE} -fno-sanitize-recover=all -fno-omit-frame-pointer -g1)
   add_link_options(-fsanitize=${QEL_SANITIZE})
-  if(CMAKE_CXX_COMPILER_ID STREQUAL "Clang")
-    add_compile_options("SHELL:-Xclang -fno-pch-timestamp")  # else the compiler cache never hits
-  endif()
   add_compile_definitions(_GLIBCXX_ASSERTIONS)
   find_program(QEL_LLD ld.lld)  # the usual linker takes long over sanitized objects
   if(QEL_LLD)
@@ -75,12 +72,6 @@ target_compile_options(qel_warnings INTERFACE
   -Wnon-virtual-dtor -Woverloaded-virtual -Wformat=2 -Werror
   $<$<CXX_COMPILER_ID:GNU>:-Wno-restrict>)  # GCC 12 sees overlaps in std::string that are not there
 
-# Precompiled in the sanitized builds, to save time. Other builds go without, so that a forgotten
-# #include is an error.
-set(QEL_STANDARD_HEADERS
-  <algorithm> <array> <chrono> <cstdint> <deque> <functional> <map> <memory> <mutex> <optional>
-  <string> <string_view> <thread> <unordered_map> <variant> <vector>)
-
 # qel_add_library(NAME SOURCES … DEPENDS …): a static library of the viewer, included from src/.
 function(qel_add_library name)
   cmake_parse_arguments(ARG "" "" "SOURCES;DEPENDS" ${ARGN})
@@ -89,9 +80,4 @@ function(qel_add_library name)
   target_link_libraries(${name} PUBLIC ${ARG_DEPENDS} PRIVATE qel_warnings)
   qel_count_branches(${name})
   qel_compile_in_batches(${name})
-  if(QEL_SANITIZE AND TARGET qel_base AND NOT name STREQUAL qel_base)
-    target_precompile_headers(${name} REUSE_FROM qel_base)
-  elseif(QEL_SANITIZE)
-    target_precompile_headers(${name} PRIVATE ${QEL_STANDARD_HEADERS})
-  endif()
 endfunction()
