@@ -10,6 +10,7 @@
 #include "base/Clock.h"
 #include "base/DispatchQueue.h"
 #include "base/TerminalText.h"
+#include "base/TimeAsleep.h"
 #include "capture/RecordConnection.h"
 #include "capture/Recorder.h"
 #include "fleet/Families.h"
@@ -36,11 +37,11 @@ struct ExporterOptions {
   std::uint64_t staleMs = 60'000;
 };
 
-// Ages stay right when somebody sets the time of day.
-std::uint64_t steadyMs() {
+// Since the machine was started: ages stay right over a sleep, and when somebody sets its clock.
+std::uint64_t sinceStartMs() {
   using namespace std::chrono;
-  return static_cast<std::uint64_t>(
-      duration_cast<milliseconds>(steady_clock::now().time_since_epoch()).count());
+  const auto awake = duration_cast<milliseconds>(steady_clock::now().time_since_epoch());
+  return static_cast<std::uint64_t>((awake + timeAsleep()).count());
 }
 
 struct Exported {
@@ -52,7 +53,7 @@ struct Exported {
 
 tesk::EventSink sinkInto(const std::shared_ptr<Exported>& exported) {
   return [exported](std::string_view eventName, const tesk::Message& event) {
-    auto recorded = capture::recordedEvent(eventName, event, steadyMs());
+    auto recorded = capture::recordedEvent(eventName, event, sinceStartMs());
     if (!recorded) return;
     if (exported->waitingEvents >= kMostWaitingEvents) {
       exported->board.countDropped();
@@ -78,7 +79,7 @@ void run(const ExporterOptions& options) {
   const auto server = fleet::MetricsServer::open(
       options.address,
       [exported, counts] {
-        auto families = exported->board.families(steadyMs());
+        auto families = exported->board.families(sinceStartMs());
         counts->addTo(families);
         return families;
       },
