@@ -10,6 +10,7 @@
 #include <array>
 #include <csignal>
 #include <thread>
+#include <vector>
 
 #include "base/DescriptorSink.h"
 #include "base/FatalError.h"

@@ -1,6 +1,8 @@
 // Packet connections of LTE, from its session management's messages.
 #include <gtest/gtest.h>
 
+#include <memory>
+
 #include "messages/nas.h"
 #include "sources/Metrics.h"
 #include "support/diagnostics/AirModem.h"

@@ -1,6 +1,7 @@
 // Every question that the dashboards ask of Prometheus, asked of Prometheus.
 #include <gtest/gtest.h>
 
+#include <array>
 #include <cstdio>
 #include <set>
 

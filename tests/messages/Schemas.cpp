@@ -5,6 +5,7 @@
 #include <google/protobuf/unknown_field_set.h>
 
 #include <fstream>
+#include <string>
 
 #include "base/FatalError.h"
 

@@ -9,6 +9,7 @@
 #include <QtDBus/QDBusMessage>
 #include <QtDBus/QDBusMetaType>
 #include <QtTest/QTest>
+#include <vector>
 
 #include "ui/quick/Appearance.h"
 

@@ -2,6 +2,9 @@
 
 #include <sdbus-c++/sdbus-c++.h>
 
+#include <algorithm>
+#include <utility>
+
 #include "harness/Proxy.h"
 
 namespace qel::trials {

@@ -1,5 +1,6 @@
 #include "harness/Stand.h"
 
+#include <algorithm>
 #include <csignal>
 #include <filesystem>
 #include <system_error>

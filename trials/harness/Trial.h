@@ -1,6 +1,7 @@
 // What every scenario works with: its options, its dice and its figures.
 #pragma once
 
+#include <algorithm>
 #include <chrono>
 #include <cstdint>
 #include <optional>

@@ -1,5 +1,7 @@
 #include "tools/watch/Rows.h"
 
+#include <algorithm>
+
 namespace qel::watch {
 namespace {
 

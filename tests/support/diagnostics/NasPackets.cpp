@@ -1,5 +1,7 @@
 #include "support/diagnostics/NasPackets.h"
 
+#include <algorithm>
+
 #include "support/diagnostics/Packets.h"
 
 namespace qel::diagnostics::test {

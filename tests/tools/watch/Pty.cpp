@@ -10,6 +10,7 @@
 #include <csignal>
 #include <cstdlib>
 #include <stdexcept>
+#include <utility>
 
 #include "tools/RunningQelctl.h"
 
