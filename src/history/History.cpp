@@ -93,7 +93,7 @@ struct History::State {
         journal(limits.journal) {
     for (Series& one : series) one = Series(limits.series);
     for (const DispatchRow& row : dispatchTable()) journal.know(row);
-    journal.know(lteServingMeasurementRow());
+    measurements = journal.know(lteServingMeasurementRow());
   }
 
   // The time that counts: one that goes back is the last one.
@@ -101,17 +101,18 @@ struct History::State {
     ++version;
     return latestMs = std::max(latestMs, receivedMs);
   }
-  // Before the report that ends it.
-  void addGap(std::uint64_t silenceMs, const Report& report);
-  void follow(const Report& report, Handling handling);
-  // Apart from what is done for every report, of which there are many.
-  [[gnu::noinline]] void follow(const StoredMetric& metric, std::uint64_t atMs, Handling handling) {
-    follow({metric.row.identifier, metric.record, metric.receivedMs, atMs}, handling);
-  }
-  auto plotter(std::uint64_t atMs) {
-    return [this, atMs](Quantity quantity, float value) {
-      series.data()[static_cast<std::size_t>(quantity)].add(atMs, value);
+  auto plotter() {
+    return [this](Quantity quantity, float value) {
+      series.data()[static_cast<std::size_t>(quantity)].add(latestMs, value);
     };
+  }
+  // These are apart from what is done for every report, of which there are many.
+  // Before the report that ends it.
+  [[gnu::noinline]] void addGap(std::uint64_t silenceMs, std::int64_t metric,
+                                std::uint64_t receivedMs);
+  [[gnu::noinline]] void follow(const StoredMetric& metric, Handling handling);
+  [[gnu::noinline]] void plot(const StoredMetric& metric, std::size_t place) {
+    serving.read(place, metric.record, plotter());
   }
 
   struct Measured {
@@ -126,6 +127,7 @@ struct History::State {
   std::optional<Measured> neighbours;  // of the times asked for last
   const DispatchRow* const rows = dispatchTable().data();
   const Ways ways = waysOf(dispatchTable());
+  std::size_t measurements = 0;  // the number of kLteServingMeasurement
   std::uint64_t version = 0;
   std::uint64_t latestMs = 0;
   HappeningLog happenings;
@@ -138,13 +140,16 @@ struct History::State {
   std::array<Series, kQuantities.size()> series;
 };
 
-void History::State::addGap(std::uint64_t silenceMs, const Report& report) {
-  happenings.tellText(report, HappeningKind::gap, std::nullopt,
+void History::State::addGap(std::uint64_t silenceMs, std::int64_t metric,
+                            std::uint64_t receivedMs) {
+  static const Dictionary kNothing;
+  happenings.tellText({metric, kNothing, receivedMs, latestMs}, HappeningKind::gap, std::nullopt,
                       "Nothing was reported for " + durationText(silenceMs));
   for (Series& one : series) one.interrupt();
 }
 
-void History::State::follow(const Report& report, Handling handling) {
+void History::State::follow(const StoredMetric& metric, Handling handling) {
+  const Report report{metric.row.identifier, metric.record, metric.receivedMs, latestMs};
   switch (handling) {
     case Handling::none:
       break;
@@ -179,13 +184,11 @@ void History::metricWasStored(const StoredMetric& metric) {
   const auto number = static_cast<std::size_t>(&metric.row - state.rows);
   const std::uint64_t silenceMs = state.times.note(number, atMs);
   if (silenceMs != 0) [[unlikely]]
-    state.addGap(silenceMs, {metric.row.identifier, metric.record, metric.receivedMs, atMs});
+    state.addGap(silenceMs, metric.row.identifier, metric.receivedMs);
   state.journal.add(number, atMs, metric.payload);
   const Way way = state.ways.data()[number];
-  if (way.serving != Way::kNone) {
-    state.serving.read(way.serving, metric.record, state.plotter(atMs));
-  }
-  if (way.handling != Handling::none) state.follow(metric, atMs, way.handling);
+  if (way.serving != Way::kNone) state.plot(metric, way.serving);
+  if (way.handling != Handling::none) state.follow(metric, way.handling);
 }
 
 void History::metricWasPassedOver(const PassedMetric& metric) {
@@ -193,19 +196,18 @@ void History::metricWasPassedOver(const PassedMetric& metric) {
   const std::uint64_t atMs = state.arrive(metric.receivedMs);
   std::optional<ServingReader::Measurement> measurement;
   if (metric.identifier == kLteServingMeasurement) {
-    measurement = state.serving.readMeasurement(metric.payload);
+    measurement = ServingReader::readMeasurement(metric.payload);
   }
-  const std::size_t number = dispatchTable().size();
-  static const Dictionary kNothing;
-  const Report report = {metric.identifier, kNothing, metric.receivedMs, atMs};
   const std::uint64_t silenceMs =
-      measurement ? state.times.note(number, atMs) : state.times.noteOther(atMs);
-  if (silenceMs != 0) state.addGap(silenceMs, report);
-  if (metric.identifier == kLteLinkFailure) {
-    state.radio.followLinkFailure(report, state.happenings);
-  } else if (measurement) {
-    state.journal.add(number, atMs, metric.payload);
-    state.serving.tell(*measurement, state.plotter(atMs));
+      measurement ? state.times.note(state.measurements, atMs) : state.times.noteOther(atMs);
+  if (silenceMs != 0) state.addGap(silenceMs, metric.identifier, metric.receivedMs);
+  if (measurement) {
+    state.journal.add(state.measurements, atMs, metric.payload);
+    ServingReader::tell(*measurement, state.plotter());
+  } else if (metric.identifier == kLteLinkFailure) {
+    static const Dictionary kNothing;
+    state.radio.followLinkFailure({metric.identifier, kNothing, metric.receivedMs, atMs},
+                                  state.happenings);
   }
 }
 

@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <cstring>
+#include <iterator>
 
 #include "base/FatalError.h"
 
@@ -24,11 +25,13 @@ void Journal::addElsewhere(std::size_t number, ByteView payload) {
   const bool isLong = payload.size() >= kLongSize;
   const std::size_t size = kHeadBytes + (isLong ? kLongBytes : 0) + payload.size();
   if (!_newest || !_newest->hasRoom(_lastMs, size)) beginChunk(_lastMs, size);
-  if (!isLong) return put(number, payload);
-  const auto length = static_cast<std::uint32_t>(payload.size());
-  putHead(number, kLongSize);
-  putBytes({reinterpret_cast<const std::uint8_t*>(&length), sizeof length});
-  putBytes(payload);
+  std::uint8_t* at = begin(number, isLong ? kLongSize : payload.size(), size - kHeadBytes);
+  if (isLong) {
+    const auto length = static_cast<std::uint32_t>(payload.size());
+    std::memcpy(at, &length, kLongBytes);
+    at += kLongBytes;
+  }
+  copy(payload, at);
 }
 
 std::size_t Journal::know(const DispatchRow& row) {
@@ -69,17 +72,20 @@ void Journal::beginChunk(std::uint64_t receivedMs, std::size_t size) {
     dropOldest();
   }
   _bytes += capacity;
-  _chunks.push_back({_nextNumber++, receivedMs, receivedMs, 0, 0, capacity,
+  _chunks.push_back({receivedMs, receivedMs, 0, 0, capacity,
                      std::make_unique_for_overwrite<std::uint8_t[]>(capacity)});
   _newest = &_chunks.back();
 }
 
 void Journal::dropOldest() {
   const Chunk& chunk = _chunks.front();
-  const bool hasNewest = std::ranges::find(_newestIn, chunk.number) != _newestIn.end();
-  for (std::size_t position = 0; hasNewest && position < chunk.size;) {
+  std::uint32_t newestOf = chunk.rows;
+  for (auto later = std::next(_chunks.begin()); later != _chunks.end(); ++later) {
+    newestOf &= ~later->rows;
+  }
+  for (std::size_t position = 0; newestOf != 0 && position < chunk.size;) {
     const Place place = read(chunk, position);
-    if (_newestIn[place.row] != chunk.number) continue;
+    if ((newestOf >> place.row & 1U) == 0) continue;
     const auto* payload = chunk.content.get() + place.begin;
     _kept[place.row] = Kept{place.receivedMs, {payload, payload + place.size}};
   }

@@ -48,7 +48,7 @@ class Journal {
         [[unlikely]] {
       return addElsewhere(number, payload);
     }
-    put(number, payload);
+    copy(payload, begin(number, payload.size(), payload.size()));
   }
   void add(const DispatchRow& row, std::uint64_t receivedMs, ByteView payload) {
     add(know(row), receivedMs, payload);
@@ -84,7 +84,6 @@ class Journal {
 
   // A run of entries: each a head of four bytes (and four more for a long payload) and its payload.
   struct Chunk {
-    std::uint64_t number = 0;
     std::uint64_t fromMs = 0;
     std::uint64_t toMs = 0;
     std::uint32_t rows = 0;  // a bit for each that occurs
@@ -111,25 +110,21 @@ class Journal {
   std::optional<std::size_t> find(std::int64_t metric) const;
   // Of the time that was set last.
   void addElsewhere(std::size_t number, ByteView payload);
-  void put(std::size_t number, ByteView payload) {
-    putHead(number, payload.size());
-    putBytes(payload);
-  }
-  [[gnu::always_inline]] void putHead(std::size_t number, std::size_t size) {
+  // The head of an entry, for which there is room; the place of the bytes that follow it.
+  [[gnu::always_inline]] std::uint8_t* begin(std::size_t number, std::size_t size,
+                                             std::size_t bytes) {
+    Chunk& chunk = *_newest;
     const std::uint64_t what = number << kSizeBits | size;
-    const std::uint64_t when = _lastMs - _newest->fromMs;
-    const auto head = static_cast<std::uint32_t>(what << kTimeBits | when);
-    std::memcpy(_newest->content.get() + _newest->size, &head, sizeof head);
-    _newest->size += sizeof head;
-    _newest->toMs = _lastMs;
-    _newest->rows |= 1U << number;
-    _newestIn.data()[number] = _newest->number;
+    const auto head = static_cast<std::uint32_t>(what << kTimeBits | (_lastMs - chunk.fromMs));
+    std::uint8_t* const at = chunk.content.get() + chunk.size;
+    std::memcpy(at, &head, kHeadBytes);
+    chunk.size += kHeadBytes + bytes;
+    chunk.toMs = _lastMs;
+    chunk.rows |= 1U << number;
+    return at + kHeadBytes;
   }
-  void putBytes(ByteView bytes) {
-    if (!bytes.empty()) {
-      std::memcpy(_newest->content.get() + _newest->size, bytes.data(), bytes.size());
-    }
-    _newest->size += bytes.size();
+  static void copy(ByteView bytes, std::uint8_t* to) {
+    if (!bytes.empty()) std::memcpy(to, bytes.data(), bytes.size());
   }
 
   void beginChunk(std::uint64_t receivedMs, std::size_t size);
@@ -147,11 +142,9 @@ class Journal {
 
   Limits _limits;
   std::array<const DispatchRow*, kMostRows> _rows{};
-  std::array<std::uint64_t, kMostRows> _newestIn{};  // number of the chunk
   std::array<std::optional<Kept>, kMostRows> _kept;
   std::deque<Chunk> _chunks;
   Chunk* _newest = nullptr;  // the last of them
-  std::uint64_t _nextNumber = 1;
   std::uint64_t _lastMs = 0;
   std::size_t _bytes = 0;
 };

@@ -16,14 +16,9 @@ void Series::Row::beginChunk() {
   _end = _next + chunk.size();
 }
 
-void Series::Row::dropFirstChunk() {
-  _chunks.pop_front();
-  _size -= kChunk;
-}
-
 std::size_t Series::Row::until(std::uint64_t timeMs) const {
   std::size_t first = 0;
-  for (std::size_t count = _size; count > 0;) {
+  for (std::size_t count = size(); count > 0;) {
     const std::size_t half = count / 2;
     if ((*this)[first + half].timeMs() <= timeMs) {
       first += half + 1;
@@ -35,11 +30,13 @@ std::size_t Series::Row::until(std::uint64_t timeMs) const {
   return first;
 }
 
-void Series::turn(std::uint64_t timeMs) {
+void Series::addAnew(std::uint64_t timeMs, float value) {
   timeMs = std::max(timeMs, _lastMs);
   const std::uint64_t distance = timeMs - _lastMs;
-  if (distance > kShortestSilenceMs && isSilence(distance)) _isInterrupted = true;
-  if (_isInterrupted || timeMs >= _mean.endMs) beginMean(timeMs);
+  if (distance > kShortestSilenceMs && isSilence(distance)) interrupt();
+  if (timeMs >= _mean.endMs) beginMean(timeMs);
+  _lastMs = timeMs;
+  push({timeMs, value, std::exchange(_isInterrupted, false)});
 }
 
 // By the middle one of the last eight distances. Before three are known nothing is usual, and five

@@ -38,14 +38,16 @@ class Series {
 
   void add(std::uint64_t timeMs, float value) {
     const bool isUsual = timeMs - _lastMs <= kShortestSilenceMs && timeMs < _mean.endMs;
-    if (!isUsual || _isInterrupted) turn(timeMs);
-    _lastMs = std::max(_lastMs, timeMs);
-    if (_recent.push({_lastMs, value, std::exchange(_isInterrupted, false)})) dropOld();
-    _mean.sum += value;
-    ++_mean.count;
+    if (!isUsual) [[unlikely]]
+      return addAnew(timeMs, value);
+    _lastMs = timeMs;
+    push({timeMs, value, false});
   }
-  // Nothing is known from here on: the next point begins a run.
-  void interrupt() { _isInterrupted = true; }
+  // Nothing is known from here on: the next point begins a run, and a mean of its own.
+  void interrupt() {
+    _isInterrupted = true;
+    _mean.endMs = 0;
+  }
 
   // The runs within both times, oldest first. A silence of more than three usual distances (and of
   // five seconds) begins a run too.
@@ -71,19 +73,19 @@ class Series {
     static constexpr std::size_t kChunk = 64;
     using Chunk = std::array<Kept, kChunk>;
 
-    std::size_t size() const { return _size; }
+    std::size_t size() const {
+      return _chunks.size() * kChunk - static_cast<std::size_t>(_end - _next);
+    }
     const Kept& operator[](std::size_t i) const { return _chunks[i / kChunk][i % kChunk]; }
-    const Kept& back() const { return (*this)[_size - 1]; }
     const Chunk& firstChunk() const { return _chunks.front(); }
     // Answers whether a chunk was begun.
     bool push(const Kept& point) {
       const bool isFull = _next == _end;
       if (isFull) beginChunk();
       *_next++ = point;
-      ++_size;
       return isFull;
     }
-    void dropFirstChunk();
+    void dropFirstChunk() { _chunks.pop_front(); }
     // How many are not after this time.
     std::size_t until(std::uint64_t timeMs) const;
 
@@ -91,14 +93,13 @@ class Series {
     void beginChunk();
 
     std::deque<Chunk> _chunks;
-    std::size_t _size = 0;
     Kept* _next = nullptr;  // within the last chunk
     Kept* _end = nullptr;
   };
   // The mean of a half minute that is not over.
   struct Mean {
     std::uint64_t fromMs = 0;
-    std::uint64_t endMs = 0;  // of the half minute
+    std::uint64_t endMs = 0;  // of the half minute; 0: of an interrupted one
     double sum = 0;
     std::uint32_t count = 0;
     bool begins = false;
@@ -109,8 +110,14 @@ class Series {
 
   static constexpr std::uint64_t kShortestSilenceMs = 5000;
 
-  // For a point that is not one of many.
-  void turn(std::uint64_t timeMs);
+  // A point that is not one of many.
+  void addAnew(std::uint64_t timeMs, float value);
+  void push(const Kept& point) {
+    if (_recent.push(point)) [[unlikely]]
+      dropOld();
+    _mean.sum += point.value;
+    ++_mean.count;
+  }
   bool isSilence(std::uint64_t distanceMs) const;
   void dropOld();
   bool isCutOffFromMeans() const;

@@ -2,7 +2,6 @@
 
 #include <algorithm>
 #include <array>
-#include <cmath>
 #include <span>
 
 #include "history/PassedMetrics.h"
@@ -16,9 +15,7 @@ namespace {
 struct KeyedValue {
   Name one;
   Name other;
-  Quantity quantity;
-  float factor = 1;
-  float offset = 0;
+  ServingScale scale;
 };
 
 // Where in a record they stand: under a key (a dictionary, or a list of them), or at its top.
@@ -30,21 +27,23 @@ struct MetricPlace {
 
 // Indexes: 36.133, 9.1.4 and 9.1.7; 25.133, 9.1.1.3 and 9.1.2.3; 45.008, 8.1.4.
 constexpr std::array kSamples = {
-    KeyedValue{"rsrp0", "rsrp1", Quantity::lteRsrp},
-    KeyedValue{"rsrq0", "rsrq1", Quantity::lteRsrq},
-    KeyedValue{"sinr0", "sinr1", Quantity::lteSinr, 0.5F},
+    KeyedValue{"rsrp0", "rsrp1", ServingScale(Quantity::lteRsrp)},
+    KeyedValue{"rsrq0", "rsrq1", ServingScale(Quantity::lteRsrq)},
+    KeyedValue{"sinr0", "sinr1", ServingScale(Quantity::lteSinr, 0.5F)},
 };
 constexpr std::array kLteReceiver = {
-    KeyedValue{"rsrp_range", "", Quantity::lteRsrp, 1, -140},
-    KeyedValue{"rsrq_range", "", Quantity::lteRsrq, 0.5F, -19.5F},
-    KeyedValue{"snr", "", Quantity::lteSinr},
+    KeyedValue{"rsrp_range", "", ServingReader::kRsrpIndex},
+    KeyedValue{"rsrq_range", "", ServingReader::kRsrqIndex},
+    KeyedValue{"snr", "", ServingReader::kSnr},
 };
 constexpr std::array kUmtsReceiver = {
-    KeyedValue{"rsrp_range", "", Quantity::umtsRscp, 1, -116},
-    KeyedValue{"rsrq_range", "", Quantity::umtsEcno, 0.5F, -24.5F},
+    KeyedValue{"rsrp_range", "", ServingScale(Quantity::umtsRscp, 1, -116)},
+    KeyedValue{"rsrq_range", "", ServingScale(Quantity::umtsEcno, 0.5F, -24.5F)},
 };
-constexpr std::array kGsmIdle = {KeyedValue{"idle_rxlev_dBm", "", Quantity::gsmRxlev}};
-constexpr std::array kGsmCall = {KeyedValue{"cs_rxlev_sub", "", Quantity::gsmRxlev, 1, -110}};
+constexpr std::array kGsmIdle = {
+    KeyedValue{"idle_rxlev_dBm", "", ServingScale(Quantity::gsmRxlev)}};
+constexpr std::array kGsmCall = {
+    KeyedValue{"cs_rxlev_sub", "", ServingScale(Quantity::gsmRxlev, 1, -110)}};
 
 constexpr std::array kPlaces = {
     MetricPlace{MetricValidator::K_LTE_RSRP_RSRQ_SINR, "avg_values", kSamples},
@@ -54,19 +53,11 @@ constexpr std::array kPlaces = {
     MetricPlace{MetricValidator::K_GSM_CS_RF_MEAS, "", kGsmCall},
 };
 
-// Beyond what any phone may report (36.133, 9.1.4, 9.1.7 and 9.1.17; 25.133, 9.1; 45.008, 8.1.4).
-struct Ends {
-  float lowest;
-  float highest;
-};
-constexpr std::array<Ends, kQuantities.size()> kPossible = {
-    Ends{-157, -30}, Ends{-44, 3}, Ends{-30, 50}, Ends{-122, -24}, Ends{-25, 1}, Ends{-121, -20}};
-
 }  // namespace
 
 bool isPossible(Quantity quantity, float value) {
-  const Ends& ends = kPossible[static_cast<std::size_t>(quantity)];
-  return value >= ends.lowest && value <= ends.highest;
+  const PossibleValues possible = possibleValues(quantity);
+  return value >= possible.lowest && value <= possible.highest;
 }
 
 std::optional<std::size_t> ServingReader::placeOf(std::int64_t metric) {
@@ -79,30 +70,21 @@ ServingReader::ServingReader() {
   for (const MetricPlace& row : kPlaces) {
     Place& place = _places.emplace_back(Place{KnownPlace(row.key), row.key.empty(), {}});
     for (const KeyedValue& value : row.fields) {
-      const Ends& ends = kPossible[static_cast<std::size_t>(value.quantity)];
-      Scale& scale = place.fields.emplace_back(value.one, value.other).scale;
-      scale.quantity = value.quantity;
-      scale.factor = value.factor;
-      scale.offset = value.offset;
-      scale.lowest = std::llround(std::ceil((ends.lowest - value.offset) / value.factor));
-      const auto highest = std::llround(std::floor((ends.highest - value.offset) / value.factor));
-      scale.span = static_cast<std::uint64_t>(highest - scale.lowest);
+      place.fields.emplace_back(value.one, value.other, value.scale);
     }
   }
-  std::ranges::transform(_places[*placeOf(kLteServingMeasurement)].fields, _measured.begin(),
-                         &Field::scale);
 }
 
-std::optional<ServingReader::Measurement> ServingReader::readMeasurement(ByteView payload) const {
-  Measurement best = {kNone, kNone, kNone};
-  const auto note = [&](std::size_t place, std::int64_t number) {
-    best.data()[place] = std::max(best.data()[place], within(_measured.data()[place], number));
-  };
-  // In the order of kLteReceiver.
-  const auto take = [&](const RxInfo& receiver) {
-    if (receiver.hasRsrpRange()) note(0, receiver.rsrpRange());
-    if (receiver.hasRsrqRange()) note(1, receiver.rsrqRange());
-    if (receiver.hasSnr()) note(2, receiver.snr());
+std::optional<ServingReader::Measurement> ServingReader::readMeasurement(ByteView payload) {
+  Measurement best;
+  const auto take = [&best](const RxInfo& receiver) {
+    if (receiver.hasRsrpRange()) {
+      best.rsrp = std::max(best.rsrp, within(kRsrpIndex, receiver.rsrpRange()));
+    }
+    if (receiver.hasRsrqRange()) {
+      best.rsrq = std::max(best.rsrq, within(kRsrqIndex, receiver.rsrqRange()));
+    }
+    if (receiver.hasSnr()) best.sinr = std::max(best.sinr, within(kSnr, receiver.snr()));
   };
   if (!readList<KCellularLteServingCellMeasurement, RxInfo>(payload, take)) return std::nullopt;
   return best;

@@ -11,6 +11,7 @@
 #include "base/Value.h"
 #include "history/KnownPlace.h"
 #include "history/Quantity.h"
+#include "history/ServingScale.h"
 
 namespace qel {
 
@@ -18,6 +19,8 @@ namespace qel {
 // stand.
 class ServingReader {
  public:
+  static constexpr std::int64_t kNone = INT64_MIN;
+
   ServingReader();
 
   // Whether reports of the metric carry any; then a number for read().
@@ -29,37 +32,38 @@ class ServingReader {
 
   // The same of a payload of kLteServingMeasurement, in two steps. Nothing when it cannot be
   // decoded.
-  using Measurement = std::array<std::int64_t, 3>;  // the best of each field
-  std::optional<Measurement> readMeasurement(ByteView payload) const;
+  struct Measurement {
+    std::int64_t rsrp = kNone;
+    std::int64_t rsrq = kNone;
+    std::int64_t sinr = kNone;
+  };
+  static std::optional<Measurement> readMeasurement(ByteView payload);
   template <class Take>
-  void tell(const Measurement& measurement, Take take) const {
-    for (std::size_t i = 0; i < measurement.size(); ++i) {
-      tell(_measured.data()[i], measurement.data()[i], take);
-    }
+  static void tell(const Measurement& measurement, Take take) {
+    tell(kRsrpIndex, measurement.rsrp, take);
+    tell(kRsrqIndex, measurement.rsrq, take);
+    tell(kSnr, measurement.sinr, take);
   }
 
+  // As receivers report them: 36.133, 9.1.4 and 9.1.7.
+  static constexpr ServingScale kRsrpIndex{Quantity::lteRsrp, 1, -140};
+  static constexpr ServingScale kRsrqIndex{Quantity::lteRsrq, 0.5F, -19.5F};
+  static constexpr ServingScale kSnr{Quantity::lteSinr};
+
  private:
-  struct Scale {
-    Quantity quantity = Quantity::lteRsrp;
-    float factor = 1;
-    float offset = 0;
-    std::int64_t lowest = 0;  // as reported, and how much more it may be
-    std::uint64_t span = 0;
-  };
   struct Field {
-    Field(Name first, Name second) : one(first), other(second), hasOther(!second.empty()) {}
+    Field(Name first, Name second, const ServingScale& its)
+        : one(first), other(second), hasOther(!second.empty()), scale(its) {}
     KnownPlace one;
     KnownPlace other;  // the same of the second receiver
     bool hasOther;
-    Scale scale;
+    ServingScale scale;
   };
   struct Place {
     KnownPlace held;
     bool isTop = false;
     std::vector<Field> fields;
   };
-  static constexpr std::int64_t kNone = INT64_MIN;
-
   // What a dictionary holds, looked up once.
   struct Sample {
     explicit Sample(const Dictionary& of) : record(of), entries(of.begin()), size(of.size()) {}
@@ -76,10 +80,8 @@ class ServingReader {
       return otherIn(field, *value);
     return within(field.scale, *value->asInt64());
   }
-  static std::int64_t within(const Scale& scale, std::int64_t number) {
-    const auto above =
-        static_cast<std::uint64_t>(number) - static_cast<std::uint64_t>(scale.lowest);
-    return above <= scale.span ? number : kNone;
+  static std::int64_t within(const ServingScale& scale, std::int64_t number) {
+    return scale.has(number) ? number : kNone;
   }
   [[gnu::noinline]] static std::int64_t otherIn(const Field& field, const Value& value);
   static std::int64_t bestIn(Field& field, const Sample& sample) {
@@ -89,13 +91,12 @@ class ServingReader {
   static std::int64_t bestIn(Field& field, const List& receivers);
 
   template <class Take>
-  static void tell(const Scale& scale, std::int64_t best, Take& take) {
+  static void tell(const ServingScale& scale, std::int64_t best, Take& take) {
     if (best == kNone) return;
-    take(scale.quantity, static_cast<float>(best) * scale.factor + scale.offset);
+    take(scale.quantity(), scale.valueOf(best));
   }
 
   std::vector<Place> _places;
-  std::array<Scale, 3> _measured;  // of the fields of kLteServingMeasurement
 };
 
 template <class Take>
