@@ -1,6 +1,7 @@
-// fleet-phones URL RECORDING PHONES RATE SECONDS: so many phones in one process, each with a
-// connection of its own, send events of the recording at RATE a second each. Prints each second how
-// many were sent and how many of them the broker has.
+// fleet-phones URL RECORDING FIRST PHONES RATE SECONDS: so many phones in one process, the first of
+// that number, each with a connection of its own, send events of the recording at RATE a second
+// each. Says "connected" when all are, and begins at the end of its standard input; then prints
+// each second how many were sent, how many of them the broker has, and its processor time in ms.
 
 #include <poll.h>
 
@@ -9,7 +10,9 @@
 #include <cstdint>
 #include <cstdio>
 #include <cstdlib>
+#include <ctime>
 #include <memory>
+#include <span>
 #include <string>
 #include <utility>
 #include <vector>
@@ -54,31 +57,19 @@ class Phones {
   Phones(fleet::LinkSettings settings, std::vector<Template> templates)
       : _settings(std::move(settings)), _templates(std::move(templates)) {}
 
-  bool connect(std::size_t count) {
-    for (std::size_t i = 0; i < count; ++i) {
-      Phone phone;
-      phone.name = "load-" + std::to_string(i + 1);
-      phone.next = i * 131 % _templates.size();
-      _settings.client = "qelwatch-" + phone.name;
-      fleet::LinkFailure failure;
-      phone.link = BrokerLink::open(
-          _settings, [this](int, const std::string& refusal) { _acknowledged += refusal.empty(); },
-          failure);
-      if (!phone.link) {
-        std::fprintf(stderr, "fleet-phones: %s\n", failure.why.c_str());
+  // Some at a time: a broker lets few wait to be let in.
+  bool connect(std::size_t first, std::size_t count) {
+    while (_phones.size() < count) {
+      const std::size_t before = _phones.size();
+      while (_phones.size() < std::min(before + kTogether, count)) {
+        if (!add(first + _phones.size())) return false;
+      }
+      if (!areOpen(before)) {
+        std::fprintf(stderr, "fleet-phones: the broker does not answer everybody\n");
         return false;
       }
-      _waited.push_back({phone.link->descriptor(), POLLIN, 0});
-      phone.link->turn(false);
-      _phones.push_back(std::move(phone));
     }
-    const auto last = Clock::now() + std::chrono::seconds(60);
-    while (_open < count && Clock::now() < last) {
-      turn(10);
-      _open = 0;
-      for (const Phone& phone : _phones) _open += phone.link->state() == BrokerLink::State::open;
-    }
-    return _open == count;
+    return true;
   }
 
   void send(std::size_t place) {
@@ -96,7 +87,7 @@ class Phones {
   }
 
   void turn(int patienceMs) {
-    if (::poll(_waited.data(), _waited.size(), patienceMs) <= 0) patienceMs = 0;
+    ::poll(_waited.data(), _waited.size(), patienceMs);
     for (std::size_t i = 0; i < _phones.size(); ++i) {
       if (_waited[i].revents != 0 || _phones[i].link->wantsToWrite()) {
         _phones[i].link->turn(_waited[i].revents != 0);
@@ -108,6 +99,8 @@ class Phones {
   std::uint64_t acknowledged() const { return _acknowledged; }
 
  private:
+  static constexpr std::size_t kTogether = 50;
+
   struct Phone {
     std::string name;
     std::unique_ptr<BrokerLink> link;
@@ -115,12 +108,43 @@ class Phones {
     std::size_t next = 0;
   };
 
+  bool add(std::size_t number) {
+    Phone phone;
+    phone.name = "load-" + std::to_string(number);
+    phone.next = number * 131 % _templates.size();
+    _settings.client = "qelwatch-" + phone.name;
+    fleet::LinkFailure failure;
+    phone.link = BrokerLink::open(
+        _settings, [this](int, const std::string& refusal) { _acknowledged += refusal.empty(); },
+        failure);
+    if (!phone.link) {
+      std::fprintf(stderr, "fleet-phones: %s: %s\n", phone.name.c_str(), failure.why.c_str());
+      return false;
+    }
+    _waited.push_back({phone.link->descriptor(), POLLIN, 0});
+    phone.link->turn(false);
+    _phones.push_back(std::move(phone));
+    return true;
+  }
+
+  bool areOpen(std::size_t from) {
+    const auto last = Clock::now() + std::chrono::seconds(60);
+    const auto isOpen = [](const Phone& phone) {
+      return phone.link->state() == BrokerLink::State::open;
+    };
+    while (Clock::now() < last) {
+      const auto news = std::span(_phones).subspan(from);
+      if (std::all_of(news.begin(), news.end(), isOpen)) return true;
+      turn(10);
+    }
+    return false;
+  }
+
   fleet::LinkSettings _settings;
   const std::vector<Template> _templates;
   const std::uint64_t _stream = nowMs() / 1000;
   std::vector<Phone> _phones;
   std::vector<pollfd> _waited;
-  std::size_t _open = 0;
   std::uint64_t _sent = 0;
   std::uint64_t _acknowledged = 0;
 };
@@ -131,7 +155,13 @@ void run(Phones& phones, std::size_t count, double rate, double seconds) {
   const auto elapsed = [begin] {
     return std::chrono::duration<double>(Clock::now() - begin).count();
   };
-  double nextLine = 1;
+  const auto say = [&phones, spent = std::clock()](const char* when) {
+    std::printf("%s %lu %lu %ld\n", when, static_cast<unsigned long>(phones.sent()),
+                static_cast<unsigned long>(phones.acknowledged()),
+                static_cast<long>((std::clock() - spent) / (CLOCKS_PER_SEC / 1000)));
+    std::fflush(stdout);
+  };
+  int nextLine = 1;
   while (elapsed() < seconds ||
          (phones.acknowledged() < phones.sent() && elapsed() < seconds + 30)) {
     const double now = std::min(elapsed(), seconds);
@@ -141,13 +171,10 @@ void run(Phones& phones, std::size_t count, double rate, double seconds) {
     }
     phones.turn(phones.sent() < due ? 0 : 5);
     if (elapsed() < nextLine) continue;
-    std::printf("%.0f %lu %lu\n", nextLine, static_cast<unsigned long>(phones.sent()),
-                static_cast<unsigned long>(phones.acknowledged()));
-    std::fflush(stdout);
-    nextLine += 1;
+    say(std::to_string(nextLine).c_str());
+    ++nextLine;
   }
-  std::printf("end %lu %lu\n", static_cast<unsigned long>(phones.sent()),
-              static_cast<unsigned long>(phones.acknowledged()));
+  say("end");
 }
 
 }  // namespace
@@ -156,26 +183,26 @@ void run(Phones& phones, std::size_t count, double rate, double seconds) {
 int main(int argc, char** argv) {
   using namespace qel;
   std::string why;
-  const auto broker = argc == 6 ? fleet::brokerAddress(argv[1], why) : std::nullopt;
+  const auto broker = argc == 7 ? fleet::brokerAddress(argv[1], why) : std::nullopt;
   if (!broker) {
-    std::fprintf(stderr, "usage: fleet-phones URL RECORDING PHONES RATE SECONDS\n");
+    std::fprintf(stderr, "usage: fleet-phones URL RECORDING FIRST PHONES RATE SECONDS\n");
     return 64;
   }
   fleet::LinkSettings settings;
   settings.broker = *broker;
-  const auto count = static_cast<std::size_t>(std::strtoul(argv[3], nullptr, 10));
+  const auto first = static_cast<std::size_t>(std::strtoul(argv[3], nullptr, 10));
+  const auto count = static_cast<std::size_t>(std::strtoul(argv[4], nullptr, 10));
   auto templates = templatesOf(argv[2]);
   if (templates.empty() || count == 0) {
     std::fprintf(stderr, "fleet-phones: nothing to send\n");
     return 65;
   }
   Phones phones(settings, std::move(templates));
-  if (!phones.connect(count)) {
-    std::fprintf(stderr, "fleet-phones: not everybody is connected\n");
-    return 69;
-  }
-  std::printf("begin\n");
+  if (!phones.connect(first, count)) return 69;
+  std::printf("connected\n");
   std::fflush(stdout);
-  run(phones, count, std::strtod(argv[4], nullptr), std::strtod(argv[5], nullptr));
+  while (std::getchar() != EOF) {
+  }
+  run(phones, count, std::strtod(argv[5], nullptr), std::strtod(argv[6], nullptr));
   return phones.acknowledged() == phones.sent() ? 0 : 74;
 }
