@@ -23,7 +23,7 @@ const std::map<std::string, Lines> kKnownRows = {
     {"fleet: Phones silent A", {"b|+182||", "a|+301|online|STATUS"}},
     {"fleet: Phones that report A", {"@0|2", "@7200|1"}},
     {"fleet: Handovers from cell to cell A", {"1217|1218|1|1"}},
-    {"fleet: Events that will never come A", {"b|7|3|1|2|SAID"}},
+    {"fleet: Events that will never come A", {"b|7|3|1|4|2|SAID"}},
     {"phone-postgresql: $phone", {"a", "b", "c"}},
     {"phone-postgresql: Level A", {"@60|-90", "@120|-92", "@240|-100"}},
     {"phone-postgresql: Quality A",

@@ -110,7 +110,7 @@ std::vector<PhoneMessages> knownFleet(std::int64_t startS, std::int64_t nowS) {
   b.registration(181, 0);
   b.registration(182, 11);
   b.say("queue", R"({"stream": 7, "dropped": 1, "lost": 0, "undecodable": 0})");
-  b.say("queue", R"({"stream": 7, "dropped": 3, "lost": 1, "undecodable": 2})");
+  b.say("queue", R"({"stream": 7, "dropped": 3, "lost": 1, "too_large": 4, "undecodable": 2})");
   Phone c("c", nowS, sent);
   c.cell(0, 300);
   return sent;

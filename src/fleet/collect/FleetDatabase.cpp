@@ -125,6 +125,7 @@ void copyRows(pqxx::work& transaction, const FleetTable& table, const Events& ev
 }
 #pragma GCC diagnostic pop
 
+// Each of a transaction with a time of its own: the newest counts.
 void insertStatus(pqxx::work& transaction, const std::vector<const PhoneStatus*>& all) {
   if (all.empty()) return;
   ArrayText phones, words;
@@ -133,24 +134,29 @@ void insertStatus(pqxx::work& transaction, const std::vector<const PhoneStatus*>
     words.add(each->status);
   }
   transaction.exec_params(
-      "INSERT INTO qelwatch.status (phone, status) SELECT * FROM unnest($1::text[], $2::text[])",
+      "INSERT INTO qelwatch.status (phone, status, time) SELECT phone, status,"
+      " now() + place * interval '1 microsecond'"
+      " FROM unnest($1::text[], $2::text[]) WITH ORDINALITY AS said (phone, status, place)",
       phones.text(), words.text());
 }
 
 void insertQueues(pqxx::work& transaction, const std::vector<const PhoneQueue*>& all) {
   if (all.empty()) return;
-  ArrayText phones, streams, dropped, lost, undecodable;
+  ArrayText phones, streams, dropped, lost, tooLarge, undecodable;
   for (const PhoneQueue* each : all) {
     phones.add(each->phone);
     streams.add(std::to_string(each->stream));
     dropped.add(std::to_string(each->dropped));
     lost.add(std::to_string(each->lost));
+    tooLarge.add(std::to_string(each->tooLarge));
     undecodable.add(std::to_string(each->undecodable));
   }
   transaction.exec_params(
-      "INSERT INTO qelwatch.queue (phone, stream, dropped, lost, undecodable) SELECT * FROM"
-      " unnest($1::text[], $2::bigint[], $3::bigint[], $4::bigint[], $5::bigint[])",
-      phones.text(), streams.text(), dropped.text(), lost.text(), undecodable.text());
+      "INSERT INTO qelwatch.queue (phone, stream, dropped, lost, too_large, undecodable)"
+      " SELECT * FROM unnest($1::text[], $2::bigint[], $3::bigint[], $4::bigint[], $5::bigint[],"
+      " $6::bigint[])",
+      phones.text(), streams.text(), dropped.text(), lost.text(), tooLarge.text(),
+      undecodable.text());
 }
 
 }  // namespace

@@ -69,17 +69,18 @@ constexpr std::string_view kPhones =
     "  LEFT JOIN LATERAL (SELECT status, time AS status_time FROM qelwatch.status\n"
     "    WHERE status.phone = phone.phone ORDER BY time DESC LIMIT 1) AS said ON true;\n";
 
+// What a stream has lost only grows, in whatever order that was said and stored.
 constexpr std::string_view kStreams =
     "CREATE OR REPLACE VIEW qelwatch.streams AS\n"
     "SELECT phone, stream, first_event, last_event, events, newest,\n"
-    "    newest - distinct_numbers AS missing, dropped, lost\n"
+    "    newest - distinct_numbers AS missing, dropped, lost, too_large\n"
     "  FROM (SELECT phone, stream, min(time) AS first_event, max(time) AS last_event,\n"
     "      count(*) AS events, max(number) AS newest,\n"
     "      count(DISTINCT number) AS distinct_numbers\n"
     "    FROM qelwatch.event GROUP BY phone, stream) AS counted\n"
-    "  LEFT JOIN LATERAL (SELECT dropped, lost FROM qelwatch.queue\n"
-    "    WHERE queue.phone = counted.phone AND queue.stream = counted.stream\n"
-    "    ORDER BY time DESC LIMIT 1) AS said ON true;\n";
+    "  LEFT JOIN LATERAL (SELECT max(dropped) AS dropped, max(lost) AS lost,\n"
+    "      max(too_large) AS too_large FROM qelwatch.queue\n"
+    "    WHERE queue.phone = counted.phone AND queue.stream = counted.stream) AS said ON true;\n";
 
 // The report of the same phone before this one, of a day at most: a query that asks for some days
 // reads no others.

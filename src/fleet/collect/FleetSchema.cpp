@@ -53,12 +53,14 @@ std::vector<SchemaTable> tablesOfPhones() {
                      "",
                      "When a phone came and went, by the database's clock.",
                      false};
-  SchemaTable queue{
-      "queue",
-      {phone, time, number("stream"), number("dropped"), number("lost"), number("undecodable")},
-      "",
-      "What phones say of events that will never come.",
-      false};
+  // Collectors that know nothing of a column that came later say nothing of it.
+  const SchemaColumn tooLarge{"too_large", "bigint", "NOT NULL DEFAULT 0"};
+  SchemaTable queue{"queue",
+                    {phone, time, number("stream"), number("dropped"), number("lost"), tooLarge,
+                     number("undecodable")},
+                    "",
+                    "What phones say of events that will never come.",
+                    false};
   return {std::move(phones), std::move(status), std::move(queue)};
 }
 

@@ -19,6 +19,7 @@ constexpr std::string_view kTopicStart = "qelwatch/";
 constexpr std::size_t kLongestMetricName = 128;
 constexpr std::string_view kStream = "stream";
 constexpr std::string_view kNumber = "number";
+constexpr std::string_view kTooLarge = "too_large";
 
 struct Topic {
   std::string_view phone;
@@ -182,7 +183,9 @@ PhoneMessage readQueue(const Topic& topic, std::string_view payload) {
        {std::pair<std::string_view, std::uint64_t*>{kStream, &queue.stream},
         {"dropped", &queue.dropped},
         {"lost", &queue.lost},
+        {kTooLarge, &queue.tooLarge},
         {"undecodable", &queue.undecodable}}) {
+    if (key == kTooLarge && !line->contains(key)) continue;  // phones did not always say it
     const auto number = numberIn(*line, key, 0, std::numeric_limits<std::int64_t>::max());
     if (!number) return NoMessage{quoted(key) + " is no number"};
     *member = *number;

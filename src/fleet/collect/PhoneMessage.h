@@ -38,6 +38,7 @@ struct PhoneQueue {
   std::uint64_t stream = 0;
   std::uint64_t dropped = 0;
   std::uint64_t lost = 0;
+  std::uint64_t tooLarge = 0;
   std::uint64_t undecodable = 0;
 };
 

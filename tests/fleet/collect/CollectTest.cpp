@@ -119,6 +119,32 @@ TEST_F(Collect, knowsWhoIsThereAndWhatWillNeverCome) {
             "lab|t|offline");
 }
 
+TEST_F(Collect, knowsWhatTheBrokerDoesNotTakeInWhateverOrderItHears) {
+  const auto program = collector();
+  send("qelwatch/lab/queue",
+       "{\"stream\": 7, \"dropped\": 0, \"lost\": 0, \"too_large\": 2, \"undecodable\": 0}\n"
+       "{\"stream\": 7, \"dropped\": 0, \"lost\": 0, \"too_large\": 1, \"undecodable\": 0}\n");
+  send(kRrcTopic, rrcState(3));
+  ASSERT_TRUE(haveCome(1)) << program->err();
+  EXPECT_TRUE(eventually([&] {
+    return database->ask("SELECT phone, missing, dropped, lost, too_large FROM qelwatch.streams") ==
+           "lab|2|0|0|2";
+  })) << database->ask("SELECT * FROM qelwatch.streams");
+}
+
+TEST_F(Collect, knowsTheLastOfWhatIsSaidAtOnce) {
+  const auto program = collector();
+  std::string said;
+  for (int i = 0; i < 20; ++i) said += "online\noffline\n";
+  send("qelwatch/lab/status", said + "online\n");
+  send(kRrcTopic, rrcState(1));
+  ASSERT_TRUE(eventually([&] {
+    return database->number("SELECT count(*) FROM qelwatch.status") == 41;
+  })) << program->err();
+  EXPECT_EQ(database->number("SELECT count(DISTINCT time) FROM qelwatch.status"), 41);
+  EXPECT_EQ(database->ask("SELECT status FROM qelwatch.phones"), "online");
+}
+
 TEST_F(Collect, acknowledgesNothingBeforeItIsCommitted) {
   const WireTap tap(broker.port());
   RunningQelctl program({"collect", "mqtt://127.0.0.1:" + std::to_string(tap.port()), "--database",

@@ -105,6 +105,64 @@ TEST_F(CollectTrouble, isMendedByPreparingAgain) {
             "database: qelwatch.lte_rrc_state has text as prev_state_dur_ms, not bigint");
 }
 
+// As one is that was made before phones said how many events were too large.
+TEST_F(CollectTrouble, isMendedInATableThatHasRows) {
+  prepare();
+  database->ask(
+      "DROP VIEW qelwatch.streams; ALTER TABLE qelwatch.queue DROP COLUMN too_large;"
+      " INSERT INTO qelwatch.queue (phone, stream, dropped, lost, undecodable)"
+      " VALUES ('lab', 7, 1, 2, 3); CREATE VIEW qelwatch.streams AS SELECT phone, stream,"
+      " time AS first_event, time AS last_event, 1::bigint AS events, 1::bigint AS newest,"
+      " 1::bigint AS missing, dropped, lost FROM qelwatch.queue");
+  expectEnd(collecting(), 78,
+            "database: qelwatch.queue has no too_large of type bigint; qelctl collect --prepare "
+            "makes them so");
+  prepare();
+  EXPECT_EQ(database->ask("SELECT dropped, lost, too_large, undecodable FROM qelwatch.queue"),
+            "1|2|0|3");
+  database->ask(
+      "INSERT INTO qelwatch.event (phone, stream, number, time, metric) VALUES"
+      " ('lab', 7, 4, now(), 'trigger')");
+  EXPECT_EQ(database->ask("SELECT missing, dropped, lost, too_large FROM qelwatch.streams"),
+            "3|1|2|0");
+  // Who knows nothing of the column goes on.
+  EXPECT_EQ(database->complaint("collector",
+                                "INSERT INTO qelwatch.queue (phone, stream, dropped, lost,"
+                                " undecodable) VALUES ('lab', 7, 1, 2, 3)"),
+            "");
+}
+
+TEST_F(CollectTrouble, isADiskOfTheDatabaseThatIsFull) {
+  prepare();
+  const auto program = collector();
+  sendSome(10);
+  ASSERT_TRUE(haveCome(_sent)) << program->err();
+  database->ask(
+      "CREATE FUNCTION fill() RETURNS trigger LANGUAGE plpgsql AS $$ BEGIN RAISE EXCEPTION"
+      " 'could not extend file: No space left on device' USING ERRCODE = 'disk_full'; END $$;"
+      " CREATE TRIGGER full_disk BEFORE INSERT ON qelwatch.event EXECUTE FUNCTION fill()");
+  sendSome(10);
+  const std::string line =
+      "database: could not extend file: No space left on device; messages wait at the broker\n";
+  EXPECT_TRUE(eventually([&] { return program->hasSaid(line); })) << program->err();
+  database->ask("DROP TRIGGER full_disk ON qelwatch.event");
+  EXPECT_TRUE(haveCome(_sent)) << program->err();
+  expectAllOnce();
+}
+
+TEST_F(CollectTrouble, isALoginThatTheDatabaseRefuses) {
+  const auto refused = [&](const std::string& address, const std::string& why) {
+    const Outcome outcome = qelctl({"collect", broker.url(), "--database", address});
+    EXPECT_EQ(outcome.exitCode, 69) << outcome.err;
+    EXPECT_NE(outcome.err.find("qelctl: database: "), std::string::npos) << outcome.err;
+    EXPECT_NE(outcome.err.find(why), std::string::npos) << outcome.err;
+  };
+  refused(database->address("stranger"), "role \"stranger\" does not exist\n");
+  std::string other = database->address();
+  other.replace(other.rfind("fleet"), 5, "other");
+  refused(other, "database \"other\" does not exist\n");
+}
+
 TEST_F(CollectTrouble, isSomebodyWhoMayDoNothing) {
   prepare();
   database->ask("REVOKE qelwatch_collector FROM collector");

@@ -141,6 +141,18 @@ TEST(PhoneMessage, isWhatAPhoneSaysOfItself) {
   EXPECT_EQ(whyNone("qelwatch/lab/status", "away"), "it is no status");
 }
 
+TEST(PhoneMessage, saysHowManyEventsWereTooLargeIfItSaysSo) {
+  const std::string start = R"({"stream": 7, "dropped": 0, "lost": 0, "undecodable": 0)";
+  const auto tooLarge = [&](const std::string& rest) {
+    return std::get<PhoneQueue>(readPhoneMessage("qelwatch/lab/queue", start + rest)).tooLarge;
+  };
+  EXPECT_EQ(tooLarge(R"(, "too_large": 5})"), 5U);
+  EXPECT_EQ(tooLarge("}"), 0U);
+  for (const char* rest : {R"(, "too_large": -1})", R"(, "too_large": "5"})"}) {
+    EXPECT_EQ(whyNone("qelwatch/lab/queue", start + rest), "\"too_large\" is no number") << rest;
+  }
+}
+
 TEST(PhoneMessage, saysTheSameInBothFormsOfEveryEvent) {
   RecordingFault fault;
   const auto reader = RecordingReader::open(QEL_SAMPLE, RecordingReader::BadLines::fail, fault);
