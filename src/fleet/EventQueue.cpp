@@ -69,9 +69,7 @@ bool EventQueue::prepare(const std::string& folder) {
   if (version == 0) {
     if (!_database.execute(std::string(kTables) + "PRAGMA user_version = " + kVersion))
       return false;
-    auto made = _database.run(
-        "INSERT INTO facts VALUES ('stream', ?1), ('newest', 0),"
-        " ('dropped', 0)");
+    auto made = _database.run("INSERT INTO facts VALUES ('stream', ?1)");
     if (!made.with(randomStream()).done()) return false;
   } else if (std::to_string(version) != kVersion) {
     return _database.fail("was made by another version of the program");
@@ -87,6 +85,8 @@ bool EventQueue::readState() {
       if (name == "stream") _stream = static_cast<std::uint32_t>(facts.number(1));
       if (name == "newest") _counts.newest = facts.number(1);
       if (name == "dropped") _counts.dropped = facts.number(1);
+      if (name == "lost") _counts.lost = facts.number(1);
+      if (name == "too_large") _counts.tooLarge = facts.number(1);
     }
     if (facts.hasFailed()) return false;
   }
@@ -109,10 +109,16 @@ bool EventQueue::insert(std::uint64_t timeMs, std::string_view metric, std::stri
       .done();
 }
 
-// For when no event is left that tells it.
-bool EventQueue::keepNewest() {
-  return _database.run("UPDATE facts SET value = ?1 WHERE name = 'newest'")
-      .with(_counts.newest)
+// The newest number for when no event is left that tells it.
+bool EventQueue::keepFacts(const Counts& counts) {
+  return _database
+      .run(
+          "REPLACE INTO facts VALUES ('newest', ?1), ('dropped', ?2), ('lost', ?3),"
+          " ('too_large', ?4)")
+      .with(counts.newest)
+      .with(counts.dropped)
+      .with(counts.lost)
+      .with(counts.tooLarge)
       .done();
 }
 
@@ -189,11 +195,7 @@ bool EventQueue::dropUntil(std::uint64_t number) {
     return _database.rollBack();
   }
   after.dropped += _counts.waiting - after.waiting;
-  const bool isDone = _database.run("UPDATE facts SET value = ?1 WHERE name = 'dropped'")
-                          .with(after.dropped)
-                          .done() &&
-                      keepNewest() && _database.execute("COMMIT");
-  if (!isDone) return _database.rollBack();
+  if (!keepFacts(after) || !_database.execute("COMMIT")) return _database.rollBack();
   _counts = after;
   return true;
 }
@@ -221,6 +223,11 @@ std::vector<QueuedEvent> EventQueue::next(std::uint64_t after, std::size_t mostB
   return events;
 }
 
+void EventQueue::leaveOut() {
+  const std::lock_guard lock(_mutex);
+  ++_counts.tooLarge;
+}
+
 void EventQueue::sendAgain() {
   const std::lock_guard lock(_mutex);
   _sending = 0;
@@ -241,7 +248,7 @@ bool EventQueue::remove(std::vector<std::uint64_t> numbers) {
   };
   const bool isDone = written([&] {
     after = _counts;
-    return _database.execute("BEGIN IMMEDIATE") && forgetAll() && keepNewest() &&
+    return _database.execute("BEGIN IMMEDIATE") && forgetAll() && keepFacts(after) &&
            _database.execute("COMMIT");
   });
   if (isDone) _counts = after;

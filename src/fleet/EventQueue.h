@@ -32,9 +32,11 @@ class EventQueue {
   struct Counts {
     std::uint64_t waiting = 0;
     std::uint64_t waitingBytes = 0;
-    std::uint64_t newest = 0;   // the last number that was given
-    std::uint64_t dropped = 0;  // unsent, because of a limit, since the queue was made
-    std::uint64_t lost = 0;     // not added, because the disk would not, since this was opened
+    std::uint64_t newest = 0;  // the last number that was given
+    // Since the queue was made, as far as the disk took that:
+    std::uint64_t dropped = 0;   // unsent, because of a limit
+    std::uint64_t lost = 0;      // not added, because the disk would not
+    std::uint64_t tooLarge = 0;  // see leaveOut()
   };
 
   // Makes it where there is none. Nothing when it cannot be used; `error` is then one line.
@@ -48,6 +50,8 @@ class EventQueue {
   // The oldest settled events after this number, of so many bytes in all or one; these are then
   // being sent, and no limit drops them.
   std::vector<QueuedEvent> next(std::uint64_t after, std::size_t mostBytes);
+  // One of those being sent is larger than anybody takes: it is counted, and still to be removed.
+  void leaveOut();
   // What was being sent waits again.
   void sendAgain();
   // These have arrived. False when the disk does not take that: they then still wait.
@@ -70,7 +74,7 @@ class EventQueue {
   template <class Change>
   bool written(Change change);
   bool forget(std::uint64_t first, std::uint64_t last, Counts& after);
-  bool keepNewest();
+  bool keepFacts(const Counts& counts);
   bool keepLimits();
   bool dropUntil(std::uint64_t number);
   std::optional<std::uint64_t> lastBeyondAge();

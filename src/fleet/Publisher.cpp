@@ -33,7 +33,10 @@ std::string numbered(std::string line, std::uint32_t stream, std::uint64_t numbe
 }  // namespace
 
 Publisher::Publisher(EventQueue& queue, PublishSettings settings, Say say)
-    : _queue(queue), _settings(complete(std::move(settings))), _say(std::move(say)) {
+    : _queue(queue),
+      _settings(complete(std::move(settings))),
+      _say(std::move(say)),
+      _lostBefore(queue.counts().lost) {
   if (_queue.counts().waiting > 0) _fresh = 1;
   _thread = std::thread([this] { run(); });
 }
@@ -89,6 +92,7 @@ void Publisher::run() {
 }
 
 bool Publisher::isBatchDue(Clock::time_point now) const {
+  if (!_isIntroduced) return false;
   if (_isSending) return true;
   return _firstFresh &&
          (_ending || now >= *_firstFresh + _settings.every || _fresh >= _settings.batchBytes);
@@ -124,6 +128,7 @@ void Publisher::beginLink() {
   _toldOfQueue.clear();
   sendStatus("online");
   tellOfQueue();
+  _isIntroduced = !isUnderWay();
   if (waiting > 0) {
     _isSending = true;
   } else {
@@ -140,6 +145,7 @@ void Publisher::endLink() {
   _queue.sendAgain();
   _sentUpTo = 0;
   _isSending = false;
+  _isIntroduced = false;
   _turnedDown.clear();
   _link.reset();
 }
@@ -180,6 +186,8 @@ void Publisher::arrived(int message, const std::string& refusal) {
     _retries.succeeded();
     _arrived.push_back(number);
     ++_sent;
+  } else if (!isUnderWay()) {
+    _isIntroduced = true;
   }
 }
 
@@ -195,9 +203,9 @@ void Publisher::forgetArrived() {
 }
 
 void Publisher::sayLosses() {
-  const auto lost = _queue.counts().lost;
-  if (lost > _lostSaid && _lostSaid == 0) _say(_queue.error() + "; events are lost");
-  _lostSaid = lost;
+  if (_hasSaidLoss || _queue.counts().lost == _lostBefore) return;
+  _hasSaidLoss = true;
+  _say(_queue.error() + "; events are lost");
 }
 
 void Publisher::sendStatus(std::string_view status) {
@@ -211,13 +219,17 @@ void Publisher::tellOfQueue() {
   const std::string text = jsonText(Dictionary{{"stream", _queue.stream()},
                                                {"dropped", counts.dropped},
                                                {"lost", counts.lost},
-                                               {"too_large", _tooLarge.load()},
+                                               {"too_large", counts.tooLarge},
                                                {"undecodable", _undecodable.load()}});
   if (std::exchange(_toldOfQueue, text) == text) return;
   bool isTooLarge = false;
   const auto message = _link->send(topic("queue"), text, BrokerLink::Retained::yes, isTooLarge);
   if (message) _underWay[*message] = 0;
 }
+
+// Some brokers hang up on who sends what they do not take, and their answer is lost where more had
+// come meanwhile: so events wait until the first messages are answered.
+bool Publisher::hasRoom() const { return _isIntroduced && _underWay.size() < kMostUnderWay; }
 
 void Publisher::sendBatch() {
   if (!std::exchange(_isSending, true) || _firstFresh) {
@@ -230,7 +242,7 @@ void Publisher::sendBatch() {
     _fresh = 1;  // and so again after a while
     return;
   }
-  while (_isSending && _underWay.size() < kMostUnderWay) _isSending = sendNext();
+  while (_isSending && hasRoom()) _isSending = sendNext();
   if (!_isSending) tellOfQueue();
 }
 
@@ -246,7 +258,8 @@ bool Publisher::sendNext() {
     if (message) {
       _underWay[*message] = event.number;
     } else {
-      if (_tooLarge++ == 0) {
+      _queue.leaveOut();
+      if (!std::exchange(_hasSaidTooLarge, true)) {
         _say(broker() + "the broker takes no message so large as event " +
              std::to_string(event.number) + ", which is left out, as are others like it");
       }
@@ -268,8 +281,8 @@ std::optional<Publisher::Clock::time_point> Publisher::nextTime(Clock::time_poin
   }
   const bool isOpen = _link->state() == BrokerLink::State::open;
   if (!isOpen || isUnderWay()) at(_lastTraffic + kAnswerPatience);
-  if (isOpen && hasWork && !_isSending) at(_firstFresh.value_or(now) + _settings.every);
-  if (isOpen && _isSending && _underWay.size() < kMostUnderWay) at(now);
+  if (_isIntroduced && hasWork && !_isSending) at(_firstFresh.value_or(now) + _settings.every);
+  if (_isSending && hasRoom()) at(now);
   const auto keepAlive = _link->keepAlive();
   if (keepAlive.count() > 0) at(std::max(_lastTraffic + keepAlive, now + 1s));
   return next;
@@ -289,8 +302,8 @@ void Publisher::leave() {
     return _link && _link->state() == BrokerLink::State::open && Clock::now() < last;
   };
   while (goOn() && (_isSending || isUnderWay())) {
-    if (_isSending) sendBatch();
-    wait(_isSending && _underWay.size() < kMostUnderWay ? Clock::now() : last);
+    if (_isSending && hasRoom()) sendBatch();
+    wait(_isSending && hasRoom() ? Clock::now() : last);
   }
   if (!goOn()) return;
   sendStatus("offline");

@@ -53,9 +53,8 @@ class Publisher {
   bool end(std::chrono::milliseconds patience);
   // Once the broker has refused for good: why. Nobody tries again then.
   std::optional<std::string> refusal() const;
-  // That the broker has, and that are larger than it takes.
+  // That the broker has.
   std::uint64_t sent() const { return _sent; }
-  std::uint64_t tooLarge() const { return _tooLarge; }
 
  private:
   using Clock = std::chrono::steady_clock;
@@ -76,6 +75,7 @@ class Publisher {
   void tellOfQueue();
   bool isBatchDue(Clock::time_point now) const;
   bool isUnderWay() const { return !_underWay.empty(); }
+  bool hasRoom() const;
   std::optional<Clock::time_point> nextTime(Clock::time_point now) const;
   void wait(std::optional<Clock::time_point> until);
   void leave();
@@ -93,7 +93,6 @@ class Publisher {
   std::atomic<bool> _isRefused = false;
   std::atomic<std::size_t> _fresh = 0;  // bytes queued since the last batch began
   std::atomic<std::uint64_t> _sent = 0;
-  std::atomic<std::uint64_t> _tooLarge = 0;
   std::atomic<std::uint64_t> _undecodable = 0;
 
   // Of the thread.
@@ -104,13 +103,16 @@ class Publisher {
   std::size_t _forgetAt = kForgetTogether;
   std::uint64_t _sentUpTo = 0;
   bool _isSending = false;
+  bool _isIntroduced = false;  // the broker has what this link began with
   bool _wasConnected = false;
   std::optional<Clock::time_point> _firstFresh;
   Clock::time_point _lastTraffic;
   std::string _toldOfQueue;
-  std::string _greeting;    // until it is said
-  std::string _turnedDown;  // why the broker did not take a message
-  std::uint64_t _lostSaid = 0;
+  std::string _greeting;            // until it is said
+  std::string _turnedDown;          // why the broker did not take a message
+  const std::uint64_t _lostBefore;  // when this began
+  bool _hasSaidLoss = false;
+  bool _hasSaidTooLarge = false;
   std::string _said;
   std::string _refusal;
 

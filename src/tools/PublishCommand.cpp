@@ -87,7 +87,7 @@ std::string summary(const fleet::Publisher& publisher, const fleet::EventQueue& 
   };
   add(counts.dropped, " dropped so far, beyond the limits of the queue");
   add(counts.lost, " lost, which the disk did not take");
-  add(publisher.tooLarge(), " larger than the broker takes");
+  add(counts.tooLarge, " larger than the broker takes");
   add(intake.counts().undecodable, " undecodable left out");
   add(intake.counts().stripped, " without their unknown content");
   return text + (options.keepIdentities ? ", identities kept" : ", identities hidden");

@@ -112,6 +112,32 @@ TEST_F(EventQueueTest, dropsTheOldestBeyondItsBytes) {
   EXPECT_EQ(numbersIn(*queue), Numbers({5}));
 }
 
+TEST_F(EventQueueTest, remembersHowManyWereTooLarge) {
+  {
+    const auto queue = open();
+    for (int i = 0; i < 3; ++i) queue->add(kNow, "a", "{}");
+    queue->leaveOut();
+    queue->leaveOut();
+    EXPECT_EQ(queue->counts().tooLarge, 2U);
+    EXPECT_TRUE(queue->remove(Numbers({1, 2})));
+  }
+  const auto queue = open();
+  EXPECT_EQ(queue->counts().tooLarge, 2U);
+  EXPECT_EQ(numbersIn(*queue), Numbers({3}));
+}
+
+// Had it been counted before it was removed, it would be counted again.
+TEST_F(EventQueueTest, countsNothingTwiceThatIsStillThere) {
+  {
+    const auto queue = open();
+    queue->add(kNow, "a", "{}");
+    queue->leaveOut();
+  }
+  const auto queue = open();
+  EXPECT_EQ(queue->counts().tooLarge, 0U);
+  EXPECT_EQ(numbersIn(*queue), Numbers({1}));
+}
+
 TEST_F(EventQueueTest, dropsNothingThatIsBeingSent) {
   const auto queue = open({.bytes = 30, .age = 24h});
   for (int i = 0; i < 3; ++i) queue->add(kNow, "a", "0123456789");

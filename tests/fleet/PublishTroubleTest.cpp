@@ -195,6 +195,27 @@ TEST_F(PublishTrouble, isADiskThatIsFullBeforeAllIsSent) {
   EXPECT_TRUE(isWithoutGap(subscriber.events()));
 }
 
+TEST_F(PublishTrouble, isRememberedWhenItBeginsAnew) {
+  const Broker broker(directory, "max_packet_size 300\n");
+  const Subscriber subscriber(broker, file("received"));
+  const auto tooLarge = [](const std::string& said) {
+    const auto end = said.find(" larger than the broker takes");
+    const auto begin = said.rfind(' ', end - 1) + 1;
+    return end == std::string::npos ? 0 : std::stoul(said.substr(begin, end - begin));
+  };
+  unsigned long before = 0;
+  for (int i = 0; i < 2; ++i) {
+    const std::uint64_t newest = subscriber.newest();
+    RunningQelctl publisher(publishing(broker.url()));
+    ASSERT_TRUE(eventually([&] { return subscriber.newest() > newest + 200; })) << publisher.err();
+    const std::string said = end(publisher);
+    EXPECT_GT(tooLarge(said), before) << said;
+    before = tooLarge(said);
+    const auto missing = [&] { return subscriber.newest() - subscriber.events().size(); };
+    EXPECT_TRUE(eventually([&] { return before >= missing() && missing() > 0; })) << missing();
+  }
+}
+
 TEST_F(PublishTrouble, isNoReasonToStopWhenItIsToldSo) {
   const std::string known = file("passwords");
   ASSERT_EQ(run("/usr/bin/mosquitto_passwd", {"-b", "-c", known, "me", "right"}).exitCode, 0);
