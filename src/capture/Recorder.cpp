@@ -17,6 +17,8 @@ constexpr std::chrono::seconds kShortestSleep{5};
 
 }  // namespace
 
+steady_clock::time_point recordingNow() { return steady_clock::now() + timeAsleep(); }
+
 std::optional<RecordedEvent> recordedEvent(std::string_view eventName, const tesk::Message& event,
                                            std::uint64_t timeMs) {
   if (eventName == tesk::kEventMetric) {
@@ -38,8 +40,10 @@ void Recorder::noteSleep() {
   const auto slept = _asleep();
   const auto length = slept - std::exchange(_slept, slept);
   if (length < kShortestSleep) return;
-  _recording->write(sleepEvent(_clock.nowMs(), length), steady_clock::now());
+  _recording->write(sleepEvent(_clock.nowMs(), length), now());
 }
+
+RotatingRecording::TimePoint Recorder::now() const { return steady_clock::now() + _asleep(); }
 
 bool Recorder::isRecordable(RecordedEvent& event) {
   if (!hasReadableForm(event)) {
@@ -53,7 +57,7 @@ void Recorder::take(std::string_view eventName, const tesk::Message& event) {
   const std::lock_guard lock(_mutex);
   noteSleep();
   auto recorded = recordedEvent(eventName, event, _clock.nowMs());
-  if (recorded && isRecordable(*recorded)) _recording->write(*recorded, steady_clock::now());
+  if (recorded && isRecordable(*recorded)) _recording->write(*recorded, now());
 }
 
 bool Recorder::mark() {
@@ -67,7 +71,7 @@ bool Recorder::mark() {
 bool Recorder::tend() {
   const std::lock_guard lock(_mutex);
   noteSleep();
-  return _recording->tend(steady_clock::now());
+  return _recording->tend(now());
 }
 
 bool Recorder::close() {

@@ -18,6 +18,10 @@
 
 namespace qel::capture {
 
+// Now, on a steady clock that goes on while the device sleeps: by it recordings are so old and so
+// long.
+std::chrono::steady_clock::time_point recordingNow();
+
 // An event of the stream of that name as a recording holds it. Nothing for other streams, which are
 // no part of one.
 std::optional<RecordedEvent> recordedEvent(std::string_view eventName, const tesk::Message& event,
@@ -61,6 +65,7 @@ class Recorder {
   bool isRecordable(RecordedEvent& event);
   // Before anything else that comes after a sleep.
   void noteSleep();
+  RotatingRecording::TimePoint now() const;
 
   mutable std::mutex _mutex;
   const std::unique_ptr<RotatingRecording> _recording;

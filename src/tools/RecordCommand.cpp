@@ -64,7 +64,7 @@ std::unique_ptr<RotatingRecording> begin(const RecordOptions& options) {
   std::string error;
   auto recording = RotatingRecording::create(options.file, limitsOf(options),
                                              options.force ? Existing::replaced : Existing::refused,
-                                             SteadyClock::now(), error);
+                                             capture::recordingNow(), error);
   if (recording) return recording;
   const bool isThere = error.ends_with(std::strerror(EEXIST));
   throw ToolError(EX_IOERR, error + (isThere ? " (--force replaces it)" : ""));
@@ -103,8 +103,12 @@ void recordOn(const RecordOptions& options, MainLoop& loop, Recorder& recorder,
     end = start + std::chrono::duration_cast<SteadyClock::duration>(Seconds(*options.durationS));
   }
   SteadyClock::time_point nextLook = start;
-  while (loop.runOnce(end ? std::min(*end, nextLook) : nextLook)) {
-    const auto now = SteadyClock::now();
+  const auto turn = [&] {
+    const auto next = end ? std::min(*end, nextLook) : nextLook;
+    return SteadyClock::now() + (next - capture::recordingNow());
+  };
+  while (loop.runOnce(turn())) {
+    const auto now = capture::recordingNow();
     if (end && now >= *end) return;
     if (now < nextLook) continue;
     nextLook = now + 1s;
@@ -121,7 +125,7 @@ void run(const RecordOptions& options) {
   requireService(options.bus);
   Recorder recorder(begin(options), hiderOf(options));
   RecordProgress progress;
-  const auto start = SteadyClock::now();
+  const auto start = capture::recordingNow();
   std::unique_ptr<RecordConnection> connection;
   const auto connector = tesk::bus::makeBusConnector(
       {options.bus},
@@ -140,7 +144,7 @@ void run(const RecordOptions& options) {
   connection.reset();
   const bool isWhole = recorder.close() && recorder.error().empty();
   if (recorder.errorNumber() == EPIPE) return;
-  progress.say(summary(options, recorder, SteadyClock::now() - start, lost));
+  progress.say(summary(options, recorder, capture::recordingNow() - start, lost));
   if (!isWhole) throw ToolError(EX_IOERR, recorder.error());
 }
 

@@ -32,8 +32,13 @@ class RecordingControl::Talk {
   RecordingControl& _control;
 };
 
-RecordingControl::RecordingControl(RecordingsFolder folder, Way way, const Clock& clock, Now now)
-    : _folder(std::move(folder)), _way(std::move(way)), _clock(clock), _now(std::move(now)) {
+RecordingControl::RecordingControl(RecordingsFolder folder, Way way, const Clock& clock, Now now,
+                                   Recorder::Asleep asleep)
+    : _folder(std::move(folder)),
+      _way(std::move(way)),
+      _clock(clock),
+      _now(std::move(now)),
+      _asleep(std::move(asleep)) {
   _view.hiddenText = kHidden;
 }
 
@@ -64,7 +69,7 @@ bool RecordingControl::begin() {
       _folder.pathOf(*name), limits, RotatingRecording::Existing::refused, _now(), _view.outcome);
   if (!recording) return false;
   auto hider = std::make_unique<IdentityHider>(Pseudonyms::random());
-  _recorder = std::make_unique<Recorder>(std::move(recording), std::move(hider), _clock);
+  _recorder = std::make_unique<Recorder>(std::move(recording), std::move(hider), _clock, _asleep);
   _connection = std::make_unique<RecordConnection>(
       *_way.connector, capture::kViewersRecorder, _way.bus, _way.configuration,
       [recorder = _recorder.get()](std::string_view eventName, const tesk::Message& event) {

@@ -27,7 +27,8 @@ struct RecordingControlView {
 
 // Main thread only. Records over a connection of its own, so that nothing is missing that the
 // screens leave out. Identities are always hidden. What is called while the service is waited for,
-// which may let the window live on, is ignored; a stop is done afterwards.
+// which may let the window live on, is ignored; a stop is done afterwards. `now` goes on while the
+// device sleeps, `asleep` tells how long it has slept.
 class RecordingControl {
  public:
   using TimePoint = std::chrono::steady_clock::time_point;
@@ -41,7 +42,7 @@ class RecordingControl {
   };
 
   RecordingControl(RecordingsFolder folder, Way way, const Clock& clock = systemClock(),
-                   Now now = std::chrono::steady_clock::now);
+                   Now now = capture::recordingNow, capture::Recorder::Asleep asleep = timeAsleep);
   ~RecordingControl();
 
   // Called after every change of the view.
@@ -73,6 +74,7 @@ class RecordingControl {
   const Way _way;
   const Clock& _clock;
   const Now _now;
+  const capture::Recorder::Asleep _asleep;
   std::function<void()> _onChanged;
   std::string _fileName;
   TimePoint _begun;

@@ -137,6 +137,23 @@ TEST_F(RecordedNight, TellsTheGapBeforeTheReportThatEndsIt) {
   EXPECT_TRUE(sleepOf(events[1]));
 }
 
+TEST_F(RecordedNight, CountsTheSleepInTheAgeOfAFile) {
+  RecordingLimits limits;
+  limits.fileAge = kPieceMs * 1ms;
+  std::string error;
+  recorder = std::make_unique<capture::Recorder>(
+      RotatingRecording::create(folder.path() + "/old.jsonl", limits,
+                                RotatingRecording::Existing::refused,
+                                std::chrono::steady_clock::now() + asleep, error),
+      nullptr, clock, [this] { return asleep; });
+  report(1);
+  recorder->tend();
+  EXPECT_EQ(recorder->progress().filesFinished, 0U);
+  sleep(std::chrono::milliseconds(kPieceMs));
+  recorder->tend();
+  EXPECT_EQ(recorder->progress().filesFinished, 1U);
+}
+
 TEST_F(RecordedNight, PassesOverANap) {
   report(1);
   sleep(4999ms);
