@@ -171,6 +171,28 @@ TEST_F(WithAScreenReader, theFirstScreenIsHeadingsButtonsAndRows) {
   EXPECT_FALSE(item(QAccessible::RadioButton, "Dark").state.checked);
 }
 
+// What is made first was told first: the foot before the rows, and the title last.
+TEST_F(WithAScreenReader, theFirstScreenIsReadFromTopToBottom) {
+  reportCell(123);
+  ASSERT_TRUE(comesToShow(window, "PCI 123, EARFCN 1300"));
+  const auto all = spokenItems(window);
+  const auto placeOf = [&all](const std::string& name) {
+    return std::ranges::find_if(all,
+                                [&name](const SpokenItem& item) {
+                                  return item.name.find(name) != std::string::npos &&
+                                         item.role != QAccessible::Window &&
+                                         item.role != QAccessible::Pane &&
+                                         item.role != QAccessible::List;
+                                }) -
+           all.begin();
+  };
+  const std::vector<std::string> inOrder = {"qelwatch", "PCI 123", "Device Info", "UMTS",
+                                            "GSM",      "Signals", "System"};
+  for (std::size_t i = 1; i < inOrder.size(); ++i) {
+    EXPECT_LT(placeOf(inOrder[i - 1]), placeOf(inOrder[i])) << inOrder[i] << '\n' << said();
+  }
+}
+
 TEST_F(WithAScreenReader, theCellIsReadAsOneSentenceWithEveryValue) {
   reportCell(123);
   reportLevel(-86);

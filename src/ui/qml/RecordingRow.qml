@@ -12,8 +12,7 @@ Tappable {
     readonly property real inset: Theme.inset(width)
     readonly property bool isCurrent: ListView.isCurrentItem && ((ListView.view as RowList)?.keysHere ?? false)
     readonly property bool beside: title.implicitWidth <= width - 2 * inset - remove.width
-    readonly property string facts:
-        [row.length, row.size, row.cells].filter(part => part).join("  \u00B7  ")
+    readonly property var facts: [row.length, row.size, row.cells].filter(part => part)
 
     signal deleted
 
@@ -22,7 +21,7 @@ Tappable {
     text: row.title
 
     Accessible.role: Accessible.ListItem
-    Accessible.name: [row.title, facts, row.fault].filter(part => part).join(", ")
+    Accessible.name: [row.title, ...facts, row.fault].filter(part => part).join(", ")
     Accessible.focused: isCurrent
 
     Rectangle {
@@ -54,7 +53,7 @@ Tappable {
         Text {
             width: parent.width
             visible: text !== ""
-            text: line.facts
+            text: line.facts.join("  \u00B7  ")
             textFormat: Text.PlainText
             color: Theme.secondary
             font.pointSize: Theme.nameSize

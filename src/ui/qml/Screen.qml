@@ -31,25 +31,7 @@ FocusScope {
         }
         width: Theme.hairline
     }
-    FocusScope {
-        id: content
-        anchors {
-            top: noticeBar.bottom
-            bottom: parent.bottom
-            left: parent.left
-            right: parent.right
-        }
-        focus: true
-    }
-    NoticeBar {
-        id: noticeBar
-        anchors {
-            top: bar.bottom
-            left: parent.left
-            right: parent.right
-        }
-        text: screen.navigation.notice
-    }
+    // In the order in which a screen reader tells them; the bar lies over what scrolls.
     ScreenBar {
         id: bar
         anchors {
@@ -57,6 +39,7 @@ FocusScope {
             left: parent.left
             right: parent.right
         }
+        z: 1
         title: screen.title
         subtitle: screen.subtitle
         previousTitle: screen.previousTitle
@@ -69,5 +52,25 @@ FocusScope {
             recorder: screen.navigation.pages.recorder
             mayBegin: screen.mayRecord
         }
+    }
+    NoticeBar {
+        id: noticeBar
+        anchors {
+            top: bar.bottom
+            left: parent.left
+            right: parent.right
+        }
+        z: 1
+        text: screen.navigation.notice
+    }
+    FocusScope {
+        id: content
+        anchors {
+            top: noticeBar.bottom
+            bottom: parent.bottom
+            left: parent.left
+            right: parent.right
+        }
+        focus: true
     }
 }

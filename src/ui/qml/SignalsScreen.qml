@@ -61,19 +61,21 @@ Screen {
                     visible: text !== ""
                     text: screen.curves.notice
                 }
+                // The time that is shown, and the buttons beside it or, where it is too wide, below.
                 Item {
+                    id: spanLine
+
+                    readonly property bool beside: span.implicitWidth <= width - zoomRow.width
+
                     x: screen.inset
                     width: parent.width - 2 * x
-                    height: Math.max(zoomRow.height, span.height + 8)
+                    height: beside ? Math.max(zoomRow.height, span.height + 8) : span.height + zoomRow.height
                     visible: screen.curves.chartCount > 0
 
                     Text {
                         id: span
-                        anchors {
-                            left: parent.left
-                            right: zoomRow.left
-                            verticalCenter: parent.verticalCenter
-                        }
+                        y: spanLine.beside ? Math.round((spanLine.height - height) / 2) : 0
+                        width: parent.width - (spanLine.beside ? zoomRow.width : 0)
                         text: screen.curves.span
                         textFormat: Text.PlainText
                         color: Theme.secondary
@@ -84,7 +86,10 @@ Screen {
                     }
                     Row {
                         id: zoomRow
-                        anchors.right: parent.right
+                        anchors {
+                            right: parent.right
+                            bottom: parent.bottom
+                        }
 
                         TextButton {
                             visible: !screen.curves.isAtEnd

@@ -10,4 +10,10 @@ void ScreenReader::enter(QQuickItem* row) const {
   QAccessible::updateAccessibility(&event);
 }
 
+void ScreenReader::readLast(QQuickItem* item) const {
+  if (!item || !item->parentItem()) return;
+  QQuickItem* last = item->parentItem()->childItems().constLast();
+  if (last != item) item->stackAfter(last);
+}
+
 }  // namespace qel

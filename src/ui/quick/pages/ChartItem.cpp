@@ -21,6 +21,12 @@ const Point* lastOf(const Curve& curve) {
   return nullptr;
 }
 
+// What stands beside a neighbour's curve; of "PCI 123" the number alone where there is no room.
+QString codeOf(const Curve& curve, bool isWhole) {
+  const QString label = shown(curve.label);
+  return isWhole ? label : label.section(u' ', -1);
+}
+
 // The value at which the band above a label ends.
 float endOfBand(const Chart& chart, std::size_t label) {
   return label + 1 < chart.labels.size() ? chart.labels[label + 1].value : chart.highest;
@@ -59,8 +65,9 @@ const Chart* ChartItem::chart() const {
   return &_page->page().charts[static_cast<std::size_t>(_chart)];
 }
 
-qreal ChartItem::AxisRoom::width() const {
-  return isOneColumn ? std::max(numbers, words) : words + kGap + numbers;
+qreal ChartItem::AxisRoom::width(Writing writing) const {
+  if (isOneColumn) return std::max(numbers, words);
+  return writing == Writing::withoutWords ? numbers : words + kGap + numbers;
 }
 
 // A word stands between the numbers of its band where the band is high enough for both.
@@ -80,10 +87,18 @@ ChartItem::AxisRoom ChartItem::axisRoom(const Chart& chart) const {
   return room;
 }
 
+ChartItem::Writing ChartItem::writing() const {
+  const auto leavesRoom = [this](Writing writing) {
+    return plotRect(writing).width() >= width() / 2;
+  };
+  if (leavesRoom(Writing::full)) return Writing::full;
+  return leavesRoom(Writing::shortCodes) ? Writing::shortCodes : Writing::withoutWords;
+}
+
 // Left of the curves stand the thresholds and what they mean, right of them the neighbours' codes,
 // above them the marks' letters and below them the times: nothing is written across a curve. Each
 // moment stands at the same place in all charts of the page.
-QRectF ChartItem::plotRect() const {
+QRectF ChartItem::plotRect(Writing writing) const {
   const QFontMetricsF metrics(_font);
   qreal left = 0;
   qreal right = kGap;
@@ -91,9 +106,10 @@ QRectF ChartItem::plotRect() const {
   const QRectF area = boundingRect().adjusted(0, line, 0, -line);
   if (!_page) return area;
   for (const Chart& each : _page->page().charts) {
-    left = std::max(left, axisRoom(each).width());
+    left = std::max(left, axisRoom(each).width(writing));
     for (const Curve& curve : each.curves) {
-      right = std::max(right, metrics.horizontalAdvance(shown(curve.label)) + 2 * kGap);
+      const QString code = codeOf(curve, writing == Writing::full);
+      right = std::max(right, metrics.horizontalAdvance(code) + 2 * kGap);
     }
   }
   return area.adjusted(left + kBandWidth + 2 * kGap, 0, -right, 0);
@@ -132,6 +148,7 @@ void ChartItem::drawAxis(QPainter& painter, const PlotArea& plot, const Chart& c
   const QFontMetricsF metrics(_font);
   const AxisRoom room = axisRoom(chart);
   const qreal numbers = plot.area().left() - kBandWidth - kGap;
+  const bool hasWords = room.isOneColumn || writing() != Writing::withoutWords;
   const qreal words = room.isOneColumn ? numbers : numbers - room.numbers - kGap;
   const auto write = [&](const std::string& text, const QColor& color, qreal right, qreal middle) {
     painter.setPen(color);
@@ -141,7 +158,7 @@ void ChartItem::drawAxis(QPainter& painter, const PlotArea& plot, const Chart& c
   for (std::size_t i = 0; i < chart.labels.size(); ++i) {
     const AxisLabel& label = chart.labels[i];
     write(label.text, _words, numbers, plot.y(label.value));
-    if (label.word.empty()) continue;
+    if (label.word.empty() || !hasWords) continue;
     write(label.word, colorOf(label.grade), words, plot.y((label.value + endOfBand(chart, i)) / 2));
   }
 }
@@ -181,6 +198,7 @@ void ChartItem::drawTimes(QPainter& painter, const PlotArea& plot) const {
 
 void ChartItem::drawCurves(QPainter& painter, const PlotArea& plot, const Chart& chart) const {
   const QFontMetricsF metrics(_font);
+  const bool areCodesWhole = writing() == Writing::full;
   std::vector<qreal> taken;
   for (const Curve& curve : chart.curves) {
     const QColor color = curve.isServing ? _serving : _neighbours;
@@ -193,7 +211,7 @@ void ChartItem::drawCurves(QPainter& painter, const PlotArea& plot, const Chart&
     taken.push_back(y);
     painter.setPen(_words);
     painter.drawText(QPointF(plot.area().right() + kGap, y + metrics.ascent() / 2 - 1),
-                     shown(curve.label));
+                     codeOf(curve, areCodesWhole));
   }
 }
 

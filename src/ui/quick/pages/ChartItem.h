@@ -7,6 +7,7 @@
 #include <QtGui/QFont>
 #include <QtQuick/QQuickPaintedItem>
 #include <array>
+#include <cstdint>
 
 #include "ui/quick/pages/CurvePainter.h"
 #include "ui/quick/pages/SignalsModel.h"
@@ -55,17 +56,23 @@ class ChartItem : public QQuickPaintedItem {
   void geometryChange(const QRectF& now, const QRectF& before) override;
 
  private:
+  // What gives way to the curves where large text takes more than half of the width: of a
+  // neighbour's code all but its number, then words that stand in a column of their own.
+  enum class Writing : std::uint8_t { full, shortCodes, withoutWords };
+
   // How much room the numbers and the words at the left of the curves take.
   struct AxisRoom {
     qreal numbers = 0;
     qreal words = 0;
     bool isOneColumn = true;  // words stand between numbers; else left of them
-    qreal width() const;
+    qreal width(Writing writing) const;
   };
 
   const Chart* chart() const;
   AxisRoom axisRoom(const Chart& chart) const;
-  QRectF plotRect() const;
+  Writing writing() const;
+  QRectF plotRect() const { return plotRect(writing()); }
+  QRectF plotRect(Writing writing) const;
   QColor colorOf(Grade grade) const;
   void drawBands(QPainter& painter, const PlotArea& plot, const Chart& chart) const;
   void drawAxis(QPainter& painter, const PlotArea& plot, const Chart& chart) const;
