@@ -29,41 +29,70 @@ std::uint64_t eightAt(const char* at) {
   return word;
 }
 
-// Both are so long. Most keys have eight to sixteen characters: their ends are all of them.
-bool areSame(const char* a, const char* b, std::size_t size) {
-  constexpr std::size_t kWord = sizeof(std::uint64_t);
-  if (a == b) return true;
-  if (size < kWord || size > 2 * kWord) return std::memcmp(a, b, size) == 0;
-  const std::size_t last = size - kWord;
-  return eightAt(a) == eightAt(b) && eightAt(a + last) == eightAt(b + last);
+constexpr std::size_t kWord = sizeof(std::uint64_t);
+
+// A key, and its two ends as numbers: most keys have eight to sixteen characters, of which they are
+// all.
+struct Wanted {
+  explicit Wanted(std::string_view key)
+      : data(key.data()),
+        size(key.size()),
+        first(eightAt(data)),
+        last(eightAt(data + size - kWord)) {}
+  static bool suits(std::string_view key) { return key.size() - kWord <= kWord; }
+
+  bool isOf(const Dictionary::Entry& entry) const {
+    const std::string_view other = entry.key;
+    if (other.size() != size) return false;
+    return other.data() == data ||
+           (eightAt(other.data()) == first && eightAt(other.data() + size - kWord) == last);
+  }
+
+  const char* data;
+  std::size_t size;
+  std::uint64_t first;
+  std::uint64_t last;
+};
+
+// Apart, so that the usual search calls nothing.
+[[gnu::noinline]] const Dictionary::Entry* searchAnyKey(const Dictionary& dictionary,
+                                                        std::string_view key) {
+  for (const Dictionary::Entry& entry : dictionary) {
+    if (entry.key.view() == key) return &entry;
+  }
+  return nullptr;
+}
+
+// The entry under the key, or null.
+const Dictionary::Entry* search(const Dictionary& dictionary, std::string_view key) {
+  if (!Wanted::suits(key)) return searchAnyKey(dictionary, key);
+  const Wanted wanted(key);
+  for (const Dictionary::Entry& entry : dictionary) {
+    if (wanted.isOf(entry)) return &entry;
+  }
+  return nullptr;
 }
 
 bool isUnder(const Dictionary::Entry& entry, std::string_view key) {
-  const std::string_view other = entry.key;
-  return other.size() == key.size() && areSame(other.data(), key.data(), key.size());
-}
-
-// The entry under the key, or the end.
-const Dictionary::Entry* search(const Dictionary& dictionary, std::string_view key) {
-  return std::ranges::find_if(dictionary, [key](const auto& entry) { return isUnder(entry, key); });
+  return Wanted::suits(key) ? Wanted(key).isOf(entry) : entry.key.view() == key;
 }
 
 }  // namespace
 
 const Value* Dictionary::find(std::string_view key) const {
   const Entry* found = search(*this, key);
-  return found == end() ? nullptr : &found->value;
+  return found ? &found->value : nullptr;
 }
 
 Value* Dictionary::find(std::string_view key) {
   const Entry* found = search(*this, key);
-  return found == end() ? nullptr : &_entries[static_cast<std::size_t>(found - begin())].value;
+  return found ? &_entries[static_cast<std::size_t>(found - begin())].value : nullptr;
 }
 
 Value* Dictionary::find(std::string_view key, std::size_t& place) {
   if (place >= size() || !isUnder(begin()[place], key)) {
     const Entry* found = search(*this, key);
-    if (found == end()) return nullptr;
+    if (!found) return nullptr;
     place = static_cast<std::size_t>(found - begin());
   }
   return &_entries[place].value;
@@ -79,7 +108,7 @@ void Dictionary::set(Text key, Value value) {
 
 void Dictionary::remove(std::string_view key) {
   const Entry* found = search(*this, key);
-  if (found != end()) _entries.erase(_entries.begin() + (found - begin()));
+  if (found) _entries.erase(_entries.begin() + (found - begin()));
 }
 
 void Dictionary::assign(Text key, const Value* value) {

@@ -21,7 +21,8 @@ constinit thread_local unsigned dropping = 0;
 Sink& standardOutputSlot();
 void flushStandardOutput() { standardOutputSlot()->flush(); }
 
-Sink* makeStandardOutputSlot() {
+// Apart from what every line asks for.
+[[gnu::noinline]] Sink* makeStandardOutputSlot() {
   std::atexit(flushStandardOutput);
   atFatalError(flushStandardOutput);
   return new Sink(std::make_shared<DescriptorSink>(STDOUT_FILENO));
@@ -37,6 +38,11 @@ Sink& systemLogSlot() {
   static auto& sink =
       *new Sink(std::make_shared<SystemLogSink>("qelwatch", SystemLogSink::Echo::none));
   return sink;
+}
+
+[[gnu::noinline]] LogSink& noOutput() {
+  static auto& none = *new NullSink();
+  return none;
 }
 
 Sink orNull(Sink sink) { return sink ? std::move(sink) : std::make_shared<NullSink>(); }
@@ -55,8 +61,9 @@ DroppedOutput::DroppedOutput() { ++dropping; }
 DroppedOutput::~DroppedOutput() { --dropping; }
 
 LogSink& standardOutput() {
-  static auto& none = *new NullSink();
-  return dropping == 0 ? *standardOutputSlot() : none;
+  if (dropping != 0) [[unlikely]]
+    return noOutput();
+  return *standardOutputSlot();
 }
 LogSink& systemLog() { return *systemLogSlot(); }
 void setStandardOutput(Sink sink) { standardOutputSlot() = orNull(std::move(sink)); }
