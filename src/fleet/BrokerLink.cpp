@@ -63,6 +63,7 @@ void BrokerLink::EndClient::operator()(mosquitto* client) const { mosquitto_dest
 
 BrokerLink::BrokerLink(const LinkSettings& settings, Arrival arrival)
     : _arrival(std::move(arrival)),
+      _files({settings.caFile, settings.certificateFile, settings.keyFile}),
       _keepAlive(settings.keepAlive),
       _subscription(settings.subscription) {
   beginLibrary();
@@ -98,7 +99,7 @@ void BrokerLink::setCallbacks(mosquitto* client) {
                                                   static_cast<std::size_t>(message->payloadlen)});
   });
   mosquitto_log_callback_set(client, [](mosquitto*, void* link, int level, const char* text) {
-    if (level == MOSQ_LOG_ERR) static_cast<Link*>(link)->_lastComplaint = text;
+    if (level == MOSQ_LOG_ERR) static_cast<Link*>(link)->hear(text);
   });
 }
 
@@ -171,14 +172,26 @@ int BrokerLink::connect(const LinkSettings& settings) {
   return code;
 }
 
+// Of a file the library says first that it cannot use it, then the cause, then what came of that.
+void BrokerLink::hear(std::string_view complaint) {
+  for (const std::string& file : _files) {
+    if (file.empty() || complaint.find('"' + file + '"') == std::string_view::npos) continue;
+    _faultyFile = file;
+    _complaint.clear();
+    return;
+  }
+  if (_faultyFile.empty() || _complaint.empty()) _complaint = complaint;
+}
+
 // Why it ended, as far as that was not noted before.
 void BrokerLink::note(int code) {
   const int error = errno;
   _state = State::ended;
   if (!_failure.why.empty()) return;
   if (code == MOSQ_ERR_TLS || code == MOSQ_ERR_TLS_HANDSHAKE ||
-      _lastComplaint.find("OpenSSL") != std::string::npos) {
-    _failure.why = "TLS: " + (_lastComplaint.empty() ? "no agreement" : lastPart(_lastComplaint));
+      _complaint.find("OpenSSL") != std::string::npos) {
+    _failure.why = "TLS: " + (_faultyFile.empty() ? "" : _faultyFile + ": ") +
+                   (_complaint.empty() ? "no agreement" : lastPart(_complaint));
     _failure.isRefusal = true;
   } else if (code == MOSQ_ERR_EAI) {
     _failure.why = lowered(::gai_strerror(error));

@@ -1,6 +1,7 @@
 // One connection to an MQTT 5 broker.
 #pragma once
 
+#include <array>
 #include <chrono>
 #include <cstdint>
 #include <functional>
@@ -93,6 +94,7 @@ class BrokerLink {
   bool prepareTls(const LinkSettings& settings);
   void holdBack(bool held) const;
   void note(int code);
+  void hear(std::string_view complaint);
   void greeted(int reason, const mqtt5__property* properties);
   void ended(int code);
   void subscribe();
@@ -115,7 +117,9 @@ class BrokerLink {
   std::unique_ptr<mosquitto, EndClient> _client;
   State _state = State::greeting;
   LinkFailure _failure;
-  std::string _lastComplaint;  // of the library
+  const std::array<std::string, 3> _files;  // that are shown to the library
+  std::string _faultyFile;                  // of these
+  std::string _complaint;                   // of the library
   std::chrono::seconds _keepAlive;
   std::uint16_t _mostAliases = 0;
   std::map<std::string, Alias> _aliases;  // of topics

@@ -127,6 +127,23 @@ TEST_F(PublishTrouble, isACertificateThatNobodyKnows) {
   EXPECT_TRUE(eventually([&] { return publisher.hasSaid("connected as one"); })) << publisher.err();
 }
 
+TEST_F(PublishTrouble, isAFileThatHoldsNoCertificateOrKey) {
+  const Certificates own(directory, "own");
+  const Certificates other(directory, "other");
+  const Broker broker(directory, own.listenerLines());
+  const std::string url = "mqtts://localhost:" + std::to_string(broker.port());
+  const std::string bad = write("bad", "no certificate\n");
+  const auto expectWhy = [&](const std::vector<std::string>& more, const std::string& why) {
+    expectOneLine(publish(url, more), 69, url + ": TLS: " + why);
+  };
+  expectWhy({"--ca", bad}, bad + ": no certificate or crl found");
+  expectWhy({"--ca", own.authority(), "--cert", bad, "--key", own.clientKey()},
+            bad + ": no start line");
+  expectWhy({"--ca", own.authority(), "--cert", own.client(), "--key", bad}, bad + ": unsupported");
+  expectWhy({"--ca", own.authority(), "--cert", own.client(), "--key", other.clientKey()},
+            other.clientKey() + ": key values mismatch");
+}
+
 TEST_F(PublishTrouble, isAQueueThatAnotherOneUses) {
   const Broker broker(directory);
   RunningQelctl publisher(publishing(broker.url()));
