@@ -9,7 +9,6 @@
 #include <string>
 
 #include "base/DispatchQueue.h"
-#include "base/FileContent.h"
 #include "base/TerminalText.h"
 #include "capture/RecordConnection.h"
 #include "fleet/EventIntake.h"
@@ -31,8 +30,6 @@ namespace {
 using namespace std::chrono_literals;
 using LoopClock = MainLoop::Clock;
 using Seconds = std::chrono::duration<double>;
-
-constexpr std::size_t kLargestConfigurationBytes = 1024 * 1024;
 
 struct Options {
   BrokerOptions broker;
@@ -110,7 +107,7 @@ void runUntilTheEnd(const Options& options, MainLoop& loop, fleet::Publisher& pu
 void run(const Options& options) {
   MainLoop loop;
   findResources();
-  Bytes configuration = contentOfFile(configurationFile(), kLargestConfigurationBytes);
+  const Bytes asked = configuration();
   fleet::PublishSettings settings = settingsOf(options);
   const std::string folder = stateFolder(options.stateFolder);
   const auto queue = queueIn(folder, options);
@@ -131,7 +128,7 @@ void run(const Options& options) {
       {options.bus}, serviceObserver(say, [&connection] { connection->begin(); }),
       loop.answerWaits());
   connection = std::make_unique<capture::RecordConnection>(
-      *connector, capture::kPublisher, options.bus, std::move(configuration),
+      *connector, capture::kPublisher, options.bus, asked,
       [&intake](std::string_view eventName, const tesk::Message& event) {
         intake.take(eventName, event);
       });
