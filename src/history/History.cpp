@@ -106,8 +106,13 @@ struct History::State {
       series.data()[static_cast<std::size_t>(quantity)].add(latestMs, value);
     };
   }
-  // These are apart from what is done for every report, of which there are many.
-  // Before the report that ends it.
+  static const Dictionary& noRecord() {
+    static const Dictionary kNone;
+    return kNone;
+  }
+
+  // These three are apart from what is done for every report. The gap comes before the report that
+  // ends it.
   [[gnu::noinline]] void addGap(std::uint64_t silenceMs, std::int64_t metric,
                                 std::uint64_t receivedMs);
   [[gnu::noinline]] void follow(const StoredMetric& metric, Handling handling);
@@ -142,8 +147,7 @@ struct History::State {
 
 void History::State::addGap(std::uint64_t silenceMs, std::int64_t metric,
                             std::uint64_t receivedMs) {
-  static const Dictionary kNothing;
-  happenings.tellText({metric, kNothing, receivedMs, latestMs}, HappeningKind::gap, std::nullopt,
+  happenings.tellText({metric, noRecord(), receivedMs, latestMs}, HappeningKind::gap, std::nullopt,
                       "Nothing was reported for " + durationText(silenceMs));
   for (Series& one : series) one.interrupt();
 }
@@ -205,8 +209,7 @@ void History::metricWasPassedOver(const PassedMetric& metric) {
     state.journal.add(state.measurements, atMs, metric.payload);
     ServingReader::tell(*measurement, state.plotter());
   } else if (metric.identifier == kLteLinkFailure) {
-    static const Dictionary kNothing;
-    state.radio.followLinkFailure({metric.identifier, kNothing, metric.receivedMs, atMs},
+    state.radio.followLinkFailure({metric.identifier, State::noRecord(), metric.receivedMs, atMs},
                                   state.happenings);
   }
 }
