@@ -87,13 +87,13 @@ class TextWriter {
     plain::close(_out, "], ");
   }
 
-  static thread_local std::array<std::vector<const FieldDescriptor*>, 8> _fields;  // by depth
+  static std::array<std::vector<const FieldDescriptor*>, 8> _fields;  // by depth
   Line& _out;
   std::string _scratch;
   std::size_t _depth = 0;
 };
 
-thread_local std::array<std::vector<const FieldDescriptor*>, 8> TextWriter::_fields;
+std::array<std::vector<const FieldDescriptor*>, 8> TextWriter::_fields;
 
 class MessageRecord {
  public:
