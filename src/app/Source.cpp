@@ -9,8 +9,8 @@
 #include "app/EventLoopWait.h"
 #include "base/FileContent.h"
 #include "base/TerminalText.h"
+#include "feed/EmbeddedFeed.h"
 #include "recording/RecordingsFolder.h"
-#include "service/InProcessConnector.h"
 #include "sources/diagnostics/port/PortName.h"
 #include "tesk/Transport.h"
 #include "ui/kit/ResourceBundle.h"
@@ -56,19 +56,22 @@ int Source::open(const Options& options) {
     first(reachable, why);
     then(reachable, why);
   };
-  const auto condition = [first = _book->condition(),
-                          then = _condition->observer()](const tesk::bus::Condition& told) {
-    first(told);
-    then(told.line);
-  };
   _connector = std::make_shared<ClosingConnector>(tesk::bus::makeBusConnector(
       {options.bus}, watch, [patience] { return std::make_shared<EventLoopWait>(patience); },
-      condition, kRestOfEvents));
+      conditionObserver(), kRestOfEvents));
   tesk::setConnector(_connector);
   // A recording tells when each event came.
   _recordConnector = std::make_shared<ClosingConnector>(tesk::bus::makeBusConnector(
       {options.bus}, {}, [patience] { return std::make_shared<EventLoopWait>(patience); }));
   return 0;
+}
+
+tesk::bus::ConditionObserver Source::conditionObserver() const {
+  return [first = _book->condition(),
+          then = _condition->observer()](const tesk::bus::Condition& told) {
+    first(told);
+    then(told.line);
+  };
 }
 
 void Source::showIn(Navigation& navigation) {
@@ -101,18 +104,12 @@ void Source::letRecord(RecorderModel& recorder) const {
 
 int Source::openWithin(const std::string& source) {
   sources::SourceError error;
-  auto core = service::makeServiceCore(source, error);
-  if (!core) {
+  auto connector = connectWithin(source, conditionObserver(), error);
+  if (!connector) {
     complain("qelwatch", error.message);
     return error.exitCode;
   }
-  service::ConditionBook& book = core->condition();
-  book.observe([&book, first = _book->condition(), then = _condition->observer()] {
-    const sources::SourceCondition current = book.current();
-    first({inWords(current), std::string(current.state), current.model, current.reason});
-    then(inWords(current));
-  });
-  _connector = std::make_shared<ClosingConnector>(service::makeInProcessConnector(std::move(core)));
+  _connector = std::make_shared<ClosingConnector>(std::move(connector));
   _recordConnector = _connector;
   tesk::setConnector(_connector);
   return 0;

@@ -33,6 +33,8 @@ class Source {
 
  private:
   int openWithin(const std::string& source);
+  // The book and the window's line hear of it.
+  tesk::bus::ConditionObserver conditionObserver() const;
   void letRecord(RecorderModel& recorder) const;
 
   std::optional<std::string> _bus;  // nothing: a source within this process

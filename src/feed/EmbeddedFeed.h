@@ -10,8 +10,12 @@
 
 namespace qel {
 
-// Connections to a service core on the source, whose condition the book follows. Nothing when there
-// is no such source; `error` then holds an exit code and one line why.
+// Connections to a service core on the source, of whose condition `tell` hears, from any thread.
+// Nothing when there is no such source; `error` then holds an exit code and one line why.
+std::shared_ptr<tesk::Connector> connectWithin(const std::string& source,
+                                               tesk::bus::ConditionObserver tell,
+                                               sources::SourceError& error);
+// The book follows the condition.
 std::shared_ptr<tesk::Connector> connectWithin(const std::string& source, FeedBook& book,
                                                sources::SourceError& error);
 
