@@ -39,11 +39,12 @@ std::vector<char**> programsOf(char** words) {
   return programs;
 }
 
-// Reads the program's standard error until it tells of a frame. False when it ends without.
+// Reads the program's standard error until it tells of a frame, which render loops begin with
+// another letter. False when it ends without.
 bool waitForFrame(int descriptor) {
   std::string heard;
   std::array<char, 4096> piece;
-  while (heard.find("Frame rendered") == std::string::npos) {
+  while (heard.find("rame rendered") == std::string::npos) {
     const ssize_t size = ::read(descriptor, piece.data(), piece.size());
     if (size <= 0) return false;
     heard.append(piece.data(), static_cast<std::size_t>(size));

@@ -3,66 +3,21 @@
 // hand and no service.
 
 #include <QtCore/QStringListModel>
-#include <QtCore/QTemporaryDir>
-#include <QtCore/QTimer>
-#include <QtGui/QGuiApplication>
-#include <QtQml/QQmlApplicationEngine>
 #include <QtQml/QQmlContext>
-#include <QtQuick/QQuickWindow>
 #include <functional>
 #include <string_view>
 
-#include "metrics/MetricValidator.h"
 #include "programs/Figures.h"
-#include "tesk/Transport.h"
-#include "ui/kit/RunLoop.h"
-#include "ui/quick/Navigation.h"
-#include "ui/quick/QuickRunLoop.h"
+#include "programs/ViewerWindow.h"
 
 namespace qel::benchmarks {
 namespace {
 
 using namespace std::chrono_literals;
 
-constexpr int kSections = 20;
-constexpr int kRowsEach = 10;
 constexpr int kRedraws = 100;
 constexpr int kScreens = 1000;
 constexpr auto kWatched = 20s;
-
-void handleEvents(std::chrono::milliseconds time) {
-  QEventLoop loop;
-  QTimer::singleShot(time, &loop, &QEventLoop::quit);
-  loop.exec();
-}
-
-// Handles events until the window has shown another frame.
-void waitForFrame(QQuickWindow& window) {
-  QEventLoop loop;
-  QObject::connect(&window, &QQuickWindow::frameSwapped, &loop, &QEventLoop::quit);
-  QTimer::singleShot(5s, &loop, &QEventLoop::quit);
-  loop.exec();
-}
-
-// 200 rows whose values carry the number.
-void fillStore(int number) {
-  EntryList& cells = MetricValidator::shared()->myLTE.EutraNbrs;
-  cells.clear();
-  for (int section = 0; section < kSections; ++section) {
-    Dictionary cell;
-    for (int row = 0; row < kRowsEach; ++row) {
-      cell.set("field_name_" + std::to_string(row), number + section * kRowsEach + row);
-    }
-    cells.push_back(std::move(cell));
-  }
-}
-
-void choose(Navigation& navigation, const QString& text) {
-  TableModel& menu = *navigation.top();
-  for (int row = 0; row < menu.count(); ++row) {
-    if (menu.data(menu.index(row), TableModel::textRole).toString() == text) menu.choose(row);
-  }
-}
 
 // Processor time in µs of what happens between the call and the end of the work that it caused.
 double cost(const std::function<void()>& work) {
@@ -78,12 +33,6 @@ double medianCost(const std::function<void()>& prepare, const std::function<void
     costs.push_back(cost(work));
   }
   return median(costs);
-}
-
-// The five seconds are over: every timer fires and the queue is worked off.
-void tick() {
-  RunLoop::main().fireDue(*RunLoop::main().nextDue());
-  QCoreApplication::sendPostedEvents();
 }
 
 // The same rows as a list whose model is reset, as they would be without a comparison.
@@ -136,17 +85,17 @@ void measurePlainList(double& same, double& changed) {
 
 std::string perTick(double microseconds) { return text(microseconds / 1000, "ms", 3); }
 
-void measureRedraw(QQuickWindow& window, Navigation& navigation) {
+void measureRedraw(const ViewerWindow& viewer) {
   int number = 0;
   fillStore(number);
-  choose(navigation, QStringLiteral("EUTRA Neighbor Info"));
+  viewer.choose("EUTRA Neighbor Info");
   handleEvents(1s);
   const auto change = [&number] { fillStore(number += 1000); };
   const double same = medianCost([] {}, tick);
   const double compared = medianCost(change, tick);
-  const auto tickAndDraw = [&window] {
+  const auto tickAndDraw = [&viewer] {
     tick();
-    waitForFrame(window);
+    waitForFrame(viewer.window());
   };
   handleEvents(1s);
   const double drawn = medianCost(
@@ -194,20 +143,20 @@ std::string watchedText(const Watched& watched) {
   return text(watched.percent, "% of a core, ", 3) + text(watched.wakeUpsEachSecond, "wake-ups/s");
 }
 
-void openAndLeave(Navigation& navigation, int times) {
+void openAndLeave(const ViewerWindow& viewer, int times) {
   for (int i = 0; i < times; ++i) {
-    choose(navigation, QStringLiteral("EUTRA Neighbor Info"));
+    viewer.choose("EUTRA Neighbor Info");
     QCoreApplication::processEvents();
-    navigation.back();
+    viewer.navigation().back();
     QCoreApplication::processEvents();
-    navigation.settle();
+    viewer.navigation().settle();
   }
 }
 
-void measureScreens(Navigation& navigation) {
-  openAndLeave(navigation, 1);
+void measureScreens(const ViewerWindow& viewer) {
+  openAndLeave(viewer, 1);
   const Watched before = watch();
-  openAndLeave(navigation, kScreens);
+  openAndLeave(viewer, kScreens);
   const Watched after = watch();
   printRow("1,000 category screens opened and left", watchedText(after),
            watchedText(before) + ": one", "< 0.5 %, no more wake-ups");
@@ -217,30 +166,16 @@ void measureScreens(Navigation& navigation) {
 }  // namespace qel::benchmarks
 
 int main(int argc, char** argv) {
-  using namespace qel;
   using namespace qel::benchmarks;
-  const QTemporaryDir home;
   qputenv("QT_QPA_PLATFORM", "offscreen");
-  qputenv("XDG_CONFIG_HOME", home.path().toLocal8Bit());
-  qputenv("XDG_RUNTIME_DIR", home.path().toLocal8Bit());
-  qputenv("DBUS_SESSION_BUS_ADDRESS", "unix:path=/nonexistent");
-  const QGuiApplication application(argc, argv);
-  setStandardOutput(nullptr);
-  setSystemLog(nullptr);
-  tesk::setConnector(nullptr);
-  const QuickRunLoop runLoop;
-  QQmlApplicationEngine engine;
-  engine.addImportPath(QStringLiteral("qrc:/qt/qml"));
-  engine.load(QStringLiteral("qrc:/qt/qml/Qelwatch/Ui/qml/Main.qml"));
-  if (engine.rootObjects().isEmpty()) return 1;
-  auto& window = *qobject_cast<QQuickWindow*>(engine.rootObjects().constFirst());
-  auto& navigation = *window.property("navigation").value<Navigation*>();
+  const ViewerWindow viewer(argc, argv);
+  if (!viewer.isThere()) return 1;
   handleEvents(1s);
-  choose(navigation, QStringLiteral("LTE"));
+  viewer.choose("LTE");
   handleEvents(1s);
   if (argc == 2 && std::string_view(argv[1]) == "screens") {
-    measureScreens(navigation);
+    measureScreens(viewer);
   } else {
-    measureRedraw(window, navigation);
+    measureRedraw(viewer);
   }
 }
