@@ -65,6 +65,7 @@ BrokerLink::BrokerLink(const LinkSettings& settings, Arrival arrival)
     : _arrival(std::move(arrival)),
       _files({settings.caFile, settings.certificateFile, settings.keyFile}),
       _keepAlive(settings.keepAlive),
+      _awaitsReceiver(settings.awaitsReceiver),
       _subscription(settings.subscription) {
   beginLibrary();
   _client.reset(mosquitto_new(settings.client.c_str(), !_subscription, this));
@@ -297,7 +298,8 @@ BrokerLink::Alias* BrokerLink::aliasOf(const std::string& topic) {
 }
 
 void BrokerLink::answered(int message, int reason) {
-  const bool isRefused = reason >= MQTT_RC_UNSPECIFIED;
+  const bool isForNobody = _awaitsReceiver && reason == MQTT_RC_NO_MATCHING_SUBSCRIBERS;
+  const bool isRefused = reason >= MQTT_RC_UNSPECIFIED || isForNobody;
   if (const auto asked = _aliasesAsked.extract(message)) asked.mapped()->isTaken |= !isRefused;
   _arrival(message, isRefused ? reasonText(reason) : "");
 }

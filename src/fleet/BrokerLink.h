@@ -44,6 +44,7 @@ struct LinkSettings {
   std::string certificateFile;  // and its key: empty, or both
   std::string keyFile;
   std::chrono::seconds keepAlive{900};  // 0: the broker never hears of a silent client
+  bool awaitsReceiver = false;          // nobody has taken what nobody has subscribed to
   RetainedMessage will;
   std::optional<Subscription> subscription;
 };
@@ -124,6 +125,7 @@ class BrokerLink {
   std::uint16_t _mostAliases = 0;
   std::map<std::string, Alias> _aliases;  // of topics
   std::map<int, Alias*> _aliasesAsked;    // by the messages that told the broker of them
+  const bool _awaitsReceiver;
   const std::optional<Subscription> _subscription;
   bool _holdsAnswers = false;     // to messages that were delivered
   bool _isAcknowledging = false;  // some of these answers are not written yet

@@ -152,6 +152,8 @@ void addLinkOptions(CLI::App& command, Options& options) {
       ->type_name("TIME")
       ->transform(asMilliseconds())
       ->check(silent(CLI::Range(std::uint64_t{0}, std::uint64_t{65535000})));
+  command.add_flag("--await-receiver", options.broker.link.awaitsReceiver,
+                   "Keep events while nobody has subscribed to them, if the broker tells");
   command.add_flag("--keep-trying", options.settings.keepsTrying,
                    "Go on without service or when the broker refuses");
 }

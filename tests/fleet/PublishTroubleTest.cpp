@@ -34,6 +34,15 @@ TEST_F(PublishTrouble, isAnUrlThatIsNone) {
                 usage("--ca and --cert are for mqtts://"));
 }
 
+TEST_F(PublishTrouble, isAServiceThatIsNotThere) {
+  const PrivateBus empty;
+  const Outcome outcome =
+      qelctl({"publish", "mqtt://localhost", "--bus", empty.address(), "--state", file("state")});
+  EXPECT_EQ(outcome.exitCode, 69);
+  EXPECT_TRUE(outcome.err.starts_with("qelctl: baseband manager service: ")) << outcome.err;
+  EXPECT_EQ(std::ranges::count(outcome.err, '\n'), 1) << outcome.err;
+}
+
 TEST_F(PublishTrouble, isANumberInPlaceOfAName) {
   auto arguments = publishing("mqtt://localhost");
   *(std::ranges::find(arguments, "--phone") + 1) = "35-209900-176148-1";
@@ -84,6 +93,21 @@ TEST_F(PublishTrouble, isABrokerThatTakesNoMessages) {
   RunningQelctl publisher(publishing(broker.url()));
   ASSERT_TRUE(eventually([&] { return subscriber.numbers().size() > 30; })) << publisher.err();
   end(publisher);
+  EXPECT_TRUE(isWithoutGap(subscriber.events()));
+}
+
+TEST_F(PublishTrouble, isABrokerWithoutReceiversIfItIsToldSo) {
+  const Broker broker(directory);
+  RunningQelctl publisher(publishing(broker.url(), {"--await-receiver"}));
+  EXPECT_TRUE(eventually([&] {
+    return publisher.hasSaid(
+        ": the broker does not take messages to qelwatch/one/…: no matching subscribers; "
+        "events wait in the queue");
+  })) << publisher.err();
+  const Subscriber subscriber(broker, file("received"));
+  ASSERT_TRUE(eventually([&] { return subscriber.newest() > 50; })) << publisher.err();
+  const std::string said = end(publisher);
+  EXPECT_TRUE(eventually([&] { return subscriber.events().size() >= sentBy(said); })) << said;
   EXPECT_TRUE(isWithoutGap(subscriber.events()));
 }
 

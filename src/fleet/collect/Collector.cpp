@@ -103,13 +103,14 @@ void Collector::openLink() {
   if (!_link) loseLink(failure);
 }
 
-// What is not acknowledged comes again over the next link.
+// What is not acknowledged comes again over the next link, if the broker still has it.
 void Collector::endLink() {
   _link.reset();
   _batch.clear();
 }
 
 void Collector::loseLink(LinkFailure failure) {  // of its own: the link's goes with it
+  if (!_batch.isEmpty()) keepBatch();            // for a broker that was killed has forgotten it
   endLink();
   _linkRetries.failed(Clock::now());
   if (failure.isRefusal && !_hadLink && !_settings.keepsTrying) {
@@ -138,16 +139,21 @@ void Collector::turn(short revents) {
   }
 }
 
-void Collector::storeBatch() {
+bool Collector::keepBatch() {
   DatabaseTrouble trouble;
   if (!_database->store(_batch.messages(), _counts.database, trouble)) {
     loseDatabase(trouble);
-    return;
+    return false;
   }
   _databaseRetries.succeeded();
-  _linkRetries.succeeded();
   _counts.broken += _batch.broken();
   _batch.clear();
+  return true;
+}
+
+void Collector::storeBatch() {
+  if (!keepBatch()) return;
+  _linkRetries.succeeded();
   _link->acknowledge();
   turn(0);
 }

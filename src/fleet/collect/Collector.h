@@ -61,6 +61,7 @@ class Collector {
   void endLink();
   void turn(short revents);
   void storeBatch();
+  bool keepBatch();
   void leave();
   void sayBroken();
   void sayOnce(const std::string& line);
@@ -73,7 +74,8 @@ class Collector {
   std::unique_ptr<FleetDatabase> _database;
   std::unique_ptr<BrokerLink> _link;
   Retries _databaseRetries;
-  Retries _linkRetries;
+  // Some brokers forget who shares messages when they begin anew, and keep none for them.
+  Retries _linkRetries{std::chrono::seconds(5)};
   bool _hadDatabase = false;
   bool _hadLink = false;
   Clock::time_point _lastTraffic;

@@ -1,4 +1,6 @@
 // What goes wrong is said in one line, and no event is lost or doubled by it.
+#include <algorithm>
+
 #include "fleet/collect/WithDatabase.h"
 
 namespace qel::testing {
@@ -59,6 +61,37 @@ TEST_F(CollectTrouble, isADatabaseThatGoesAndComes) {
   }
   EXPECT_TRUE(program->hasSaid("database: back")) << program->err();
   expectAllOnce();
+}
+
+TEST_F(CollectTrouble, isABrokerThatGoesAndComes) {
+  prepare();
+  const auto program = collector();
+  sendSome(50);
+  ASSERT_TRUE(haveCome(_sent)) << program->err();
+  broker.kill();
+  ASSERT_TRUE(eventually([&] { return program->hasSaid("; trying again\n"); })) << program->err();
+  broker.start();
+  ASSERT_TRUE(eventually([&] { return program->hasSaid(": connected again as one of "); }))
+      << program->err();
+  sendSome(50);
+  EXPECT_TRUE(haveCome(_sent)) << program->err();
+  expectAllOnce();
+}
+
+TEST_F(CollectTrouble, isABrokerKilledBeforeItHeardOfWhatCame) {
+  prepare();
+  auto words = collecting();
+  *(std::ranges::find(words, "--every") + 1) = "30s";
+  RunningQelctl program(words);
+  ASSERT_TRUE(eventually([&] { return program.hasSaid("connected as one"); })) << program.err();
+  sendSome(5);
+  broker.kill();
+  EXPECT_TRUE(haveCome(_sent)) << program.err();
+  expectAllOnce();
+  broker.start();
+  ASSERT_TRUE(eventually([&] { return program.hasSaid("connected again as one"); }))
+      << program.err();
+  EXPECT_TRUE(end(program).ends_with(": 5 events stored\n")) << program.err();
 }
 
 TEST_F(CollectTrouble, isTheOtherCollectorKilled) {
