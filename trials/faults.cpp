@@ -22,6 +22,7 @@ constexpr std::array kScenarios = {
     Scenario{"kill-broker", "broker killed", 50, 2, killBroker},
     Scenario{"kill-publisher", "publisher killed", 50, 3, killPublisher},
     Scenario{"kill-collector", "collector killed", 50, 2, killCollector},
+    Scenario{"kill-collected-broker", "broker of collectors killed", 50, 2, killBrokerOfCollectors},
     Scenario{"kill-database", "database killed", 20, 1, killDatabase},
     Scenario{"stop-service", "service stopped for up to 6 s", 20, 0, stopService},
     Scenario{"stop-bus", "bus stopped for up to 6 s", 20, 0, stopBus},

@@ -36,12 +36,13 @@ class CollectingStand {
       promise(testing::eventually([&] { return !_collectors[i]->errors().empty(); }),
               name + " connects");
     }
-    _publisher = _stand.start(
-        "publisher", {QEL_QELCTL, "publish", _broker.url(), "--state",
-                      _stand.directory() + "/publisher", "--phone", "one", "--every", "20ms"});
+    _publisher = _stand.start("publisher", {QEL_QELCTL, "publish", _broker.url(), "--state",
+                                            _stand.directory() + "/publisher", "--phone", "one",
+                                            "--every", "20ms", "--await-receiver"});
     expectMore("at first");
   }
 
+  Broker& broker() { return _broker; }
   Postgres& database() { return _database; }
   Program& collector(std::size_t i) { return *_collectors[i % _collectors.size()]; }
 
@@ -108,6 +109,15 @@ void killCollector(Trial& trial) {
                           process.signal(SIGKILL);
                           process.waitForEnd();
                           process.start();
+                        });
+}
+
+// It forgets who shares messages, and then keeps none for those who are still away.
+void killBrokerOfCollectors(Trial& trial) {
+  repeatWhileCollecting(trial, "after the broker was killed",
+                        [](CollectingStand& stand, std::size_t) {
+                          stand.broker().kill();
+                          stand.broker().start();
                         });
 }
 

@@ -16,6 +16,7 @@ void fullQueueDisk(Trial& trial);
 
 // kill -9 of who stores what was sent, and of the database.
 void killCollector(Trial& trial);
+void killBrokerOfCollectors(Trial& trial);
 void killDatabase(Trial& trial);
 
 void stopService(Trial& trial);
