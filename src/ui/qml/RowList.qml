@@ -7,11 +7,7 @@ ListView {
     // Has its reader left the top?
     property bool scrolledAway: false
 
-    function readInOrder(): void {
-        ScreenReader.readLast(footerItem);
-    }
-
     // A list makes what stands below its rows before them.
-    onCountChanged: Qt.callLater(readInOrder)
+    onContentHeightChanged: ScreenReader.readLast(footerItem)
     onMovementEnded: scrolledAway = !atYBeginning
 }

@@ -1,5 +1,6 @@
 #include "ui/quick/ScreenReader.h"
 
+#include <QtCore/QTimer>
 #include <QtGui/QAccessible>
 
 namespace qel {
@@ -11,9 +12,12 @@ void ScreenReader::enter(QQuickItem* row) const {
 }
 
 void ScreenReader::readLast(QQuickItem* item) const {
-  if (!item || !item->parentItem()) return;
-  QQuickItem* last = item->parentItem()->childItems().constLast();
-  if (last != item) item->stackAfter(last);
+  if (!item) return;
+  QTimer::singleShot(0, item, [item] {
+    if (!item->parentItem()) return;
+    QQuickItem* last = item->parentItem()->childItems().constLast();
+    if (last != item) item->stackAfter(last);
+  });
 }
 
 }  // namespace qel

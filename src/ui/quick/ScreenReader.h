@@ -18,7 +18,8 @@ class ScreenReader final : public QObject {
 
   // The keyboard is now on this row, though what takes the keys is its list. Null: on none.
   Q_INVOKABLE void enter(QQuickItem* row) const;
-  // Of all items of its parent this is told last, whenever it was made. Null: nothing happens.
+  // Of all items that its parent has when this turn of events is over it is told last. Null:
+  // nothing happens.
   Q_INVOKABLE void readLast(QQuickItem* item) const;
 };
 
