@@ -109,8 +109,10 @@ void Collector::endLink() {
   _batch.clear();
 }
 
-void Collector::loseLink(LinkFailure failure) {  // of its own: the link's goes with it
-  if (!_batch.isEmpty()) keepBatch();            // for a broker that was killed has forgotten it
+// What has come is stored: a broker that was killed has forgotten it. The failure is its own, for
+// the link's goes with it.
+void Collector::loseLink(LinkFailure failure) {
+  if (!_batch.isEmpty()) keepBatch();
   endLink();
   _linkRetries.failed(Clock::now());
   if (failure.isRefusal && !_hadLink && !_settings.keepsTrying) {
