@@ -12,3 +12,6 @@ set(CMAKE_PREFIX_PATH /usr/lib/${QEL_TRIPLET}/cmake)
 set(CMAKE_IGNORE_PREFIX_PATH /usr/lib/${QEL_BUILDER})
 set(QT_HOST_PATH /usr)
 set(QT_HOST_PATH_CMAKE_DIR /usr/lib/${QEL_BUILDER}/cmake)
+
+# What pkg-config knows is that architecture's too.
+set(ENV{PKG_CONFIG_LIBDIR} ${CMAKE_SYSROOT}/usr/lib/${QEL_TRIPLET}/pkgconfig:${CMAKE_SYSROOT}/usr/share/pkgconfig)

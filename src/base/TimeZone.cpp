@@ -16,6 +16,8 @@
 namespace qel {
 namespace {
 
+static_assert(sizeof(std::time_t) == 8, "a time may be after 2038");
+
 class SystemTimeZone final : public TimeZone {
  public:
   CivilTime at(std::int64_t seconds) const override {

@@ -14,6 +14,8 @@
 namespace qel {
 namespace {
 
+static_assert(sizeof(::off_t) == 8, "a recording may be larger than 2 GiB");
+
 constexpr std::size_t kChunkBytes = 64 * 1024;
 constexpr std::string_view kGzipMark = "\x1f\x8b";
 
