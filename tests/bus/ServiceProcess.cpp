@@ -46,7 +46,7 @@ Client::Client(const PrivateBus& bus, const std::string& name) {
 template <class Condition>
 bool Client::waitFor(Condition condition) {
   std::unique_lock lock(_mutex);
-  return _changed.wait_for(lock, std::chrono::seconds(10), condition);
+  return _changed.wait_for(lock, std::chrono::seconds(60), condition);
 }
 
 bool Client::waitForReachable(bool reachable) {

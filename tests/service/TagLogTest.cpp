@@ -59,7 +59,7 @@ TEST_F(TagLogTest, AnEventOfMetricIdentifiersWritesOneLineAndIsDelivered) {
   core->performCommand(*session, tesk::kCommandAddConfiguration,
                        addRequest(configuration({{kRrcState}})));
   core->eventsOn(*session);
-  for (int i = 0; i < 3; ++i) source->send(metricEvent(kRrcState, 1000, tags(100'000)));
+  for (int i = 0; i < 3; ++i) source->send(metricEvent(kRrcState, 1000, tags(10'000)));
   EXPECT_EQ(log.count(), 3U);
   EXPECT_EQ(systemLog.lines().size(), 1U);
 }

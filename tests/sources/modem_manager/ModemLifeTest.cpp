@@ -57,8 +57,10 @@ TEST(ModemManagerSource, GoesOnAfterTheLossOfTheBus) {
   world.manager->add(kModemPath, modemWithRsrp(-71));
   EXPECT_TRUE(world.waitForRsrp(-71));
   world.source.reset();
-  ASSERT_THAT(log.lines(), ::testing::SizeIs(1));
-  EXPECT_THAT(log.lines()[0], HasSubstr("no message bus"));
+  // One line a reason: on a busy machine it finds the bus in other states on its way down and up.
+  EXPECT_THAT(log.lines(),
+              ::testing::SizeIs(::testing::AllOf(::testing::Ge(1U), ::testing::Le(3U))));
+  EXPECT_THAT(log.lines(), ::testing::Each(HasSubstr("no message bus")));
 }
 
 TEST(ModemManagerSource, TakesTheFirstModemAndStaysWithIt) {
