@@ -87,7 +87,7 @@ std::optional<ByteView> take(PBDataReader& reader, std::uint64_t count) {
     return std::nullopt;
   }
   reader._pos += count;
-  return left.first(count);
+  return left.first(static_cast<std::size_t>(count));
 }
 
 std::optional<ByteView> takeDelimited(PBDataReader& reader) {

@@ -20,7 +20,7 @@ class PBDataReader {
   // What may be read now. Nothing when the position is beyond the end.
   ByteView left() const {
     const std::uint64_t end = std::min(_length, _size);
-    return _pos < end ? ByteView(_bytes + _pos, end - _pos) : ByteView();
+    return _pos < end ? ByteView(_bytes + _pos, static_cast<std::size_t>(end - _pos)) : ByteView();
   }
 
   const std::uint8_t* const _bytes;

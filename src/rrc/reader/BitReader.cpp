@@ -37,8 +37,8 @@ std::int64_t BitReader::integer(std::int64_t low, std::int64_t high) {
 }
 
 std::size_t BitReader::length() {
-  if (!flag()) return bits(7);
-  if (!flag()) return bits(14);
+  if (!flag()) return static_cast<std::size_t>(bits(7));
+  if (!flag()) return static_cast<std::size_t>(bits(14));
   _failed = true;
   return 0;
 }
@@ -54,7 +54,7 @@ std::uint64_t BitReader::smallNumber() {
 }
 
 std::size_t BitReader::smallLength() {
-  if (!flag()) return bits(6) + 1;
+  if (!flag()) return static_cast<std::size_t>(bits(6)) + 1;
   const std::size_t count = length();
   if (count < 1) _failed = true;
   return count;

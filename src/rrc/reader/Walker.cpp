@@ -119,8 +119,9 @@ Step Walker::choice(BitReader& bits, const Type& type, Found& found, unsigned de
   if (type.extensible && bits.flag()) {
     const std::uint64_t index = bits.smallNumber();
     found.value = type.count + static_cast<std::int64_t>(index & 0xFFFF);
-    return addition(bits, index < type.additions ? &field(type, type.count + index) : nullptr,
-                    depth);
+    const bool known = index < type.additions;
+    return addition(
+        bits, known ? &field(type, type.count + static_cast<std::size_t>(index)) : nullptr, depth);
   }
   found.value = bits.integer(0, type.count - 1);
   if (bits.failed()) return Step::damaged;
