@@ -33,7 +33,8 @@ bool Exporter::tellHappenings() {
   const auto& happenings = _history.happenings();
   const std::uint64_t gone = _history.happeningsGone();
   for (; _happeningsTold < gone + happenings.size(); ++_happeningsTold) {
-    if (!_sink.put(happeningTable(), rowOf(happenings[_happeningsTold - gone]))) return false;
+    const auto index = static_cast<std::size_t>(_happeningsTold - gone);
+    if (!_sink.put(happeningTable(), rowOf(happenings[index]))) return false;
   }
   return true;
 }

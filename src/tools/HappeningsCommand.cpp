@@ -65,7 +65,7 @@ class Printer {
     const auto& happenings = history.happenings();
     const std::uint64_t gone = history.happeningsGone();
     for (; _next < gone + happenings.size(); ++_next) {
-      if (_next >= gone) print(happenings[_next - gone]);
+      if (_next >= gone) print(happenings[static_cast<std::size_t>(_next - gone)]);
     }
   }
 

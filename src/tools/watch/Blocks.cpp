@@ -51,7 +51,7 @@ std::size_t eighthsOf(double value, const BlockFrame& frame, std::size_t lines) 
 std::size_t columnOf(std::uint64_t timeMs, const BlockFrame& frame) {
   const std::uint64_t span = std::max<std::uint64_t>(1, frame.toMs - frame.fromMs);
   const std::uint64_t into = std::clamp(timeMs, frame.fromMs, frame.toMs) - frame.fromMs;
-  return std::min<std::size_t>(into * frame.columns / span, frame.columns - 1);
+  return std::min(static_cast<std::size_t>(into * frame.columns / span), frame.columns - 1);
 }
 
 std::vector<std::string> bars(const std::vector<Run>& runs, const BlockFrame& frame,

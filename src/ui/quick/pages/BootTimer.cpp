@@ -45,7 +45,8 @@ void BootTimer::set(std::chrono::milliseconds wait) {
   const auto seconds = std::chrono::duration_cast<std::chrono::seconds>(wait);
   itimerspec spec{};
   spec.it_value.tv_sec = seconds.count();
-  spec.it_value.tv_nsec = std::chrono::nanoseconds(wait - seconds).count();
+  const auto rest = std::chrono::nanoseconds(wait - seconds).count();
+  spec.it_value.tv_nsec = static_cast<decltype(spec.it_value.tv_nsec)>(rest);
   ::timerfd_settime(_descriptor, 0, &spec, nullptr);
 }
 
