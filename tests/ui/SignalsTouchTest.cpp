@@ -5,13 +5,16 @@
 #include <QtCore/QCoreApplication>
 #include <QtCore/QPoint>
 #include <QtCore/QPointF>
+#include <QtGui/QGuiApplication>
 #include <QtGui/QPointingDevice>
 #include <QtGui/QWheelEvent>
 #include <QtTest/QTest>
 #include <map>
 #include <memory>
 
+#include "messages/lte_neighbours.h"
 #include "messages/lte_serving.h"
+#include "ui/Reports.h"
 #include "ui/Window.h"
 
 namespace qel {
@@ -51,6 +54,18 @@ void reportTheHourBeforeNow(History& history) {
         {{"kKeyMetricID", MetricValidator::K_LTE_RSRP_RSRQ_SINR}, {"kKeyPayload", signal.data()}});
   }
   validator->setObserver(&history);
+}
+
+void reportNeighbour() {
+  auto cell = std::make_shared<EgwErrcNbrEutraMeas>();
+  cell->setNbrEarfcn(1300);
+  cell->setNbrPhysCellId(321);
+  cell->setNbrRsrp(40);
+  cell->setNbrRsrq(14);
+  KCellularLteNbrEutraCellMeas neighbours;
+  neighbours.addMeasNbrEutra(cell);
+  MetricValidator::shared()->processMetric(
+      {{"kKeyMetricID", MetricValidator::K_LTE_INTRARAT_MEAS}, {"kKeyPayload", neighbours.data()}});
 }
 
 class SignalsUnderFingers : public ::testing::Test {
@@ -320,6 +335,26 @@ TEST_F(SignalsUnderFingers, aMouseDragsTapsAndHoldsAlike) {
   for (double place = 0.3; place <= 0.7; place += 0.02) QTest::mouseMove(shownWindow, at(place));
   EXPECT_NEAR(placeRead(), 0.7, 0.04);
   QTest::mouseRelease(shownWindow, Qt::LeftButton, Qt::NoModifier, at(0.7));
+}
+
+// Thresholds, words and codes once left far less.
+TEST(SignalsInLargeText, leaveHalfOfTheWidthToTheCurves) {
+  QFont large = QGuiApplication::font();
+  large.setPointSize(22);
+  QGuiApplication::setFont(large);
+  const Window window;
+  reportTheHourBeforeNow(window.navigation().pages()->history());
+  testing::reportCell(123);
+  reportNeighbour();
+  window.navigation().open(QStringLiteral("signals"));
+  ASSERT_EQ(window.navigation().pages()->curves()->neighbours()->rowCount(), 1);
+  for (const QSize size : {QSize(320, 568), QSize(720, 360)}) {
+    window.window().resize(size);
+    window.settle();
+    const QQuickItem* chart = firstChartBelow(window.window().contentItem());
+    ASSERT_TRUE(chart);
+    EXPECT_GE(chart->property("plotWidth").toReal(), chart->width() / 2) << size.width();
+  }
 }
 
 }  // namespace
