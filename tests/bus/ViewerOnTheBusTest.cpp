@@ -109,6 +109,7 @@ TEST_F(ViewerOnTheBus, comesIntoServiceWhenTheServiceStartsLater) {
   const ServiceProcess service(bus, "simulated,speed=10");
   EXPECT_TRUE(viewer.waitForMore(valid, 5));
   EXPECT_TRUE(viewer.waitForAll("Querying SIM files", 1));  // events may come while it starts
+  EXPECT_EQ(viewer.count("Querying SIM files"), 1);
 }
 
 }  // namespace
