@@ -10,8 +10,6 @@
 
 #include "bus/PolicyTrial.h"
 #include "sources/modem_manager/FakeModemManager.h"
-#include "sources/modem_manager/ModemManagerSource.h"
-#include "support/PrivateBus.h"
 
 namespace qel::testing {
 namespace {
@@ -40,13 +38,7 @@ class ModemPolicy : public ::testing::Test {
 
   // Whether the bus lets the call through; the fake has no such method, or refuses the arguments.
   int callAs(const char* user, const std::string& interface, const std::string& member) const {
-    return as(user, nullptr, [&] {
-      return judge([&] {
-        const auto connection = sdbus::createSessionBusConnectionWithAddress(bus->address());
-        const auto proxy = sdbus::createProxy(*connection, kService, kModemPath);
-        proxy->callMethod(member).onInterface(interface).withTimeout(10s);
-      });
-    });
+    return as(user, kOtherGroup, *bus, {"call", kService, kModemPath, interface, member});
   }
 
   std::unique_ptr<PrivateBus> bus;
@@ -132,31 +124,14 @@ TEST_F(ModemPolicy, IsEnoughForTheSource) {
                   {"SignalsLocation", false}}}});
   const std::array<std::string, 4> calls = {"GetCellInfo", "GetLocation", "Setup",
                                             "Location.Setup"};
-  std::array<int, 2> done{};
-  ASSERT_EQ(::pipe(done.data()), 0);
-  std::thread watch([&] {
-    const auto end = std::chrono::steady_clock::now() + 30s;
-    for (const std::string& call : calls) {
-      while (manager->calls(call) == 0 && std::chrono::steady_clock::now() < end) {
-        std::this_thread::sleep_for(5ms);
-      }
+  const ChildProcess source(launchAs(kServiceUser, kOtherGroup, *bus, {"modem"}));
+  const auto end = std::chrono::steady_clock::now() + 30s;
+  for (const std::string& call : calls) {
+    while (manager->calls(call) == 0 && std::chrono::steady_clock::now() < end) {
+      std::this_thread::sleep_for(5ms);
     }
-    EXPECT_EQ(::write(done[1], "x", 1), 1);
-  });
-  as(kServiceUser, nullptr, [&] {
-    class Nobody final : public sources::EventReceiver {
-      Taken take(const sources::SourceEvent&) override { return Taken::yes; }
-    };
-    sources::ModemManagerSource source({}, {bus->address()}, {100ms, 2s});
-    const auto receiver = std::make_shared<Nobody>();
-    source.start(receiver, std::make_shared<sources::ListenerSignal>());
-    char byte = 0;
-    return ::read(done[0], &byte, 1) == 1 ? 0 : 1;
-  });
-  watch.join();
+  }
   for (const std::string& call : calls) EXPECT_GT(manager->calls(call), 0) << call;
-  ::close(done[0]);
-  ::close(done[1]);
 }
 
 }  // namespace

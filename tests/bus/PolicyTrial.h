@@ -1,23 +1,23 @@
 // Shipped bus policies, tried as different users. Root alone can become somebody else.
 #pragma once
 
-#include <grp.h>
-#include <pwd.h>
-#include <sdbus-c++/sdbus-c++.h>
-#include <sys/wait.h>
-#include <unistd.h>
-
 #include <fstream>
-#include <functional>
 #include <regex>
 #include <sstream>
 #include <string>
+#include <utility>
+#include <vector>
+
+#include "bus/Answer.h"
+#include "support/ChildProcess.h"
+#include "support/PrivateBus.h"
 
 namespace qel::testing {
 
 // Accounts that every Debian has, in place of those that installing the package makes.
 inline constexpr const char* kServiceUser = "daemon";
 inline constexpr const char* kClientGroup = "dialout";
+inline constexpr const char* kOtherGroup = "nogroup";
 
 // What stands in that policy file, for these accounts.
 inline std::string shippedPolicy(const char* file) {
@@ -32,31 +32,17 @@ inline std::string shippedPolicy(const char* file) {
                             std::string("group=\"") + kClientGroup + "\"");
 }
 
-// Runs `work` in a child as that user and groups; what it returned.
-template <class Work>
-int as(const char* user, const char* extraGroup, Work work) {
-  const passwd account = *::getpwnam(user);
-  const gid_t extra = extraGroup ? ::getgrnam(extraGroup)->gr_gid : account.pw_gid;
-  const pid_t child = ::fork();
-  if (child == 0) {
-    const bool changed = ::setgroups(1, &extra) == 0 && ::setgid(account.pw_gid) == 0 &&
-                         ::setuid(account.pw_uid) == 0;
-    ::_exit(changed ? work() : 99);
-  }
-  int status = 0;
-  ::waitpid(child, &status, 0);
-  return WIFEXITED(status) ? WEXITSTATUS(status) : -WTERMSIG(status);
+// Does that as that user, who is in the group as well; `words` as BusUser.cpp has them.
+inline Launch launchAs(const std::string& user, const std::string& group, const PrivateBus& bus,
+                       const std::vector<std::string>& words) {
+  std::vector<std::string> all = {QEL_BUS_USER, user, group, bus.address()};
+  all.insert(all.end(), words.begin(), words.end());
+  return {.words = std::move(all)};
 }
 
-enum Answer { allowed = 0, denied = 1, other = 2 };
-
-inline int judge(const std::function<void()>& call) {
-  try {
-    call();
-    return allowed;
-  } catch (const sdbus::Error& error) {
-    return error.getName() == "org.freedesktop.DBus.Error.AccessDenied" ? denied : other;
-  }
+inline int as(const std::string& user, const std::string& group, const PrivateBus& bus,
+              const std::vector<std::string>& words) {
+  return ChildProcess(launchAs(user, group, bus, words)).waitForEnd();
 }
 
 }  // namespace qel::testing

@@ -7,10 +7,11 @@
 #include <sys/ioctl.h>
 #include <sys/socket.h>
 #include <sys/stat.h>
-#include <sys/wait.h>
+#include <sys/syscall.h>
 #include <termios.h>
 #include <unistd.h>
 
+#include <thread>
 #include <vector>
 
 #include "sources/diagnostics/port/AndroidPort.h"
@@ -109,17 +110,16 @@ TEST(TerminalPort, IsNoFile) {
   EXPECT_FALSE(Reading("/tmp").port);
 }
 
-// Root may open what another holds: so this is somebody else's try.
+// Root may open what another holds: so a thread that is nobody tries, alone in the process.
 Kind triedByNobody(const std::string& path) {
-  const pid_t child = ::fork();
-  if (child == 0) {
-    if (::getuid() == 0 && ::setresuid(kNobody, kNobody, kNobody) != 0) ::_exit(99);
-    PortTrouble trouble;
-    ::_exit(openPort(path, trouble) ? 98 : static_cast<int>(trouble.kind));
-  }
-  int status = 0;
-  ::waitpid(child, &status, 0);
-  return static_cast<Kind>(WEXITSTATUS(status));
+  PortTrouble trouble;
+  std::thread([&] {
+    if (::getuid() == 0) {
+      ASSERT_EQ(::syscall(SYS_setresuid, kNobody, kNobody, kNobody), 0);
+    }
+    EXPECT_FALSE(openPort(path, trouble));
+  }).join();
+  return trouble.kind;
 }
 
 TEST(TerminalPort, SaysThatAnotherHoldsIt) {
