@@ -18,4 +18,8 @@ std::chrono::milliseconds timeAsleep() {
   return std::chrono::duration_cast<std::chrono::milliseconds>(read(CLOCK_BOOTTIME) - awake);
 }
 
+std::chrono::steady_clock::time_point sleeplessNow() {
+  return std::chrono::steady_clock::now() + timeAsleep();
+}
+
 }  // namespace qel

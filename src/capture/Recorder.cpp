@@ -17,8 +17,6 @@ constexpr std::chrono::seconds kShortestSleep{5};
 
 }  // namespace
 
-steady_clock::time_point recordingNow() { return steady_clock::now() + timeAsleep(); }
-
 std::optional<RecordedEvent> recordedEvent(std::string_view eventName, const tesk::Message& event,
                                            std::uint64_t timeMs) {
   if (eventName == tesk::kEventMetric) {
@@ -43,7 +41,7 @@ void Recorder::noteSleep() {
   _recording->write(sleepEvent(_clock.nowMs(), length), now());
 }
 
-RotatingRecording::TimePoint Recorder::now() const { return steady_clock::now() + _asleep(); }
+RotatingRecording::TimePoint Recorder::now() const { return steady_clock::now() + _slept; }
 
 bool Recorder::isRecordable(RecordedEvent& event) {
   if (!hasReadableForm(event)) {
@@ -63,7 +61,7 @@ void Recorder::take(std::string_view eventName, const tesk::Message& event) {
 bool Recorder::mark() {
   const std::lock_guard lock(_mutex);
   noteSleep();
-  if (!_recording->write(markEvent(_clock.nowMs(), _marks + 1), steady_clock::now())) return false;
+  if (!_recording->write(markEvent(_clock.nowMs(), _marks + 1), now())) return false;
   ++_marks;
   return true;
 }

@@ -18,10 +18,6 @@
 
 namespace qel::capture {
 
-// Now, on a steady clock that goes on while the device sleeps: by it recordings are so old and so
-// long.
-std::chrono::steady_clock::time_point recordingNow();
-
 // An event of the stream of that name as a recording holds it. Nothing for other streams, which are
 // no part of one.
 std::optional<RecordedEvent> recordedEvent(std::string_view eventName, const tesk::Message& event,
@@ -65,6 +61,7 @@ class Recorder {
   bool isRecordable(RecordedEvent& event);
   // Before anything else that comes after a sleep.
   void noteSleep();
+  // With the sleep that was noted: recordings are so old and so long by it.
   RotatingRecording::TimePoint now() const;
 
   mutable std::mutex _mutex;

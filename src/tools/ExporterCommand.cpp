@@ -40,8 +40,8 @@ struct ExporterOptions {
 // Since the machine was started: ages stay right over a sleep, and when somebody sets its clock.
 std::uint64_t sinceStartMs() {
   using namespace std::chrono;
-  const auto awake = duration_cast<milliseconds>(steady_clock::now().time_since_epoch());
-  return static_cast<std::uint64_t>((awake + timeAsleep()).count());
+  return static_cast<std::uint64_t>(
+      duration_cast<milliseconds>(sleeplessNow().time_since_epoch()).count());
 }
 
 struct Exported {

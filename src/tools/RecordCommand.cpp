@@ -11,6 +11,7 @@
 #include <optional>
 #include <string>
 
+#include "base/TimeAsleep.h"
 #include "capture/RecordConnection.h"
 #include "capture/Recorder.h"
 #include "tesk/bus/BusConnector.h"
@@ -64,7 +65,7 @@ std::unique_ptr<RotatingRecording> begin(const RecordOptions& options) {
   std::string error;
   auto recording = RotatingRecording::create(options.file, limitsOf(options),
                                              options.force ? Existing::replaced : Existing::refused,
-                                             capture::recordingNow(), error);
+                                             sleeplessNow(), error);
   if (recording) return recording;
   const bool isThere = error.ends_with(std::strerror(EEXIST));
   throw ToolError(EX_IOERR, error + (isThere ? " (--force replaces it)" : ""));
@@ -105,10 +106,10 @@ void recordOn(const RecordOptions& options, MainLoop& loop, Recorder& recorder,
   SteadyClock::time_point nextLook = start;
   const auto turn = [&] {
     const auto next = end ? std::min(*end, nextLook) : nextLook;
-    return SteadyClock::now() + (next - capture::recordingNow());
+    return SteadyClock::now() + (next - sleeplessNow());
   };
   while (loop.runOnce(turn())) {
-    const auto now = capture::recordingNow();
+    const auto now = sleeplessNow();
     if (end && now >= *end) return;
     if (now < nextLook) continue;
     nextLook = now + 1s;
@@ -125,7 +126,7 @@ void run(const RecordOptions& options) {
   requireService(options.bus);
   Recorder recorder(begin(options), hiderOf(options));
   RecordProgress progress;
-  const auto start = capture::recordingNow();
+  const auto start = sleeplessNow();
   std::unique_ptr<RecordConnection> connection;
   const auto connector = tesk::bus::makeBusConnector(
       {options.bus},
@@ -144,7 +145,7 @@ void run(const RecordOptions& options) {
   connection.reset();
   const bool isWhole = recorder.close() && recorder.error().empty();
   if (recorder.errorNumber() == EPIPE) return;
-  progress.say(summary(options, recorder, capture::recordingNow() - start, lost));
+  progress.say(summary(options, recorder, sleeplessNow() - start, lost));
   if (!isWhole) throw ToolError(EX_IOERR, recorder.error());
 }
 

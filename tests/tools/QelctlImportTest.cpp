@@ -6,8 +6,8 @@
 
 #include "messages/nas.h"
 #include "metrics/MetricValidator.h"
-#include "recording/RecordingReader.h"
 #include "recording/TemporaryFile.h"
+#include "support/RecordedEvents.h"
 #include "support/diagnostics/Packets.h"
 #include "tools/Qelctl.h"
 
@@ -52,15 +52,6 @@ std::string textOf(const Bytes& bytes) { return {bytes.begin(), bytes.end()}; }
 
 std::string frame(std::uint16_t code, const Bytes& body, std::uint64_t timeMs = kSomeTimeMs) {
   return textOf(framed(logPacket(code, body, timeMs)));
-}
-
-std::vector<RecordedEvent> eventsOf(const std::string& path) {
-  std::vector<RecordedEvent> events;
-  RecordingFault fault;
-  const auto reader = RecordingReader::open(path, RecordingReader::BadLines::fail, fault);
-  while (auto event = reader ? reader->next() : std::nullopt) events.push_back(std::move(*event));
-  EXPECT_TRUE(reader && !reader->fault()) << fault.message;
-  return events;
 }
 
 // Imports the raw log and reads what was made of it.

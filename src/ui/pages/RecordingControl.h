@@ -10,6 +10,7 @@
 
 #include "base/Bytes.h"
 #include "base/Clock.h"
+#include "base/TimeAsleep.h"
 #include "capture/RecordConnection.h"
 #include "capture/Recorder.h"
 #include "recording/RecordingsFolder.h"
@@ -42,7 +43,7 @@ class RecordingControl {
   };
 
   RecordingControl(RecordingsFolder folder, Way way, const Clock& clock = systemClock(),
-                   Now now = capture::recordingNow, capture::Recorder::Asleep asleep = timeAsleep);
+                   Now now = sleeplessNow, capture::Recorder::Asleep asleep = timeAsleep);
   ~RecordingControl();
 
   // Called after every change of the view.

@@ -10,6 +10,7 @@
 #include "base/LogSink.h"
 #include "base/Rendering.h"
 #include "recording/Mark.h"
+#include "support/RecordedEvents.h"
 #include "support/RecordedLines.h"
 
 namespace qel::testing {
@@ -56,14 +57,6 @@ std::vector<std::string> contentOf(const MetricStore& store) {
   content.push_back(jsonText(umts.SelReselCellInfo));
   content.push_back(jsonText(lte.IMSI));
   return content;
-}
-
-std::vector<RecordedEvent> eventsOf(const std::string& path) {
-  RecordingFault fault;
-  const auto reader = RecordingReader::open(path, RecordingReader::BadLines::fail, fault);
-  std::vector<RecordedEvent> events;
-  while (auto event = reader->next()) events.push_back(std::move(*event));
-  return events;
 }
 
 // What the dispatcher makes of all events up to each of these times, one after the other.

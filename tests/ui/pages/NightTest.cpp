@@ -4,8 +4,8 @@
 
 #include "capture/Recorder.h"
 #include "history/ToldHappening.h"
-#include "recording/RecordingReader.h"
 #include "support/FixedTimeZone.h"
+#include "support/RecordedEvents.h"
 #include "support/RecordedLines.h"
 #include "tesk/Constants.h"
 #include "ui/kit/RunLoop.h"
@@ -96,11 +96,7 @@ class RecordedNight : public ::testing::Test {
   }
   std::vector<RecordedEvent> recorded() {
     EXPECT_TRUE(recorder->close());
-    RecordingFault fault;
-    const auto reader = RecordingReader::open(file, RecordingReader::BadLines::fail, fault);
-    std::vector<RecordedEvent> events;
-    while (auto event = reader ? reader->next() : std::nullopt) events.push_back(std::move(*event));
-    return events;
+    return eventsOf(file);
   }
 
   const TemporaryFolder folder;

@@ -4,8 +4,8 @@
 
 #include "messages/nas.h"
 #include "recording/Mark.h"
-#include "recording/RecordingReader.h"
 #include "support/FakeTransport.h"
+#include "support/RecordedEvents.h"
 #include "support/RecordedLines.h"
 #include "tesk/Constants.h"
 
@@ -27,14 +27,7 @@ class RecordingControlTest : public ::testing::Test {
     return {std::make_shared<FakeConnector>(service), std::nullopt, Bytes{1, 2, 3}};
   }
   void send(const RecordedEvent& event) { service->send(tesk::kEventMetric, event.entries); }
-  std::vector<RecordedEvent> recorded() const {
-    RecordingFault fault;
-    const auto reader =
-        RecordingReader::open(folder.path() + "/" + kName, RecordingReader::BadLines::fail, fault);
-    std::vector<RecordedEvent> events;
-    while (auto event = reader ? reader->next() : std::nullopt) events.push_back(std::move(*event));
-    return events;
-  }
+  std::vector<RecordedEvent> recorded() const { return eventsOf(folder.path() + "/" + kName); }
 
   const std::string kName = "2017-07-14 02.40.00.jsonl.gz";
   TemporaryFolder folder;

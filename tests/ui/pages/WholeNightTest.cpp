@@ -7,12 +7,12 @@
 #include <algorithm>
 
 #include "history/ToldHappening.h"
-#include "recording/RecordingReader.h"
 #include "recording/Sleep.h"
 #include "service/InProcessConnector.h"
 #include "service/StateFile.h"
 #include "service/support/Configuration.h"
 #include "service/support/FakeSource.h"
+#include "support/RecordedEvents.h"
 #include "support/RecordedLines.h"
 #include "ui/kit/RunLoop.h"
 #include "ui/pages/Freshness.h"
@@ -103,11 +103,7 @@ class WholeNight : public ::testing::Test {
   std::vector<RecordedEvent> stopAndRead() {
     const std::string path = folder.path() + "/" + control->fileName();
     control->stop();
-    RecordingFault fault;
-    const auto reader = RecordingReader::open(path, RecordingReader::BadLines::fail, fault);
-    std::vector<RecordedEvent> events;
-    while (auto event = reader ? reader->next() : std::nullopt) events.push_back(std::move(*event));
-    return events;
+    return eventsOf(path);
   }
 
   const TemporaryFolder folder;
