@@ -167,7 +167,8 @@ std::size_t hashField(const Message& message, const Field& field) {
   if constexpr (HasPresenceBit<Field>) {
     if (!Presence::get(message, field.presenceBit)) return 0;
     // Signed values widen with their sign.
-    return static_cast<std::uint64_t>(message.*field.member) * kScalarFactor;
+    return static_cast<std::size_t>(static_cast<std::uint64_t>(message.*field.member) *
+                                    kScalarFactor);
   } else {
     return hashHeld(message.*field.member);
   }
