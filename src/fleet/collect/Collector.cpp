@@ -50,6 +50,7 @@ Collector::Collector(CollectSettings settings, Say say)
 
 std::optional<CollectEnd> Collector::run(const std::function<bool()>& isToEnd,
                                          const WakeUp& wakeUp) {
+  _isToEnd = isToEnd;
   while (!isToEnd() && !_end) step(wakeUp);
   if (_link && _link->state() == BrokerLink::State::open) leave();
   endLink();
@@ -71,7 +72,7 @@ void Collector::sayOnce(const std::string& line) {
 
 void Collector::openDatabase() {
   DatabaseTrouble trouble;
-  _database = FleetDatabase::open(_settings.database, trouble);
+  _database = FleetDatabase::open(_settings.database, {_settings.patience, _isToEnd}, trouble);
   if (!_database) {
     const bool isRefused = trouble.kind == DatabaseTrouble::Kind::away && !_hadDatabase &&
                            isDatabaseOpen(_settings.database);
@@ -88,7 +89,9 @@ void Collector::loseDatabase(const DatabaseTrouble& trouble) {
   _database.reset();
   _databaseRetries.failed(Clock::now());
   const std::string line = "database: " + trouble.why;
-  if (trouble.kind != DatabaseTrouble::Kind::away && !_settings.keepsTrying) {
+  const bool mayComeBack =
+      trouble.kind == DatabaseTrouble::Kind::away || trouble.kind == DatabaseTrouble::Kind::silent;
+  if (!mayComeBack && !_settings.keepsTrying) {
     _end = CollectEnd{trouble.kind == DatabaseTrouble::Kind::layout, line};
   } else {
     sayOnce(line + "; messages wait at the broker");

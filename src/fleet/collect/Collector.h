@@ -21,6 +21,7 @@ struct CollectSettings {
   std::string name;      // of this collector at the broker, which keeps messages for it
   std::string group;     // of those who share the messages
   std::string database;  // of databaseAddress()
+  std::chrono::milliseconds patience{60'000};  // with a statement of its
   std::chrono::milliseconds every{500};        // how long a message waits for others
   std::size_t batch = 2000;                    // messages that are stored earlier
   std::chrono::seconds sessionAge{7 * 86400};  // how long the broker keeps messages for it
@@ -46,7 +47,8 @@ class Collector {
 
   Collector(CollectSettings settings, Say say);
 
-  // Until told to end, which `wakeUp` says earlier, or there is no use in going on.
+  // Until told to end, which `wakeUp` says earlier, or there is no use in going on. Any thread may
+  // ask whether it is to end.
   std::optional<CollectEnd> run(const std::function<bool()>& isToEnd, const WakeUp& wakeUp);
   const CollectCounts& counts() const { return _counts; }
 
@@ -71,6 +73,7 @@ class Collector {
 
   CollectSettings _settings;
   const Say _say;
+  std::function<bool()> _isToEnd;
   std::unique_ptr<FleetDatabase> _database;
   std::unique_ptr<BrokerLink> _link;
   Retries _databaseRetries;

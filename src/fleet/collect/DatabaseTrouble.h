@@ -11,6 +11,7 @@ namespace qel::fleet {
 struct DatabaseTrouble {
   enum class Kind : std::uint8_t {
     away,     // another time it may
+    silent,   // it took a statement and never answered; another time it may
     refused,  // login or rights: trying again changes nothing
     layout,   // its tables are not those of this program
   };

@@ -37,9 +37,10 @@ std::vector<const Kind*> allOf(std::span<const PhoneMessage> messages) {
   return found;
 }
 
-std::string withRole(const std::string& address) {
+std::string withRole(const std::string& address, std::chrono::milliseconds statement) {
   return address + "options='-c role=" + std::string(kCollectorRole) +
-         " -c statement_timeout=60s -c timezone=UTC -c datestyle=ISO -c client_encoding=UTF8"
+         " -c statement_timeout=" + std::to_string(statement.count()) +
+         "ms -c timezone=UTC -c datestyle=ISO -c client_encoding=UTF8"
          " -c client_min_messages=warning'";
 }
 
@@ -162,24 +163,40 @@ void insertQueues(pqxx::work& transaction, const std::vector<const PhoneQueue*>&
 }  // namespace
 
 struct FleetDatabase::Session {
-  explicit Session(const std::string& address) : connection(address) {}
+  Session(const std::string& address, const AnswerPatience& patience)
+      : connection(withRole(address, patience.statement)), watch(patience) {}
+
+  // Before each statement that may take long.
+  void expectAnswer() { watch.expect(connection.sock()); }
+
   pqxx::connection connection;
+  AnswerWatch watch;
 };
 
-FleetDatabase::FleetDatabase(const std::string& address, const Clock& clock)
-    : _clock(clock), _session(std::make_unique<Session>(withRole(address))) {}
+FleetDatabase::FleetDatabase(const std::string& address, const AnswerPatience& patience,
+                             const Clock& clock)
+    : _clock(clock), _session(std::make_unique<Session>(address, patience)) {}
 
 FleetDatabase::~FleetDatabase() = default;
 
 std::unique_ptr<FleetDatabase> FleetDatabase::open(const std::string& address,
+                                                   const AnswerPatience& patience,
                                                    DatabaseTrouble& trouble, const Clock& clock) {
   std::unique_ptr<FleetDatabase> database;
-  const auto connect = [&] {
-    database.reset(new FleetDatabase(address, clock));
-    database->checkLayout();
-  };
-  if (!guarded(connect, trouble)) database.reset();
+  const auto connect = [&] { database.reset(new FleetDatabase(address, patience, clock)); };
+  if (!guarded(connect, trouble)) return nullptr;
+  if (!database->answersTo([&] { database->checkLayout(); }, trouble)) return nullptr;
   return database;
+}
+
+bool FleetDatabase::answersTo(const std::function<void()>& work, DatabaseTrouble& trouble) {
+  _session->expectAnswer();
+  const bool isDone = guarded(work, trouble);
+  _session->watch.answered();
+  if (!isDone && _session->watch.hasGivenUp()) {
+    trouble = {DatabaseTrouble::Kind::silent, "it does not answer"};
+  }
+  return isDone;
 }
 
 void FleetDatabase::checkLayout() {
@@ -206,6 +223,7 @@ void FleetDatabase::checkLayout() {
 
 void FleetDatabase::makeDay(std::int64_t day) {
   if (_days.contains(day)) return;
+  _session->expectAnswer();
   pqxx::work transaction(_session->connection);
   transaction.exec_params("SELECT qelwatch.make_day(date '1970-01-01' + $1::integer)",
                           std::to_string(day));
@@ -227,7 +245,7 @@ void FleetDatabase::makeDays(std::span<const PhoneMessage> messages) {
 bool FleetDatabase::store(std::span<const PhoneMessage> messages, StoredCounts& counts,
                           DatabaseTrouble& trouble) {
   if (messages.empty()) return true;
-  return guarded(
+  return answersTo(
       [&] {
         makeDays(messages);
         storeOrSplit(messages, counts);
@@ -277,6 +295,7 @@ void FleetDatabase::storeAll(std::span<const PhoneMessage> messages, StoredCount
   for (const NumberedEvent* event : events) {
     if (!_knownPhones.contains(event->phone)) newPhones.insert(event->phone);
   }
+  _session->expectAnswer();
   pqxx::work transaction(_session->connection);
   if (!newPhones.empty()) {
     ArrayText phones;
@@ -290,7 +309,11 @@ void FleetDatabase::storeAll(std::span<const PhoneMessage> messages, StoredCount
   for (const NumberedEvent* event : fresh) {
     if (!event->rows.empty()) byTable[event->table].push_back(event);
   }
-  for (const auto& [table, ofTable] : byTable) copyRows(transaction, *table, ofTable);
+  for (const auto& [table, ofTable] : byTable) {
+    _session->expectAnswer();
+    copyRows(transaction, *table, ofTable);
+  }
+  _session->expectAnswer();
   insertStatus(transaction, allOf<PhoneStatus>(messages));
   insertQueues(transaction, allOf<PhoneQueue>(messages));
   transaction.commit();

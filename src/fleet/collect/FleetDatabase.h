@@ -2,6 +2,7 @@
 #pragma once
 
 #include <cstdint>
+#include <functional>
 #include <memory>
 #include <set>
 #include <span>
@@ -9,6 +10,7 @@
 #include <vector>
 
 #include "base/Clock.h"
+#include "fleet/collect/AnswerWatch.h"
 #include "fleet/collect/DatabaseTrouble.h"
 #include "fleet/collect/PhoneMessage.h"
 
@@ -25,7 +27,9 @@ struct StoredCounts {
 class FleetDatabase {
  public:
   // Nothing when it cannot be used. The address is of databaseAddress().
-  static std::unique_ptr<FleetDatabase> open(const std::string& address, DatabaseTrouble& trouble,
+  static std::unique_ptr<FleetDatabase> open(const std::string& address,
+                                             const AnswerPatience& patience,
+                                             DatabaseTrouble& trouble,
                                              const Clock& clock = systemClock());
   ~FleetDatabase();
   FleetDatabase(const FleetDatabase&) = delete;
@@ -40,7 +44,8 @@ class FleetDatabase {
  private:
   struct Session;
 
-  FleetDatabase(const std::string& address, const Clock& clock);
+  FleetDatabase(const std::string& address, const AnswerPatience& patience, const Clock& clock);
+  bool answersTo(const std::function<void()>& work, DatabaseTrouble& trouble);
   void checkLayout();
   void makeDays(std::span<const PhoneMessage> messages);
   void makeDay(std::int64_t day);

@@ -34,6 +34,7 @@ struct Options {
   std::string name;
   std::string group = "qelwatch";
   std::uint64_t everyMs = 500;
+  std::uint64_t patienceMs = 60'000;
   std::uint64_t sessionMs = 7ULL * 24 * 60 * 60 * 1000;
   bool prepares = false;
 };
@@ -92,6 +93,7 @@ void collect(const Options& options, const std::string& database) {
   settings.name = options.name;
   settings.group = options.group;
   settings.every = std::chrono::milliseconds(options.everyMs);
+  settings.patience = std::chrono::milliseconds(options.patienceMs);
   settings.sessionAge =
       std::chrono::ceil<std::chrono::seconds>(std::chrono::milliseconds(options.sessionMs));
   const StopSignals signals;
@@ -124,6 +126,11 @@ void addOptions(CLI::App& app, Options& options) {
       ->type_name("MESSAGES")
       ->check(silent(CLI::Range(std::size_t{1}, std::size_t{20'000})))
       ->capture_default_str();
+  app.add_option("--patience", options.patienceMs,
+                 "How long the database may take for a statement; 60s unless given")
+      ->type_name("TIME")
+      ->transform(asMilliseconds())
+      ->check(silent(CLI::Range(std::uint64_t{1'000}, std::uint64_t{3'600'000})));
   app.add_option("--session", options.sessionMs,
                  "How long the broker keeps messages for it while it is away; 7d unless given")
       ->type_name("TIME")

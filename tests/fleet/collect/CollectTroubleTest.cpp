@@ -6,6 +6,22 @@
 namespace qel::testing {
 namespace {
 
+// The one who serves the collector stands still, for the life of this object.
+class HangingServer {
+ public:
+  explicit HangingServer(const Postgres& database)
+      : _pid(static_cast<pid_t>(database.number("SELECT pid FROM pg_stat_activity WHERE "
+                                                "application_name = 'qelctl collect'"))) {
+    ::kill(_pid, SIGSTOP);
+  }
+  ~HangingServer() { ::kill(_pid, SIGCONT); }
+  HangingServer(const HangingServer&) = delete;
+  HangingServer& operator=(const HangingServer&) = delete;
+
+ private:
+  const pid_t _pid;
+};
+
 class CollectTrouble : public WithDatabase {
  protected:
   void expectEnd(const std::vector<std::string>& words, int exitCode,
@@ -60,6 +76,36 @@ TEST_F(CollectTrouble, isADatabaseThatGoesAndComes) {
     ASSERT_TRUE(haveCome(_sent)) << program->err();
   }
   EXPECT_TRUE(program->hasSaid("database: back")) << program->err();
+  expectAllOnce();
+}
+
+TEST_F(CollectTrouble, isADatabaseThatHangs) {
+  prepare();
+  const auto program = collector("one", {"--patience", "1s"});
+  sendSome(50);
+  ASSERT_TRUE(haveCome(_sent)) << program->err();
+  const HangingServer hanging(*database);
+  sendSome(50);
+  EXPECT_TRUE(eventually([&] {
+    return program->hasSaid("database: it does not answer; messages wait at the broker\n");
+  })) << program->err();
+  EXPECT_TRUE(haveCome(_sent)) << program->err();
+  EXPECT_TRUE(program->hasSaid("database: back")) << program->err();
+  expectAllOnce();
+}
+
+TEST_F(CollectTrouble, isADatabaseThatHangsAtTheEnd) {
+  prepare();
+  auto program = collector();
+  sendSome(50);
+  ASSERT_TRUE(haveCome(_sent)) << program->err();
+  {
+    const HangingServer hanging(*database);
+    sendSome(50);
+    end(*program);
+  }
+  program = collector();
+  EXPECT_TRUE(haveCome(_sent)) << program->err();
   expectAllOnce();
 }
 
