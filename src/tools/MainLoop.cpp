@@ -3,25 +3,13 @@
 #include <poll.h>
 #include <unistd.h>
 
-#include <algorithm>
 #include <atomic>
-#include <cstdint>
-#include <limits>
 #include <memory>
 
 #include "base/DispatchQueue.h"
+#include "base/PollTimeout.h"
 
 namespace qel::tools {
-namespace {
-
-int waitUntil(std::optional<MainLoop::Clock::time_point> until) {
-  if (!until) return -1;
-  using std::chrono::milliseconds;
-  const auto left = std::chrono::ceil<milliseconds>(*until - MainLoop::Clock::now()).count();
-  return static_cast<int>(std::clamp<std::int64_t>(left, 0, std::numeric_limits<int>::max()));
-}
-
-}  // namespace
 
 class MainLoop::AnswerWait final : public tesk::bus::AnswerWait {
  public:
@@ -32,7 +20,7 @@ class MainLoop::AnswerWait final : public tesk::bus::AnswerWait {
     const auto end = Clock::now() + (isEnding ? kPatienceAtTheEnd : kPatience);
     while (!_woken && isEnding == _loop.isStopping() && Clock::now() < end) {
       pollfd waited{_loop._signals.wakeUp().descriptor(), POLLIN, 0};
-      ::poll(&waited, 1, waitUntil(end));
+      ::poll(&waited, 1, pollTimeout(end));
       _loop._signals.wakeUp().clear();
     }
     _loop._more = true;  // what rang may have been work
@@ -69,7 +57,7 @@ bool MainLoop::isStopping() const { return _signals.arrived() != 0 || _outputClo
 bool MainLoop::runOnce(std::optional<Clock::time_point> until) {
   if (isStopping()) return false;
   for (pollfd& each : _waited) each.revents = 0;
-  ::poll(_waited.data(), _waited.size(), _more ? 0 : waitUntil(until));
+  ::poll(_waited.data(), _waited.size(), _more ? 0 : pollTimeout(until));
   _outputClosed = (_waited[1].revents & (POLLERR | POLLHUP)) != 0;
   if (_waited[0].revents != 0) _signals.wakeUp().clear();
   if (isStopping()) return false;

@@ -2,9 +2,9 @@
 
 #include <poll.h>
 
-#include <algorithm>
 #include <utility>
 
+#include "base/PollTimeout.h"
 #include "service/bus/BusErrors.h"
 #include "service/bus/CallLimits.h"
 #include "tesk/Constants.h"
@@ -26,12 +26,6 @@ constexpr auto kRegistrationsEvery = 10s;
 constexpr const char* kOwnerLost =
     "type='signal',sender='org.freedesktop.DBus',interface='org.freedesktop.DBus',"
     "member='NameOwnerChanged',arg2=''";
-
-int millisecondsUntil(SteadyClock::time_point moment) {
-  const auto now = SteadyClock::now();
-  if (moment <= now) return 0;
-  return static_cast<int>(std::chrono::ceil<std::chrono::milliseconds>(moment - now).count());
-}
 
 // Nobody waits for an answer that cannot be sent.
 void answerWith(const sdbus::MethodCall& call, const sdbus::Error& error) {
@@ -171,17 +165,14 @@ bool BusFront::isBusBehind() const {
   return (_connection.getEventLoopPollData().events & POLLOUT) != 0;
 }
 
-int BusFront::pollTimeout(const sdbus::IConnection::PollData& bus) const {
+int BusFront::timeout(const sdbus::IConnection::PollData& bus) const {
   const bool isBehind = (bus.events & POLLOUT) != 0;
   int timeout = bus.getPollTimeout();
   if (isBehind) return timeout;
   if (!_calls.empty()) return 0;
-  const auto atMost = [&timeout](int wait) {
-    timeout = timeout < 0 ? wait : std::min(timeout, wait);
-  };
-  if (const auto due = _changed.due()) atMost(millisecondsUntil(*due));
-  if (counted() != _noted) atMost(millisecondsUntil(_notedAt + kCountersEvery));
-  return timeout;
+  timeout = shorterTimeout(timeout, pollTimeout(_changed.due()));
+  if (counted() == _noted) return timeout;
+  return shorterTimeout(timeout, pollTimeout(_notedAt + kCountersEvery));
 }
 
 void BusFront::waitAndProcess(int stopDescriptor) {
@@ -195,7 +186,7 @@ void BusFront::waitAndProcess(int stopDescriptor) {
   for (const auto& [busName, client] : _clients) {
     waited.push_back({client->stream().descriptor(), client->stream().pollEvents(), 0});
   }
-  ::poll(waited.data(), waited.size(), pollTimeout(bus));
+  ::poll(waited.data(), waited.size(), timeout(bus));
   _status.reset();  // events went on meanwhile
   _wakeUp->clear();
   std::vector<short> happened;

@@ -88,7 +88,7 @@ class BusFront final : private FrontObject, public tesk::BasebandManager1_adapto
   void noteOwnerChange(sdbus::Message& signal);
   void forget(const std::string& busName);
   void noteCondition();
-  int pollTimeout(const sdbus::IConnection::PollData& bus) const;
+  int timeout(const sdbus::IConnection::PollData& bus) const;
   void serveStreams(const std::vector<short>& happened);
 
   const CoreStatus& status() const;

@@ -8,6 +8,7 @@
 
 #include "base/Clock.h"
 #include "base/LogSink.h"
+#include "base/PollTimeout.h"
 #include "sources/diagnostics/DiagnosticsCondition.h"
 #include "sources/diagnostics/PacketTable.h"
 
@@ -20,15 +21,6 @@ using State = DiagnosticsSession::State;
 WantedPackets allThatIsRead() {
   return {[](std::uint16_t code) { return findLog(code) != nullptr; },
           [](std::uint16_t id) { return findEvent(id) != nullptr; }};
-}
-
-// For poll: rounded up, and -1 for ever.
-int timeoutUntil(std::chrono::steady_clock::time_point moment) {
-  constexpr auto kLongest = std::chrono::milliseconds{24h};
-  if (moment == std::chrono::steady_clock::time_point::max()) return -1;
-  const auto left =
-      std::chrono::ceil<std::chrono::milliseconds>(moment - std::chrono::steady_clock::now());
-  return static_cast<int>(std::clamp(left, 0ms, kLongest).count());
 }
 
 }  // namespace
@@ -88,7 +80,7 @@ bool DiagnosticsSource::Run::waitForPorts(PortFinder& finder, Clock::time_point 
   while (!_stopping && Clock::now() < end) {
     std::array<pollfd, 2> waited{pollfd{_wakeUp.descriptor(), POLLIN, 0},
                                  pollfd{finder.descriptor(), POLLIN, 0}};
-    ::poll(waited.data(), waited.size(), timeoutUntil(end));
+    ::poll(waited.data(), waited.size(), pollTimeout(end));
     _wakeUp.clear();
     if (waited[1].revents == 0) continue;
     rest(_timing.firstPause);  // udev needs a moment for a device
@@ -122,7 +114,7 @@ void DiagnosticsSource::Run::wait(const DiagPort& port, const DiagnosticsSession
   const auto until = std::min({session.due(), _metrics.due(), _endAt});
   std::array<pollfd, 2> waited{pollfd{_wakeUp.descriptor(), POLLIN, 0},
                                pollfd{port.descriptor(), POLLIN, 0}};
-  ::poll(waited.data(), waited.size(), timeoutUntil(until));
+  ::poll(waited.data(), waited.size(), pollTimeout(until));
   if (waited[0].revents != 0) _wakeUp.clear();
   _readable = waited[1].revents != 0;
 }
@@ -190,7 +182,7 @@ void DiagnosticsSource::Run::rest(std::chrono::milliseconds pause) {
   const auto end = Clock::now() + pause;
   while (!_stopping && Clock::now() < end) {
     pollfd waited{_wakeUp.descriptor(), POLLIN, 0};
-    ::poll(&waited, 1, timeoutUntil(end));
+    ::poll(&waited, 1, pollTimeout(end));
     _wakeUp.clear();
   }
 }

@@ -6,6 +6,7 @@
 #include <array>
 #include <utility>
 
+#include "base/PollTimeout.h"
 #include "bus/Turn.h"
 #include "sources/modem_manager/ModemCondition.h"
 #include "sources/modem_manager/Names.h"
@@ -20,14 +21,6 @@ constexpr auto kFarewell = 2s;
 // By number: Modem/2 comes before Modem/10.
 bool isEarlier(const std::string& a, const std::string& b) {
   return a.size() != b.size() ? a.size() < b.size() : a < b;
-}
-
-int pollTimeout(ModemLink::Clock::time_point until, int busTimeout) {
-  // Rounded up to the next millisecond, and never far away.
-  const auto left = std::clamp<std::chrono::nanoseconds>(
-      until == ModemLink::Clock::time_point::max() ? 1h : until - ModemLink::Clock::now(), 0s, 1h);
-  const int wait = static_cast<int>(std::chrono::ceil<std::chrono::milliseconds>(left).count());
-  return busTimeout < 0 ? wait : std::min(busTimeout, wait);
 }
 
 }  // namespace
@@ -47,7 +40,8 @@ ModemLink::ModemLink(const bus::BusAddress& address, ModemWish wish, const Modem
 void ModemLink::waitAndProcess(int wakeDescriptor, Clock::time_point until) {
   const auto bus = _connection->getEventLoopPollData();
   std::array<pollfd, 2> waited = {{{bus.fd, bus.events, 0}, {wakeDescriptor, POLLIN, 0}}};
-  ::poll(waited.data(), waited.size(), pollTimeout(std::min(until, due()), bus.getPollTimeout()));
+  ::poll(waited.data(), waited.size(),
+         shorterTimeout(pollTimeout(std::min(until, due())), bus.getPollTimeout()));
   process();
 }
 
@@ -142,7 +136,7 @@ void ModemLink::finish() {
     while (_watched && _watched->changesSettings() && Clock::now() < end) {
       const auto bus = _connection->getEventLoopPollData();
       pollfd waited{bus.fd, bus.events, 0};
-      ::poll(&waited, 1, pollTimeout(end, bus.getPollTimeout()));
+      ::poll(&waited, 1, shorterTimeout(pollTimeout(end), bus.getPollTimeout()));
       bus::processTurn(*_connection);
     }
   };

@@ -7,6 +7,7 @@
 #include <utility>
 
 #include "base/Clock.h"
+#include "base/PollTimeout.h"
 #include "base/WakeUp.h"
 #include "sources/MetricKeeper.h"
 #include "sources/modem_manager/ModemCondition.h"
@@ -107,10 +108,9 @@ struct ModemManagerSource::Run {
   // New listeners do not shorten it.
   void rest(std::chrono::milliseconds pause) {
     const auto end = Steady::now() + pause;
-    for (auto left = pause; !stopping && left > 0ms;
-         left = std::chrono::ceil<std::chrono::milliseconds>(end - Steady::now())) {
+    while (!stopping && Steady::now() < end) {
       pollfd waited{wakeUp.descriptor(), POLLIN, 0};
-      ::poll(&waited, 1, static_cast<int>(left.count()));
+      ::poll(&waited, 1, pollTimeout(end));
       wakeUp.clear();
     }
   }

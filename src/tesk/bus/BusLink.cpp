@@ -9,6 +9,7 @@
 #include <limits>
 #include <utility>
 
+#include "base/PollTimeout.h"
 #include "bus/Turn.h"
 #include "tesk/bus/BasebandManager1Proxy.h"
 #include "tesk/bus/EventPacket.h"
@@ -204,7 +205,7 @@ bool BusLink::isOverdue(Clock::time_point now) const {
   return !_sent.empty() && now - _sent.begin()->second.at >= kAnswerTimeout;
 }
 
-int BusLink::pollTimeout(const sdbus::IConnection::PollData& bus) const {
+int BusLink::timeout(const sdbus::IConnection::PollData& bus) const {
   const auto now = Clock::now();
   auto next = _tryAgainAt;
   if (_restsUntil) next = next ? std::min(*next, *_restsUntil) : _restsUntil;
@@ -212,11 +213,7 @@ int BusLink::pollTimeout(const sdbus::IConnection::PollData& bus) const {
     const auto overdueAt = _sent.begin()->second.at + kAnswerTimeout;
     next = next ? std::min(*next, overdueAt) : overdueAt;
   }
-  const int timeout = bus.getPollTimeout();
-  if (!next) return timeout;
-  const auto left = std::chrono::ceil<std::chrono::milliseconds>(*next - now);
-  const int wait = std::max(0, static_cast<int>(left.count()));
-  return timeout < 0 ? wait : std::min(timeout, wait);
+  return qel::shorterTimeout(qel::pollTimeout(next), bus.getPollTimeout());
 }
 
 bool BusLink::waitAndProcess(int wakeDescriptor) {
@@ -224,7 +221,7 @@ bool BusLink::waitAndProcess(int wakeDescriptor) {
   std::array<pollfd, 3> waited = {{{bus.fd, bus.events, 0},
                                    {wakeDescriptor, POLLIN, 0},
                                    {isAttached() && !_restsUntil ? _stream.get() : -1, POLLIN, 0}}};
-  ::poll(waited.data(), waited.size(), pollTimeout(bus));
+  ::poll(waited.data(), waited.size(), timeout(bus));
   const bool hasRested = _restsUntil && Clock::now() >= *_restsUntil;
   if (waited[2].revents != 0 || hasRested) processStream();
   if (waited[0].revents != 0 || bus.getPollTimeout() == 0) processBus();

@@ -86,7 +86,7 @@ class BusLink {
   // The registration is over, and what was sent under it comes to nothing.
   void detach(std::string_view why);
   void tryAgainLater(std::chrono::milliseconds longestPause);
-  int pollTimeout(const sdbus::IConnection::PollData& bus) const;
+  int timeout(const sdbus::IConnection::PollData& bus) const;
 
   const std::string _clientName;
   const EventSink _sink;

@@ -10,6 +10,7 @@
 #include <utility>
 #include <vector>
 
+#include "base/PollTimeout.h"
 #include "base/WakeUp.h"
 #include "tesk/bus/BusLink.h"
 #include "tesk/bus/Reasons.h"
@@ -166,11 +167,10 @@ class BusTransport::Worker {
     const auto end = std::chrono::steady_clock::now() + pause;
     while (!isStopping()) {
       runTasks(nullptr);
-      const auto left =
-          std::chrono::ceil<std::chrono::milliseconds>(end - std::chrono::steady_clock::now());
-      if (left.count() <= 0) return;
+      const int left = qel::pollTimeout(end);
+      if (left == 0) return;
       pollfd waited{_wakeUp.descriptor(), POLLIN, 0};
-      ::poll(&waited, 1, static_cast<int>(left.count()));
+      ::poll(&waited, 1, left);
       _wakeUp.clear();
     }
   }
