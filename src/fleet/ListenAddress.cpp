@@ -76,7 +76,8 @@ std::string whyNotFree(const ListenAddress& address) {
   const int yes = 1;
   ::setsockopt(descriptor, SOL_SOCKET, SO_REUSEADDR, &yes, sizeof yes);
   const auto* name = reinterpret_cast<const sockaddr*>(&there.storage);
-  const bool isFree = ::bind(descriptor, name, there.size) == 0 && ::listen(descriptor, 1) == 0;
+  // Not listened to: nobody is to meet a server here that is about to go.
+  const bool isFree = ::bind(descriptor, name, there.size) == 0;
   const std::string why = isFree ? "" : std::strerror(errno);
   ::close(descriptor);
   return why;
