@@ -46,6 +46,17 @@ TEST(EventPacket, leavesOutValuesThatDoNotTravel) {
             (Dictionary{{"a", 1}}));
 }
 
+TEST(EventPacket, isIdentifiedByAnInteger) {
+  const auto identified = [](std::string_view stream, const Dictionary& entries) {
+    return isIdentified(StreamEvent{stream, Message(entries)});
+  };
+  EXPECT_TRUE(identified(kEventMetric, kEvent));
+  EXPECT_FALSE(identified(kEventMetric, {}));
+  EXPECT_FALSE(identified(kEventMetric, {{"kKeyMetricID", "3952132"}}));
+  EXPECT_FALSE(identified(kEventMetric, {{"kKeyMetricID", Bytes{1}}}));
+  EXPECT_TRUE(identified(kEventTrigger, {}));
+}
+
 TEST(EventPacket, isNeverLargerThanItsLimit) {
   const auto sized = [](std::size_t size) {
     return encodeEvent(kEventMetric, Message(Dictionary{{"kKeyPayload", Bytes(size)}}));

@@ -16,6 +16,7 @@
 #include "bus/MoodyService.h"
 #include "bus/ServiceProcess.h"
 #include "tesk/Constants.h"
+#include "tesk/bus/EventPacket.h"
 
 namespace qel::testing {
 namespace {
@@ -235,6 +236,23 @@ TEST_F(ViewerOfASlowService, makesItsStartOnceTheServiceIsNoLongerTooBusy) {
   ASSERT_TRUE(eventually([&service] { return service.refusals() >= 2; }));
   service.setMoods(Mood::answers, Mood::answers);
   expectOneWholeStart(process, service);
+}
+
+// Bytes at random that happened to be a packet, of a metric event without a metric, ended it.
+TEST_F(ViewerOfASlowService, passesOverEventsThatNameNoMetric) {
+  MoodyService service(bus, Mood::answers, Mood::answers);
+  ChildProcess process(viewer());
+  ASSERT_TRUE(eventually([&service] { return service.commands().size() == 3; }));
+  const auto send = [&service](const Dictionary& entries) {
+    service.send(*tesk::bus::encodeEvent(tesk::kEventMetric, tesk::Message(entries)));
+  };
+  send({});
+  send({{"kKeyMetricID", "1"}});
+  send({{"kKeyMetricID", 1}});
+  EXPECT_TRUE(eventually(
+      [this] { return said().find("I dont care for this Metric") != std::string::npos; }));
+  process.signal(SIGTERM);
+  EXPECT_EQ(process.waitForEnd(), 0) << said();
 }
 
 }  // namespace

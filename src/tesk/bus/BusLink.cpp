@@ -256,7 +256,8 @@ std::size_t BusLink::readEvents() {
       tryAgainLater(kLongestPause);
       break;
     }
-    if (auto event = decodeEvent({packet.data(), static_cast<std::size_t>(size)})) {
+    auto event = decodeEvent({packet.data(), static_cast<std::size_t>(size)});
+    if (event && isIdentified(*event)) {
       _sink(event->name, std::move(event->message));
     }
   }

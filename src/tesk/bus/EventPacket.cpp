@@ -80,4 +80,10 @@ std::optional<StreamEvent> decodeEvent(qel::ByteView bytes) {
   return StreamEvent{stream->name, Message(std::move(entries))};
 }
 
+bool isIdentified(const StreamEvent& event) {
+  if (event.name != kEventMetric) return true;
+  const Value* identifier = event.message.entries().find(kKeyMetricID);
+  return identifier && identifier->asInt64();
+}
+
 }  // namespace tesk::bus

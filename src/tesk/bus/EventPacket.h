@@ -24,4 +24,7 @@ std::optional<qel::Bytes> encodeEvent(std::string_view eventName, const Message&
 // Nothing for bytes that are no packet.
 std::optional<StreamEvent> decodeEvent(qel::ByteView packet);
 
+// Whether a metric event says of which metric it is: what comes without may be anybody's bytes.
+bool isIdentified(const StreamEvent& event);
+
 }  // namespace tesk::bus

@@ -42,12 +42,14 @@ TEST(WatchAtABrokenService, givesTheTerminalBackBeforeItEndsFatally) {
   WatchAtPty watch({"--bus", bus.address()});
   const termios before = watch.settings();
   ASSERT_TRUE(watch.writes("Connected, no reports yet"));
-  const auto packet = tesk::bus::encodeEvent(tesk::kEventMetric, tesk::Message());
+  const auto packet = tesk::bus::encodeEvent(
+      tesk::kEventMetric,
+      tesk::Message(Dictionary{{"kKeyMetricID", 0x3C4E04}, {"kKeyPayload", Bytes{0xFF}}}));
   ASSERT_TRUE(packet);
   service.send(*packet);
   EXPECT_EQ(watch.waitForEnd(), -SIGABRT);
   EXPECT_TRUE(WatchAtPty::areSame(watch.settings(), before));
-  ASSERT_TRUE(watch.writes("fatal error: "));
+  ASSERT_TRUE(watch.writes("fatal error: metric 3C4E04 has an undecodable payload"));
   EXPECT_LT(watch.written().find("\x1B[?1049l"), watch.written().find("fatal error: "));
 }
 
