@@ -103,7 +103,7 @@ Step timeOurs(const std::vector<Payload>& payloads) {
 }
 
 Dictionary eventOf(const Payload& payload) {
-  return {{"kKeyMetricID", payload.metric + kMetricEventBase},
+  return {{"kKeyMetricID", std::int64_t{payload.metric} + std::int64_t{kMetricEventBase}},
           {"kKeyProfileID", 0},
           {"kKeyPayload", payload.bytes}};
 }

@@ -2,7 +2,6 @@
 
 #include <algorithm>
 #include <array>
-#include <bit>
 #include <string>
 
 #include "base/FatalError.h"
@@ -14,28 +13,45 @@ namespace {
 
 constexpr std::size_t kLongestHexadecimal = 16;
 
-// "%2X" of a 64-bit integer; the place behind it.
-char* putHexadecimal(char* at, std::int64_t number) {
-  constexpr unsigned kBits = 4;  // of a digit
-  const auto bits = static_cast<std::uint64_t>(number);
-  unsigned left = std::max(1U, (static_cast<unsigned>(std::bit_width(bits)) + kBits - 1) / kBits);
-  if (left == 1) *at++ = ' ';
-  while (left-- > 0) *at++ = "0123456789ABCDEF"[bits >> kBits * left & 0xF];
-  return at;
+// The two digits of every byte.
+constexpr auto kHexadecimal = [] {
+  std::array<std::array<char, 2>, 256> texts{};
+  for (std::size_t byte = 0; byte < texts.size(); ++byte) {
+    texts[byte] = {"0123456789ABCDEF"[byte >> 4], "0123456789ABCDEF"[byte & 0xF]};
+  }
+  return texts;
+}();
+
+// "%2X" of a 64-bit integer before a place; where it begins.
+char* putHexadecimal(std::int64_t number, char* end) {
+  const auto put = [&end](std::uint64_t byte) {
+    end -= 2;
+    std::ranges::copy(kHexadecimal[byte & 0xFF], end);
+  };
+  auto left = static_cast<std::uint64_t>(number);
+  for (; left > 0xFF; left >>= 8) put(left);
+  put(left);
+  if (left > 0xF) return end;
+  if (left != static_cast<std::uint64_t>(number)) return end + 1;
+  *end = ' ';
+  return end;
 }
 
 void logHexadecimal(std::int64_t identifier, LogSink& output) {
   if (!output.wantsLines()) return;
   constexpr std::string_view kText = "Metric ID in Hex = ";
   std::array<char, kText.size() + kLongestHexadecimal> line;
-  const char* end = putHexadecimal(std::ranges::copy(kText, line.data()).out, identifier);
-  output.write({line.data(), end});
+  char* const end = line.data() + line.size();
+  char* const number = putHexadecimal(identifier, end);
+  std::ranges::copy(kText, number - kText.size());
+  output.write({number - kText.size(), end});
 }
 
 [[noreturn]] void refusePayload(std::int64_t identifier) {
-  std::array<char, kLongestHexadecimal> number;
-  char* const end = putHexadecimal(number.data(), identifier);
-  fatalError("metric " + std::string(number.data(), end) + " has an undecodable payload");
+  std::array<char, kLongestHexadecimal> text;
+  char* const end = text.data() + text.size();
+  fatalError("metric " + std::string(putHexadecimal(identifier, end), end) +
+             " has an undecodable payload");
 }
 
 }  // namespace

@@ -2,7 +2,10 @@
 
 #include <gtest/gtest.h>
 
+#include <array>
+#include <cinttypes>
 #include <csignal>
+#include <cstdio>
 
 #include "base/Rendering.h"
 #include "messages/lte_serving.h"
@@ -64,6 +67,19 @@ TEST(MetricValidator, writesShortAndNegativeIdentifiersInHex) {
   EXPECT_EQ(lines.at(0), "Metric ID in Hex =  5");
   EXPECT_EQ(lines.at(2), "Metric ID in Hex =  0");
   EXPECT_EQ(lines.at(4), "Metric ID in Hex = FFFFFFFFFFFFFFFF");
+}
+
+TEST(MetricValidator, writesIdentifiersOfAnyLengthInHex) {
+  FedValidator validator;
+  std::size_t line = 0;
+  for (unsigned width = 1; width <= 64; ++width) {
+    const std::uint64_t bits = 0xA5C3'1E72'9B04'6DF8U >> (64 - width);
+    validator->processMetric(metricEvent(static_cast<std::int64_t>(bits), Bytes()));
+    std::array<char, 40> expected{};
+    std::snprintf(expected.data(), expected.size(), "Metric ID in Hex = %2" PRIX64, bits);
+    EXPECT_EQ(validator.out.lines().at(line), expected.data());
+    line = validator.out.lines().size();
+  }
 }
 
 TEST(MetricValidator, doesNotLookAtThePayloadOfAnUnknownMetric) {
