@@ -19,7 +19,7 @@ std::string faultOf(const FileContent& file) {
     case FileContent::Fault::unreadable:
       return std::strerror(file.error);
     case FileContent::Fault::notRegular:
-      return "no regular file";
+      return "not a regular file";
     case FileContent::Fault::tooLarge:
       return "longer than " + std::to_string(kLongestLogin) + " bytes";
     case FileContent::Fault::none:

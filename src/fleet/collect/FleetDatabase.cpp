@@ -12,6 +12,7 @@
 #include "fleet/collect/ArrayText.h"
 #include "fleet/collect/FleetSchema.h"
 #include "fleet/collect/SchemaLook.h"
+#include "fleet/collect/WatchedConnection.h"
 
 namespace qel::fleet {
 namespace {
@@ -162,20 +163,11 @@ void insertQueues(pqxx::work& transaction, const std::vector<const PhoneQueue*>&
 
 }  // namespace
 
-struct FleetDatabase::Session {
-  Session(const std::string& address, const AnswerPatience& patience)
-      : connection(withRole(address, patience.statement)), watch(patience) {}
-
-  // Before each statement that may take long.
-  void expectAnswer() { watch.expect(connection.sock()); }
-
-  pqxx::connection connection;
-  AnswerWatch watch;
-};
-
 FleetDatabase::FleetDatabase(const std::string& address, const AnswerPatience& patience,
                              const Clock& clock)
-    : _clock(clock), _session(std::make_unique<Session>(address, patience)) {}
+    : _clock(clock),
+      _connection(
+          std::make_unique<WatchedConnection>(withRole(address, patience.statement), patience)) {}
 
 FleetDatabase::~FleetDatabase() = default;
 
@@ -185,22 +177,13 @@ std::unique_ptr<FleetDatabase> FleetDatabase::open(const std::string& address,
   std::unique_ptr<FleetDatabase> database;
   const auto connect = [&] { database.reset(new FleetDatabase(address, patience, clock)); };
   if (!guarded(connect, trouble)) return nullptr;
-  if (!database->answersTo([&] { database->checkLayout(); }, trouble)) return nullptr;
+  const auto check = [&] { database->checkLayout(); };
+  if (!database->_connection->answersTo(check, trouble)) return nullptr;
   return database;
 }
 
-bool FleetDatabase::answersTo(const std::function<void()>& work, DatabaseTrouble& trouble) {
-  _session->expectAnswer();
-  const bool isDone = guarded(work, trouble);
-  _session->watch.answered();
-  if (!isDone && _session->watch.hasGivenUp()) {
-    trouble = {DatabaseTrouble::Kind::silent, "it does not answer"};
-  }
-  return isDone;
-}
-
 void FleetDatabase::checkLayout() {
-  pqxx::work transaction(_session->connection);
+  pqxx::work transaction(_connection->library());
   const FoundTables tables = foundTables(transaction);
   const std::string prepare = "; qelctl collect --prepare makes them so";
   if (tables.empty()) throw WrongLayout("it has no tables of this program" + prepare);
@@ -223,8 +206,8 @@ void FleetDatabase::checkLayout() {
 
 void FleetDatabase::makeDay(std::int64_t day) {
   if (_days.contains(day)) return;
-  _session->expectAnswer();
-  pqxx::work transaction(_session->connection);
+  _connection->expectAnswer();
+  pqxx::work transaction(_connection->library());
   transaction.exec_params("SELECT qelwatch.make_day(date '1970-01-01' + $1::integer)",
                           std::to_string(day));
   transaction.commit();
@@ -245,7 +228,7 @@ void FleetDatabase::makeDays(std::span<const PhoneMessage> messages) {
 bool FleetDatabase::store(std::span<const PhoneMessage> messages, StoredCounts& counts,
                           DatabaseTrouble& trouble) {
   if (messages.empty()) return true;
-  return answersTo(
+  return _connection->answersTo(
       [&] {
         makeDays(messages);
         storeOrSplit(messages, counts);
@@ -295,8 +278,8 @@ void FleetDatabase::storeAll(std::span<const PhoneMessage> messages, StoredCount
   for (const NumberedEvent* event : events) {
     if (!_knownPhones.contains(event->phone)) newPhones.insert(event->phone);
   }
-  _session->expectAnswer();
-  pqxx::work transaction(_session->connection);
+  _connection->expectAnswer();
+  pqxx::work transaction(_connection->library());
   if (!newPhones.empty()) {
     ArrayText phones;
     for (const std::string& phone : newPhones) phones.add(phone);
@@ -310,10 +293,10 @@ void FleetDatabase::storeAll(std::span<const PhoneMessage> messages, StoredCount
     if (!event->rows.empty()) byTable[event->table].push_back(event);
   }
   for (const auto& [table, ofTable] : byTable) {
-    _session->expectAnswer();
+    _connection->expectAnswer();
     copyRows(transaction, *table, ofTable);
   }
-  _session->expectAnswer();
+  _connection->expectAnswer();
   insertStatus(transaction, allOf<PhoneStatus>(messages));
   insertQueues(transaction, allOf<PhoneQueue>(messages));
   transaction.commit();

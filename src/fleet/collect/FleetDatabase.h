@@ -2,7 +2,6 @@
 #pragma once
 
 #include <cstdint>
-#include <functional>
 #include <memory>
 #include <set>
 #include <span>
@@ -15,6 +14,8 @@
 #include "fleet/collect/PhoneMessage.h"
 
 namespace qel::fleet {
+
+class WatchedConnection;
 
 struct StoredCounts {
   std::uint64_t stored = 0;   // events
@@ -42,10 +43,7 @@ class FleetDatabase {
              DatabaseTrouble& trouble);
 
  private:
-  struct Session;
-
   FleetDatabase(const std::string& address, const AnswerPatience& patience, const Clock& clock);
-  bool answersTo(const std::function<void()>& work, DatabaseTrouble& trouble);
   void checkLayout();
   void makeDays(std::span<const PhoneMessage> messages);
   void makeDay(std::int64_t day);
@@ -54,7 +52,7 @@ class FleetDatabase {
   void storeAll(std::span<const PhoneMessage> messages, StoredCounts& counts);
 
   const Clock& _clock;
-  const std::unique_ptr<Session> _session;
+  const std::unique_ptr<WatchedConnection> _connection;
   std::int64_t _today = 0;
   std::set<std::int64_t> _days;        // since 1970, that were asked for today
   std::set<std::string> _knownPhones;  // some of those in the table

@@ -1,9 +1,11 @@
 #include "fleet/collect/Preparation.h"
 
+#include <memory>
 #include <pqxx/pqxx>
 
 #include "fleet/collect/FleetSchema.h"
 #include "fleet/collect/SchemaLook.h"
+#include "fleet/collect/WatchedConnection.h"
 
 namespace qel::fleet {
 namespace {
@@ -13,11 +15,12 @@ std::string layoutText(int layout) { return "layout " + std::to_string(layout); 
 // One run of this at a time.
 class Preparation {
  public:
-  Preparation(pqxx::transaction_base& transaction, Prepared& prepared)
-      : _transaction(transaction), _prepared(prepared) {}
+  Preparation(WatchedConnection& connection, pqxx::transaction_base& transaction,
+              Prepared& prepared)
+      : _connection(connection), _transaction(transaction), _prepared(prepared) {}
 
   void run() {
-    _transaction.exec("SELECT pg_advisory_xact_lock(hashtext('qelwatch.prepare'))");
+    exec("SELECT pg_advisory_xact_lock(hashtext('qelwatch.prepare'))");
     const int layout = foundLayout(_transaction);
     if (layout > kLayout) {
       throw WrongLayout("its tables have " + layoutText(layout) + ", this program knows " +
@@ -25,22 +28,26 @@ class Preparation {
     }
     _found = foundTables(_transaction);
     const Partitions partitions = choosePartitions();
-    _transaction.exec("CREATE SCHEMA IF NOT EXISTS qelwatch");
-    _transaction.exec(
+    exec("CREATE SCHEMA IF NOT EXISTS qelwatch");
+    exec(
         "CREATE TABLE IF NOT EXISTS qelwatch.version"
         " (layout integer NOT NULL, made timestamptz NOT NULL DEFAULT now())");
     for (const SchemaTable& table : schemaTables()) makeTable(table, partitions);
-    _transaction.exec(functions(partitions));
-    _transaction.exec(views());
-    _transaction.exec(roles());
-    _transaction.exec(rights());
+    exec(functions(partitions));
+    exec(views());
+    exec(roles());
+    exec(rights());
     if (layout == 0) {
-      _transaction.exec("INSERT INTO qelwatch.version (layout) VALUES (" + std::to_string(kLayout) +
-                        ")");
+      exec("INSERT INTO qelwatch.version (layout) VALUES (" + std::to_string(kLayout) + ")");
     }
   }
 
  private:
+  void exec(const std::string& statement) {
+    _connection.expectAnswer();
+    _transaction.exec(statement);
+  }
+
   bool isTrue(const std::string& question) {
     return _transaction.exec1("SELECT EXISTS (" + question + ")")[0].as<bool>();
   }
@@ -60,20 +67,19 @@ class Preparation {
   void makeTable(const SchemaTable& table, Partitions partitions) {
     const auto found = _found.find(table.name);
     if (found == _found.end()) {
-      _transaction.exec(creationOf(table, partitions));
+      exec(creationOf(table, partitions));
       ++_prepared.tables;
     } else {
       for (const SchemaColumn& column : table.columns) makeColumn(table, column, found->second);
     }
-    _transaction.exec(commentsOf(table));
+    exec(commentsOf(table));
   }
 
   void makeColumn(const SchemaTable& table, const SchemaColumn& column,
                   const FoundTables::mapped_type& found) {
     const auto there = found.find(column.name);
     if (there == found.end()) {
-      _transaction.exec("ALTER TABLE " + withSchema(table.name) + " ADD COLUMN " +
-                        definitionOf(column));
+      exec("ALTER TABLE " + withSchema(table.name) + " ADD COLUMN " + definitionOf(column));
       ++_prepared.columns;
     } else if (there->second != column.type) {
       throw WrongLayout(withSchema(table.name) + " has " + there->second + " as " + column.name +
@@ -81,6 +87,7 @@ class Preparation {
     }
   }
 
+  WatchedConnection& _connection;
   pqxx::transaction_base& _transaction;
   Prepared& _prepared;
   FoundTables _found;
@@ -88,24 +95,27 @@ class Preparation {
 
 }  // namespace
 
-bool prepareDatabase(const std::string& address, Prepared& prepared, DatabaseTrouble& trouble) {
-  return guarded(
-      [&] {
-        pqxx::connection connection(address);
-        {
-          pqxx::work transaction(connection);
-          transaction.exec("SET LOCAL client_min_messages = warning");
-          Preparation(transaction, prepared).run();
-          transaction.commit();
-        }
-        for (const char* day : {"0", "1"}) {
-          pqxx::work transaction(connection);
-          transaction.exec("SELECT qelwatch.make_day((now() AT TIME ZONE 'UTC')::date + " +
-                           std::string(day) + ")");
-          transaction.commit();
-        }
-      },
-      trouble);
+bool prepareDatabase(const std::string& address, const AnswerPatience& patience, Prepared& prepared,
+                     DatabaseTrouble& trouble) {
+  std::unique_ptr<WatchedConnection> connection;
+  const auto connect = [&] { connection = std::make_unique<WatchedConnection>(address, patience); };
+  const auto prepare = [&] {
+    {
+      pqxx::work transaction(connection->library());
+      transaction.exec("SET client_min_messages = warning");
+      transaction.exec("SET statement_timeout = " + std::to_string(patience.statement.count()));
+      Preparation(*connection, transaction, prepared).run();
+      transaction.commit();
+    }
+    for (const char* day : {"0", "1"}) {
+      connection->expectAnswer();
+      pqxx::work transaction(connection->library());
+      transaction.exec("SELECT qelwatch.make_day((now() AT TIME ZONE 'UTC')::date + " +
+                       std::string(day) + ")");
+      transaction.commit();
+    }
+  };
+  return guarded(connect, trouble) && connection->answersTo(prepare, trouble);
 }
 
 }  // namespace qel::fleet

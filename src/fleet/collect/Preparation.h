@@ -3,6 +3,7 @@
 
 #include <string>
 
+#include "fleet/collect/AnswerWatch.h"
 #include "fleet/collect/DatabaseTrouble.h"
 
 namespace qel::fleet {
@@ -16,6 +17,7 @@ struct Prepared {
 
 // By somebody who may make schemas and roles; all at once or nothing. What is there stays. False
 // when it could not be done.
-bool prepareDatabase(const std::string& address, Prepared& prepared, DatabaseTrouble& trouble);
+bool prepareDatabase(const std::string& address, const AnswerPatience& patience, Prepared& prepared,
+                     DatabaseTrouble& trouble);
 
 }  // namespace qel::fleet

@@ -16,7 +16,7 @@ inline std::unique_ptr<RecordingReader> openedRecording(const std::string& path,
                                                         RecordingFault& fault) {
   struct stat status {};
   if (::stat(path.c_str(), &status) == 0 && !S_ISREG(status.st_mode)) {
-    fault = {RecordingFault::Kind::notOpened, path + ": no regular file"};
+    fault = {RecordingFault::Kind::notOpened, path + ": not a regular file"};
     return nullptr;
   }
   return RecordingReader::open(path, RecordingReader::BadLines::skip, fault);

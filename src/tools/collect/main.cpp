@@ -59,10 +59,11 @@ int exitCodeOf(const fleet::DatabaseTrouble& trouble) {
   return trouble.kind == fleet::DatabaseTrouble::Kind::layout ? EX_CONFIG : EX_UNAVAILABLE;
 }
 
-void prepare(const std::string& database) {
+void prepare(const Options& options, const std::string& database) {
   fleet::Prepared prepared;
   fleet::DatabaseTrouble trouble;
-  if (!fleet::prepareDatabase(database, prepared, trouble)) {
+  const fleet::AnswerPatience patience{std::chrono::milliseconds(options.patienceMs)};
+  if (!fleet::prepareDatabase(database, patience, prepared, trouble)) {
     throw ToolError(exitCodeOf(trouble), "database", trouble.why);
   }
   say("database: " + std::to_string(prepared.tables) + " tables made, " +
@@ -179,7 +180,7 @@ int run(int argc, char** argv) {
   }
   leaveNoCore();
   std::signal(SIGPIPE, SIG_IGN);
-  options.prepares ? prepare(database) : collect(options, database);
+  options.prepares ? prepare(options, database) : collect(options, database);
   return EX_OK;
 }
 

@@ -109,6 +109,39 @@ TEST_F(CollectTrouble, isADatabaseThatHangsAtTheEnd) {
   expectAllOnce();
 }
 
+// Of somebody else who prepares the same database, until this object ends.
+class OtherPreparation {
+ public:
+  explicit OtherPreparation(const Postgres& database)
+      : _session(database.session("SELECT pg_advisory_lock(hashtext('qelwatch.prepare'));"
+                                  "SELECT pg_sleep(600)")) {
+    EXPECT_TRUE(eventually([&] {
+      return database.number("SELECT count(*) FROM pg_locks WHERE locktype = 'advisory'") == 1;
+    }));
+  }
+
+ private:
+  const std::unique_ptr<ChildProcess> _session;
+};
+
+TEST_F(CollectTrouble, isADatabaseThatTakesTooLongToPrepare) {
+  const OtherPreparation other(*database);
+  expectEnd({"collect", "--prepare", "--patience", "1s", "--database", database->address("owner")},
+            69, "database: canceling statement due to statement timeout");
+}
+
+TEST_F(CollectTrouble, isADatabaseThatHangsWhileItIsPrepared) {
+  const OtherPreparation other(*database);
+  RunningQelctl program(
+      {"collect", "--prepare", "--patience", "5s", "--database", database->address("owner")});
+  ASSERT_TRUE(eventually([&] {
+    return database->number("SELECT count(*) FROM pg_locks WHERE locktype = 'advisory'") == 2;
+  })) << program.err();
+  const HangingServer hanging(*database);
+  EXPECT_EQ(program.waitForEnd(), 69);
+  EXPECT_TRUE(program.hasSaid("database: it does not answer\n")) << program.err();
+}
+
 TEST_F(CollectTrouble, isABrokerThatGoesAndComes) {
   prepare();
   const auto program = collector();

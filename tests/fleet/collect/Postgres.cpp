@@ -111,6 +111,12 @@ std::string Postgres::ask(const std::string& sql) const {
   return out;
 }
 
+std::unique_ptr<ChildProcess> Postgres::session(const std::string& sql) const {
+  return std::make_unique<ChildProcess>(Launch{
+      .words = {binaries() + "psql", "-h", _folder, "-U", "owner", "-Atq", "-c", sql, "fleet"},
+      .out = _folder + "/session"});
+}
+
 std::vector<std::string> Postgres::lines(const std::string& sql) const {
   std::vector<std::string> all;
   std::istringstream stream(ask(sql));

@@ -31,6 +31,9 @@ class Postgres {
   // As that user: the error, or nothing.
   std::string complaint(const std::string& user, const std::string& sql) const;
 
+  // The owner, who says this and waits for the answers until the object is gone.
+  std::unique_ptr<ChildProcess> session(const std::string& sql) const;
+
   void start();
   // Like a machine that loses its power.
   void kill();
