@@ -43,9 +43,10 @@ class Preparation {
   }
 
  private:
+  // What follows has all of its time, however long this one took.
   void exec(const std::string& statement) {
-    _connection.expectAnswer();
     _transaction.exec(statement);
+    _connection.expectAnswer();
   }
 
   bool isTrue(const std::string& question) {
