@@ -11,9 +11,9 @@
 #include "base/Rendering.h"
 #include "base/TimeZone.h"
 #include "history/History.h"
-#include "messages/catalogue/KBBMetricUtility.h"
 #include "messages/catalogue/MetricMessages.h"
 #include "metrics/MetricValidator.h"
+#include "sources/SourceEvent.h"
 
 namespace qel::bench {
 namespace {
@@ -103,9 +103,7 @@ Step timeOurs(const std::vector<Payload>& payloads) {
 }
 
 Dictionary eventOf(const Payload& payload) {
-  return {{"kKeyMetricID", std::int64_t{payload.metric} + std::int64_t{kMetricEventBase}},
-          {"kKeyProfileID", 0},
-          {"kKeyPayload", payload.bytes}};
+  return sources::metricEvent(payload.metric, payload.bytes, 0).entries;
 }
 
 namespace {
